@@ -1,0 +1,31 @@
+#pragma once
+
+#include <cstddef>
+
+namespace ovrin_yaml {
+
+/// Memory for the many small objects of value trees and diffs.
+///
+/// Each thread carves its requests from chunks of its own, so that no lock is taken. Memory lives until the
+/// process ends, whichever thread asked for it and whether or not that thread is still there; single pieces
+/// are never given back to the system. Under AddressSanitizer every request is an allocation of its own, so
+/// that overruns are seen.
+///
+/// Returns `bytes` bytes, aligned for any pointer or integer. Throws std::bad_alloc when there is no memory.
+void* ArenaAllocate(std::size_t bytes);
+
+/// A stateless allocator for std::vector over ArenaAllocate. What a growing vector leaves behind stays in the
+/// arena, so reserve where the count is known.
+template <class T> struct ArenaAllocator {
+    using value_type = T;
+
+    ArenaAllocator() = default;
+    template <class U> ArenaAllocator(const ArenaAllocator<U>&) {}
+
+    T* allocate(std::size_t count) { return static_cast<T*>(ArenaAllocate(count * sizeof(T))); }
+    void deallocate(T*, std::size_t) {}
+
+    template <class U> bool operator==(const ArenaAllocator<U>&) const { return true; }
+};
+
+} // namespace ovrin_yaml

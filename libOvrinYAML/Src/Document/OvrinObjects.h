@@ -1,0 +1,31 @@
+#pragma once
+
+#include "Document/YAMLMapping.h"
+
+#include <iosfwd>
+#include <string>
+
+namespace ovrin_yaml {
+
+/// One object file: a root mapping from file-id scalar to object mapping, in file order.
+///
+/// An object mapping holds the body's keys (normally one, the class name) and behind them the header's data:
+/// MERGE_FileID, MERGE_ClassID and, if the header line ended in " stripped", MERGE_StrippedPrefab.
+/// An object is destroyed without giving back its tree: programs end soon after.
+class OvrinObjects {
+public:
+    YAMLMapping& GetMapping() { return m_Root; }
+    const YAMLMapping& GetMapping() const { return m_Root; }
+
+    /// Writes the file as the editor does. Throws YAMLError "Object has no class id: " and the id's text when
+    /// an object lost the entry, and the duplicate-keys text when an object holds repeated keys at its top.
+    void Output(std::ostream& stream) const;
+
+    /// A deep copy, owned by the caller.
+    OvrinObjects* Clone() const;
+
+private:
+    YAMLMapping m_Root;
+};
+
+} // namespace ovrin_yaml

@@ -1,0 +1,93 @@
+#include "Document/ScalarTable.h"
+
+#include "Document/Arena.h"
+#include "Document/Hash.h"
+
+#include <cstring>
+#include <new>
+
+namespace ovrin_yaml {
+
+namespace {
+
+/// Scalar hashes enter container hashes, which decide what counts as equal: the seed is part of the system.
+constexpr std::uint32_t kScalarSeed = 42;
+
+constexpr unsigned kTagShift = 48;
+constexpr std::uint64_t kAddressMask = (std::uint64_t{1} << kTagShift) - 1;
+
+/// The top bits of a hash choose the shard and its low bits the place, so the tag comes from between.
+std::uint64_t Tag(std::uint32_t hash) {
+    return hash >> 10 & 0xffffu;
+}
+
+std::uint64_t Pack(YAMLScalar* scalar) {
+    return Tag(scalar->m_Hash) << kTagShift | reinterpret_cast<std::uint64_t>(scalar);
+}
+
+YAMLScalar* Unpack(std::uint64_t slot) {
+    return reinterpret_cast<YAMLScalar*>(slot & kAddressMask);
+}
+
+} // namespace
+
+ScalarTable& ScalarTable::Instance() {
+    // Never destroyed: scalars are used until the process ends, by static objects too.
+    static ScalarTable& table = *new ScalarTable;
+    return table;
+}
+
+YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t line) {
+    const std::uint32_t hash = MurmurHash3(text, kScalarSeed);
+    Shard& shard = m_Shards[hash >> (32 - kShardBits)];
+    if (const Slots* slots = shard.slots.load(std::memory_order_acquire))
+        if (YAMLScalar* scalar = Find(*slots, text, hash)) return scalar;
+
+    const std::lock_guard lock(shard.mutex);
+    Slots* slots = shard.slots.load(std::memory_order_relaxed);
+    if (slots)
+        if (YAMLScalar* scalar = Find(*slots, text, hash)) return scalar;
+    if (!slots || 2 * (shard.count + 1) > slots->mask + 1) Grow(shard);
+    YAMLScalar* scalar = Make(text, hash, line);
+    Fill(*shard.slots.load(std::memory_order_relaxed), scalar);
+    ++shard.count;
+    return scalar;
+}
+
+YAMLScalar* ScalarTable::Find(const Slots& slots, std::string_view text, std::uint32_t hash) {
+    for (std::size_t place = hash;; ++place) {
+        const std::uint64_t slot = slots.entries[place & slots.mask].load(std::memory_order_acquire);
+        if (!slot) return nullptr;
+        if (slot >> kTagShift != Tag(hash)) continue;
+        YAMLScalar* scalar = Unpack(slot);
+        if (scalar->m_Hash == hash && scalar->Value() == text) return scalar;
+    }
+}
+
+void ScalarTable::Fill(const Slots& slots, YAMLScalar* scalar) {
+    std::size_t place = scalar->m_Hash;
+    while (slots.entries[place & slots.mask].load(std::memory_order_relaxed)) ++place;
+    slots.entries[place & slots.mask].store(Pack(scalar), std::memory_order_release);
+}
+
+YAMLScalar* ScalarTable::Make(std::string_view text, std::uint32_t hash, std::uint32_t line) {
+    // One piece of memory for the object and, behind it, the text with a NUL.
+    char* memory = static_cast<char*>(ArenaAllocate(sizeof(YAMLScalar) + text.size() + 1));
+    char* copy = memory + sizeof(YAMLScalar);
+    if (!text.empty()) std::memcpy(copy, text.data(), text.size());
+    copy[text.size()] = '\0';
+    return new (memory) YAMLScalar(copy, static_cast<std::uint32_t>(text.size()), hash, line);
+}
+
+void ScalarTable::Grow(Shard& shard) {
+    Slots* old = shard.slots.load(std::memory_order_relaxed);
+    shard.all.push_back(std::make_unique<Slots>(old ? 2 * (old->mask + 1) : kFirstCapacity));
+    Slots* grown = shard.all.back().get();
+    if (old)
+        for (std::size_t i = 0; i <= old->mask; ++i)
+            if (const std::uint64_t slot = old->entries[i].load(std::memory_order_relaxed))
+                Fill(*grown, Unpack(slot));
+    shard.slots.store(grown, std::memory_order_release);
+}
+
+} // namespace ovrin_yaml

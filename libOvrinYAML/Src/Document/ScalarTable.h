@@ -1,0 +1,60 @@
+#pragma once
+
+#include "Document/YAMLScalar.h"
+
+#include <array>
+#include <atomic>
+#include <memory>
+#include <mutex>
+#include <string_view>
+#include <vector>
+
+namespace ovrin_yaml {
+
+/// The set of all interned scalars: a hash table cut into shards by the upper bits of the hash.
+///
+///     shard 0   slots -> [ . s . . s s . . ]     open addressing, linear probing, at most half full
+///     ...
+///     shard 63  slots -> [ s . . . ]
+///
+/// A text that is known is found without a lock: slots are only ever filled, never emptied or changed, so a
+/// reader sees either the scalar or an empty slot. Only the second case takes the shard's lock, looks again
+/// and fills the slot. A full shard gets a table of twice the size; the old one stays readable for those who
+/// still look at it, and they fall through to the lock if it lacks the scalar.
+class ScalarTable {
+public:
+    static ScalarTable& Instance();
+
+    /// The one scalar of `text`; a new one gets `line`.
+    YAMLScalar* Intern(std::string_view text, std::uint32_t line);
+
+private:
+    /// A scalar's address with 16 bits of its hash above it, so that most probes of other scalars need not
+    /// look into memory elsewhere. User addresses have 47 bits on the platforms served.
+    using Slot = std::atomic<std::uint64_t>;
+
+    struct Slots {
+        explicit Slots(std::size_t capacity) : mask(capacity - 1), entries(new Slot[capacity]()) {}
+        const std::size_t mask;
+        const std::unique_ptr<Slot[]> entries;
+    };
+
+    struct alignas(64) Shard {
+        std::atomic<Slots*> slots{nullptr};
+        std::mutex mutex;
+        std::size_t count = 0;
+        std::vector<std::unique_ptr<Slots>> all; // the current table last
+    };
+
+    static constexpr unsigned kShardBits = 6;
+    static constexpr std::size_t kFirstCapacity = 64;
+
+    static YAMLScalar* Find(const Slots& slots, std::string_view text, std::uint32_t hash);
+    static void Fill(const Slots& slots, YAMLScalar* scalar);
+    static YAMLScalar* Make(std::string_view text, std::uint32_t hash, std::uint32_t line);
+    static void Grow(Shard& shard);
+
+    std::array<Shard, std::size_t{1} << kShardBits> m_Shards;
+};
+
+} // namespace ovrin_yaml

@@ -1,0 +1,49 @@
+#pragma once
+
+#include "Document/Arena.h"
+#include "Document/YAMLAlloc.h"
+#include "Document/YAMLError.h"
+#include "Document/YAMLNode.h"
+
+#include <vector>
+
+namespace ovrin_yaml {
+
+class YAMLScalar;
+
+using NodeList = std::vector<YAMLNode*, ArenaAllocator<YAMLNode*>>;
+
+/// A list of values, which it owns. An item may be null (a hole) only while operations are being applied;
+/// hashing and writing need all items.
+class YAMLSequence final : public YAMLNode {
+public:
+    explicit YAMLSequence(bool flow = false) : YAMLNode(Kind::Sequence), m_Flow(flow) {}
+    YAMLSequence(const YAMLSequence&) = delete;
+    YAMLSequence& operator=(const YAMLSequence&) = delete;
+
+    /// The sequence was written in flow style, [...].
+    bool m_Flow;
+    NodeList m_Items;
+
+    void Append(const YAMLScalar* item);
+    /// The item, which may be null. Throws "Cannot get non existing index in YAMLSequence".
+    YAMLNode* Get(int index) const;
+    /// Replaces the item and returns the old one. Throws "Cannot change non existing index in YAMLSequence".
+    YAMLNode* Set(int index, YAMLNode* item);
+    /// Appends holes until `count` items are there.
+    void GrowTo(std::size_t count);
+    /// Closes all holes; what stands behind one moves forward.
+    void DropHoles();
+    /// A deep copy; holes stay.
+    YAMLSequence* StaticClone() const;
+
+    void Free() override { YAMLAlloc<YAMLSequence>::free(this); }
+    YAMLNode* Clone() const override { return StaticClone(); }
+    bool Equals(const YAMLNode* other) const override;
+    bool EqualsExpensive(const YAMLNode* other) const override;
+    void Accept(YAMLNodeVisitor& visitor) override { visitor.Visit(*this); }
+    void RebuildHash(bool shallow) override;
+    void ResetForAlloc();
+};
+
+} // namespace ovrin_yaml
