@@ -57,7 +57,7 @@ bool MergeRules::MatchesPath(const Path& pattern, const Path& path) {
 const std::vector<Path>& MergeRules::SelectKeyPaths(const Path& path) {
     if (path.size() == 1 && path[0] == YAMLScalar::underscore) return defaultDirectPath;
     for (const SequenceInfo& rule : s_ArrayUniqueKeyMap)
-        if (MatchesPath(rule.path, path)) return rule.type == Set ? rule.keys : noPaths;
+        if (MatchesPath(rule.path, path)) return rule.type == SequenceType::Set ? rule.keys : noPaths;
     return defaultPath;
 }
 

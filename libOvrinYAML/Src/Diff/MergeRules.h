@@ -11,7 +11,7 @@
 namespace ovrin_yaml {
 
 /// How the elements of a list are matched: by key, or by equality.
-enum SequenceType { Set = 0, Plain = 1 };
+enum class SequenceType { Set = 0, Plain = 1 };
 
 struct SequenceInfo {
     SequenceType type;

@@ -100,7 +100,8 @@ void RulesReader::ReadArrayRule() const {
     const bool set = m_Tokens[0] == "set";
     Require(set || m_Tokens[0] == "plain", "Invalid rule format missing action at line ");
     Require(!set || m_Tokens.size() > 2, "Invalid format of unique key specification at line ");
-    MergeRules::AddSequenceUniqueKeys(set ? Set : Plain, ToPath(m_Tokens[1]), FieldPaths());
+    const SequenceType type = set ? SequenceType::Set : SequenceType::Plain;
+    MergeRules::AddSequenceUniqueKeys(type, ToPath(m_Tokens[1]), FieldPaths());
 }
 
 void RulesReader::ReadExclusionRule() const {

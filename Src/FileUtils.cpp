@@ -1,0 +1,104 @@
+#include "FileUtils.h"
+
+#include "ErrMsg.h"
+
+#include <cerrno>
+#include <climits>
+#include <cstdlib>
+#include <fcntl.h>
+#include <fstream>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace {
+
+std::stringstream errs;
+
+/// The read size where a file does not tell its own.
+constexpr std::size_t kChunkSize = 64 * 1024;
+
+class FileDescriptor {
+public:
+    explicit FileDescriptor(int descriptor) : m_Descriptor(descriptor) {}
+    FileDescriptor(const FileDescriptor&) = delete;
+    FileDescriptor& operator=(const FileDescriptor&) = delete;
+    ~FileDescriptor() {
+        if (m_Descriptor >= 0) close(m_Descriptor);
+    }
+    int Get() const { return m_Descriptor; }
+
+private:
+    const int m_Descriptor;
+};
+
+/// Never 0: one byte beyond the size lets the end be seen without growing the buffer.
+std::size_t ExpectedSize(int descriptor) {
+    struct stat status;
+    if (fstat(descriptor, &status) != 0 || status.st_size <= 0) return kChunkSize;
+    return static_cast<std::size_t>(status.st_size) + 1;
+}
+
+bool ReadToEnd(int descriptor, std::string& bytes) {
+    bytes.resize(ExpectedSize(descriptor));
+    for (std::size_t length = 0;;) {
+        const ssize_t count = read(descriptor, bytes.data() + length, bytes.size() - length);
+        if (count < 0 && errno == EINTR) continue;
+        if (count < 0) return false;
+        length += static_cast<std::size_t>(count);
+        if (count == 0) {
+            bytes.resize(length);
+            return true;
+        }
+        if (length == bytes.size()) bytes.resize(2 * length);
+    }
+}
+
+} // namespace
+
+std::string GetUserHomeDir() {
+    const char* home = std::getenv("HOME");
+    return home ? home : "~";
+}
+
+std::string OvrinToNativePath(const std::string& path) {
+    return path;
+}
+
+std::string CreateTempFile() {
+    char path[] = "/tmp/MERGEXXXXXX";
+    const int descriptor = mkstemp(path);
+    if (descriptor < 0) return {};
+    close(descriptor);
+    return path;
+}
+
+bool FileExists(const char* path) {
+    return access(path, R_OK) == 0;
+}
+
+bool IsFileEmpty(const std::string& path) {
+    std::ifstream stream(path, std::ios::binary);
+    stream.seekg(0, std::ios::end);
+    return stream.tellg() == std::streampos(0);
+}
+
+std::string GetFileExtension(const std::string& path) {
+    const std::size_t dot = path.rfind('.');
+    return dot == std::string::npos ? std::string() : path.substr(dot + 1);
+}
+
+std::string GetDataFilesDir() {
+    char buffer[PATH_MAX];
+    const std::string path = realpath("/proc/self/exe", buffer) ? buffer : "";
+    const std::size_t separator = path.find_last_of("/\\");
+    if (separator != std::string::npos) return path.substr(0, separator + 1);
+    errs << (path.empty() ? "Couldn't locate dir of factory merge spec file\n" : "My path is invalid\n");
+    ErrMsg(errs);
+    return {};
+}
+
+ReadResult ReadWholeFile(const std::string& path, std::string& bytes) {
+    const FileDescriptor file(open(OvrinToNativePath(path).c_str(), O_RDONLY | O_CLOEXEC));
+    if (file.Get() < 0) return ReadResult::CannotOpen;
+    return ReadToEnd(file.Get(), bytes) ? ReadResult::Complete : ReadResult::CannotRead;
+}

@@ -1,0 +1,8 @@
+#pragma once
+
+struct MergeConfig;
+
+/// Serves one merge by the smart merge, an external tool or both, and writes the destination. Fills in the
+/// premerge paths of `config` where they are needed and empty. Returns the exit status of the process;
+/// failures have been reported then.
+int ProcessMergeCommand(MergeConfig& config);

@@ -1,0 +1,27 @@
+#include "Thread.h"
+
+#include <system_error>
+
+Thread::Thread(std::function<void()> body) : m_Work(new Work{std::move(body), nullptr}) {
+    try {
+        m_Thread = std::jthread([work = m_Work.get()] { work->Run(); });
+    } catch (const std::system_error&) {
+        m_Work->Run();
+    }
+}
+
+void Thread::Work::Run() noexcept {
+    try {
+        body();
+    } catch (...) {
+        exception = std::current_exception();
+    }
+}
+
+void Thread::Join() {
+    if (m_Thread.joinable()) m_Thread.join();
+}
+
+void Thread::CheckForExceptions() const {
+    if (m_Work->exception) std::rethrow_exception(m_Work->exception);
+}

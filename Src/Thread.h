@@ -1,0 +1,31 @@
+#pragma once
+
+#include <exception>
+#include <functional>
+#include <memory>
+#include <thread>
+
+/// A thread that carries an exception to the one who waits for it. Join every thread of a stage before asking
+/// any for its exception: then no failure leaves another thread running.
+class Thread {
+public:
+    /// Starts `body`, or runs it here and now if no thread is to be had.
+    explicit Thread(std::function<void()> body);
+    Thread(Thread&&) = default;
+    Thread& operator=(Thread&&) = delete;
+
+    /// Waits for the end of the body. So does the destructor.
+    void Join();
+    /// Throws what left the body, of whatever type. Only after Join.
+    void CheckForExceptions() const;
+
+private:
+    struct Work {
+        std::function<void()> body;
+        std::exception_ptr exception;
+        void Run() noexcept;
+    };
+
+    std::unique_ptr<Work> m_Work; // the started thread holds its address
+    std::jthread m_Thread;        // none once joined, or when the body ran on the spawning thread
+};
