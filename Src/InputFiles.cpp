@@ -5,6 +5,7 @@
 #include "Document/ObjectFileReader.h"
 #include "FileUtils.h"
 
+#include <exception>
 #include <sstream>
 
 using namespace ovrin_yaml;

@@ -1,0 +1,176 @@
+#include "Diff/MergeRules.h"
+#include "Document/YAMLMapping.h"
+
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <sstream>
+#include <stdexcept>
+
+namespace ovrin_yaml {
+namespace {
+
+class MergeRulesTest : public testing::Test {
+protected:
+    MergeRulesTest() {
+        initialize();
+        MergeRules::ResetForTests();
+    }
+    ~MergeRulesTest() override { MergeRules::ResetForTests(); }
+};
+
+Path P(const std::string& text) {
+    std::vector<std::string> elements;
+    MergeRules::Tokenize(text, '.', elements);
+    Path path;
+    for (const std::string& element : elements) path.push_back(YAMLScalar::Lookup(element));
+    return path;
+}
+
+void Load(const std::string& text) {
+    std::istringstream stream(text);
+    MergeRules::LoadSequenceUniqueKeys(stream);
+}
+
+std::string ErrorOf(const std::string& text) {
+    try {
+        Load(text);
+    } catch (const std::runtime_error& error) {
+        return error.what();
+    }
+    return "none";
+}
+
+/// A mapping of the pairs; "a.b" as a key nests.
+YAMLMapping* Map(const std::vector<std::pair<std::string, std::string>>& pairs) {
+    YAMLMapping* mapping = YAMLAlloc<YAMLMapping>::create();
+    for (const auto& [key, value] : pairs) {
+        const std::size_t dot = key.find('.');
+        YAMLNode* node = YAMLScalar::Lookup(value);
+        if (dot != std::string::npos) node = Map({{key.substr(dot + 1), value}});
+        mapping->Append(YAMLScalar::Lookup(key.substr(0, dot)), node);
+    }
+    return mapping;
+}
+
+std::string Values(const std::vector<Path>& fieldPaths, const YAMLNode* node) {
+    std::string text;
+    for (const YAMLScalar* value : MergeRules::GetUniqueMappingValues(fieldPaths, node))
+        text += std::string(value->Value()) + ";";
+    return text;
+}
+
+std::vector<Path> Keys(const std::string& path) {
+    return MergeRules::SelectKeyPaths(P(path));
+}
+
+TEST_F(MergeRulesTest, TheFirstBadLineIsReported) {
+    const std::pair<const char*, const char*> cases[] = {
+        {"set a b", "Rules file must specify section before any rules e.g. [arrays]. at line 1"},
+        {" # x", "Rules file must specify section before any rules e.g. [arrays]. at line 1"},
+        {"[arrays]\r\n", "Rules file must specify section before any rules e.g. [arrays]. at line 1"},
+        {"[arrays]\n\n   \n# x\nset", "Invalid rule format at line 5"},
+        {"[arrays]\nsets a", "Invalid rule format missing action at line 2"},
+        {"[arrays]\nset a\nset", "Invalid format of unique key specification at line 2"},
+        {"[exclusions]\nexclude", "Invalid rule format at line 2"},
+        {"[exclusions]\nexcluded a", "Invalid format of excluded key specification at line 2"},
+        {"[exclusions]\nincludeIfContains a", "Invalid format of excludeIfContains specification at line 2"},
+        {"[comparisons]\nfloat", "Invalid rule format at line 2"},
+        {"[comparisons]\nfloat a.b 1 2 3", "Invalid rule format at line 2"},
+        {"[comparisons]\ndouble a", "Invalid rule format missing action at line 2"},
+        {"[premerge]\nlegacyBlankPremergeBase x", "Invalid rule format at line 2"},
+        {"[premerge]\nblank", "Invalid rule format missing action at line 2"},
+    };
+    for (const auto& [text, error] : cases) EXPECT_EQ(ErrorOf(text), error + std::string("\n")) << text;
+    EXPECT_EQ(ErrorOf("[arrays] extra\nplain a\tb"), "none");
+}
+
+TEST_F(MergeRulesTest, RulesAboveABadLineStay) {
+    ErrorOf("[exclusions]\nexclude a\nbad a\nexclude b");
+    EXPECT_FALSE(MergeRules::IsMergeablePath(P("a")));
+    EXPECT_TRUE(MergeRules::IsMergeablePath(P("b")));
+}
+
+TEST_F(MergeRulesTest, AStarIsExactlyOneElement) {
+    EXPECT_TRUE(MergeRules::MatchesPath(P("*.a"), P("1.a")));
+    for (const char* path : {"1.2.a", "a", "1.b", "1.a.2", ""})
+        EXPECT_FALSE(MergeRules::MatchesPath(P("*.a"), P(path))) << path;
+    EXPECT_TRUE(MergeRules::MatchesPath(P("..."), {}));
+}
+
+TEST_F(MergeRulesTest, TheFirstMatchingListRuleChoosesTheKeys) {
+    Load("[arrays]\nset *.T.m id owner.fileID\nplain *.T.p x\nset *.T.* name");
+    EXPECT_EQ(Keys("1.T.m"), (std::vector<Path>{P("id"), P("owner.fileID")}));
+    EXPECT_EQ(Keys("1.T.p"), std::vector<Path>{});
+    EXPECT_EQ(Keys("1.T.q"), std::vector<Path>{P("name")});
+    EXPECT_EQ(Keys("1.U.q"), std::vector<Path>{P("fileID")});
+    EXPECT_EQ(Keys("_"), std::vector<Path>{P("_")});
+}
+
+TEST_F(MergeRulesTest, NothingIsMatchedByKeyBeforeRulesAreLoaded) {
+    EXPECT_TRUE(Keys("1.T.m").empty());
+    EXPECT_TRUE(Keys("_").empty());
+}
+
+TEST_F(MergeRulesTest, AKeyIsCompleteOrEmpty) {
+    const YAMLMapping* node = Map({{"a", "1"}, {"b.c", "2"}});
+    EXPECT_EQ(Values({P("a"), P("b.c"), P("*"), P("b.*"), P("_.b._.c")}, node), "1;2;1;2;2;");
+    for (const char* missing : {"x", "a.x", "b", "b.x", "_"})
+        EXPECT_EQ(Values({P("a"), P(missing)}, node), "") << missing;
+    EXPECT_EQ(Values({P("_")}, YAMLScalar::one), "1;");
+    EXPECT_EQ(Values({P("*")}, Map({})), "");
+    EXPECT_EQ(Values({P("_")}, nullptr), "");
+}
+
+TEST_F(MergeRulesTest, RepeatedKeysCannotBeLookedUp) {
+    const YAMLMapping* node = Map({{"a", "1"}, {"a", "2"}});
+    for (const char* path : {"a", "*"})
+        EXPECT_THROW(MergeRules::GetYAMLNodeFieldByPath(node, P(path)), YAMLError) << path;
+}
+
+TEST_F(MergeRulesTest, TheFirstMatchingExclusionDecides) {
+    Load("[exclusions]\ninclude x\nexclude x\n[premerge]\n[exclusions]\nexclude y\ninclude y");
+    EXPECT_TRUE(MergeRules::IsMergeablePath(P("x")));
+    EXPECT_FALSE(MergeRules::IsMergeablePath(P("y")));
+    EXPECT_TRUE(MergeRules::IsMergeablePath(P("z")));
+}
+
+TEST_F(MergeRulesTest, AConditionalExclusionNeedsAllItsFields) {
+    Load("[exclusions]\nexcludeIfContains x a b\nincludeIfContains x c\nexcludeIfContains x a\n");
+    const auto mergeable = [](const YAMLNode* node) { return MergeRules::IsMergeablePath(P("x"), node); };
+    EXPECT_FALSE(mergeable(Map({{"a", "1"}, {"b", "1"}, {"c", "1"}})));
+    EXPECT_TRUE(mergeable(Map({{"a", "1"}, {"c", "1"}})));
+    EXPECT_FALSE(mergeable(Map({{"a", "1"}})));
+    EXPECT_TRUE(mergeable(Map({})));
+    EXPECT_TRUE(MergeRules::IsMergeablePath(P("x"))) << "conditional rules need a value";
+}
+
+TEST_F(MergeRulesTest, TolerancesAreReadLikeStreamsReadNumbers) {
+    Load("[comparisons]\nfloat a\nfloat b 0.5\nfloat c 0.5 2x\nfloat d x\n");
+    const std::tuple<float, float> expected[] = {
+        {1.1920929e-07f, 1.1920929e-07f}, {0.5f, 0.5f}, {0.5f, 2.f}, {0.f, 0.f}};
+    ASSERT_EQ(MergeRules::s_ComparisonFieldPaths.size(), std::size(expected));
+    for (std::size_t i = 0; i < std::size(expected); ++i)
+        EXPECT_EQ(MergeRules::s_ComparisonFieldPaths[i].second, expected[i]) << i;
+}
+
+TEST_F(MergeRulesTest, BlanksInThePremergedBaseAreAskedFor) {
+    EXPECT_FALSE(MergeRules::CheckBlankPremergeBaseEnabled());
+    Load("[premerge]\n legacyBlankPremergeBase ");
+    EXPECT_TRUE(MergeRules::CheckBlankPremergeBaseEnabled());
+}
+
+TEST_F(MergeRulesTest, TheFactoryRulesKeyComponentsAndOverridesAndHideNothing) {
+    std::ifstream file(OVRIN_SOURCE_DIR "/Src/Data/mergerules.txt");
+    ASSERT_TRUE(file);
+    MergeRules::LoadSequenceUniqueKeys(file);
+    EXPECT_EQ(Values(Keys("1.GameObject.m_Component"), Map({{"component.fileID", "12"}})), "12;");
+    const YAMLMapping* change = Map({{"target.fileID", "7"}, {"propertyPath", "m_Name"}, {"value", "x"}});
+    for (const char* instance : {"1.PrefabInstance", "1.Prefab"})
+        EXPECT_EQ(Values(Keys(instance + std::string(".m_Modification.m_Modifications")), change),
+                  "7;m_Name;");
+    EXPECT_TRUE(MergeRules::s_ComparisonFieldPaths.empty());
+}
+
+} // namespace
+} // namespace ovrin_yaml
