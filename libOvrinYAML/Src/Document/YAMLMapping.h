@@ -63,6 +63,8 @@ public:
     bool m_Flow;
 
     bool HasDuplicates() const { return m_HasDuplicates; }
+    /// Throws the duplicate-keys YAMLError in the duplicate state.
+    void RequireNormalState() const;
     /// All pairs, in either state. In the normal state some may have been removed (their key is null).
     std::span<const Entry> RawEntries() const { return {m_Entries.data(), m_Entries.size()}; }
 
@@ -113,7 +115,6 @@ public:
     void ResetForAlloc() { Clear(); }
 
 private:
-    void RequireNormalState() const;
     /// Position of `key` in m_Entries, or KeyIndex::kMissing.
     std::uint32_t Find(const YAMLScalar* key) const;
     void PushBack(const YAMLScalar* key, YAMLNode* value);
