@@ -1,0 +1,64 @@
+#include "Document/OvrinObjects.h"
+#include "Document/YAMLEmitter.h"
+#include "Document/YAMLScalar.h"
+
+#include <memory>
+#include <ostream>
+#include <vector>
+
+namespace ovrin_yaml {
+
+namespace {
+
+/// Text is handed to the stream in pieces of about this size: big enough to make calls cheap, small enough
+/// to stay in the cache.
+constexpr std::size_t kPieceSize = std::size_t{1} << 20;
+
+constexpr const char* kFileHeader = "%YAML 1.1\n%TAG !o! tag:" OVRIN_TAG_AUTHORITY ",2011:\n";
+
+bool IsPlaceHolder(const YAMLScalar* key) {
+    return key == YAMLScalar::fileIDPlaceHolderName || key == YAMLScalar::classIDPlaceHolderName ||
+           key == YAMLScalar::strippedPrefabPlaceHolderName;
+}
+
+void AppendHeaderLine(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text) {
+    const YAMLScalar* fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
+    const YAMLScalar* classID = AsScalar(object.Get(YAMLScalar::classIDPlaceHolderName));
+    if (!fileID) fileID = &rootKey;
+    if (!classID) throw YAMLError("Object has no class id: " + std::string(fileID->Value()));
+    text.append("--- !o!").append(classID->Value()).append(" &").append(fileID->Value());
+    if (object.HasKey(YAMLScalar::strippedPrefabPlaceHolderName)) text.append(" stripped");
+    text.push_back('\n');
+}
+
+void AppendBody(const YAMLMapping& object, std::string& text) {
+    std::vector<YAMLMapping::Entry> body;
+    for (const YAMLMapping::Entry& entry : object)
+        if (!IsPlaceHolder(entry.key)) body.push_back(entry);
+    YAMLEmitter(text).EmitDocument(body, object.m_Flow);
+    text.push_back('\n');
+}
+
+} // namespace
+
+void OvrinObjects::Output(std::ostream& stream) const {
+    std::string text = kFileHeader;
+    for (const YAMLMapping::Entry& entry : m_Root) {
+        const YAMLMapping& object = ToMapping(entry.value);
+        AppendHeaderLine(*entry.key, object, text);
+        AppendBody(object, text);
+        if (text.size() < kPieceSize) continue;
+        stream.write(text.data(), static_cast<std::streamsize>(text.size()));
+        text.clear();
+    }
+    stream.write(text.data(), static_cast<std::streamsize>(text.size()));
+    stream.flush();
+}
+
+OvrinObjects* OvrinObjects::Clone() const {
+    auto copy = std::make_unique<OvrinObjects>();
+    m_Root.CloneInto(copy->m_Root);
+    return copy.release();
+}
+
+} // namespace ovrin_yaml
