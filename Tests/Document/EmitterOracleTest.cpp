@@ -79,7 +79,7 @@ struct Generator {
     Tree Node(int depth) {
         const int kind = depth == 0 ? 0 : Below(4);
         const bool flow = flowAndQuotes && Below(3) == 0;
-        if (kind < 2) return Value();
+        if (kind < 2) return std::string_view(Value());
         YAMLMapping* mapping = Mapping({}, flow);
         YAMLSequence* sequence = Sequence({}, flow);
         for (int children = Below(5); children > 0; --children) {
