@@ -1,0 +1,115 @@
+#include "Diff/CreateDiffOperation.h"
+
+#include "Diff/MergeRules.h"
+#include "Diff/YAMLMappingDiff.h"
+#include "Diff/YAMLSequenceDiff.h"
+#include "Diff/YAMLSequenceRemapper.h"
+#include "Document/YAMLMapping.h"
+#include "Document/YAMLSequence.h"
+
+#include <algorithm>
+#include <cmath>
+#include <limits>
+
+namespace ovrin_yaml {
+
+namespace {
+
+void RequireNormalState(const YAMLNode* node) {
+    if (const YAMLMapping* mapping = AsMapping(node)) mapping->RequireNormalState();
+}
+
+/// Whether two floats differ by less than the larger of the two bounds, in single precision throughout. A
+/// bound that is not greater than zero switches the tolerance off.
+bool WithinTolerance(float a, float b, float relative, float absolute) {
+    if (!(relative > 0) || !(absolute > 0)) return false;
+    if (a == b) return true;
+    const float magnitude = std::min(std::fabs(a) + std::fabs(b), std::numeric_limits<float>::max());
+    return std::max(absolute, relative * magnitude) > std::fabs(a - b);
+}
+
+const Operation* DiffScalars(const Path& path, const YAMLScalar* base, const YAMLScalar* dest) {
+    for (const auto& [pattern, bounds] : MergeRules::s_ComparisonFieldPaths) {
+        if (!MergeRules::MatchesPath(pattern, path)) continue;
+        const auto [relative, absolute] = bounds;
+        if (WithinTolerance(base->GetFloatValue(), dest->GetFloatValue(), relative, absolute)) return nullptr;
+        break;
+    }
+    return YAMLAlloc<ChangeOperation>::create(dest);
+}
+
+/// A reference is written in flow style and changes as a whole, but for its file id.
+bool IsMergeableByStyle(const YAMLMapping* base, const YAMLMapping* dest) {
+    if (!base->m_Flow && !dest->m_Flow) return true;
+    return base->HasKey(YAMLScalar::fileID) || dest->HasKey(YAMLScalar::fileID);
+}
+
+bool IsMergeableMapping(const Path& path, const YAMLMapping* base, const YAMLMapping* dest) {
+    for (const auto& rule : MergeRules::s_DiffExclusionFieldPaths)
+        if (MergeRules::MatchesPath(rule.path, path) &&
+            !MergeRules::GetUniqueMappingValues(rule.fieldPaths, dest).empty())
+            return rule.mergeable;
+    for (const auto& [pattern, mergeable] : MergeRules::s_ExclusionFieldPaths)
+        if (MergeRules::MatchesPath(pattern, path)) return mergeable;
+    return IsMergeableByStyle(base, dest);
+}
+
+/// A component whose script changed is another component: its fields can't be combined with the other side's.
+bool HasNewScript(const Path& path, const YAMLMappingDiff* diff) {
+    return path.size() == 2 && path[1] == YAMLScalar::monoBehaviour && diff->HasKey(YAMLScalar::mScript);
+}
+
+const Operation* DiffMappings(Path& path, const YAMLMapping* base, const YAMLMapping* dest) {
+    YAMLMappingDiff* diff = YAMLMappingDiff::Diff(path, base, dest);
+    if (diff->Entries().empty()) {
+        YAMLAlloc<YAMLMappingDiff>::free(diff);
+        return nullptr;
+    }
+    const bool mergeable = IsMergeableMapping(path, base, dest) && !HasNewScript(path, diff);
+    return YAMLAlloc<ChangeMappingOperation>::create(diff, mergeable);
+}
+
+const Operation* DiffSequences(Path& path, const YAMLSequence* base, const YAMLSequence* dest) {
+    const YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindMapping(path, base, dest);
+    YAMLSequenceDiff* diff =
+        remapper ? YAMLSequenceDiff::Diff(path, remapper->Arrange(base->m_Items), dest->m_Items)
+                 : YAMLSequenceDiff::Diff(path, base->m_Items, dest->m_Items);
+    if (!remapper && diff->Entries().empty()) {
+        YAMLAlloc<YAMLSequenceDiff>::free(diff);
+        return nullptr;
+    }
+    return YAMLAlloc<ChangeSequenceOperation>::create(diff, remapper,
+                                                      MergeRules::IsMergeablePath(path, dest));
+}
+
+} // namespace
+
+bool CountAsEqual(const YAMLNode* base, const YAMLNode* dest) {
+    if (base == dest) return true;
+    if (!base || !dest || base->m_Hash != dest->m_Hash) return false;
+    // A rebuilt hash says nothing of repeated keys, and what they hold must not get lost.
+    if (base->m_Hash == 0) {
+        RequireNormalState(base);
+        RequireNormalState(dest);
+    }
+    return true;
+}
+
+const Operation* CreateDiffOperation(Path& path, const YAMLNode* base, const YAMLNode* dest) {
+    if (base == dest) return nullptr;
+    if (!dest) return YAMLAlloc<RemoveOperation>::create(MergeRules::IsMergeablePath(path, base));
+    if (!base) return YAMLAlloc<AddOperation>::create(dest, MergeRules::IsMergeablePath(path, dest));
+    if (CountAsEqual(base, dest)) return nullptr;
+    if (base->GetKind() != dest->GetKind()) return YAMLAlloc<ChangeOperation>::create(dest);
+    switch (base->GetKind()) {
+    case YAMLNode::Kind::Scalar:
+        return DiffScalars(path, AsScalar(base), AsScalar(dest));
+    case YAMLNode::Kind::Mapping:
+        return DiffMappings(path, AsMapping(base), AsMapping(dest));
+    case YAMLNode::Kind::Sequence:
+        return DiffSequences(path, AsSequence(base), AsSequence(dest));
+    }
+    throw YAMLError("Cannot diff unknown yaml value");
+}
+
+} // namespace ovrin_yaml

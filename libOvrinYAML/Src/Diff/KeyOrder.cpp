@@ -1,0 +1,81 @@
+#include "Diff/KeyOrder.h"
+
+#include "Diff/CreateDiffOperation.h"
+#include "Diff/YAMLSequenceDiff.h"
+#include "Diff/YAMLSequenceRemapper.h"
+#include "Document/YAMLMapping.h"
+#include "Document/YAMLSequence.h"
+
+#include <algorithm>
+
+namespace ovrin_yaml {
+
+namespace {
+
+YAMLSequence* KeysOf(const YAMLMapping* mapping) {
+    YAMLSequence* keys = YAMLAlloc<YAMLSequence>::create();
+    keys->m_Items.reserve(mapping->Size());
+    for (const auto& entry : *mapping) keys->Append(entry.key);
+    keys->RebuildHash(false);
+    return keys;
+}
+
+bool HaveSameKeys(const YAMLMapping* base, const YAMLMapping* dest) {
+    return base->Size() == dest->Size() &&
+           std::equal(base->begin(), base->end(), dest->begin(),
+                      [](const auto& a, const auto& b) { return a.key == b.key; });
+}
+
+const ChangeSequenceOperation* MakeIdentity(std::size_t count) {
+    YAMLSequenceDiff* noChange = YAMLAlloc<YAMLSequenceDiff>::create();
+    return YAMLAlloc<ChangeSequenceOperation>::create(noChange, YAMLSequenceRemapper::MakeIdentity(count),
+                                                      true);
+}
+
+/// Nearly all mappings keep their keys: operations never change, so one identity of each length serves them
+/// all.
+const ChangeSequenceOperation* Identity(std::size_t count) {
+    constexpr std::size_t kKeptLengths = 64;
+    if (count >= kKeptLengths) return MakeIdentity(count);
+    thread_local const ChangeSequenceOperation* t_Identities[kKeptLengths] = {};
+    if (!t_Identities[count]) t_Identities[count] = MakeIdentity(count);
+    return t_Identities[count];
+}
+
+} // namespace
+
+const ChangeSequenceOperation* DiffKeyOrder(const YAMLMapping* base, const YAMLMapping* dest) {
+    if (HaveSameKeys(base, dest)) return Identity(base->Size());
+    Path path = {YAMLScalar::underscore};
+    YAMLSequence* baseKeys = KeysOf(base);
+    YAMLSequence* destKeys = KeysOf(dest);
+    const Operation* operation = CreateDiffOperation(path, baseKeys, destKeys);
+    // The operations inside point at the keys, which outlive their lists.
+    YAMLAlloc<YAMLSequence>::free(baseKeys);
+    YAMLAlloc<YAMLSequence>::free(destKeys);
+    if (operation) return As<ChangeSequenceOperation>(operation);
+    // Lists of one hash count as equal, as everywhere; applying such a diff may then fail for its keys.
+    YAMLSequenceRemapper* unchanged = YAMLSequenceRemapper::MakeIdentity(base->Size());
+    unchanged->m_DestinationCount = dest->Size();
+    return YAMLAlloc<ChangeSequenceOperation>::create(YAMLAlloc<YAMLSequenceDiff>::create(), unchanged, true);
+}
+
+bool IsIdentityKeyOrder(const ChangeSequenceOperation* order) {
+    return order->m_Diff->Entries().empty() && (!order->m_Remapper || order->m_Remapper->IsIdentity());
+}
+
+void ApplyKeyOrder(const ChangeSequenceOperation* order, std::vector<const YAMLScalar*> before,
+                   YAMLMapping& target) {
+    YAMLSequence keys;
+    keys.m_Items.reserve(before.size());
+    for (const YAMLScalar* key : before) keys.Append(key);
+    if (order->m_Remapper && !order->m_Remapper->IsIdentity()) order->m_Remapper->Apply(keys);
+    order->m_Diff->Apply(keys);
+    std::vector<const YAMLScalar*> after;
+    after.reserve(keys.m_Items.size());
+    for (const YAMLNode* key : keys.m_Items)
+        if (key) after.push_back(AsScalar(key));
+    target.Reorder(after);
+}
+
+} // namespace ovrin_yaml

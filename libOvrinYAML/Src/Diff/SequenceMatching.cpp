@@ -1,0 +1,133 @@
+// The search functions of YAMLSequenceRemapper: matching by key and by equality.
+
+#include "Diff/EqualityMatcher.h"
+#include "Diff/MergeRules.h"
+#include "Diff/YAMLSequenceRemapper.h"
+#include "Document/KeyIndex.h"
+
+#include <algorithm>
+
+namespace ovrin_yaml {
+
+namespace {
+
+/// Gives the key of sequence elements as one scalar, so that equal keys are the same object.
+class ElementKeys {
+public:
+    /// A key whose first field is a file id is joined by the guid beside it, which says what file it counts
+    /// in.
+    explicit ElementKeys(const std::vector<Path>& keyPaths) : m_KeyPaths(keyPaths) {
+        if (keyPaths.empty() || keyPaths[0].empty() || keyPaths[0].back() != YAMLScalar::fileID) return;
+        m_GuidPaths = {keyPaths[0]};
+        m_GuidPaths[0].back() = YAMLScalar::guid;
+    }
+
+    /// Null if the element has no key.
+    const YAMLScalar* Of(const YAMLNode* element) const {
+        const auto values = MergeRules::GetUniqueMappingValues(m_KeyPaths, element);
+        if (values.empty()) return nullptr;
+        const auto guid = MergeRules::GetUniqueMappingValues(m_GuidPaths, element);
+        if (values.size() == 1 && guid.empty()) return values[0];
+        std::string text = YAMLSequenceRemapper::CollapseKeyElementValues(values);
+        if (!guid.empty()) text.append(":").append(guid[0]->Value());
+        return YAMLScalar::Lookup(text);
+    }
+
+private:
+    const std::vector<Path>& m_KeyPaths;
+    std::vector<Path> m_GuidPaths;
+};
+
+/// The keys of all elements, or nothing if one has no key or two have the same.
+bool FindUniqueKeys(const ElementKeys& keys, const YAMLSequence* sequence,
+                    std::vector<const YAMLScalar*>& found, KeyIndex& indexes) {
+    const auto& items = sequence->m_Items;
+    found.reserve(items.size());
+    indexes.Reserve(items.size());
+    for (std::size_t i = 0; i < items.size(); ++i) {
+        const YAMLScalar* key = keys.Of(items[i]);
+        if (!key || indexes.Find(key) != KeyIndex::kMissing) return false;
+        indexes.Set(key, static_cast<std::uint32_t>(i));
+        found.push_back(key);
+    }
+    return true;
+}
+
+int IndexOf(const KeyIndex& indexes, const YAMLScalar* key) {
+    const std::uint32_t index = key ? indexes.Find(key) : KeyIndex::kMissing;
+    return index == KeyIndex::kMissing ? -1 : static_cast<int>(index);
+}
+
+YAMLSequenceRemapper* UnlessIdentity(YAMLSequenceRemapper* remapper) {
+    if (!remapper->IsIdentity()) return remapper;
+    YAMLAlloc<YAMLSequenceRemapper>::free(remapper);
+    return nullptr;
+}
+
+} // namespace
+
+YAMLSequenceRemapper* YAMLSequenceRemapper::FindMapping(const Path& path, const YAMLSequence* base,
+                                                        const YAMLSequence* dest) {
+    const std::vector<Path>& keyPaths = MergeRules::SelectKeyPaths(path);
+    if (keyPaths.empty()) return FindGenericMapping(base, dest);
+    const ElementKeys keys(keyPaths);
+    std::vector<const YAMLScalar*> baseKeys, destKeys;
+    KeyIndex baseIndexes, destIndexes;
+    if (!FindUniqueKeys(keys, base, baseKeys, baseIndexes) ||
+        !FindUniqueKeys(keys, dest, destKeys, destIndexes))
+        return FindGenericMapping(base, dest);
+    YAMLSequenceRemapper* remapper =
+        YAMLAlloc<YAMLSequenceRemapper>::create(base->m_Items.size(), dest->m_Items.size(), true);
+    for (std::size_t i = 0; i < baseKeys.size(); ++i)
+        remapper->m_Mapping[i] = IndexOf(destIndexes, baseKeys[i]);
+    return UnlessIdentity(remapper);
+}
+
+YAMLSequenceRemapper* YAMLSequenceRemapper::FindGenericMapping(const YAMLSequence* base,
+                                                               const YAMLSequence* dest) {
+    const auto& from = base->m_Items;
+    const auto& to = dest->m_Items;
+    const std::size_t n = from.size(), m = to.size(), common = std::min(n, m);
+    std::size_t prefix = 0;
+    while (prefix < common && from[prefix]->Equals(to[prefix])) ++prefix;
+    if (n == m && prefix == n) return nullptr;
+    std::size_t suffix = 0;
+    while (suffix < common && from[n - 1 - suffix]->Equals(to[m - 1 - suffix])) ++suffix;
+
+    YAMLSequenceRemapper* remapper = YAMLAlloc<YAMLSequenceRemapper>::create(n, m, false);
+    auto& mapping = remapper->m_Mapping;
+    for (std::size_t i = 0; i < prefix; ++i) mapping[i] = static_cast<int>(i);
+    // Where the two overlap, the suffix stands.
+    for (std::size_t t = 0; t < suffix; ++t) mapping[n - 1 - t] = static_cast<int>(m - 1 - t);
+    if (m - suffix > prefix && n - suffix > prefix) {
+        EqualityMatcher matcher(to, prefix, m - suffix);
+        for (std::size_t i = prefix; i < n - suffix; ++i) mapping[i] = matcher.TakeFirstEqual(from[i]);
+    }
+    return UnlessIdentity(remapper);
+}
+
+YAMLSequenceRemapper* YAMLSequenceRemapper::FindIdMapping(const std::vector<Path>& keyPaths,
+                                                          const YAMLSequence* first,
+                                                          const YAMLSequence* second) {
+    const ElementKeys keys(keyPaths);
+    KeyIndex indexes;
+    for (std::size_t i = 0; i < second->m_Items.size(); ++i)
+        if (const YAMLScalar* key = keys.Of(second->m_Items[i]))
+            indexes.Set(key, static_cast<std::uint32_t>(i));
+    YAMLSequenceRemapper* remapper =
+        YAMLAlloc<YAMLSequenceRemapper>::create(first->m_Items.size(), second->m_Items.size(), true);
+    for (std::size_t i = 0; i < first->m_Items.size(); ++i)
+        remapper->m_Mapping[i] = IndexOf(indexes, keys.Of(first->m_Items[i]));
+    return remapper;
+}
+
+std::string YAMLSequenceRemapper::CollapseKeyElementValues(const std::vector<const YAMLScalar*>& values) {
+    std::string text;
+    for (std::size_t i = 0; i < values.size(); ++i) {
+        if (i > 0) text += ':';
+        text += values[i]->Value();
+    }
+    return text;
+}
+
+} // namespace ovrin_yaml

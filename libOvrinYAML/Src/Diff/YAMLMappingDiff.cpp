@@ -1,0 +1,92 @@
+#include "Diff/YAMLMappingDiff.h"
+
+#include "Diff/CreateDiffOperation.h"
+#include "Diff/KeyOrder.h"
+#include "Diff/MergeRules.h"
+#include "Document/YAMLMapping.h"
+
+namespace ovrin_yaml {
+
+namespace {
+
+/// The pairs of `dest` behind the pair at `hint`, if its key is the wanted one, save the search: most
+/// mappings have the same keys in the same order.
+class AlignedLookup {
+public:
+    explicit AlignedLookup(const YAMLMapping* mapping)
+        : m_Mapping(mapping), m_Next(mapping->begin()), m_End(mapping->end()) {}
+
+    const YAMLNode* Get(const YAMLScalar* key) {
+        if (m_Next != m_End && m_Next->key == key) {
+            const YAMLNode* value = m_Next->value;
+            ++m_Next;
+            return value;
+        }
+        return m_Mapping->Get(key);
+    }
+
+private:
+    const YAMLMapping* m_Mapping;
+    YAMLMapping::Iterator m_Next;
+    YAMLMapping::Iterator m_End;
+};
+
+} // namespace
+
+YAMLMappingDiff* YAMLMappingDiff::Diff(Path& path, const YAMLMapping* base, const YAMLMapping* dest) {
+    YAMLMappingDiff* diff = YAMLAlloc<YAMLMappingDiff>::create();
+    AlignedLookup destValues(dest);
+    for (const auto& [key, baseValue] : *base) {
+        const YAMLNode* destValue = destValues.Get(key);
+        if (CountAsEqual(baseValue, destValue)) continue;
+        path.push_back(key);
+        const Operation* operation = CreateDiffOperation(path, baseValue, destValue);
+        path.pop_back();
+        if (operation) diff->Add(key, operation);
+    }
+    AlignedLookup baseValues(base);
+    for (const auto& [key, destValue] : *dest) {
+        if (baseValues.Get(key)) continue;
+        path.push_back(key);
+        diff->Add(key, CreateDiffOperation(path, nullptr, destValue));
+        path.pop_back();
+    }
+    diff->m_KeyOrder = DiffKeyOrder(base, dest);
+    return diff;
+}
+
+YAMLMappingDiff* YAMLMappingDiff::Diff(const YAMLMapping* base, const YAMLMapping* dest) {
+    Path path;
+    return Diff(path, base, dest);
+}
+
+void YAMLMappingDiff::Add(const YAMLScalar* key, const Operation* operation) {
+    if (HasKey(key)) throw YAMLError("Cannot do a double change on the same key in a mapping");
+    m_Entries.push_back({key, operation});
+    if (m_Index) {
+        m_Index->Set(key, static_cast<std::uint32_t>(m_Entries.size() - 1));
+    } else if (m_Entries.size() > KeyIndex::kSearchLimit) {
+        m_Index = std::make_unique<KeyIndex>();
+        for (std::uint32_t i = 0; i < m_Entries.size(); ++i) m_Index->Set(m_Entries[i].key, i);
+    }
+}
+
+const Operation* YAMLMappingDiff::Find(const YAMLScalar* key) const {
+    if (m_Index) {
+        const std::uint32_t position = m_Index->Find(key);
+        return position == KeyIndex::kMissing ? nullptr : m_Entries[position].operation;
+    }
+    for (const Entry& entry : m_Entries)
+        if (entry.key == key) return entry.operation;
+    return nullptr;
+}
+
+void YAMLMappingDiff::Apply(YAMLMapping& target) const {
+    std::vector<const YAMLScalar*> before;
+    before.reserve(target.Size());
+    for (const auto& entry : target) before.push_back(entry.key);
+    for (const Entry& entry : m_Entries) entry.operation->Apply(target, entry.key);
+    if (m_KeyOrder) ApplyKeyOrder(m_KeyOrder, std::move(before), target);
+}
+
+} // namespace ovrin_yaml

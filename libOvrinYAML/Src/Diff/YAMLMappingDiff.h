@@ -1,0 +1,65 @@
+#pragma once
+
+#include "Diff/Operation.h"
+#include "Document/KeyIndex.h"
+
+#include <memory>
+#include <vector>
+
+namespace ovrin_yaml {
+
+class ConflictResolver;
+class YAMLDiffOutput;
+
+/// The diff of two mappings: an operation for each key that differs, and how the order of the keys changed.
+///
+/// The order is data of its own, since a file must come out byte for byte as the editor would write it: the
+/// list of keys is diffed, merged and applied like any sequence, with each key as its own element.
+///
+///     base keys a b c   destination keys c a d, a changed
+///     entries     a: ChangeOperation   b: RemoveOperation   d: AddOperation
+///     key order   remapper 1, -1, 0   count 3   operations 2: AddOperation("d")
+///
+/// A diff doesn't own its operations.
+class YAMLMappingDiff {
+public:
+    struct Entry {
+        const YAMLScalar* key;
+        const Operation* operation;
+    };
+
+    /// The diff from `base` to `dest`, two hashed mappings at `path`, which comes back as it was.
+    static YAMLMappingDiff* Diff(Path& path, const YAMLMapping* base, const YAMLMapping* dest);
+    static YAMLMappingDiff* Diff(const YAMLMapping* base, const YAMLMapping* dest);
+
+    /// Throws YAMLError "Cannot do a double change on the same key in a mapping".
+    void Add(const YAMLScalar* key, const Operation* operation);
+    bool HasKey(const YAMLScalar* key) const { return Find(key) != nullptr; }
+    /// The operation for `key`, or null.
+    const Operation* Find(const YAMLScalar* key) const;
+    /// In the order in which they were added; the position is the entry's index. Of a diff made by Diff: the
+    /// changed and removed keys in base order, then the new ones in destination order.
+    const std::vector<Entry>& Entries() const { return m_Entries; }
+
+    /// Changes `target`, which must equal the base of the diff. Throws YAMLError where it doesn't fit;
+    /// `target` is then left halfway.
+    void Apply(YAMLMapping& target) const;
+    void Output(YAMLDiffOutput& output) const;
+
+    /// Merges the diffs of two sides. The result holds operations of the inputs, which must outlive it.
+    static YAMLMappingDiff* Merge(const YAMLMappingDiff* left, const YAMLMappingDiff* right,
+                                  ConflictResolver& resolver);
+
+    /// How the key list changed. Set by every Diff, as an identity if it didn't; null in a diff made
+    /// otherwise, where the order that applying the entries leaves is kept.
+    const ChangeSequenceOperation* m_KeyOrder = nullptr;
+
+    void ResetForAlloc() {}
+
+private:
+    std::vector<Entry> m_Entries;
+    std::unique_ptr<KeyIndex>
+        m_Index; // positions in m_Entries, once there are more than KeyIndex::kSearchLimit
+};
+
+} // namespace ovrin_yaml
