@@ -1,0 +1,79 @@
+// The merge of two diffs of one mapping or one sequence, key by key.
+
+#include "Diff/KeyOrder.h"
+#include "Diff/YAMLMappingDiff.h"
+#include "Diff/YAMLSequenceDiff.h"
+#include "Diff/YAMLSequenceRemapper.h"
+#include "Merge/YAMLConflict.h"
+
+namespace ovrin_yaml {
+
+namespace {
+
+/// Merges the changes of two key lists. Every diff of two trees has one, changed or not, so that an order
+/// that one side alone moved is merged with the other side's unmoved one, and lost, wherever both sides have
+/// a diff of the mapping. A key that one side dropped stays in the merged list: whether it is there is
+/// decided by its entry.
+const ChangeSequenceOperation* MergeKeyOrder(const ChangeSequenceOperation* left,
+                                             const ChangeSequenceOperation* right,
+                                             ConflictResolver& resolver) {
+    if (!left || !right) return right ? right : left;
+    if (left == right && IsIdentityKeyOrder(left)) return left;
+    Path ancestry = {YAMLScalar::underscore};
+    ancestry.swap(resolver.m_Path);
+    const ChangeSequenceOperation* merged = ChangeSequenceOperation::Merge(left, right, resolver, false);
+    ancestry.swap(resolver.m_Path);
+    return merged;
+}
+
+/// The keys of two diffs: by their index in the diff that has them, the left one if both do; of two keys with
+/// one index the left diff's goes first.
+template <class Visit>
+void ForEachKey(const YAMLMappingDiff* left, const YAMLMappingDiff* right, const Visit& visit) {
+    const auto& leftEntries = left->Entries();
+    const auto& rightEntries = right->Entries();
+    for (std::size_t index = 0; index < std::max(leftEntries.size(), rightEntries.size()); ++index) {
+        if (index < leftEntries.size())
+            visit(leftEntries[index].key, leftEntries[index].operation, right->Find(leftEntries[index].key));
+        if (index < rightEntries.size() && !left->HasKey(rightEntries[index].key))
+            visit(rightEntries[index].key, nullptr, rightEntries[index].operation);
+    }
+}
+
+} // namespace
+
+YAMLMappingDiff* YAMLMappingDiff::Merge(const YAMLMappingDiff* left, const YAMLMappingDiff* right,
+                                        ConflictResolver& resolver) {
+    YAMLMappingDiff* merged = YAMLAlloc<YAMLMappingDiff>::create();
+    merged->m_KeyOrder = MergeKeyOrder(left->m_KeyOrder, right->m_KeyOrder, resolver);
+    ForEachKey(left, right, [&](const YAMLScalar* key, const Operation* leftOne, const Operation* rightOne) {
+        resolver.PushPath(key);
+        if (const Operation* operation = Operation::Merge(leftOne, rightOne, resolver))
+            merged->Add(key, operation);
+        resolver.PopPath();
+    });
+    return merged;
+}
+
+YAMLSequenceDiff* YAMLSequenceDiff::Merge(const YAMLSequenceDiff* left, const YAMLSequenceDiff* right,
+                                          std::set<int>& droppedIndexes, ConflictResolver& resolver) {
+    YAMLSequenceDiff* merged = YAMLAlloc<YAMLSequenceDiff>::create();
+    auto l = left->Entries().begin();
+    auto r = right->Entries().begin();
+    const auto leftEnd = left->Entries().end();
+    const auto rightEnd = right->Entries().end();
+    while (l != leftEnd || r != rightEnd) {
+        const int index = r == rightEnd || (l != leftEnd && l->index < r->index) ? l->index : r->index;
+        const Operation* leftOne = l != leftEnd && l->index == index ? (l++)->operation : nullptr;
+        const Operation* rightOne = r != rightEnd && r->index == index ? (r++)->operation : nullptr;
+        resolver.PushPath(IndexScalar(index));
+        if (const Operation* operation = Operation::Merge(leftOne, rightOne, resolver))
+            merged->Add(index, operation);
+        else
+            droppedIndexes.insert(index);
+        resolver.PopPath();
+    }
+    return merged;
+}
+
+} // namespace ovrin_yaml

@@ -1,0 +1,259 @@
+#include "Merge/RecordingConflictResolver.h"
+
+#include "Diff/MergeRules.h"
+#include "Diff/MergeTreeVisitors.h"
+#include "Diff/YAMLMappingDiff.h"
+#include "Diff/YAMLSequenceDiff.h"
+#include "Document/YAMLError.h"
+#include "Document/YAMLMapping.h"
+
+#include <algorithm>
+
+namespace ovrin_yaml {
+
+bool RecordingConflictResolver::HasPendingConflicts() const {
+    return std::any_of(m_Records.begin(), m_Records.end(),
+                       [](const Record& record) { return record.resolve == ResolveConflict; });
+}
+
+void RecordingConflictResolver::PushRecord(ConflictType type, MergeResolve resolve, const Operation* left,
+                                           const Operation* right) {
+    m_Records.push_back({m_Path, type, resolve, left, right});
+}
+
+// One side alone. The default plays no part: a change that nobody conflicts with passes.
+
+const Operation* RecordingConflictResolver::SingleSideResolve(const Operation* operation, ConflictType type) {
+    const bool isLeft = IsLeftSide(type);
+    const MergeResolve resolve = FindResolve(m_Path).value_or(ResolveMerged);
+    PushRecord(type, resolve, isLeft ? operation : nullptr, isLeft ? nullptr : operation);
+    const bool dropped = resolve == ResolveBase || resolve == ResolveConflict ||
+                         (resolve == ResolveLeft && !isLeft) || (resolve == ResolveRight && isLeft);
+    return dropped ? nullptr : operation;
+}
+
+const Operation* RecordingConflictResolver::OnValueAdded(const AddOperation* operation, ConflictType type) {
+    return SingleSideResolve(operation, type);
+}
+
+const Operation* RecordingConflictResolver::OnValueChanged(const ChangeOperation* operation,
+                                                           ConflictType type) {
+    return SingleSideResolve(operation, type);
+}
+
+const Operation* RecordingConflictResolver::OnMappingChanged(const ChangeMappingOperation* operation,
+                                                             ConflictType type) {
+    return SingleSideResolve(operation, type);
+}
+
+const Operation* RecordingConflictResolver::OnSequenceChanged(const ChangeSequenceOperation* operation,
+                                                              ConflictType type) {
+    return SingleSideResolve(operation, type);
+}
+
+const Operation* RecordingConflictResolver::OnValueRemoved(const RemoveOperation* operation,
+                                                           ConflictType type) {
+    const Operation* result = SingleSideResolve(operation, type);
+    m_Records.back().left = nullptr;
+    m_Records.back().right = nullptr;
+    return result;
+}
+
+// Both sides.
+
+std::optional<RecordingConflictResolver::Outcome>
+RecordingConflictResolver::Decided(MergeResolve found, const Operation* left, const Operation* right) const {
+    switch (found) {
+    case ResolveLeft:
+        return Outcome{left, found};
+    case ResolveRight:
+        return Outcome{right, found};
+    case ResolveMerged:
+    case ResolveConflict:
+        return std::nullopt;
+    default:
+        return Outcome{nullptr, found};
+    }
+}
+
+RecordingConflictResolver::Outcome RecordingConflictResolver::ConflictFallback(const Operation* left,
+                                                                               const Operation* right,
+                                                                               const Operation* pick) const {
+    switch (m_DefaultResolve) {
+    case ResolveBlank:
+        return {MergeTreeCloneVisitor::CloneBlank(pick), ResolveConflict};
+    case ResolveRight:
+        return {right, ResolveConflict};
+    case ResolveLeft:
+        return {left, ResolveConflict};
+    default:
+        return {nullptr, ResolveConflict};
+    }
+}
+
+/// Settles a pair by the decision made for it, or else by `settle`, which is told whether an open conflict
+/// was asked for and gives the outcome.
+template <class Settle>
+const Operation* RecordingConflictResolver::ResolvePair(ConflictType type, const Operation* left,
+                                                        const Operation* right, const Settle& settle) {
+    const MergeResolve found = FindResolve(m_Path).value_or(ResolveMerged);
+    const std::optional<Outcome> decided = Decided(found, left, right);
+    const Outcome outcome = decided ? *decided : settle(found == ResolveConflict);
+    PushRecord(type, outcome.resolve, left, right);
+    return outcome.operation;
+}
+
+const Operation* RecordingConflictResolver::OnSameValueChanged(const ChangeOperation* left,
+                                                               const ChangeOperation* right) {
+    return ResolvePair(ConflictBothChanges, left, right, [&](bool asConflict) {
+        if (!asConflict && left->m_Value->Equals(right->m_Value)) return Outcome{left, ResolveMerged};
+        return ConflictFallback(left, right, left);
+    });
+}
+
+const Operation* RecordingConflictResolver::ResolveRemoveAgainstChange(const RemoveOperation* left,
+                                                                       const Operation* right) {
+    return ResolvePair(ConflictRemoveAgainstChange, left, right,
+                       [&](bool) { return ConflictFallback(left, right, right); });
+}
+
+const Operation* RecordingConflictResolver::OnSameValueChanged(const RemoveOperation* left,
+                                                               const ChangeOperation* right) {
+    return ResolveRemoveAgainstChange(left, right);
+}
+
+const Operation* RecordingConflictResolver::OnSameValueChanged(const RemoveOperation* left,
+                                                               const ChangeMappingOperation* right) {
+    return ResolveRemoveAgainstChange(left, right);
+}
+
+const Operation* RecordingConflictResolver::OnSameValueRemoved(const RemoveOperation* left,
+                                                               const RemoveOperation* right) {
+    const Operation* result = ResolvePair(ConflictBothRemoves, left, right, [&](bool asConflict) {
+        return asConflict ? ConflictFallback(left, right, left) : Outcome{left, ResolveMerged};
+    });
+    m_Records.back().left = nullptr;
+    m_Records.back().right = nullptr;
+    return result;
+}
+
+bool RecordingConflictResolver::MayMergeInside(const Operation* left, const Operation* right) const {
+    return left->m_Mergeable && right->m_Mergeable && MergeRules::IsMergeablePath(m_Path);
+}
+
+template <class Change, class MergeInside>
+const Operation* RecordingConflictResolver::ResolveContainers(const Change* left, const Change* right,
+                                                              const MergeInside& merge) {
+    return ResolvePair(ConflictBothChanges, left, right, [&](bool asConflict) {
+        if (!asConflict && MayMergeInside(left, right)) return Outcome{merge(), ResolveMerged};
+        if (!asConflict && OperationEquals(left, right)) return Outcome{left, ResolveMerged};
+        return ConflictFallback(left, right, left);
+    });
+}
+
+const Operation* RecordingConflictResolver::OnSameMappingChanged(const ChangeMappingOperation* left,
+                                                                 const ChangeMappingOperation* right) {
+    return ResolveContainers(left, right, [&] { return ChangeMappingOperation::Merge(left, right, *this); });
+}
+
+const Operation* RecordingConflictResolver::OnSameSequenceChanged(const ChangeSequenceOperation* left,
+                                                                  const ChangeSequenceOperation* right) {
+    return ResolveContainers(left, right,
+                             [&] { return ChangeSequenceOperation::Merge(left, right, *this, true); });
+}
+
+const Operation* RecordingConflictResolver::OnSameValueAdded(const AddOperation* left,
+                                                             const AddOperation* right) {
+    const YAMLNode* leftValue = left->m_Value;
+    const YAMLNode* rightValue = right->m_Value;
+    const MergeResolve found = FindResolve(m_Path).value_or(ResolveMerged);
+    if (found == ResolveMerged && MayMergeInside(left, right)) {
+        const auto kind = leftValue->GetKind();
+        const bool sameKind = kind == rightValue->GetKind();
+        // Containers that differ are merged inside, which leaves its own records.
+        if (sameKind && kind == YAMLNode::Kind::Mapping &&
+            !YAMLMappingDiff::Diff(AsMapping(leftValue), AsMapping(rightValue))->Entries().empty())
+            return MergeAddedMappings(left, right);
+        if (sameKind && kind == YAMLNode::Kind::Sequence &&
+            !YAMLSequenceDiff::Diff(AsSequence(leftValue), AsSequence(rightValue))->Entries().empty())
+            return MergeAddedSequences(left, right);
+        const bool equal = sameKind && (kind != YAMLNode::Kind::Scalar || leftValue->Equals(rightValue));
+        const Outcome outcome = equal ? Outcome{left, ResolveMerged} : ConflictFallback(left, right, left);
+        PushRecord(ConflictBothAdds, outcome.resolve, left, right);
+        return outcome.operation;
+    }
+    return ResolvePair(ConflictBothAdds, left, right, [&](bool asConflict) {
+        if (!asConflict && leftValue->Equals(rightValue)) return Outcome{left, ResolveMerged};
+        return ConflictFallback(left, right, left);
+    });
+}
+
+const Operation* RecordingConflictResolver::MergeAddedMappings(const AddOperation* left,
+                                                               const AddOperation* right) {
+    const YAMLMapping nothing;
+    const YAMLMapping* leftValue = AsMapping(left->m_Value);
+    const YAMLMappingDiff* merged =
+        YAMLMappingDiff::Merge(YAMLMappingDiff::Diff(&nothing, leftValue),
+                               YAMLMappingDiff::Diff(&nothing, AsMapping(right->m_Value)), *this);
+    if (merged->Entries().empty() && m_DefaultResolve == ResolveBase) return nullptr;
+    YAMLMapping* value = YAMLAlloc<YAMLMapping>::create(leftValue->m_Flow);
+    merged->Apply(*value);
+    return YAMLAlloc<AddOperation>::create(value, true);
+}
+
+const Operation* RecordingConflictResolver::MergeAddedSequences(const AddOperation* left,
+                                                                const AddOperation* right) {
+    const YAMLSequence nothing;
+    const YAMLSequence* leftValue = AsSequence(left->m_Value);
+    std::set<int> ignoredDropped;
+    const YAMLSequenceDiff* merged = YAMLSequenceDiff::Merge(
+        YAMLSequenceDiff::Diff(&nothing, leftValue),
+        YAMLSequenceDiff::Diff(&nothing, AsSequence(right->m_Value)), ignoredDropped, *this);
+    if (merged->Entries().empty() && m_DefaultResolve == ResolveBase) return nullptr;
+    YAMLSequence* value = YAMLAlloc<YAMLSequence>::create(leftValue->m_Flow);
+    merged->Apply(*value);
+    value->DropHoles();
+    return YAMLAlloc<AddOperation>::create(value, true);
+}
+
+// What post-processing found.
+
+void RecordingConflictResolver::OnComponentDependencyConflict(const ComponentDependencyConflict& conflict) {
+    const YAMLScalar* id = conflict.leftComponent ? conflict.leftComponent : conflict.rightComponent;
+    const auto record = std::find_if(m_Records.begin(), m_Records.end(), [id](const Record& candidate) {
+        return candidate.path.size() == 1 && candidate.path[0] == id;
+    });
+    if (record == m_Records.end()) return;
+    record->resolve = ResolveConflict;
+    const Operation* removal = YAMLAlloc<RemoveOperation>::create(true);
+    if (conflict.conflictType == ConflictRightRemoves) record->right = removal;
+    if (conflict.conflictType == ConflictLeftRemoves) record->left = removal;
+}
+
+void RecordingConflictResolver::OnTransformCycleDetected(const YAMLScalar* fileID, YAMLMapping& object) {
+    const YAMLScalar* classKey = object.HasKey(YAMLScalar::transform)       ? YAMLScalar::transform
+                                 : object.HasKey(YAMLScalar::rectTransform) ? YAMLScalar::rectTransform
+                                                                            : nullptr;
+    if (!classKey) throw new YAMLError("Cycle detected with no Transform or RectTransform");
+    const Path path = {fileID, classKey, YAMLScalar::mFather, YAMLScalar::fileID};
+    const bool blank = m_DefaultResolve == ResolveBlank;
+    const bool breaks = blank || FindResolve(path) == ResolveBreakCycle;
+    if (breaks) {
+        YAMLMapping* transform = AsMapping(object.Get(classKey));
+        YAMLMapping* father = transform ? AsMapping(transform->Get(YAMLScalar::mFather)) : nullptr;
+        // A Transform of a prefab instance has its parent stored elsewhere: there is nothing to change here.
+        if (father && father->HasKey(YAMLScalar::fileID))
+            father->Change(YAMLScalar::fileID, blank ? YAMLScalar::empty : YAMLScalar::zero)->Free();
+    }
+    m_Records.push_back({path, ConflictTransformCycle, breaks && !blank ? ResolveBreakCycle : ResolveConflict,
+                         nullptr, nullptr});
+}
+
+bool RecordingConflictResolverRecordComparer::operator()(const RecordingConflictResolver::Record& a,
+                                                         const RecordingConflictResolver::Record& b) const {
+    return std::lexicographical_compare(
+        a.path.begin(), a.path.end(), b.path.begin(), b.path.end(),
+        [](const YAMLScalar* x, const YAMLScalar* y) { return x != y && x->Value() < y->Value(); });
+}
+
+} // namespace ovrin_yaml

@@ -1,0 +1,106 @@
+#include "Merge/YAMLConflict.h"
+
+#include "Document/YAMLError.h"
+
+namespace ovrin_yaml {
+
+std::string PathToString(const Path& path) {
+    std::string text;
+    for (std::size_t i = 0; i < path.size(); ++i) {
+        if (i > 0) text += '.';
+        text += path[i]->Value();
+    }
+    return text;
+}
+
+void ConflictResolver::PushPath(const YAMLScalar* key) {
+    if (key == YAMLScalar::mFather && !m_Path.empty() &&
+        (m_Path.back() == YAMLScalar::transform || m_Path.back() == YAMLScalar::rectTransform)) {
+        if (m_IsChangedTransform.insert(m_Path.front()).second) m_ChangedTransforms.push_back(m_Path.front());
+    }
+    m_Path.push_back(key);
+}
+
+void ConflictResolver::PopPath() {
+    if (m_Path.empty()) throw YAMLError("Tried to pop on empty ConflictResolver path");
+    m_Path.pop_back();
+}
+
+SidePickingConflictResolver::SidePickingConflictResolver(MergeResolve side) : m_Side(side) {
+    if (side != ResolveLeft && side != ResolveRight)
+        throw YAMLError("SidePickingConflictResolver only accepts side left or right");
+}
+
+const Operation* SidePickingConflictResolver::Pick(const Operation* left, const Operation* right) const {
+    return m_Side == ResolveLeft ? left : right;
+}
+
+const Operation* SidePickingConflictResolver::OnSameValueAdded(const AddOperation* left,
+                                                               const AddOperation* right) {
+    return Pick(left, right);
+}
+
+const Operation* SidePickingConflictResolver::OnSameValueChanged(const ChangeOperation* left,
+                                                                 const ChangeOperation* right) {
+    return Pick(left, right);
+}
+
+const Operation* SidePickingConflictResolver::OnSameValueChanged(const RemoveOperation* left,
+                                                                 const ChangeOperation* right) {
+    return Pick(left, right);
+}
+
+const Operation* SidePickingConflictResolver::OnSameValueChanged(const RemoveOperation* left,
+                                                                 const ChangeMappingOperation* right) {
+    return Pick(left, right);
+}
+
+const Operation* SidePickingConflictResolver::OnSameMappingChanged(const ChangeMappingOperation* left,
+                                                                   const ChangeMappingOperation* right) {
+    return ChangeMappingOperation::Merge(left, right, *this);
+}
+
+const Operation* SidePickingConflictResolver::OnSameSequenceChanged(const ChangeSequenceOperation* left,
+                                                                    const ChangeSequenceOperation* right) {
+    return Pick(left, right);
+}
+
+void SidePickingConflictResolver::OnComponentDependencyConflict(const ComponentDependencyConflict&) {
+    throw YAMLError("OnComponentDependencyConflict not implemented in SidePickingConflictResolver");
+}
+
+const Operation* ExceptionConflictResolver::OnSameValueAdded(const AddOperation* left, const AddOperation*) {
+    throw YAMLError("Conflict for same value added " + PathToString(m_Path) + " at line " +
+                    std::to_string(left->m_Value->m_Line));
+}
+
+const Operation* ExceptionConflictResolver::OnSameValueChanged(const ChangeOperation*,
+                                                               const ChangeOperation*) {
+    throw YAMLError("Conflict for same value changed " + PathToString(m_Path));
+}
+
+const Operation* ExceptionConflictResolver::OnSameValueChanged(const RemoveOperation*,
+                                                               const ChangeOperation*) {
+    throw YAMLError("Conflict for removed value changed " + PathToString(m_Path));
+}
+
+const Operation* ExceptionConflictResolver::OnSameValueChanged(const RemoveOperation*,
+                                                               const ChangeMappingOperation*) {
+    throw YAMLError("Conflict for removed value changed " + PathToString(m_Path) + " in right file");
+}
+
+const Operation* ExceptionConflictResolver::OnSameMappingChanged(const ChangeMappingOperation*,
+                                                                 const ChangeMappingOperation*) {
+    throw YAMLError("Conflict for same mapping changed " + PathToString(m_Path));
+}
+
+const Operation* ExceptionConflictResolver::OnSameSequenceChanged(const ChangeSequenceOperation*,
+                                                                  const ChangeSequenceOperation*) {
+    throw YAMLError("Conflict for same sequence changed " + PathToString(m_Path));
+}
+
+void ExceptionConflictResolver::OnComponentDependencyConflict(const ComponentDependencyConflict&) {
+    throw YAMLError("OnComponentDependencyConflict not implemented in ExceptionConflictResolver");
+}
+
+} // namespace ovrin_yaml
