@@ -10,3 +10,6 @@ void ReadYAMLPath(const std::string& path, ovrin_yaml::OvrinObjects& objects);
 /// Loads the rules file of that name, "auto" being the one beside the executable. Called once per command,
 /// before any file is read. Throws YAMLError if the file can't be read and std::runtime_error for a bad line.
 void SetupRules(const std::string& rulesFile);
+
+/// Loads the type info file. Throws YAMLError or std::runtime_error if it can't be read.
+void SetupTypeInfo(const std::string& typeInfoFile);

@@ -1,0 +1,27 @@
+#include "DiffCommand.h"
+
+#include "CommandSettings.h"
+#include "OutputFile.h"
+#include "TimerStat.h"
+#include "TwoFiles.h"
+
+#include "Diff/YAMLDiffOutput.h"
+#include "Diff/YAMLMappingDiff.h"
+
+#include <iostream>
+#include <sstream>
+
+int HandleDiffCommand(DiffConfig& config) {
+    constexpr std::size_t kIndentWidth = 2;
+    TimerStat root("Diff Command", config.timing ? &std::cout : nullptr);
+    TwoFiles files;
+    ReadAndDiff(root, config, files);
+    TimerStat timer(root, "Output diff");
+    // The text is complete before the destination is touched: an object that can't be shown ends the command.
+    std::ostringstream text;
+    text << "Diff '" << config.leftFile << "' vs. '" << config.rightFile << "':\n";
+    ovrin_yaml::YAMLDiffOutput output(text, kIndentWidth);
+    files.diff->Output(output);
+    WriteOutput(config.destFile, [&](std::ostream& stream) { stream << text.view(); });
+    return 0;
+}

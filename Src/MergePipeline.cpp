@@ -1,0 +1,175 @@
+// The road of one merge. HandleMergeCommand is its table of contents; each stage is one call.
+
+#include "MergePipeline.h"
+
+#include "CommandSettings.h"
+#include "DriverErrors.h"
+#include "ErrMsg.h"
+#include "FileUtils.h"
+#include "InputFiles.h"
+#include "OutputFile.h"
+#include "Premerge.h"
+#include "ReadInputs.h"
+#include "Thread.h"
+#include "TimerStat.h"
+
+#include "Diff/YAMLMappingDiff.h"
+#include "Document/OvrinObjects.h"
+#include "Document/YAMLError.h"
+#include "Merge/ConflictReport.h"
+#include "Merge/RecordingConflictResolver.h"
+#include "Repair/FileIDCollisions.h"
+#include "Repair/PostProcess.h"
+#include "Repair/PreProcess.h"
+
+#include <iostream>
+#include <memory>
+#include <sstream>
+
+using namespace ovrin_yaml;
+
+namespace {
+
+/// The three files of a merge. The result is built in the base.
+struct MergeFiles {
+    OvrinObjects base, left, right;
+};
+
+struct MergeDiffs {
+    const YAMLMappingDiff* left = nullptr;
+    const YAMLMappingDiff* right = nullptr;
+};
+
+void ReadFiles(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
+    TimerStat timer(root, "Read files");
+    {
+        TimerStat rulesTimer(timer, "Reading unique keys");
+        SetupRules(config.rulesFile);
+    }
+    if (config.typeInfoFile != kDefaultTypeInfoFile) {
+        TimerStat typesTimer(root, "Read type info");
+        SetupTypeInfo(config.typeInfoFile);
+    }
+    ReadInputs(timer, config.useThreads,
+               {{"Read base", &config.baseFile, &files.base},
+                {"Read left", &config.leftFile, &files.left},
+                {"Read right", &config.rightFile, &files.right}});
+}
+
+void PreProcessFile(const std::string& path, OvrinObjects& objects) {
+    try {
+        PreProcess(objects.GetMapping());
+    } catch (const YAMLError& error) {
+        throw YAMLError("Cannot merge file '" + path + "': " + error.what());
+    }
+}
+
+void PreProcessMappings(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
+    TimerStat timer(root, "Preprocess mappings");
+    PreProcessFile(config.baseFile, files.base);
+    PreProcessFile(config.leftFile, files.left);
+    PreProcessFile(config.rightFile, files.right);
+    const YAMLMapping& base = files.base.GetMapping();
+    const YAMLMapping& left = files.left.GetMapping();
+    YAMLMapping& right = files.right.GetMapping();
+    RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
+}
+
+MergeDiffs DiffOnThreads(TimerStat& timer, const MergeFiles& files) {
+    MergeDiffs diffs;
+    Thread left(
+        [&] { diffs.left = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.left.GetMapping()); });
+    Thread right(
+        [&] { diffs.right = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.right.GetMapping()); });
+    {
+        TimerStat waitTimer(timer, "Waiting for left diff");
+        left.Join();
+        right.Join();
+    }
+    left.CheckForExceptions();
+    right.CheckForExceptions();
+    return diffs;
+}
+
+MergeDiffs CreateDiffs(TimerStat& root, const MergeConfig& config, const MergeFiles& files) {
+    TimerStat timer(root, "Creating diffs");
+    if (config.useThreads) return DiffOnThreads(timer, files);
+    MergeDiffs diffs;
+    {
+        TimerStat leftTimer(timer, "Creating left diff");
+        diffs.left = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.left.GetMapping());
+    }
+    TimerStat rightTimer(timer, "Creating right diff");
+    diffs.right = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.right.GetMapping());
+    return diffs;
+}
+
+/// False, after a message, if the file can't be read.
+bool ReadResolveFile(TimerStat& root, const MergeConfig& config, RecordingConflictResolver& resolver) {
+    if (config.resolveFile.empty()) return true;
+    TimerStat timer(root, "Reading resolve file");
+    std::string text;
+    if (ReadWholeFile(OvrinToNativePath(config.resolveFile), text) != ReadResult::Complete) {
+        g_DriverErrors << "Couldn't open merge resolve file '" << config.resolveFile << "'";
+        ErrMsg(g_DriverErrors);
+        return false;
+    }
+    std::istringstream stream(std::move(text));
+    InputConflictRecords(stream, resolver);
+    return true;
+}
+
+/// Null where no premerge can follow: nobody else reads the base once it is changed.
+std::unique_ptr<OvrinObjects> CloneBase(TimerStat& root, const MergeConfig& config,
+                                        const OvrinObjects& base) {
+    TimerStat timer(root, "Cloning base roots");
+    if (config.premergeBaseDest.empty() || config.premergeRightDest.empty()) return nullptr;
+    return std::unique_ptr<OvrinObjects>(base.Clone());
+}
+
+/// Returns whether component dependencies were found broken.
+bool ApplyMergedChanges(TimerStat& root, const YAMLMappingDiff& merged, MergeFiles& files,
+                        RecordingConflictResolver& resolver) {
+    TimerStat timer(root, "Applying merged changes");
+    bool hasComponentDependencyConflicts = false;
+    merged.Apply(files.base.GetMapping());
+    TimerStat postTimer(timer, "Post process merged changes");
+    PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), resolver,
+                hasComponentDependencyConflicts);
+    return hasComponentDependencyConflicts;
+}
+
+} // namespace
+
+int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath) {
+    TimerStat root("Merging", config.timing ? &std::cout : nullptr);
+    MergeFiles files;
+    ReadFiles(root, config, files);
+    RecordingConflictResolver resolver(config.resolve);
+    { TimerStat timer(root, "Creating mappings"); }
+    PreProcessMappings(root, config, files);
+    const MergeDiffs diffs = CreateDiffs(root, config, files);
+    if (!ReadResolveFile(root, config, resolver)) return 1;
+    const YAMLMappingDiff* merged = nullptr;
+    {
+        TimerStat timer(root, "Merging");
+        merged = YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver);
+    }
+    const std::unique_ptr<OvrinObjects> baseClone = CloneBase(root, config, files.base);
+    const bool hasComponentDependencyConflicts = ApplyMergedChanges(root, *merged, files, resolver);
+    {
+        TimerStat timer(root, "Output conflicts");
+        WriteOutput(config.conflictFile,
+                    [&](std::ostream& stream) { OutputConflictRecords(stream, resolver, config.describe); });
+    }
+    {
+        TimerStat timer(root, "Output result");
+        WriteOutput(outputPath, [&](std::ostream& stream) { files.base.Output(stream); });
+    }
+    if (!resolver.HasPendingConflicts()) return 0;
+    if (baseClone)
+        PremergeBoth(
+            root, config,
+            {*baseClone, files.left.GetMapping(), files.right.GetMapping(), diffs.left, diffs.right});
+    return hasComponentDependencyConflicts ? 3 : 2;
+}

@@ -1,0 +1,59 @@
+#include "Premerge.h"
+
+#include "CommandSettings.h"
+#include "OutputFile.h"
+#include "Thread.h"
+#include "TimerStat.h"
+
+#include "Diff/MergeRules.h"
+#include "Merge/RecordingConflictResolver.h"
+#include "Repair/PostProcess.h"
+
+#include <memory>
+#include <ostream>
+
+using namespace ovrin_yaml;
+
+namespace {
+
+void Premerge(MergeResolve resolve, TimerStat& parent, const std::string& path, OvrinObjects& objects,
+              const PremergeInputs& inputs) {
+    TimerStat timer(parent, "Premerge " + path);
+    RecordingConflictResolver resolver(resolve);
+    const YAMLMappingDiff* merged = nullptr;
+    {
+        TimerStat mergeTimer(timer, "Merging premerge");
+        merged = YAMLMappingDiff::Merge(inputs.leftDiff, inputs.rightDiff, resolver);
+    }
+    {
+        TimerStat applyTimer(timer, "Applying premerge merged changes");
+        merged->Apply(objects.GetMapping());
+        PostProcessMergeOnly(objects.GetMapping(), inputs.left, inputs.right, resolver);
+    }
+    TimerStat outputTimer(timer, "Output premerge result");
+    WriteOutput(path, [&](std::ostream& stream) { objects.Output(stream); });
+}
+
+Thread SpawnPremergeThread(MergeResolve resolve, const std::string& path, OvrinObjects& objects,
+                           const PremergeInputs& inputs) {
+    return Thread([=, &path, &objects, &inputs] {
+        // Standard output may be the main thread's: the timers of a pass hang under a silent root.
+        TimerStat root("Premerge", nullptr);
+        Premerge(resolve, root, path, objects, inputs);
+    });
+}
+
+} // namespace
+
+void PremergeBoth(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs) {
+    const std::unique_ptr<OvrinObjects> secondClone(inputs.base.Clone());
+    // The name announces the clone, but the line stands for nothing: it is part of the listing.
+    { TimerStat timer(root, "Clone base roots"); }
+    const MergeResolve baseResolve = MergeRules::CheckBlankPremergeBaseEnabled() ? ResolveBlank : ResolveBase;
+    Thread baseThread = SpawnPremergeThread(baseResolve, config.premergeBaseDest, *secondClone, inputs);
+    Thread rightThread = SpawnPremergeThread(ResolveRight, config.premergeRightDest, inputs.base, inputs);
+    baseThread.Join();
+    rightThread.Join();
+    baseThread.CheckForExceptions();
+    rightThread.CheckForExceptions();
+}

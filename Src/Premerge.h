@@ -1,0 +1,22 @@
+#pragma once
+
+#include "Diff/YAMLMappingDiff.h"
+#include "Document/OvrinObjects.h"
+
+struct MergeConfig;
+class TimerStat;
+
+/// What both premerge passes work on. They share all but the base read-only.
+struct PremergeInputs {
+    ovrin_yaml::OvrinObjects& base; // as it was before the merge; used up
+    const ovrin_yaml::YAMLMapping& left;
+    const ovrin_yaml::YAMLMapping& right;
+    const ovrin_yaml::YAMLMappingDiff* leftDiff;
+    const ovrin_yaml::YAMLMappingDiff* rightDiff;
+};
+
+/// Writes the premerged base and the premerged right file, which hold all that could be merged and, at the
+/// open conflicts, the value of the base (or blanks, where the rules want them) and of the right side.
+/// Decisions of a resolve file don't count here. The passes run beside each other, each to its end; then the
+/// first failure in this order is thrown.
+void PremergeBoth(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs);

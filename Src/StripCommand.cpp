@@ -1,0 +1,51 @@
+#include "StripCommand.h"
+
+#include "CommandSettings.h"
+#include "OutputFile.h"
+#include "TimerStat.h"
+#include "TwoFiles.h"
+
+#include "Diff/YAMLMappingDiff.h"
+#include "Document/YAMLMapping.h"
+
+#include <iostream>
+#include <sstream>
+#include <vector>
+
+using namespace ovrin_yaml;
+
+namespace {
+
+bool IsHeaderKey(const YAMLScalar* key) {
+    return key == YAMLScalar::fileIDPlaceHolderName || key == YAMLScalar::classIDPlaceHolderName;
+}
+
+/// Cuts `mapping` down to the keys that `diff` touches and, in an object, those that name it. A changed
+/// sequence stays whole.
+void StripUnchangedMapping(YAMLMapping& mapping, const YAMLMappingDiff& diff) {
+    std::vector<const YAMLScalar*> unchanged;
+    for (const auto& [key, value] : mapping) {
+        const Operation* operation = diff.Find(key);
+        if (!operation && !IsHeaderKey(key)) unchanged.push_back(key);
+        const auto* change = As<ChangeMappingOperation>(operation);
+        YAMLMapping* child = AsMapping(value);
+        if (change && child) StripUnchangedMapping(*child, *change->m_Diff);
+    }
+    for (const YAMLScalar* key : unchanged) mapping.Remove(key);
+}
+
+} // namespace
+
+int HandleStripCommand(StripConfig& config) {
+    TimerStat root("Strip Command", config.timing ? &std::cout : nullptr);
+    TwoFiles files;
+    ReadAndDiff(root, config, files);
+    StripUnchangedMapping(files.right.GetMapping(), *files.diff);
+    TimerStat timer(root, "Output result");
+    // The text is complete before the destination is touched: an object that can't be written ends the
+    // command.
+    std::ostringstream text;
+    files.right.Output(text);
+    WriteOutput(config.destFile, [&](std::ostream& stream) { stream << text.view(); });
+    return 0;
+}

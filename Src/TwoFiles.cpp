@@ -1,0 +1,38 @@
+#include "TwoFiles.h"
+
+#include "CommandSettings.h"
+#include "InputFiles.h"
+#include "ReadInputs.h"
+#include "TimerStat.h"
+
+#include "Diff/YAMLMappingDiff.h"
+#include "Repair/PreProcess.h"
+
+using namespace ovrin_yaml;
+
+void ReadAndDiff(TimerStat& root, const TwoFileConfig& config, TwoFiles& files) {
+    {
+        TimerStat timer(root, "Read files");
+        {
+            TimerStat rulesTimer(timer, "Reading unique keys");
+            SetupRules(config.rulesFile);
+        }
+        if (config.typeInfoFile != kDefaultTypeInfoFile) {
+            TimerStat typesTimer(root, "Read type info");
+            SetupTypeInfo(config.typeInfoFile);
+        }
+        // The left file plays the base and the right one the changed side, in the names too.
+        ReadInputs(
+            timer, config.useThreads,
+            {{"Read base", &config.leftFile, &files.left}, {"Read left", &config.rightFile, &files.right}});
+    }
+    { TimerStat timer(root, "Creating mappings"); }
+    {
+        TimerStat timer(root, "Preprocess mappings");
+        PreProcess(files.left.GetMapping());
+        PreProcess(files.right.GetMapping());
+    }
+    TimerStat timer(root, "Creating diff");
+    TimerStat diffTimer(timer, "Creating left diff");
+    files.diff = YAMLMappingDiff::Diff(&files.left.GetMapping(), &files.right.GetMapping());
+}
