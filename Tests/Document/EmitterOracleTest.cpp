@@ -2,10 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <iterator>
 #include <random>
-#include <regex>
 #include <string>
-#include <vector>
 #include <yaml.h>
 
 namespace {
@@ -20,46 +19,28 @@ struct Generator {
     bool flowAndQuotes; // flow collections, and the quote in texts
     std::mt19937 random;
 
-    int Below(int limit) { return static_cast<int>(random() % static_cast<unsigned>(limit)); }
+    int Below(std::size_t limit) { return static_cast<int>(random() % limit); }
+
+    std::string Piece() {
+        static const char* const kWords[] = {"a", "word", "m_Name", "1.5", " ", " ", "  ", ":"};
+        static const char* const kGroups[] = {": ",     "? ",           "- ",        "---",    "...",
+                                              " #",     "\n\n",         "\n ",       " \n",    "\u00E9",
+                                              "\uFFFD", "\u0085",       "\u00A0",    "\u2028", "\u2029",
+                                              "\uFEFF", "\u65E5\u672C", "\U0001F600"};
+        static const std::string kMarks("~=#\"\\-?,[]{}&*!|>%@`\t\r\n\n\x01\x1B\x7F\0", 28);
+        if (flowAndQuotes && Below(20) == 0) return "'";
+        if (Below(3) != 0) return kWords[Below(std::size(kWords))];
+        if (Below(2) != 0) return kGroups[Below(std::size(kGroups))];
+        return std::string(1, kMarks[Below(kMarks.size())]);
+    }
 
     std::string Text() {
-        static const std::vector<std::string> kPieces = {"a",          "word",
-                                                         "m_Name",     "1.5",
-                                                         " ",          " ",
-                                                         " ",          "  ",
-                                                         ":",          ": ",
-                                                         " #",         "#",
-                                                         "\"",         "\\",
-                                                         "-",          "- ",
-                                                         "---",        "...",
-                                                         "?",          "? ",
-                                                         ",",          "[",
-                                                         "]",          "{",
-                                                         "}",          "&",
-                                                         "*",          "!",
-                                                         "|",          ">",
-                                                         "%",          "@",
-                                                         "`",          "~",
-                                                         "=",          "\n",
-                                                         "\n",         "\n\n",
-                                                         "\n ",        " \n",
-                                                         "\t",         "\r",
-                                                         "\x01",       "\x1B",
-                                                         "\x7F",       std::string(1, '\0'),
-                                                         "\u00E9",     "\u0085",
-                                                         "\u00A0",     "\u2028",
-                                                         "\u2029",     "\uFEFF",
-                                                         "\uFFFE",     "\u65E5\u672C",
-                                                         "\U0001F600", "'",
-                                                         "''"};
-        const int kinds = static_cast<int>(kPieces.size()) - (flowAndQuotes ? 0 : 2);
         std::string text;
         if (Below(4) == 0) {
             for (int words = Below(40); words > 0; --words)
                 text.append(std::string(1 + Below(12), 'w')).append(Below(8) ? " " : "  ");
         }
-        for (int pieces = Below(6); pieces > 0; --pieces) text += kPieces[Below(Below(3) ? 8 : kinds)];
-        if (Below(6) == 0) text += kPieces[Below(kinds)];
+        for (int pieces = Below(7); pieces > 0; --pieces) text += Piece();
         if (finalBreaks && Below(2) == 0) text.insert(0, "a").append(1 + Below(3), '\n');
         return text;
     }
@@ -142,8 +123,18 @@ std::string OurText(const YAMLNode& node) {
     return text + "\n";
 }
 
-std::string Replace(const std::string& text, const char* pattern, const char* with) {
-    return std::regex_replace(text, std::regex(pattern), with);
+std::string WithoutBlanksAtLineEnds(std::string text) {
+    for (std::size_t at; (at = text.find(" \n")) != std::string::npos;) text.erase(at, 1);
+    return text;
+}
+
+/// Only quoted texts have empty lines, so a quote that opens a line behind one closes a text.
+std::string WithClosingQuotesAtColumn0(std::string text) {
+    for (std::size_t at = 0; (at = text.find("\n\n", at)) != std::string::npos; ++at) {
+        const std::size_t end = text.find_first_not_of(' ', at + 2);
+        if (end != std::string::npos && text[end] == '\'') text.erase(at + 2, end - at - 2);
+    }
+    return text;
 }
 
 TEST(EmitterOracle, AgreesWithTheLibrary) {
@@ -156,14 +147,14 @@ TEST(EmitterOracle, AgreesWithTheLibrary) {
 TEST(EmitterOracle, DiffersInTheBlankBeforeAnEmptyValue) {
     for (unsigned seed = 0; seed < 3000; ++seed) {
         const Tree tree = Generator{true, false, true, std::mt19937(seed)}.Node(3);
-        ASSERT_EQ(Replace(OurText(*tree.node), " +\n", "\n"), LibraryText(*tree.node)) << "seed " << seed;
+        ASSERT_EQ(WithoutBlanksAtLineEnds(OurText(*tree.node)), LibraryText(*tree.node)) << "seed " << seed;
     }
 }
 
 TEST(EmitterOracle, DiffersInTheColumnOfAQuoteBehindALineBreak) {
     for (unsigned seed = 0; seed < 3000; ++seed) {
         const Tree tree = Generator{false, true, false, std::mt19937(seed)}.Node(3);
-        const std::string library = Replace(LibraryText(*tree.node), "\n\n +'", "\n\n'");
+        const std::string library = WithClosingQuotesAtColumn0(LibraryText(*tree.node));
         ASSERT_EQ(OurText(*tree.node), library) << "seed " << seed;
     }
 }

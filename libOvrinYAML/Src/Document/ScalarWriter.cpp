@@ -1,7 +1,6 @@
 #include "Document/ScalarWriter.h"
 
 #include <algorithm>
-#include <cstdint>
 
 namespace ovrin_yaml {
 
@@ -22,7 +21,7 @@ std::size_t FindFold(std::string_view text, std::size_t from) {
 }
 
 struct Character {
-    std::uint32_t code;
+    char32_t code;
     std::size_t length; // in bytes
 };
 
@@ -31,7 +30,7 @@ Character Decode(std::string_view text) {
     const unsigned char first = static_cast<unsigned char>(text[0]);
     const std::size_t length = first < 0xC0 ? 1 : first < 0xE0 ? 2 : first < 0xF0 ? 3 : first < 0xF8 ? 4 : 1;
     if (length == 1 || length > text.size()) return {first, 1};
-    std::uint32_t code = first & (0x7Fu >> length);
+    char32_t code = first & (0x7Fu >> length);
     for (std::size_t i = 1; i < length; ++i) {
         if ((text[i] & 0xC0) != 0x80) return {first, 1};
         code = code << 6 | (text[i] & 0x3Fu);
@@ -39,48 +38,15 @@ Character Decode(std::string_view text) {
     return {code, length};
 }
 
-/// The letter that stands for a character behind a backslash, or 0.
-char ShortEscape(std::uint32_t code) {
-    switch (code) {
-    case 0x00:
-        return '0';
-    case 0x07:
-        return 'a';
-    case 0x08:
-        return 'b';
-    case 0x09:
-        return 't';
-    case 0x0A:
-        return 'n';
-    case 0x0B:
-        return 'v';
-    case 0x0C:
-        return 'f';
-    case 0x0D:
-        return 'r';
-    case 0x1B:
-        return 'e';
-    case '"':
-        return '"';
-    case '\\':
-        return '\\';
-    case 0x85:
-        return 'N';
-    case 0xA0:
-        return '_';
-    case 0x2028:
-        return 'L';
-    case 0x2029:
-        return 'P';
-    default:
-        return 0;
-    }
-}
+/// Characters that are written as a letter behind a backslash, and those letters.
+constexpr std::u32string_view kLettered(U"\0\a\b\t\n\v\f\r\x1B\"\\\x85\xA0\u2028\u2029", 15);
+constexpr std::string_view kLetters("0abtnvfre\"\\N_LP");
+static_assert(kLettered.size() == kLetters.size());
 
-void WriteEscape(TextOutput& output, std::uint32_t code) {
+void WriteEscape(TextOutput& output, char32_t code) {
     output.Put('\\');
-    if (const char letter = ShortEscape(code)) {
-        output.Put(letter);
+    if (const std::size_t at = kLettered.find(code); at != std::u32string_view::npos) {
+        output.Put(kLetters[at]);
         return;
     }
     const int digits = code <= 0xFF ? 2 : code <= 0xFFFF ? 4 : 8;
