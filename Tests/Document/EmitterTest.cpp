@@ -182,7 +182,7 @@ TEST_F(ObjectFileWriter, WritesAFileWithoutObjects) {
 TEST_F(ObjectFileWriter, WritesFilesLongerThanAPiece) {
     const string text = W(1000);
     string expected;
-    for (int i = 0; i < 3000; ++i) {
+    for (int i = 0; i < 1200; ++i) {
         Add(IntToString(i), {{"A", std::string_view(text)}, {"MERGE_ClassID", "1"}});
         expected += "--- !o!1 &" + IntToString(i) + "\nA: " + text + "\n";
     }
