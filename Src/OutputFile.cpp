@@ -4,6 +4,7 @@
 
 #include <fstream>
 #include <iostream>
+#include <vector>
 
 void WriteOutput(const std::string& path, const std::function<void(std::ostream&)>& write) {
     if (path.empty()) {
@@ -16,9 +17,15 @@ void WriteOutput(const std::string& path, const std::function<void(std::ostream&
 }
 
 void OutputResultToDestination(const std::string& source, const std::string& dest) {
-    std::string bytes;
-    if (ReadWholeFile(OvrinToNativePath(source), bytes) != ReadResult::Complete) return;
+    std::filebuf input;
+    if (!input.open(OvrinToNativePath(source), std::ios::in | std::ios::binary)) return;
     WriteOutput(dest, [&](std::ostream& stream) {
-        stream.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
+        std::vector<char> piece(std::size_t{1} << 20);
+        for (;;) {
+            const std::streamsize count =
+                input.sgetn(piece.data(), static_cast<std::streamsize>(piece.size()));
+            if (count <= 0) break;
+            stream.write(piece.data(), count);
+        }
     });
 }

@@ -6,6 +6,14 @@
 
 namespace ovrin_yaml {
 
+#if defined(__SANITIZE_ADDRESS__)
+
+void* ArenaAllocate(std::size_t bytes) {
+    return ::operator new(bytes);
+}
+
+#else
+
 namespace {
 
 constexpr std::size_t kAlignment = 8;
@@ -34,9 +42,6 @@ void* AllocateFromNewChunk(ThreadArena& arena, std::size_t bytes) {
 } // namespace
 
 void* ArenaAllocate(std::size_t bytes) {
-#if defined(__SANITIZE_ADDRESS__)
-    return ::operator new(bytes);
-#else
     bytes = (bytes + kAlignment - 1) & ~(kAlignment - 1);
     ThreadArena& arena = t_Arena;
     if (bytes > arena.left) return AllocateFromNewChunk(arena, bytes);
@@ -44,7 +49,8 @@ void* ArenaAllocate(std::size_t bytes) {
     arena.position += bytes;
     arena.left -= bytes;
     return piece;
-#endif
 }
+
+#endif
 
 } // namespace ovrin_yaml
