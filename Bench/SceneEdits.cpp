@@ -26,15 +26,17 @@ bool IsNumber(const std::string& text) {
     return first < text.size() && std::isdigit(static_cast<unsigned char>(text[first]));
 }
 
-std::string OtherText(const std::string& text, SceneRandom& random) {
+std::string AnyText(const std::string& like, SceneRandom& random) {
+    constexpr std::uint64_t integers = 100;
     constexpr std::size_t longestName = 24;
+    if (!IsNumber(like)) return like.size() > longestName ? RandomNote(random) : RandomName(random);
+    bool isInteger = like.find('.') == std::string::npos;
+    return isInteger ? std::to_string(random.Below(integers)) : RandomNumber(random);
+}
+
+std::string OtherText(const std::string& text, SceneRandom& random) {
     std::string other = text;
-    while (other == text) {
-        if (IsNumber(text))
-            other = RandomNumber(random);
-        else
-            other = text.size() > longestName ? RandomNote(random) : RandomName(random);
-    }
+    while (other == text) other = AnyText(text, random);
     return other;
 }
 

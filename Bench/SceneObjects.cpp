@@ -173,10 +173,12 @@ SceneValue RandomVector(SceneRandom& random) {
 }
 
 SceneValue AssetReference(SceneRandom& random) {
+    constexpr std::uint64_t assets = 1 << 16; // scenes use the same assets again and again
+    SceneRandom asset(random.Below(assets));
     std::string type = random.Below(2) == 0 ? "2" : "3";
     std::string id =
         random.Below(3) == 0 ? "-" + LongID(random) : std::to_string(2100000 + 100 * random.Below(50));
-    return FlowMapping({{"fileID", id}, {"guid", Hex(random, 32)}, {"type", type}});
+    return FlowMapping({{"fileID", id}, {"guid", Hex(asset, 32)}, {"type", type}});
 }
 
 SceneObject MakeGameObject(SceneRandom& random, std::int64_t id) {
