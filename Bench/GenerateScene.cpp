@@ -40,7 +40,8 @@ public:
         while (m_At < m_Words.size()) ReadOne(Next());
         if (m_Result.directory.empty()) throw std::runtime_error("No directory given");
         SceneOptions& options = m_Result.options;
-        if (!options.size && !options.objects) options.size = 1 << 20;
+        bool endsByCount = options.mode == SceneOptions::Mode::Conflicts;
+        if (!options.size && !options.objects && !endsByCount) options.size = 1 << 20;
         return m_Result;
     }
 
@@ -103,27 +104,30 @@ private:
     Arguments m_Result;
 };
 
-/// A file of the directory, opened for writing; close it to know that everything arrived.
-class OutputFile : public std::ofstream {
-public:
-    explicit OutputFile(const std::string& path) : std::ofstream(path, std::ios::binary) {
-        exceptions(std::ios::failbit | std::ios::badbit);
-    }
-};
+std::ofstream OpenForWriting(const std::string& path) {
+    std::ofstream file(path, std::ios::binary);
+    if (!file) throw std::runtime_error("Cannot write " + path);
+    return file;
+}
+
+void Close(std::ofstream& file) {
+    file.close();
+    if (!file) throw std::runtime_error("Writing failed");
+}
 
 SceneCounts WriteFiles(const Arguments& arguments) {
-    OutputFile base(arguments.directory + "/base.ovrin");
-    OutputFile left(arguments.directory + "/left.ovrin");
-    OutputFile right(arguments.directory + "/right.ovrin");
+    std::ofstream base = OpenForWriting(arguments.directory + "/base.ovrin");
+    std::ofstream left = OpenForWriting(arguments.directory + "/left.ovrin");
+    std::ofstream right = OpenForWriting(arguments.directory + "/right.ovrin");
     std::ofstream resolve;
     bool hasDecisions = arguments.options.mode == SceneOptions::Mode::Conflicts;
-    if (hasDecisions) resolve = OutputFile(arguments.directory + "/resolve.txt");
+    if (hasDecisions) resolve = OpenForWriting(arguments.directory + "/resolve.txt");
     SceneCounts counts =
         GenerateScene(arguments.options, {base, left, right, hasDecisions ? &resolve : nullptr});
-    base.close();
-    left.close();
-    right.close();
-    if (hasDecisions) resolve.close();
+    Close(base);
+    Close(left);
+    Close(right);
+    if (hasDecisions) Close(resolve);
     return counts;
 }
 

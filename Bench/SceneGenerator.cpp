@@ -2,6 +2,8 @@
 
 #include "SceneEdits.h"
 
+#include <algorithm>
+
 namespace ovrin_bench {
 namespace {
 
@@ -34,7 +36,7 @@ private:
     }
 
     void MakeNextTree() {
-        SceneTree tree = MakeTree(m_Random, m_IDs);
+        SceneTree tree = MakeTree(m_Random, m_IDs, MostEntities());
         SceneEditor editor(tree, m_Random, m_IDs);
         switch (m_Options.mode) {
         case Mode::Conflicts:
@@ -55,6 +57,22 @@ private:
             break;
         }
         for (const SceneSlot& slot : tree.slots) WriteSlot(slot);
+    }
+
+    /// Keeps the last trees small, so that a scene ends close to what was asked for.
+    std::uint64_t MostEntities() const {
+        constexpr std::uint64_t most = 24;
+        constexpr std::uint64_t bytesPerEntity = 1700; // measured: about 3.6 objects of 470 bytes
+        constexpr std::uint64_t objectsPerEntity = 4;
+        std::uint64_t fitting = most;
+        if (m_Options.size) fitting = Missing(m_Options.size, m_Counts.bytes) / bytesPerEntity;
+        if (m_Options.objects)
+            fitting = std::min(fitting, Missing(m_Options.objects, m_Counts.objects) / objectsPerEntity);
+        return std::clamp<std::uint64_t>(fitting, 1, most);
+    }
+
+    static std::uint64_t Missing(std::uint64_t whole, std::uint64_t done) {
+        return whole > done ? whole - done : 0;
     }
 
     void EditApart(SceneEditor& editor) {

@@ -177,7 +177,7 @@ SceneValue AssetReference(SceneRandom& random) {
     SceneRandom asset(random.Below(assets));
     std::string type = random.Below(2) == 0 ? "2" : "3";
     std::string id =
-        random.Below(3) == 0 ? "-" + LongID(random) : std::to_string(2100000 + 100 * random.Below(50));
+        random.Below(3) == 0 ? "-" + LongID(random) : std::to_string(5100000 + 100 * random.Below(50));
     return FlowMapping({{"fileID", id}, {"guid", Hex(asset, 32)}, {"type", type}});
 }
 

@@ -61,9 +61,9 @@ SceneObject& SceneSlot::Edit(Side side) {
     return *edited[side];
 }
 
-SceneTree MakeTree(SceneRandom& random, SceneIDs& ids) {
+SceneTree MakeTree(SceneRandom& random, SceneIDs& ids, std::uint64_t mostEntities) {
     SceneTree tree;
-    std::uint64_t entities = 1 + random.Below(24);
+    std::uint64_t entities = 1 + random.Below(mostEntities);
     for (std::uint64_t i = 0; i < entities; ++i) MakeEntity(tree, i == 0 ? 0 : random.Below(i), random, ids);
     if (random.Below(3) == 0) MakePrefab(tree, random, ids);
     if (random.Below(8) == 0) {

@@ -39,7 +39,8 @@ struct SceneTree {
     std::vector<SceneEntity> entities;
 };
 
-SceneTree MakeTree(SceneRandom& random, SceneIDs& ids);
+/// A tree of up to `mostEntities` entities; at least 1.
+SceneTree MakeTree(SceneRandom& random, SceneIDs& ids, std::uint64_t mostEntities);
 
 /// Appends a MonoBehaviour that only `side` has to an entity, its place in the game object's list included.
 void AddComponent(SceneTree& tree, std::size_t entity, Side side, SceneRandom& random, SceneIDs& ids);

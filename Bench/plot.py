@@ -3,7 +3,7 @@
 import math
 
 WIDTH, HEIGHT = 720, 440
-LEFT, RIGHT, TOP, BOTTOM = 70, 190, 20, 50  # margins; the names of the curves stand in the right one
+LEFT, RIGHT, TOP, BOTTOM = 70, 210, 20, 50  # margins; the names of the curves stand in the right one
 COLOURS = ["#1b6ca8", "#7fb3d5", "#b03a2e", "#e6a59e", "#3d8c40", "#8e5ea2"]
 
 
