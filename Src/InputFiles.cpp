@@ -4,6 +4,7 @@
 #include "Diff/MergeRules.h"
 #include "Document/ObjectFileReader.h"
 #include "FileUtils.h"
+#include "Repair/YAMLTypeInfo.h"
 
 #include <exception>
 #include <sstream>
@@ -40,4 +41,10 @@ void SetupRules(const std::string& rulesFile) {
         throw YAMLError("Cannot open rules file for reading:" + path);
     std::istringstream stream(std::move(text));
     MergeRules::LoadSequenceUniqueKeys(stream);
+}
+
+void SetupTypeInfo(const std::string& typeInfoFile) {
+    OvrinObjects objects;
+    ReadYAMLPath(typeInfoFile, objects);
+    GetTypeInfoManager()->Read(objects);
 }

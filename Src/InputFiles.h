@@ -11,5 +11,6 @@ void ReadYAMLPath(const std::string& path, ovrin_yaml::OvrinObjects& objects);
 /// before any file is read. Throws YAMLError if the file can't be read and std::runtime_error for a bad line.
 void SetupRules(const std::string& rulesFile);
 
-/// Loads the type info file. Throws YAMLError or std::runtime_error if it can't be read.
+/// Loads the type information of that object file into the library. Called at most once per command, before
+/// threads are started. Throws YAMLError if the file can't be read and std::runtime_error for a bad entry.
 void SetupTypeInfo(const std::string& typeInfoFile);
