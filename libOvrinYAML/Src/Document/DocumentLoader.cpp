@@ -8,9 +8,11 @@
 
 #include <yaml.h>
 
+#include <algorithm>
 #include <cstring>
 #include <new>
 #include <unordered_map>
+#include <vector>
 
 namespace ovrin_yaml {
 
@@ -24,6 +26,7 @@ constexpr std::uint64_t kMaximumAliasedNodes = 10'000'000;
 const char* const kUTF16Problem =
     "YAML file is not UTF-8 encoded, all files must be UTF-8 encoded for performance reasons";
 const char* const kVersionProblem = "found incompatible YAML document";
+const char* const kDepthProblem = "Document is nested too deeply";
 
 /// A libyaml parser over a text; the text must outlive it.
 class Parser {
@@ -160,6 +163,12 @@ private:
         YAMLNode* node; // null while the node is open
         std::uint64_t firstNode;
         std::uint64_t nodeCount;
+        std::size_t levels; // containers inside each other, 0 for a scalar
+    };
+
+    struct OpenContainer {
+        Anchor* anchor;         // null without one
+        std::size_t levels = 1; // of what it holds so far, itself included
     };
 
     void TakeRootTag(const yaml_char_t* tag, const char* implicitTag) {
@@ -175,26 +184,30 @@ private:
     }
 
     void Open(YAMLNode::Kind kind, bool flow, const yaml_char_t* anchor, std::uint32_t line) {
-        if (m_Builder.Depth() == kMaximumDepth) throw YAMLError("Document is nested too deeply");
-        m_OpenAnchors.push_back(DefineAnchor(anchor, m_NodeCount, nullptr));
+        if (m_Builder.Depth() == kMaximumDepth) throw YAMLError(kDepthProblem);
+        m_Open.push_back({DefineAnchor(anchor, m_NodeCount, nullptr)});
         m_Builder.Open(kind, flow, line);
         ++m_NodeCount;
     }
 
     void Close() {
         YAMLNode* node = m_Builder.Close();
-        if (Anchor* anchor = m_OpenAnchors.back()) {
-            anchor->node = node;
-            anchor->nodeCount = m_NodeCount - anchor->firstNode;
-        }
-        m_OpenAnchors.pop_back();
+        const OpenContainer closed = m_Open.back();
+        m_Open.pop_back();
+        if (Anchor* anchor = closed.anchor)
+            *anchor = {node, anchor->firstNode, m_NodeCount - anchor->firstNode, closed.levels};
+        NoteLevels(closed.levels);
+    }
+
+    void NoteLevels(std::size_t levels) {
+        if (!m_Open.empty()) m_Open.back().levels = std::max(m_Open.back().levels, levels + 1);
     }
 
     /// Node addresses in an unordered_map stay valid, so the open anchors may be pointed at.
     Anchor* DefineAnchor(const yaml_char_t* name, std::uint64_t firstNode, YAMLNode* node) {
         if (!name) return nullptr;
         const auto [position, isNew] =
-            m_Anchors.try_emplace(std::string(Text(name)), Anchor{node, firstNode, 1});
+            m_Anchors.try_emplace(std::string(Text(name)), Anchor{node, firstNode, 1, 0});
         // What the library says of a duplicate anchor: the rest of its sentence is context, not problem.
         if (!isNew) throw YAMLError("second occurrence");
         return &position->second;
@@ -209,6 +222,8 @@ private:
         if (!anchor.node) return FailAlias("Recursive alias");
         if (m_AliasedNodes + anchor.nodeCount > kMaximumAliasedNodes)
             return FailAlias("Too many aliased nodes");
+        if (m_Builder.Depth() + anchor.levels > kMaximumDepth) return FailAlias(kDepthProblem);
+        NoteLevels(anchor.levels);
         m_AliasedNodes += anchor.nodeCount;
         m_NodeCount += anchor.nodeCount - 1;
         AddNode(CopyExactly(anchor.node));
@@ -225,7 +240,7 @@ private:
     std::uint64_t m_NodeCount = 0; // aliases expanded
     std::uint64_t m_AliasedNodes = 0;
     std::unordered_map<std::string, Anchor> m_Anchors;
-    std::vector<Anchor*> m_OpenAnchors; // null for a container without an anchor
+    std::vector<OpenContainer> m_Open;
 };
 
 /// Parses up to the start of the document. False if there is none.
