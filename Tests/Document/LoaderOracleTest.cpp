@@ -163,7 +163,7 @@ struct TextGenerator {
             std::string(Below(8) ? "%YAML 1.1\n%TAG !o! tag:x,1:\n--- !o!1 &2\n" : kHeaders[Below(5)]) +
             Block(3, "") + kEnds[Below(6)];
         for (std::size_t faults = Below(3) ? 0 : 1 + Below(3); faults > 0; --faults) {
-            static const std::string kBytes(" :-'\"{}[]&*!?#,\n\t|>%@\x01\xc3\xff", 26);
+            static const std::string kBytes(" :-'\"{}[]&*!?#,\n\t|>%@\x01\xc3\xff");
             const std::size_t at = Below(text.size());
             if (Below(2))
                 text.erase(at, 1 + Below(5));

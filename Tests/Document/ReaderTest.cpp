@@ -133,7 +133,7 @@ TEST(Reader, TheWordStrippedCountsDirectlyBeforeTheLineEnd) {
 
 TEST(Reader, ATextEndsAtItsFirstNUL) {
     const std::string text = ObjectText("--- !o!1 &2\na: b\n");
-    EXPECT_EQ(ReadAndWrite(text + std::string("\0--- !o!1 &3\n{", 15)), text);
+    EXPECT_EQ(ReadAndWrite(text + std::string("\0--- !o!1 &3\n{", 14)), text);
 }
 
 TEST(Reader, BehindAnEndMarkerOnlyBlanksAndCommentsMayFollow) {

@@ -1,7 +1,7 @@
 // What holds for every document. The exceptions are the rules' own: a key order that one side moved is lost
 // where both sides have a diff of the mapping, as they always have at the root; equal moves of both sides are
-// lost in lists and mappings that are merged inside; neither an empty list in place of an empty mapping nor the
-// flow flag of a container that stays is a difference.
+// lost in lists and mappings that are merged inside; neither an empty list in place of an empty mapping nor
+// the flow flag of a container that stays is a difference.
 
 #include "SceneGenerator.h"
 #include "Support/Merges.h"

@@ -129,31 +129,4 @@ TEST_F(OperationMerge, OneSidesKeyOrderIsTakenWhereTheOtherHasNone) {
     EXPECT_EQ(YAMLMappingDiff::Merge(&none, &none, resolver)->m_KeyOrder, nullptr);
 }
 
-TEST_F(OperationMerge, WhatNobodyTakesLeavesNoTrace) {
-    class Refusing final : public ConflictResolver {
-        using Op = const Operation*;
-        Op OnValueChanged(const ChangeOperation*, ConflictType) override { return nullptr; }
-        Op OnSameValueAdded(const AddOperation*, const AddOperation*) override { return nullptr; }
-        Op OnSameValueChanged(const ChangeOperation*, const ChangeOperation*) override { return nullptr; }
-        Op OnSameValueChanged(const RemoveOperation*, const ChangeOperation*) override { return nullptr; }
-        Op OnSameValueChanged(const RemoveOperation*, const ChangeMappingOperation*) override {
-            return nullptr;
-        }
-        Op OnSameMappingChanged(const ChangeMappingOperation* left,
-                                const ChangeMappingOperation* right) override {
-            return ChangeMappingOperation::Merge(left, right, *this);
-        }
-        Op OnSameSequenceChanged(const ChangeSequenceOperation*, const ChangeSequenceOperation*) override {
-            return nullptr;
-        }
-        void OnComponentDependencyConflict(const ComponentDependencyConflict&) override {}
-    } resolver;
-    const auto merge = [&](const char* base, const char* left, const char* right) {
-        return Describe(YAMLMappingDiff::Merge(DiffOf(base, left), DiffOf(base, right), resolver));
-    };
-    EXPECT_EQ(merge("a: 1\nb: 1", "a: 2\nb: 2", "a: 3"), "b delete");
-    EXPECT_EQ(merge("m: {fileID: 1}", "m: {fileID: 2}", "m: {fileID: 3}"), "m ()") << "an empty change stays";
-    EXPECT_EQ(merge("m:\n  a: 1\n  b: 1", "m:\n  b: 1", "m:\n  a: 1"), "m (a delete; b delete)");
-}
-
 } // namespace

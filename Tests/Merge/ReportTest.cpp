@@ -122,22 +122,4 @@ TEST_F(Report, PathsAreCutAtEveryDot) {
     EXPECT_EQ(StringToPath("*.x")[0], YAMLScalar::star);
 }
 
-TEST_F(Report, EveryConflictHasItsWords) {
-    const char* const words[] = {"none",
-                                 "Both adds",
-                                 "Both changes",
-                                 "Both removes",
-                                 "Left adds",
-                                 "Right adds",
-                                 "Left changes",
-                                 "Right changes",
-                                 "Left removes",
-                                 "Right removes",
-                                 "Transform cycle",
-                                 "<unknown conflict type>",
-                                 "<unknown conflict type>"};
-    for (int type = 0; type < 13; ++type)
-        EXPECT_EQ(ConflictTypeToStringHuman(static_cast<ConflictType>(type)), words[type]);
-}
-
 } // namespace

@@ -177,16 +177,4 @@ TEST_F(BadInput, CarriageReturnsAreNone) {
     EXPECT_EQ(directory.Read("dest.ovrin"), merged);
 }
 
-TEST_F(BadInput, ADecisionFileThatCannotBeUsedStopsTheMerge) {
-    const std::string merge =
-        "\"$OVRIN\" merge -i decisions --fallback none base.ovrin left.ovrin right.ovrin dest.ovrin";
-    EXPECT_EQ(directory.Run(merge), 1);
-    EXPECT_EQ(directory.Read("stderr"), "Couldn't open merge resolve file 'decisions'");
-    directory.Write("decisions", "Conflict handling:\nkeep a.b\n");
-    EXPECT_EQ(directory.Run(merge), 1);
-    EXPECT_EQ(directory.Read("stderr"),
-              "Unknown handling type 'keep' (should be left,right or base) specified on line 1\n");
-    EXPECT_EQ(directory.Read("dest.ovrin"), "untouched\n");
-}
-
 } // namespace

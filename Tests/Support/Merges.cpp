@@ -29,7 +29,7 @@ MergeOutput Merge(const MergeInput& input) {
     merged->Apply(*body);
     std::ostringstream report;
     OutputConflictRecords(report, resolver, true);
-    return {Show(body), Records(resolver), Describe(merged), report.str(), resolver.HasPendingConflicts()};
+    return {Show(body), Records(resolver), report.str(), resolver.HasPendingConflicts()};
 }
 
 std::string Merged(const std::string& base, const std::string& left, const std::string& right) {

@@ -21,7 +21,6 @@ struct MergeInput {
 struct MergeOutput {
     std::string body;    // of the merged mapping, as Show gives it
     std::string records; // one line each
-    std::string diff;    // the merged diff, as Describe gives it
     std::string report;  // with the descriptions of what was no conflict
     bool isPending;
 };
