@@ -64,13 +64,14 @@ TEST_F(Operations, AComponentWithANewScriptIsNotMerged) {
 }
 
 TEST_F(Operations, FloatsWithinTheToleranceAreUnchanged) {
-    Rules("[comparisons]\nfloat p 0.01 0.001\nfloat z 0 1\nfloat z 1 1\nfloat n 1 0\nfloat *.s 1 1\n");
+    Rules("[comparisons]\nfloat p 0.01 0.001\nfloat z 0 1\nfloat z 1 1\nfloat n 1 0\nfloat *.s 1 1\nfloat e "
+          "0.5 0.5\n");
     const std::tuple<const char*, const char*, const char*, bool> cases[] = {
         {"p", "100", "100.5", false}, {"p", "100", "103", true},   {"p", "0", "0.0005", false},
         {"p", "0", "0.002", true},    {"p", "1", "1.0", false},    {"p", "abc", "x", false}, // both are 0
         {"z", "1", "1.0", true},      {"n", "1", "1.0", true},     {"q", "1", "1.0", true},
         {"p", "1e50", "2e50", false}, {"p", "1e50", "1e38", true}, {"p", "1", "{a: 1}", true},
-        {"1.s", "1", "1.5", false},   {"1.2.s", "1", "1.5", true}};
+        {"e", "0", "0.5", true},      {"1.s", "1", "1.5", false},  {"1.2.s", "1", "1.5", true}};
     for (const auto& [path, base, dest, changes] : cases)
         EXPECT_EQ(OperationOf(path, base, dest) != nullptr, changes) << path << " " << base << " " << dest;
 }

@@ -123,6 +123,15 @@ TEST(Reader, PositionsCountCharactersAsBytes) {
     EXPECT_NE(ReadError("\xef\xbb\xbf" + ObjectText(kTwoObjects)), "none");
 }
 
+TEST(Reader, AHeaderThatIsNoASCIIEndsTheWalkInsteadOfTurningItBack) {
+    for (int surplus = 1; surplus < 80; ++surplus) {
+        std::string comment = "# ";
+        for (int i = 0; i < surplus; ++i) comment += "\u00E9";
+        EXPECT_NE(ReadError("%YAML 1.1\n" + comment + "\n%TAG !o! tag:x,1:\n" + kTwoObjects), "none")
+            << surplus;
+    }
+}
+
 TEST(Reader, TheWordStrippedCountsDirectlyBeforeTheLineEnd) {
     EXPECT_NE(Objects("--- !o!1 &2   stripped\na: b\n").find("MERGE_StrippedPrefab: 1"), std::string::npos);
     EXPECT_EQ(Objects("--- !o!1 &2\nstripped: stripped\n"),
