@@ -218,12 +218,19 @@ const Operation* RecordingConflictResolver::MergeAddedSequences(const AddOperati
 
 // What post-processing found.
 
+RecordingConflictResolver::Record* RecordingConflictResolver::FindObjectRecord(const YAMLScalar* fileID) {
+    for (; m_IndexedRecords < m_Records.size(); ++m_IndexedRecords) {
+        const Path& path = m_Records[m_IndexedRecords].path;
+        if (path.size() == 1) m_ObjectRecords.try_emplace(path[0], m_IndexedRecords);
+    }
+    const auto found = m_ObjectRecords.find(fileID);
+    return found == m_ObjectRecords.end() ? nullptr : &m_Records[found->second];
+}
+
 void RecordingConflictResolver::OnComponentDependencyConflict(const ComponentDependencyConflict& conflict) {
-    const YAMLScalar* id = conflict.leftComponent ? conflict.leftComponent : conflict.rightComponent;
-    const auto record = std::find_if(m_Records.begin(), m_Records.end(), [id](const Record& candidate) {
-        return candidate.path.size() == 1 && candidate.path[0] == id;
-    });
-    if (record == m_Records.end()) return;
+    Record* record =
+        FindObjectRecord(conflict.leftComponent ? conflict.leftComponent : conflict.rightComponent);
+    if (!record) return;
     record->resolve = ResolveConflict;
     const Operation* removal = YAMLAlloc<RemoveOperation>::create(true);
     if (conflict.conflictType == ConflictRightRemoves) record->right = removal;

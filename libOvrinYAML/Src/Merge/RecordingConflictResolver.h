@@ -4,6 +4,7 @@
 #include "Merge/YAMLConflict.h"
 
 #include <optional>
+#include <unordered_map>
 #include <vector>
 
 namespace ovrin_yaml {
@@ -63,6 +64,8 @@ private:
 
     std::optional<MergeResolve> FindResolve(const Path& path) const { return m_Resolves.Find(path); }
     void PushRecord(ConflictType type, MergeResolve resolve, const Operation* left, const Operation* right);
+    /// The first record whose path is this id alone, or null.
+    Record* FindObjectRecord(const YAMLScalar* fileID);
     const Operation* SingleSideResolve(const Operation* operation, ConflictType type);
     /// What a decision says of a pair; nothing where the pair is to be settled as if there were none.
     std::optional<Outcome> Decided(MergeResolve found, const Operation* left, const Operation* right) const;
@@ -80,6 +83,8 @@ private:
     const Operation* MergeAddedSequences(const AddOperation* left, const AddOperation* right);
 
     std::vector<Record> m_Records;
+    std::unordered_map<const YAMLScalar*, std::size_t> m_ObjectRecords; // of the first m_IndexedRecords ones
+    std::size_t m_IndexedRecords = 0;
     ResolveTable m_Resolves;
     const MergeResolve m_DefaultResolve;
 };
