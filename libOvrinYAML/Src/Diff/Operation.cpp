@@ -46,7 +46,8 @@ void AddOperation::Apply(YAMLSequence& sequence, int index) const {
 }
 
 void ChangeMappingOperation::Apply(YAMLMapping& mapping, const YAMLScalar* key) const {
-    m_Diff->Apply(ToMapping(mapping.GetRef(key)));
+    mapping.GetRef(key);
+    m_Diff->Apply(ToMapping(mapping.GetForChange(key)));
 }
 
 void ChangeMappingOperation::Apply(YAMLSequence& sequence, int index) const {

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/OvrinObjects.h"
+#include "Document/ObjectFile.h"
 
 #include <string>
 
@@ -18,9 +18,9 @@ namespace ovrin_yaml {
 /// a read failure. Hashes are built on the way.
 /// Throws YAMLError with the library's problem text or one of this reader's; `objects` then holds what came
 /// before. Returns false only if a parser can't be set up.
-bool ParseYAMLString(std::string text, OvrinObjects& objects);
+bool ParseYAMLString(std::string text, OvrinObjects& objects, ReaderOptions options = {});
 
 /// The same for the bytes of a whole file: tests the signature first, and takes the text up to the first NUL.
-bool ParseYAMLFile(std::string bytes, OvrinObjects& objects);
+bool ParseYAMLFile(std::string bytes, OvrinObjects& objects, ReaderOptions options = {});
 
 } // namespace ovrin_yaml

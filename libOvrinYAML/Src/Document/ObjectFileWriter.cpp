@@ -45,8 +45,12 @@ void OvrinObjects::Output(std::ostream& stream) const {
     std::string text = kFileHeader;
     for (const YAMLMapping::Entry& entry : m_Root) {
         const YAMLMapping& object = ToMapping(entry.value);
-        AppendHeaderLine(*entry.key, object, text);
-        AppendBody(object, text);
+        if (object.m_Source) {
+            text += *object.m_Source;
+        } else {
+            AppendHeaderLine(*entry.key, object, text);
+            AppendBody(object, text);
+        }
         if (text.size() < kPieceSize) continue;
         stream.write(text.data(), static_cast<std::streamsize>(text.size()));
         text.clear();

@@ -3,6 +3,7 @@
 #include "Document/YAMLMapping.h"
 
 #include <iosfwd>
+#include <memory>
 #include <string>
 
 namespace ovrin_yaml {
@@ -24,8 +25,12 @@ public:
     /// A deep copy, owned by the caller.
     OvrinObjects* Clone() const;
 
+    /// Keeps the text that objects point into with their source bytes.
+    void KeepText(std::shared_ptr<const std::string> text) { m_Text = std::move(text); }
+
 private:
     YAMLMapping m_Root;
+    std::shared_ptr<const std::string> m_Text;
 };
 
 } // namespace ovrin_yaml

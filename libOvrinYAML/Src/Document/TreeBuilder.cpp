@@ -8,6 +8,7 @@
 namespace ovrin_yaml {
 
 void TreeBuilder::Open(YAMLNode::Kind kind, bool flow, std::uint32_t line) {
+    if (m_Open.empty()) m_KeptAllPairs = true;
     m_Open.push_back({kind, flow, line, m_Nodes.size()});
 }
 
@@ -21,9 +22,11 @@ YAMLNode* TreeBuilder::Close() {
     return node;
 }
 
-YAMLNode* TreeBuilder::MakeMapping(const OpenContainer& open) const {
+YAMLNode* TreeBuilder::MakeMapping(const OpenContainer& open) {
     YAMLMapping* mapping = YAMLAlloc<YAMLMapping>::create(open.flow);
-    mapping->Reserve((m_Nodes.size() - open.firstNode) / 2);
+    // An object gets its header data behind the keys of its body.
+    const std::size_t headerEntries = m_Open.empty() ? 3 : 0;
+    mapping->Reserve((m_Nodes.size() - open.firstNode) / 2 + headerEntries);
     std::uint32_t hash = 0;
     std::uint32_t index = 0;
     for (std::size_t i = open.firstNode; i + 1 < m_Nodes.size(); i += 2, ++index) {
@@ -32,6 +35,7 @@ YAMLNode* TreeBuilder::MakeMapping(const OpenContainer& open) const {
         hash = FoldPair(hash, key->m_Hash, m_Nodes[i + 1]->m_Hash, index);
         mapping->Append(key, m_Nodes[i + 1]);
     }
+    m_KeptAllPairs = m_KeptAllPairs && mapping->RawEntries().size() == index;
     mapping->m_Hash = hash;
     return mapping;
 }
@@ -50,6 +54,11 @@ YAMLNode* TreeBuilder::TakeRoot() {
     YAMLNode* root = m_Nodes.empty() ? nullptr : m_Nodes.front();
     m_Nodes.clear();
     return root;
+}
+
+void TreeBuilder::Clear() {
+    m_Nodes.clear();
+    m_Open.clear();
 }
 
 } // namespace ovrin_yaml

@@ -16,6 +16,7 @@ namespace ovrin_yaml {
 class TreeBuilder {
 public:
     void AddNode(YAMLNode* node) { m_Nodes.push_back(node); }
+    /// Opens a container; `line` is where it starts.
     void Open(YAMLNode::Kind kind, bool flow, std::uint32_t line);
     /// Makes the container opened last, adds it to the one around it and returns it. A pair whose key is no
     /// scalar is dropped and folds nothing into the hash, but its index counts.
@@ -25,6 +26,11 @@ public:
     std::size_t Depth() const { return m_Open.size(); }
     /// The finished tree, or null. Empties the builder.
     YAMLNode* TakeRoot();
+    /// Whether every pair since the builder was last empty is in its mapping: none was dropped for its key,
+    /// or for repeating one with an equal value.
+    bool KeptAllPairs() const { return m_KeptAllPairs; }
+    /// Forgets everything, what was finished and what is open.
+    void Clear();
 
 private:
     struct OpenContainer {
@@ -34,11 +40,12 @@ private:
         std::size_t firstNode;
     };
 
-    YAMLNode* MakeMapping(const OpenContainer& open) const;
+    YAMLNode* MakeMapping(const OpenContainer& open);
     YAMLNode* MakeSequence(const OpenContainer& open) const;
 
     std::vector<YAMLNode*> m_Nodes;
     std::vector<OpenContainer> m_Open;
+    bool m_KeptAllPairs = true;
 };
 
 } // namespace ovrin_yaml

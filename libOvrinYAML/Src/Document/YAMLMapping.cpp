@@ -89,6 +89,18 @@ YAMLNode* YAMLMapping::GetRef(const YAMLScalar* key) const {
     throw YAMLError("Cannot get unknown key from yaml mapping");
 }
 
+YAMLNode* YAMLMapping::GetForChange(const YAMLScalar* key) {
+    YAMLNode* value = Get(key);
+    YAMLMapping* object = AsMapping(value);
+    if (!object) return value;
+    if (object->m_IsShared) {
+        object = AsMapping(object->Clone());
+        Change(key, object);
+    }
+    object->m_Source = nullptr;
+    return object;
+}
+
 std::size_t YAMLMapping::Size() const {
     RequireNormalState();
     return m_Entries.size() - m_Removed;

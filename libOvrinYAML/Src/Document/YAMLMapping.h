@@ -8,6 +8,7 @@
 
 #include <cstddef>
 #include <span>
+#include <string_view>
 #include <vector>
 
 namespace ovrin_yaml {
@@ -61,6 +62,11 @@ public:
 
     /// The mapping was written in flow style, {...}.
     bool m_Flow;
+    /// The mapping is an object that several trees hold: it is never freed, and copied before it is changed.
+    bool m_IsShared = false;
+    /// The bytes that the writer would give for this object, or null where they aren't known. Valid until the
+    /// object is changed; they belong to whoever read the file.
+    const std::string_view* m_Source = nullptr;
 
     bool HasDuplicates() const { return m_HasDuplicates; }
     /// Throws the duplicate-keys YAMLError in the duplicate state.
@@ -81,6 +87,9 @@ public:
     YAMLNode* Get(const YAMLScalar* key) const;
     /// The value of `key`. Throws "Cannot get unknown key from yaml mapping".
     YAMLNode* GetRef(const YAMLScalar* key) const;
+    /// The value of `key`, ready to be changed inside: an object that is shared is replaced by a copy first,
+    /// and one whose source bytes are known forgets them. Null or a throw as with Get.
+    YAMLNode* GetForChange(const YAMLScalar* key);
     bool HasKey(const YAMLScalar* key) const { return Get(key) != nullptr; }
     std::size_t Size() const;
     Iterator begin() const;
@@ -106,7 +115,9 @@ public:
     /// Frees all values and empties the mapping; it stays in its state.
     void Clear();
 
-    void Free() override { YAMLAlloc<YAMLMapping>::free(this); }
+    void Free() override {
+        if (!m_IsShared) YAMLAlloc<YAMLMapping>::free(this);
+    }
     YAMLNode* Clone() const override;
     bool Equals(const YAMLNode* other) const override;
     bool EqualsExpensive(const YAMLNode* other) const override;

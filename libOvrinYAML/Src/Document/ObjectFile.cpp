@@ -1,0 +1,222 @@
+#include "Document/ObjectFile.h"
+
+#include "Document/Arena.h"
+#include "Document/ChunkWalker.h"
+#include "Document/WrittenFormReader.h"
+#include "Document/YAMLScalar.h"
+
+#include <algorithm>
+#include <cstring>
+#include <new>
+
+namespace ovrin_yaml {
+
+namespace {
+
+constexpr std::string_view kSignature = "%YAML";
+constexpr std::string_view kMarker = "---";
+constexpr std::string_view kDocumentStart = "--- !o!";
+constexpr std::string_view kNextHeader = "\n--- !o!";
+/// Lines in a header of the usual form; the parser counts them in every document.
+constexpr std::uint32_t kHeaderLines = 2;
+/// Text that is read at one go: enough to forget the handing out of pieces, little enough to share them out.
+constexpr std::size_t kPieceBytes = std::size_t{256} << 10;
+
+/// The file id in a document's header line, where that has the usual form.
+std::string_view FileIDOf(const char* begin, const char* end) {
+    const std::string_view line(begin, static_cast<std::size_t>(std::find(begin, end, '\n') - begin));
+    const std::size_t anchor = line.find('&');
+    if (anchor == std::string_view::npos) return {};
+    return line.substr(anchor + 1, line.find(' ', anchor) - anchor - 1);
+}
+
+} // namespace
+
+void ObjectFile::Take(std::string bytes) {
+    if (std::string_view(bytes).substr(0, kSignature.size() + 4).find(kSignature) == std::string_view::npos)
+        throw YAMLError(
+            "File is not a valid text serialized YAML file. Make sure that Asset Serialization is "
+            "set to 'Force text' in Editor Settings.");
+    if (const void* nul = std::memchr(bytes.data(), '\0', bytes.size()))
+        bytes.resize(static_cast<std::size_t>(static_cast<const char*>(nul) - bytes.data()));
+    TakeText(std::move(bytes));
+}
+
+void ObjectFile::TakeText(std::string text) {
+    m_Text = std::make_shared<const std::string>(std::move(text));
+    m_Header = std::string_view(*m_Text).substr(0, m_Text->find(kMarker));
+}
+
+/// "%YAML 1.1" and the %TAG line of the handle "!o!", with nothing in its prefix that isn't plain in every
+/// sense.
+bool ObjectFile::HasWrittenHeader() const {
+    constexpr std::string_view kBegin = "%YAML 1.1\n%TAG !o! tag:";
+    if (!m_Header.starts_with(kBegin) || !m_Header.ends_with('\n')) return false;
+    const std::string_view prefix = m_Header.substr(kBegin.size(), m_Header.size() - kBegin.size() - 1);
+    const auto isPlain = [](char c) {
+        return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') ||
+               std::string_view(".,:-").find(c) != std::string_view::npos;
+    };
+    return std::all_of(prefix.begin(), prefix.end(), isPlain) &&
+           std::string_view(*m_Text).substr(m_Header.size()).starts_with(kDocumentStart);
+}
+
+void ObjectFile::Cut(const ObjectFile* base) {
+    if (!m_Options.fast || !HasWrittenHeader()) return;
+    if (base && m_Options.share && !base->m_Documents.empty() && m_Header == base->m_Header) {
+        m_Base = base;
+        CutAlong(*base);
+    } else {
+        CutAlone();
+    }
+    MakePieces();
+}
+
+const char* ObjectFile::FindDocumentEnd(const char* begin) const {
+    const std::size_t offset = static_cast<std::size_t>(begin - m_Text->data());
+    const std::size_t next = m_Text->find(kNextHeader, offset + kMarker.size());
+    return next == std::string::npos ? End() : m_Text->data() + next + 1;
+}
+
+void ObjectFile::CutAlone() {
+    for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
+        const char* end = FindDocumentEnd(begin);
+        m_Documents.push_back({begin, static_cast<std::size_t>(end - begin), kNone});
+        begin = end;
+    }
+}
+
+/// Whether the base's document stands at `position` in the same words and ends there, too.
+bool ObjectFile::StandsAt(const Document& document, const char* position, const char* end) const {
+    const std::size_t left = static_cast<std::size_t>(end - position);
+    if (left < document.length || std::memcmp(position, document.begin, document.length) != 0) return false;
+    if (left == document.length) return true;
+    return position[document.length - 1] == '\n' &&
+           std::string_view(position + document.length, left - document.length).starts_with(kDocumentStart);
+}
+
+/// Most documents follow each other as they do in the base, so the base's next one is tried before any
+/// search.
+void ObjectFile::CutAlong(const ObjectFile& base) {
+    std::size_t expected = 0;
+    for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
+        if (expected < base.m_Documents.size() && StandsAt(base.m_Documents[expected], begin, End())) {
+            m_Documents.push_back({begin, base.m_Documents[expected].length, expected});
+            ++expected;
+        } else {
+            const char* end = FindDocumentEnd(begin);
+            const std::size_t lender = FindLender(base, begin, end, expected);
+            m_Documents.push_back({begin, static_cast<std::size_t>(end - begin), lender});
+        }
+        begin += m_Documents.back().length;
+    }
+}
+
+/// For a document that isn't the expected one; `expected` becomes the one behind the base's of the same id.
+std::size_t ObjectFile::FindLender(const ObjectFile& base, const char* begin, const char* end,
+                                   std::size_t& expected) const {
+    const std::size_t index = base.IndexOf(FileIDOf(begin, end));
+    if (index == kNone) return kNone;
+    expected = index + 1;
+    const Document& candidate = base.m_Documents[index];
+    const bool same =
+        candidate.length == static_cast<std::size_t>(end - begin) && StandsAt(candidate, begin, end);
+    return same ? index : kNone;
+}
+
+std::size_t ObjectFile::IndexOf(std::string_view fileID) const {
+    std::call_once(m_IndexOnce, [this] {
+        m_Index.reserve(m_Documents.size());
+        for (std::size_t i = 0; i < m_Documents.size(); ++i) {
+            const Document& document = m_Documents[i];
+            m_Index.try_emplace(FileIDOf(document.begin, document.begin + document.length), i);
+        }
+    });
+    const auto found = m_Index.find(fileID);
+    return found == m_Index.end() ? kNone : found->second;
+}
+
+void ObjectFile::MakePieces() {
+    std::size_t bytes = 0;
+    Piece piece{0, 0};
+    for (std::size_t i = 0; i < m_Documents.size(); ++i) {
+        if (m_Documents[i].lender == kNone) bytes += m_Documents[i].length;
+        piece.end = i + 1;
+        if (bytes < kPieceBytes && piece.end != m_Documents.size()) continue;
+        m_Pieces.push_back(piece);
+        piece = {piece.end, piece.end};
+        bytes = 0;
+    }
+}
+
+void ObjectFile::ReadPiece(std::size_t piece) {
+    WrittenFormReader reader;
+    for (std::size_t i = m_Pieces[piece].first; i < m_Pieces[piece].end; ++i)
+        if (m_Documents[i].lender == kNone) ReadDocument(reader, m_Documents[i]);
+}
+
+void ObjectFile::ReadDocument(WrittenFormReader& reader, Document& document) const {
+    const auto read = reader.Read({document.begin, document.length}, kHeaderLines);
+    if (!read.object) return;
+    document.object = read.object;
+    document.fileID = YAMLScalar::Lookup(read.fileID);
+    AddHeaderData(*read.object, document.fileID, read.classID, read.isStripped);
+    if (!m_Base && read.isAsWritten)
+        read.object->m_Source =
+            new (ArenaAllocate(sizeof(std::string_view))) std::string_view(document.begin, document.length);
+}
+
+bool ObjectFile::Finish() {
+    YAMLMapping& root = m_Objects.GetMapping();
+    // A text that ends behind the first marker holds no document.
+    if (m_Text->size() <= m_Header.size() + 5) return true;
+    try {
+        if (m_Documents.empty())
+            ReadRestByLibrary(m_Header.size());
+        else
+            FinishDocuments();
+    } catch (const std::bad_alloc&) {
+        return false;
+    }
+    root.RebuildHash(true);
+    if (!m_Base && !m_Documents.empty()) m_Objects.KeepText(m_Text);
+    return true;
+}
+
+void ObjectFile::FinishDocuments() {
+    YAMLMapping& root = m_Objects.GetMapping();
+    root.Reserve(m_Documents.size());
+    for (const Document& own : m_Documents) {
+        const Document& document = own.lender == kNone ? own : m_Base->m_Documents[own.lender];
+        if (document.object) {
+            document.object->m_IsShared = document.object->m_IsShared || own.lender != kNone;
+            root.Append(document.fileID, document.object);
+        } else if (!ReadByLibrary(own, &own == &m_Documents.back())) {
+            return;
+        }
+    }
+}
+
+/// Reads a single document with libyaml. If it doesn't end where the next one begins, all that follows goes
+/// the same way, and false is returned.
+bool ObjectFile::ReadByLibrary(const Document& document, bool isLast) {
+    std::string chunk(m_Header);
+    chunk.append(document.begin, document.length);
+    if (!isLast) chunk += kMarker;
+    ChunkWalker walker(std::move(chunk), std::string(m_Header), m_Objects.GetMapping());
+    if (!walker.ReadDocument()) return false;
+    if (!isLast && walker.Position() == document.length) return true;
+    ReadRestByLibrary(static_cast<std::size_t>(document.begin - m_Text->data()) + walker.Position());
+    return false;
+}
+
+/// Reads everything from the document at `offset` on with libyaml.
+void ObjectFile::ReadRestByLibrary(std::size_t offset) {
+    std::string text(m_Header);
+    text.append(*m_Text, offset);
+    ChunkWalker walker(std::move(text), std::string(m_Header), m_Objects.GetMapping());
+    while (walker.ReadDocument()) {
+    }
+}
+
+} // namespace ovrin_yaml

@@ -1,0 +1,494 @@
+#include "Document/WrittenFormReader.h"
+
+#include "Document/ScalarStyle.h"
+#include "Document/YAMLScalar.h"
+
+#include <algorithm>
+#include <array>
+#include <cstring>
+
+namespace ovrin_yaml {
+
+namespace {
+
+/// Deeper documents are left to the library: it has the limit.
+constexpr int kMaximumDepth = 100;
+/// The parser looks for the colon behind a key within 1024 characters.
+constexpr std::ptrdiff_t kLongestKey = 1000;
+/// The writer gives longer keys another form, and breaks lines behind this column.
+constexpr std::ptrdiff_t kLongestSimpleKey = 128;
+constexpr std::ptrdiff_t kLineWidth = 80;
+
+enum CharClass : std::uint8_t {
+    kId = 1,         // in class and file ids
+    kPlain = 2,      // inside a plain text in block style, whatever stands beside it
+    kPlainStart = 4, // first in a plain text, whatever follows
+    kFlow = 8,       // inside a plain text in flow style, whatever stands beside it
+    kQuoted = 16,    // stands for itself in quotes
+};
+
+constexpr bool Contains(std::string_view set, int c) {
+    return set.find(static_cast<char>(c)) != set.npos;
+}
+
+constexpr std::array<std::uint8_t, 256> MakeClasses() {
+    std::array<std::uint8_t, 256> classes{};
+    for (int c = 0x21; c < 0x7f; ++c) {
+        if (Contains("0123456789-", c)) classes[c] |= kId;
+        if (!Contains(":#", c)) classes[c] |= kPlain;
+        if (!Contains("-?:,[]{}#&*!|>'\"%@`", c)) classes[c] |= kPlainStart;
+        if (!Contains(",[]{}?:#", c)) classes[c] |= kFlow;
+        if (!Contains("'\"\\", c)) classes[c] |= kQuoted;
+    }
+    return classes;
+}
+
+constexpr std::array<std::uint8_t, 256> kClasses = MakeClasses();
+
+bool Is(char c, CharClass wanted) {
+    return kClasses[static_cast<unsigned char>(c)] & wanted;
+}
+
+YAMLScalar* Intern(const char* begin, const char* end) {
+    return YAMLScalar::Lookup({begin, static_cast<std::size_t>(end - begin)});
+}
+
+void AppendUTF8(std::string& text, std::uint32_t c) {
+    const auto put = [&text](std::uint32_t byte) { text += static_cast<char>(byte); };
+    if (c < 0x80) {
+        put(c);
+        return;
+    }
+    if (c < 0x800) {
+        put(0xc0 | c >> 6);
+    } else if (c < 0x10000) {
+        put(0xe0 | c >> 12);
+        put(0x80 | (c >> 6 & 0x3f));
+    } else {
+        put(0xf0 | c >> 18);
+        put(0x80 | (c >> 12 & 0x3f));
+        put(0x80 | (c >> 6 & 0x3f));
+    }
+    put(0x80 | (c & 0x3f));
+}
+
+} // namespace
+
+/// Counts the open collections.
+class WrittenFormReader::Nesting {
+public:
+    explicit Nesting(WrittenFormReader& reader) : m_Reader(reader) {
+        if (++m_Reader.m_Depth > kMaximumDepth) throw NotSure();
+    }
+    ~Nesting() { --m_Reader.m_Depth; }
+
+private:
+    WrittenFormReader& m_Reader;
+};
+
+WrittenFormReader::Document WrittenFormReader::Read(std::string_view text, std::uint32_t firstLine) {
+    Document document;
+    if (text.empty() || text.back() != '\n') return document;
+    m_Position = text.data();
+    m_End = m_Position + text.size();
+    m_LineStart = m_Position;
+    m_Line = firstLine;
+    m_Depth = 0;
+    m_IsAsWritten = true;
+    try {
+        ReadHeaderLine(document);
+        if (m_Indent != 0) throw NotSure();
+        ReadBlockMapping(0);
+        if (m_Indent != -1) throw NotSure();
+        YAMLNode* root = m_Builder.TakeRoot();
+        root->m_Line = firstLine;
+        document.object = AsMapping(root);
+        document.isAsWritten = m_IsAsWritten && m_Builder.KeptAllPairs();
+    } catch (const NotSure&) {
+        m_Builder.Clear();
+    }
+    return document;
+}
+
+void WrittenFormReader::ReadHeaderLine(Document& document) {
+    constexpr std::string_view kMarker = "--- !o!", kAnchor = " &", kStripped = " stripped";
+    const auto skip = [this](std::string_view text) {
+        if (!std::string_view(m_Position, m_End - m_Position).starts_with(text)) return false;
+        m_Position += text.size();
+        return true;
+    };
+    if (!skip(kMarker)) throw NotSure();
+    document.classID = ReadId();
+    if (!skip(kAnchor)) throw NotSure();
+    document.fileID = ReadId();
+    document.isStripped = skip(kStripped);
+    if (*m_Position != '\n') throw NotSure();
+    NextLine();
+}
+
+std::string_view WrittenFormReader::ReadId() {
+    const char* begin = m_Position;
+    while (Is(*m_Position, kId)) ++m_Position;
+    if (m_Position == begin) throw NotSure();
+    return {begin, static_cast<std::size_t>(m_Position - begin)};
+}
+
+/// From the end of a line to the first character of the next that is no blank.
+void WrittenFormReader::NextLine() {
+    const char* line = ++m_Position;
+    m_LineStart = line;
+    ++m_Line;
+    if (line == m_End) {
+        m_Indent = -1;
+        return;
+    }
+    while (*m_Position == ' ') ++m_Position;
+    m_Indent = static_cast<int>(m_Position - line);
+    if (*m_Position == '\n') throw NotSure();
+    // At the first column three dashes or dots would end the document.
+    if (m_Indent == 0 && (*line == '.' || (*line == '-' && line[1] == '-'))) throw NotSure();
+}
+
+bool WrittenFormReader::AtListItem() const {
+    return *m_Position == '-' && (m_Position[1] == ' ' || m_Position[1] == '\n');
+}
+
+// Block style. Each function begins at the first character of its node and ends at that of the next line that
+// is not its own, with m_Indent set.
+
+void WrittenFormReader::ReadBlockMapping(int indent) {
+    const Nesting nesting(*this);
+    m_Builder.Open(YAMLNode::Kind::Mapping, false, m_Line);
+    do {
+        if (!Is(*m_Position, kPlainStart)) throw NotSure();
+        const char* end = ScanPlain(m_Position);
+        if (*end != ':' || end - m_Position > kLongestKey) throw NotSure();
+        NoteKey(m_Position, end);
+        m_Builder.AddNode(Intern(m_Position, end));
+        m_Position = end + 1;
+        ReadBlockValue(indent);
+    } while (m_Indent == indent);
+    m_Builder.Close();
+}
+
+void WrittenFormReader::ReadBlockValue(int indent) {
+    const bool hasBlank = *m_Position == ' ';
+    if (hasBlank && *++m_Position != '\n') return ReadInline(indent);
+    NextLine();
+    const bool isList = m_Indent == indent && AtListItem();
+    const bool isEmpty = m_Indent <= indent && !isList;
+    NoteIf(hasBlank != isEmpty);
+    if (isList)
+        ReadBlockSequence(indent);
+    else if (isEmpty)
+        m_Builder.AddNode(YAMLScalar::empty);
+    else if (m_Indent == indent + 2 && !AtListItem())
+        ReadBlockMapping(m_Indent);
+    else
+        throw NotSure();
+}
+
+void WrittenFormReader::ReadBlockSequence(int indent) {
+    const Nesting nesting(*this);
+    m_Builder.Open(YAMLNode::Kind::Sequence, false, m_Line);
+    do {
+        ReadItem(indent);
+    } while (m_Indent == indent && AtListItem());
+    m_Builder.Close();
+}
+
+void WrittenFormReader::ReadItem(int indent) {
+    const bool hasBlank = *++m_Position == ' ';
+    if (hasBlank && *++m_Position != '\n') {
+        m_Indent = indent + 2;
+        if (AtListItem()) return ReadBlockSequence(m_Indent);
+        if (Is(*m_Position, kPlainStart) && *ScanPlain(m_Position) == ':') return ReadBlockMapping(m_Indent);
+        return ReadInline(indent);
+    }
+    NextLine();
+    if (m_Indent > indent) throw NotSure();
+    NoteIf(!hasBlank);
+    m_Builder.AddNode(YAMLScalar::empty);
+}
+
+/// A value that begins on the line of its key or dash. What is further in than `indent` continues it.
+void WrittenFormReader::ReadInline(int indent) {
+    const char first = *m_Position;
+    if (first == '{' || first == '[') {
+        m_FlowIndent = indent;
+        ReadFlow();
+    } else if (first == '\'' || first == '"') {
+        m_Builder.AddNode(ReadQuoted(false));
+    } else {
+        m_Builder.AddNode(ReadPlainLines(indent));
+        return;
+    }
+    if (*m_Position != '\n') throw NotSure();
+    NextLine();
+    if (m_Indent > indent) throw NotSure();
+}
+
+/// The end of the plain text on this line: the line end, or a colon that ends a key.
+const char* WrittenFormReader::ScanPlain(const char* from) const {
+    for (const char* p = from;; ++p) {
+        while (Is(*p, kPlain)) ++p;
+        switch (*p) {
+        case '\n':
+            return p;
+        case ':':
+            if (p[1] == ' ' || p[1] == '\n') return p;
+            break;
+        case ' ': // not before a comment, and not at the end, where the parser would drop it
+            if (p[1] == '#' || p[1] == '\n') throw NotSure();
+            break;
+        case '#':
+            break;
+        default:
+            throw NotSure();
+        }
+    }
+}
+
+YAMLScalar* WrittenFormReader::ReadPlainLines(int indent) {
+    const bool isNegative = *m_Position == '-' && Is(m_Position[1], kPlain);
+    if (!Is(*m_Position, kPlainStart) && !isNegative) throw NotSure();
+    const char* begin = m_Position;
+    const char* end = ScanPlain(begin);
+    if (*end != '\n') throw NotSure();
+    NoteText(begin, end);
+    std::ptrdiff_t width = Column(end);
+    m_Position = end;
+    NextLine();
+    if (m_Indent <= indent) return Intern(begin, end);
+    m_Text.assign(begin, end);
+    while (m_Indent > indent) {
+        NoteIf(width <= kLineWidth || m_Indent != indent + 2);
+        if (*m_Position == '#') throw NotSure();
+        end = ScanPlain(m_Position);
+        if (*end != '\n') throw NotSure();
+        NoteText(m_Position, end);
+        width = Column(end);
+        m_Text.append(1, ' ').append(m_Position, end);
+        m_Position = end;
+        NextLine();
+    }
+    return YAMLScalar::Lookup(m_Text);
+}
+
+/// A text that stands plain on this line: the writer breaks lines at blanks behind the width, and quotes what
+/// could be taken for a document marker.
+void WrittenFormReader::NoteText(const char* begin, const char* end) {
+    const std::string_view text(begin, static_cast<std::size_t>(end - begin));
+    NoteIf(text.starts_with("---") || text.starts_with("..."));
+    if (Column(end) <= kLineWidth) return;
+    const char* const behindWidth = std::max(begin, m_LineStart + kLineWidth + 1);
+    NoteIf(behindWidth < end && std::memchr(behindWidth, ' ', static_cast<std::size_t>(end - behindWidth)));
+}
+
+void WrittenFormReader::NoteKey(const char* begin, const char* end) {
+    const std::string_view text(begin, static_cast<std::size_t>(end - begin));
+    NoteIf(text.starts_with("---") || text.starts_with("...") || end - begin > kLongestSimpleKey);
+}
+
+// Flow style. Each function begins at the first character of its node and ends behind the last.
+
+void WrittenFormReader::ReadFlow() {
+    const Nesting nesting(*this);
+    m_FlowIndent += 2;
+    if (*m_Position == '{')
+        ReadFlowMapping();
+    else
+        ReadFlowSequence();
+    m_FlowIndent -= 2;
+}
+
+void WrittenFormReader::OpenFlow(YAMLNode::Kind kind) {
+    m_Builder.Open(kind, true, m_Line);
+    ++m_Position;
+}
+
+void WrittenFormReader::ReadFlowMapping() {
+    OpenFlow(YAMLNode::Kind::Mapping);
+    if (*m_Position == '}') {
+        ++m_Position;
+    } else {
+        NoteIf(Column(m_Position) > kLineWidth);
+        do {
+            const char* begin = m_Position;
+            const std::uint32_t line = m_Line;
+            const bool isQuoted = *begin == '\'' || *begin == '"';
+            m_Builder.AddNode(isQuoted ? ReadQuoted(true) : ReadFlowPlain());
+            if (m_Line != line || m_Position - begin > kLongestKey) throw NotSure();
+            NoteKey(begin, m_Position);
+            if (*m_Position != ':' || m_Position[1] != ' ') throw NotSure();
+            m_Position += 2;
+            ReadFlowValue();
+        } while (ReadFlowSeparator('}'));
+    }
+    m_Builder.Close();
+}
+
+void WrittenFormReader::ReadFlowSequence() {
+    OpenFlow(YAMLNode::Kind::Sequence);
+    if (*m_Position == ']') {
+        ++m_Position;
+    } else {
+        NoteIf(Column(m_Position) > kLineWidth);
+        do {
+            ReadFlowValue();
+        } while (ReadFlowSeparator(']'));
+    }
+    m_Builder.Close();
+}
+
+void WrittenFormReader::ReadFlowValue() {
+    const char first = *m_Position;
+    if (first == '{' || first == '[')
+        ReadFlow();
+    else
+        m_Builder.AddNode(first == '\'' || first == '"' ? ReadQuoted(true) : ReadFlowPlain());
+}
+
+/// Behind an entry: true at the first character of the next, false behind the closing bracket.
+bool WrittenFormReader::ReadFlowSeparator(char close) {
+    if (*m_Position == close) {
+        ++m_Position;
+        return false;
+    }
+    if (*m_Position != ',') throw NotSure();
+    const bool isFull = Column(++m_Position) > kLineWidth;
+    if (*m_Position == ' ') {
+        NoteIf(isFull);
+        ++m_Position;
+        return true;
+    }
+    if (*m_Position != '\n') throw NotSure();
+    NextLine();
+    if (m_Indent < 1) throw NotSure();
+    NoteIf(!isFull || m_Indent != m_FlowIndent);
+    return true;
+}
+
+YAMLScalar* WrittenFormReader::ReadFlowPlain() {
+    const char* p = m_Position;
+    if (!Is(*p, kPlainStart) && !(*p == '-' && Is(p[1], kFlow))) throw NotSure();
+    while (Is(*p, kFlow) || (*p == ' ' && Is(p[1], kFlow))) ++p;
+    // A blank, a line end or a sign that has a meaning of its own is met by the caller, who wants none of
+    // them.
+    NoteText(m_Position, p);
+    YAMLScalar* scalar = Intern(m_Position, p);
+    m_Position = p;
+    return scalar;
+}
+
+// Quoted texts.
+
+YAMLScalar* WrittenFormReader::ReadQuoted(bool inFlow) {
+    const char quote = *m_Position++;
+    const char* p = m_Position;
+    const char other = quote == '"' ? '\'' : '"';
+    while (Is(*p, kQuoted) || *p == ' ' || *p == other) ++p;
+    if (*p != quote || (quote == '\'' && p[1] == '\'')) return ReadQuotedWithFolds(p);
+    const std::string_view text(m_Position, static_cast<std::size_t>(p - m_Position));
+    NoteText(m_Position, p);
+    const ScalarForms forms = ClassifyScalar(text);
+    NoteIf(quote != '\'' || !forms.singleQuoted || (inFlow ? forms.plainInFlow : forms.plainInBlock));
+    YAMLScalar* scalar = YAMLScalar::Lookup(text);
+    m_Position = p + 1;
+    return scalar;
+}
+
+/// Up to `from` the text stands for itself, unless it ends in blanks: these are looked at again.
+YAMLScalar* WrittenFormReader::ReadQuotedWithFolds(const char* from) {
+    m_IsAsWritten = false;
+    const char quote = m_Position[-1];
+    while (from != m_Position && from[-1] == ' ') --from;
+    m_Text.assign(m_Position, from);
+    m_Position = from;
+    for (;;) {
+        const char c = *m_Position;
+        if (c == quote && !(quote == '\'' && m_Position[1] == '\'')) break;
+        if (c == ' ' || c == '\n') {
+            FoldLines();
+        } else if (c == '\\' && quote == '"') {
+            Unescape();
+        } else if (c > ' ' && c < 0x7f) {
+            m_Text += c;
+            m_Position += c == quote ? 2 : 1;
+        } else {
+            throw NotSure();
+        }
+    }
+    ++m_Position;
+    return YAMLScalar::Lookup(m_Text);
+}
+
+/// Blanks inside a line stand for themselves. Around line ends they count for nothing: one line end is a
+/// blank, and of several the first counts for nothing either.
+void WrittenFormReader::FoldLines() {
+    const char* blanks = m_Position;
+    while (*m_Position == ' ') ++m_Position;
+    if (*m_Position != '\n') {
+        m_Text.append(blanks, m_Position);
+        return;
+    }
+    std::size_t lineEnds = 0;
+    const char* line = m_Position;
+    while (*m_Position == '\n') {
+        ++lineEnds;
+        ++m_Line;
+        m_LineStart = line = ++m_Position;
+        if (line == m_End) throw NotSure();
+        while (*m_Position == ' ') ++m_Position;
+    }
+    // At the first column three dashes or dots would end the document.
+    if (m_Position == line) throw NotSure();
+    if (lineEnds == 1)
+        m_Text += ' ';
+    else
+        m_Text.append(lineEnds - 1, '\n');
+}
+
+void WrittenFormReader::Unescape() {
+    struct Escape {
+        char letter;
+        std::uint32_t character;
+    };
+    static constexpr Escape kEscapes[] = {
+        {'0', 0},    {'a', 7},    {'b', 8},      {'t', 9},      {'n', 10},  {'v', 11},
+        {'f', 12},   {'r', 13},   {'e', 0x1b},   {' ', 0x20},   {'"', '"'}, {'\\', '\\'},
+        {'N', 0x85}, {'_', 0xa0}, {'L', 0x2028}, {'P', 0x2029},
+    };
+    const char letter = m_Position[1];
+    m_Position += 2;
+    for (const Escape& escape : kEscapes)
+        if (escape.letter == letter) return AppendUTF8(m_Text, escape.character);
+    switch (letter) {
+    case 'x':
+        return AppendUTF8(m_Text, ReadHex(2));
+    case 'u':
+        return AppendUTF8(m_Text, ReadHex(4));
+    case 'U':
+        return AppendUTF8(m_Text, ReadHex(8));
+    default:
+        throw NotSure();
+    }
+}
+
+std::uint32_t WrittenFormReader::ReadHex(int digits) {
+    std::uint32_t value = 0;
+    for (; digits > 0; --digits) {
+        const char c = *m_Position;
+        const int digit = c >= '0' && c <= '9'   ? c - '0'
+                          : c >= 'A' && c <= 'F' ? c - 'A' + 10
+                          : c >= 'a' && c <= 'f' ? c - 'a' + 10
+                                                 : -1;
+        if (digit < 0) throw NotSure();
+        value = value << 4 | static_cast<std::uint32_t>(digit);
+        ++m_Position;
+    }
+    if ((value >= 0xd800 && value <= 0xdfff) || value > 0x10ffff) throw NotSure();
+    return value;
+}
+
+} // namespace ovrin_yaml
