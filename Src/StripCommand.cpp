@@ -27,9 +27,8 @@ void StripUnchangedMapping(YAMLMapping& mapping, const YAMLMappingDiff& diff) {
     for (const auto& [key, value] : mapping) {
         const Operation* operation = diff.Find(key);
         if (!operation && !IsHeaderKey(key)) unchanged.push_back(key);
-        const auto* change = As<ChangeMappingOperation>(operation);
-        YAMLMapping* child = AsMapping(value);
-        if (change && child) StripUnchangedMapping(*child, *change->m_Diff);
+        if (const auto* change = As<ChangeMappingOperation>(operation))
+            StripUnchangedMapping(ToMapping(mapping.GetForChange(key)), *change->m_Diff);
     }
     for (const YAMLScalar* key : unchanged) mapping.Remove(key);
 }

@@ -14,6 +14,13 @@ namespace ovrin_yaml {
 /// Returns `bytes` bytes, aligned for any pointer or integer. Throws std::bad_alloc when there is no memory.
 void* ArenaAllocate(std::size_t bytes);
 
+/// The same for a single big piece that is zero throughout, which costs nothing before it is used.
+void* AllocateZeroed(std::size_t bytes);
+
+/// Asks the system for huge pages behind a big piece of memory: fewer page faults, fewer address look-ups.
+/// Small pieces stay as they are.
+void AdviseHugePages(void* memory, std::size_t bytes);
+
 /// A stateless allocator for std::vector over ArenaAllocate. What a growing vector leaves behind stays in the
 /// arena, so reserve where the count is known.
 template <class T> struct ArenaAllocator {

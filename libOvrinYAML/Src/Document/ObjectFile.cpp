@@ -2,6 +2,7 @@
 
 #include "Document/Arena.h"
 #include "Document/ChunkWalker.h"
+#include "Document/ScalarTable.h"
 #include "Document/WrittenFormReader.h"
 #include "Document/YAMLScalar.h"
 
@@ -79,6 +80,9 @@ const char* ObjectFile::FindDocumentEnd(const char* begin) const {
 }
 
 void ObjectFile::CutAlone() {
+    // A guess that spares the table most of its growing.
+    constexpr std::size_t kBytesPerScalar = 64;
+    ScalarTable::Instance().Reserve(m_Text->size() / kBytesPerScalar);
     for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
         const char* end = FindDocumentEnd(begin);
         m_Documents.push_back({begin, static_cast<std::size_t>(end - begin), kNone});

@@ -3,6 +3,8 @@
 #include "Document/Arena.h"
 #include "Document/Hash.h"
 
+#include <algorithm>
+#include <bit>
 #include <cstring>
 #include <new>
 
@@ -37,9 +39,38 @@ ScalarTable& ScalarTable::Instance() {
     return table;
 }
 
-YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t line) {
-    const std::uint32_t hash = MurmurHash3(text, kScalarSeed);
-    Shard& shard = m_Shards[hash >> (32 - kShardBits)];
+ScalarTable::Slots::Slots(std::size_t capacity)
+    : mask(capacity - 1), entries(static_cast<Slot*>(AllocateZeroed(capacity * sizeof(Slot)))) {}
+
+std::uint32_t ScalarTable::HashOf(std::string_view text) {
+    return MurmurHash3(text, kScalarSeed);
+}
+
+const ScalarTable::Slot* ScalarTable::SlotOf(std::uint32_t hash) const {
+    const Slots* slots = m_Shards[hash >> (32 - kShardBits)].slots.load(std::memory_order_acquire);
+    return slots ? &slots->entries[hash & slots->mask] : nullptr;
+}
+
+void ScalarTable::PrefetchSlot(std::uint32_t hash) const {
+    __builtin_prefetch(SlotOf(hash));
+}
+
+void ScalarTable::PrefetchScalar(std::uint32_t hash) const {
+    const Slot* slot = SlotOf(hash);
+    const std::uint64_t held = slot ? slot->load(std::memory_order_relaxed) : 0;
+    if (held && held >> kTagShift == Tag(hash)) __builtin_prefetch(Unpack(held));
+}
+
+void ScalarTable::Reserve(std::size_t count) {
+    const std::size_t capacity = std::bit_ceil(2 * count / m_Shards.size() + 1);
+    for (Shard& shard : m_Shards) {
+        const Slots* slots = shard.slots.load(std::memory_order_relaxed);
+        if (capacity > kFirstCapacity && (!slots || slots->mask + 1 < capacity)) Grow(shard, capacity);
+    }
+}
+
+YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t hash, std::uint32_t line) {
+    Shard& shard = ShardOf(hash);
     if (const Slots* slots = shard.slots.load(std::memory_order_acquire))
         if (YAMLScalar* scalar = Find(*slots, text, hash)) return scalar;
 
@@ -47,7 +78,8 @@ YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t line) {
     Slots* slots = shard.slots.load(std::memory_order_relaxed);
     if (slots)
         if (YAMLScalar* scalar = Find(*slots, text, hash)) return scalar;
-    if (!slots || 2 * (shard.count + 1) > slots->mask + 1) Grow(shard);
+    const std::size_t capacity = slots ? slots->mask + 1 : 0;
+    if (2 * (shard.count + 1) > capacity) Grow(shard, std::max(2 * capacity, kFirstCapacity));
     YAMLScalar* scalar = Make(text, hash, line);
     Fill(*shard.slots.load(std::memory_order_relaxed), scalar);
     ++shard.count;
@@ -79,9 +111,9 @@ YAMLScalar* ScalarTable::Make(std::string_view text, std::uint32_t hash, std::ui
     return new (memory) YAMLScalar(copy, static_cast<std::uint32_t>(text.size()), hash, line);
 }
 
-void ScalarTable::Grow(Shard& shard) {
-    Slots* old = shard.slots.load(std::memory_order_relaxed);
-    shard.all.push_back(std::make_unique<Slots>(old ? 2 * (old->mask + 1) : kFirstCapacity));
+void ScalarTable::Grow(Shard& shard, std::size_t capacity) {
+    const Slots* old = shard.slots.load(std::memory_order_relaxed);
+    shard.all.push_back(std::make_unique<Slots>(capacity));
     Slots* grown = shard.all.back().get();
     if (old)
         for (std::size_t i = 0; i <= old->mask; ++i)

@@ -26,7 +26,21 @@ public:
     static ScalarTable& Instance();
 
     /// The one scalar of `text`; a new one gets `line`.
-    YAMLScalar* Intern(std::string_view text, std::uint32_t line);
+    YAMLScalar* Intern(std::string_view text, std::uint32_t line) { return Intern(text, HashOf(text), line); }
+
+    // Looking up one text after the other means waiting for memory twice each time, for the slot and for the
+    // scalar that it holds. Who has many texts asks for all slots, then for all scalars, and then for the
+    // results.
+
+    static std::uint32_t HashOf(std::string_view text);
+    /// Starts to load the slot of a text with this hash.
+    void PrefetchSlot(std::uint32_t hash) const;
+    /// Starts to load the scalar that the slot of a text with this hash holds.
+    void PrefetchScalar(std::uint32_t hash) const;
+    YAMLScalar* Intern(std::string_view text, std::uint32_t hash, std::uint32_t line);
+
+    /// Makes room for that many scalars in all. Not while other threads use the table.
+    void Reserve(std::size_t count);
 
 private:
     /// A scalar's address with 16 bits of its hash above it, so that most probes of other scalars need not
@@ -34,9 +48,9 @@ private:
     using Slot = std::atomic<std::uint64_t>;
 
     struct Slots {
-        explicit Slots(std::size_t capacity) : mask(capacity - 1), entries(new Slot[capacity]()) {}
+        explicit Slots(std::size_t capacity);
         const std::size_t mask;
-        const std::unique_ptr<Slot[]> entries;
+        Slot* const entries; // stays until the process ends, as the scalars do
     };
 
     struct alignas(64) Shard {
@@ -49,10 +63,12 @@ private:
     static constexpr unsigned kShardBits = 6;
     static constexpr std::size_t kFirstCapacity = 64;
 
+    Shard& ShardOf(std::uint32_t hash) { return m_Shards[hash >> (32 - kShardBits)]; }
+    const Slot* SlotOf(std::uint32_t hash) const;
     static YAMLScalar* Find(const Slots& slots, std::string_view text, std::uint32_t hash);
     static void Fill(const Slots& slots, YAMLScalar* scalar);
     static YAMLScalar* Make(std::string_view text, std::uint32_t hash, std::uint32_t line);
-    static void Grow(Shard& shard);
+    static void Grow(Shard& shard, std::size_t capacity);
 
     std::array<Shard, std::size_t{1} << kShardBits> m_Shards;
 };

@@ -49,10 +49,6 @@ bool Is(char c, CharClass wanted) {
     return kClasses[static_cast<unsigned char>(c)] & wanted;
 }
 
-YAMLScalar* Intern(const char* begin, const char* end) {
-    return YAMLScalar::Lookup({begin, static_cast<std::size_t>(end - begin)});
-}
-
 void AppendUTF8(std::string& text, std::uint32_t c) {
     const auto put = [&text](std::uint32_t byte) { text += static_cast<char>(byte); };
     if (c < 0x80) {
@@ -164,7 +160,7 @@ void WrittenFormReader::ReadBlockMapping(int indent) {
         const char* end = ScanPlain(m_Position);
         if (*end != ':' || end - m_Position > kLongestKey) throw NotSure();
         NoteKey(m_Position, end);
-        m_Builder.AddNode(Intern(m_Position, end));
+        m_Builder.AddText({m_Position, end});
         m_Position = end + 1;
         ReadBlockValue(indent);
     } while (m_Indent == indent);
@@ -181,7 +177,7 @@ void WrittenFormReader::ReadBlockValue(int indent) {
     if (isList)
         ReadBlockSequence(indent);
     else if (isEmpty)
-        m_Builder.AddNode(YAMLScalar::empty);
+        m_Builder.AddScalar(YAMLScalar::empty);
     else if (m_Indent == indent + 2 && !AtListItem())
         ReadBlockMapping(m_Indent);
     else
@@ -208,7 +204,7 @@ void WrittenFormReader::ReadItem(int indent) {
     NextLine();
     if (m_Indent > indent) throw NotSure();
     NoteIf(!hasBlank);
-    m_Builder.AddNode(YAMLScalar::empty);
+    m_Builder.AddScalar(YAMLScalar::empty);
 }
 
 /// A value that begins on the line of its key or dash. What is further in than `indent` continues it.
@@ -218,9 +214,9 @@ void WrittenFormReader::ReadInline(int indent) {
         m_FlowIndent = indent;
         ReadFlow();
     } else if (first == '\'' || first == '"') {
-        m_Builder.AddNode(ReadQuoted(false));
+        ReadQuoted(false);
     } else {
-        m_Builder.AddNode(ReadPlainLines(indent));
+        ReadPlainLines(indent);
         return;
     }
     if (*m_Position != '\n') throw NotSure();
@@ -249,7 +245,7 @@ const char* WrittenFormReader::ScanPlain(const char* from) const {
     }
 }
 
-YAMLScalar* WrittenFormReader::ReadPlainLines(int indent) {
+void WrittenFormReader::ReadPlainLines(int indent) {
     const bool isNegative = *m_Position == '-' && Is(m_Position[1], kPlain);
     if (!Is(*m_Position, kPlainStart) && !isNegative) throw NotSure();
     const char* begin = m_Position;
@@ -259,7 +255,7 @@ YAMLScalar* WrittenFormReader::ReadPlainLines(int indent) {
     std::ptrdiff_t width = Column(end);
     m_Position = end;
     NextLine();
-    if (m_Indent <= indent) return Intern(begin, end);
+    if (m_Indent <= indent) return m_Builder.AddText({begin, end});
     m_Text.assign(begin, end);
     while (m_Indent > indent) {
         NoteIf(width <= kLineWidth || m_Indent != indent + 2);
@@ -272,7 +268,7 @@ YAMLScalar* WrittenFormReader::ReadPlainLines(int indent) {
         m_Position = end;
         NextLine();
     }
-    return YAMLScalar::Lookup(m_Text);
+    m_Builder.AddScalar(YAMLScalar::Lookup(m_Text));
 }
 
 /// A text that stands plain on this line: the writer breaks lines at blanks behind the width, and quotes what
@@ -317,7 +313,10 @@ void WrittenFormReader::ReadFlowMapping() {
             const char* begin = m_Position;
             const std::uint32_t line = m_Line;
             const bool isQuoted = *begin == '\'' || *begin == '"';
-            m_Builder.AddNode(isQuoted ? ReadQuoted(true) : ReadFlowPlain());
+            if (isQuoted)
+                ReadQuoted(true);
+            else
+                ReadFlowPlain();
             if (m_Line != line || m_Position - begin > kLongestKey) throw NotSure();
             NoteKey(begin, m_Position);
             if (*m_Position != ':' || m_Position[1] != ' ') throw NotSure();
@@ -345,8 +344,10 @@ void WrittenFormReader::ReadFlowValue() {
     const char first = *m_Position;
     if (first == '{' || first == '[')
         ReadFlow();
+    else if (first == '\'' || first == '"')
+        ReadQuoted(true);
     else
-        m_Builder.AddNode(first == '\'' || first == '"' ? ReadQuoted(true) : ReadFlowPlain());
+        ReadFlowPlain();
 }
 
 /// Behind an entry: true at the first character of the next, false behind the closing bracket.
@@ -369,21 +370,20 @@ bool WrittenFormReader::ReadFlowSeparator(char close) {
     return true;
 }
 
-YAMLScalar* WrittenFormReader::ReadFlowPlain() {
+void WrittenFormReader::ReadFlowPlain() {
     const char* p = m_Position;
     if (!Is(*p, kPlainStart) && !(*p == '-' && Is(p[1], kFlow))) throw NotSure();
     while (Is(*p, kFlow) || (*p == ' ' && Is(p[1], kFlow))) ++p;
     // A blank, a line end or a sign that has a meaning of its own is met by the caller, who wants none of
     // them.
     NoteText(m_Position, p);
-    YAMLScalar* scalar = Intern(m_Position, p);
+    m_Builder.AddText({m_Position, p});
     m_Position = p;
-    return scalar;
 }
 
 // Quoted texts.
 
-YAMLScalar* WrittenFormReader::ReadQuoted(bool inFlow) {
+void WrittenFormReader::ReadQuoted(bool inFlow) {
     const char quote = *m_Position++;
     const char* p = m_Position;
     const char other = quote == '"' ? '\'' : '"';
@@ -393,13 +393,12 @@ YAMLScalar* WrittenFormReader::ReadQuoted(bool inFlow) {
     NoteText(m_Position, p);
     const ScalarForms forms = ClassifyScalar(text);
     NoteIf(quote != '\'' || !forms.singleQuoted || (inFlow ? forms.plainInFlow : forms.plainInBlock));
-    YAMLScalar* scalar = YAMLScalar::Lookup(text);
+    m_Builder.AddText(text);
     m_Position = p + 1;
-    return scalar;
 }
 
 /// Up to `from` the text stands for itself, unless it ends in blanks: these are looked at again.
-YAMLScalar* WrittenFormReader::ReadQuotedWithFolds(const char* from) {
+void WrittenFormReader::ReadQuotedWithFolds(const char* from) {
     m_IsAsWritten = false;
     const char quote = m_Position[-1];
     while (from != m_Position && from[-1] == ' ') --from;
@@ -420,7 +419,7 @@ YAMLScalar* WrittenFormReader::ReadQuotedWithFolds(const char* from) {
         }
     }
     ++m_Position;
-    return YAMLScalar::Lookup(m_Text);
+    m_Builder.AddScalar(YAMLScalar::Lookup(m_Text));
 }
 
 /// Blanks inside a line stand for themselves. Around line ends they count for nothing: one line end is a

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/TreeBuilder.h"
+#include "Document/BatchedBuilder.h"
 #include "Document/YAMLMapping.h"
 
 #include <cstdint>
@@ -56,7 +56,7 @@ private:
     void ReadBlockSequence(int indent);
     void ReadItem(int indent);
     void ReadInline(int indent);
-    YAMLScalar* ReadPlainLines(int indent);
+    void ReadPlainLines(int indent);
     const char* ScanPlain(const char* from) const;
 
     void ReadFlow();
@@ -65,17 +65,17 @@ private:
     void ReadFlowValue();
     void OpenFlow(YAMLNode::Kind kind);
     bool ReadFlowSeparator(char close);
-    YAMLScalar* ReadFlowPlain();
+    void ReadFlowPlain();
 
-    YAMLScalar* ReadQuoted(bool inFlow);
-    YAMLScalar* ReadQuotedWithFolds(const char* from);
+    void ReadQuoted(bool inFlow);
+    void ReadQuotedWithFolds(const char* from);
     void FoldLines();
     void Unescape();
     std::uint32_t ReadHex(int digits);
 
     class Nesting;
 
-    TreeBuilder m_Builder;
+    BatchedBuilder m_Builder;
     std::string m_Text; // of a scalar that doesn't stand in the document as it is
     const char* m_Position = nullptr;
     const char* m_End = nullptr;

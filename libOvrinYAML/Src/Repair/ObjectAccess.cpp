@@ -33,7 +33,8 @@ TransformFields GetTransform(const YAMLNode* object) {
 }
 
 YAMLMapping& Editable(YAMLMapping& root, const YAMLScalar* id) {
-    return ToMapping(root.GetRef(id));
+    root.GetRef(id);
+    return ToMapping(root.GetForChange(id));
 }
 
 void SetReference(YAMLMapping& root, const YAMLScalar* id, const YAMLScalar* classKey,

@@ -1,0 +1,55 @@
+#pragma once
+
+#include "Document/TreeBuilder.h"
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <string_view>
+
+namespace ovrin_yaml {
+
+/// A TreeBuilder that interns its scalars many at a time.
+///
+/// Steps are noted first. When enough of them wait, the memory of all their scalars is asked for at once, and
+/// then the steps are carried out:
+///
+///     noted      open | "m_X" | open flow | "fileID" | "12" | close | ...
+///     loading    slots of all hashes, then the scalars in them
+///     built      each text is interned from what is in the cache by now
+class BatchedBuilder {
+public:
+    /// `text` must stay where it is until the builder is flushed or cleared.
+    void AddText(std::string_view text);
+    void AddScalar(YAMLScalar* scalar);
+    void Open(YAMLNode::Kind kind, bool flow, std::uint32_t line);
+    void Close();
+
+    /// Carries out what is noted and returns the finished tree, or null.
+    YAMLNode* TakeRoot();
+    bool KeptAllPairs() const { return m_Builder.KeptAllPairs(); }
+    void Clear();
+
+private:
+    struct Step {
+        enum class What : std::uint8_t { Text, Scalar, OpenMapping, OpenSequence, Close };
+        What what;
+        bool flow;
+        std::uint32_t hash;   // Text
+        std::uint32_t number; // length of a Text, line of a container
+        union {
+            const char* text;
+            YAMLScalar* scalar;
+        };
+    };
+
+    Step& Note(Step::What what);
+    void Flush();
+    void CarryOut(const Step& step);
+
+    std::array<Step, 256> m_Steps;
+    std::size_t m_Count = 0;
+    TreeBuilder m_Builder;
+};
+
+} // namespace ovrin_yaml
