@@ -2,6 +2,9 @@
 
 #include "ErrMsg.h"
 
+#include "Document/Arena.h"
+
+#include <algorithm>
 #include <cerrno>
 #include <climits>
 #include <cstdlib>
@@ -38,19 +41,33 @@ std::size_t ExpectedSize(int descriptor) {
     return static_cast<std::size_t>(status.st_size) + 1;
 }
 
-bool ReadToEnd(int descriptor, std::string& bytes) {
-    bytes.resize(ExpectedSize(descriptor));
-    for (std::size_t length = 0;;) {
-        const ssize_t count = read(descriptor, bytes.data() + length, bytes.size() - length);
+/// Fills `buffer` from the file; -1 if it can't be read. Less than `size` means that the end was reached.
+ssize_t ReadFully(int descriptor, char* buffer, std::size_t size) {
+    std::size_t length = 0;
+    while (length < size) {
+        const ssize_t count = read(descriptor, buffer + length, size - length);
         if (count < 0 && errno == EINTR) continue;
-        if (count < 0) return false;
+        if (count < 0) return -1;
+        if (count == 0) break;
         length += static_cast<std::size_t>(count);
-        if (count == 0) {
-            bytes.resize(length);
-            return true;
-        }
-        if (length == bytes.size()) bytes.resize(2 * length);
     }
+    return static_cast<ssize_t>(length);
+}
+
+bool ReadToEnd(int descriptor, std::string& bytes) {
+    bool isComplete = true;
+    bytes.clear();
+    for (std::size_t capacity = ExpectedSize(descriptor); bytes.size() < capacity; capacity *= 2) {
+        const std::size_t before = bytes.size();
+        bytes.resize_and_overwrite(capacity, [&](char* buffer, std::size_t) {
+            ovrin_yaml::AdviseHugePages(buffer + before, capacity - before);
+            const ssize_t count = ReadFully(descriptor, buffer + before, capacity - before);
+            isComplete = count >= 0;
+            return before + static_cast<std::size_t>(std::max<ssize_t>(count, 0));
+        });
+        if (!isComplete || bytes.size() < capacity) break;
+    }
+    return isComplete;
 }
 
 } // namespace

@@ -2,7 +2,6 @@
 
 #include "CommandSettings.h"
 #include "Diff/MergeRules.h"
-#include "Document/ObjectFileReader.h"
 #include "FileUtils.h"
 #include "Repair/YAMLTypeInfo.h"
 
@@ -11,26 +10,26 @@
 
 using namespace ovrin_yaml;
 
-namespace {
-
-void ReadAndParse(const std::string& path, OvrinObjects& objects) {
+void TakeFile(const std::string& path, ObjectFile& file) {
     std::string bytes;
     const ReadResult result = ReadWholeFile(path, bytes);
     if (result == ReadResult::CannotOpen) throw YAMLError("Cannot open file");
-    if (result == ReadResult::CannotRead || !ParseYAMLFile(std::move(bytes), objects))
-        throw YAMLError("Cannot read file");
+    if (result == ReadResult::CannotRead) throw YAMLError("Cannot read file");
+    file.Take(std::move(bytes));
 }
 
-} // namespace
+void FinishFile(ObjectFile& file) {
+    if (!file.Finish()) throw YAMLError("Cannot read file");
+}
 
 void ReadYAMLPath(const std::string& path, OvrinObjects& objects) {
-    try {
-        ReadAndParse(path, objects);
-    } catch (const YAMLError& error) {
-        throw YAMLError("Error parsing file '" + path + "': " + error.what());
-    } catch (const std::exception& error) {
-        throw YAMLError("Error parsing file '" + path + "' caught unknown exception: " + error.what());
-    }
+    WithFileName(path, [&] {
+        ObjectFile file(objects, {});
+        TakeFile(path, file);
+        file.Cut(nullptr);
+        for (std::size_t piece = 0; piece < file.PieceCount(); ++piece) file.ReadPiece(piece);
+        FinishFile(file);
+    });
 }
 
 void SetupRules(const std::string& rulesFile) {

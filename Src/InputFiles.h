@@ -1,8 +1,27 @@
 #pragma once
 
-#include "Document/OvrinObjects.h"
+#include "Document/ObjectFile.h"
+#include "Document/YAMLError.h"
 
+#include <exception>
 #include <string>
+
+/// Takes a step of reading the file `path`. What it throws is thrown again as YAMLError with the path and the
+/// fault.
+template <class Step> void WithFileName(const std::string& path, const Step& step) {
+    try {
+        step();
+    } catch (const ovrin_yaml::YAMLError& error) {
+        throw ovrin_yaml::YAMLError("Error parsing file '" + path + "': " + error.what());
+    } catch (const std::exception& error) {
+        throw ovrin_yaml::YAMLError("Error parsing file '" + path +
+                                    "' caught unknown exception: " + error.what());
+    }
+}
+
+/// The first and the last step of reading an object file. They throw YAMLError for a file that can't be read.
+void TakeFile(const std::string& path, ovrin_yaml::ObjectFile& file);
+void FinishFile(ovrin_yaml::ObjectFile& file);
 
 /// Reads an object file into `objects`, which must be empty. Throws YAMLError with the path and the fault.
 void ReadYAMLPath(const std::string& path, ovrin_yaml::OvrinObjects& objects);

@@ -4,24 +4,112 @@
 #include "Thread.h"
 #include "TimerStat.h"
 
+#include <algorithm>
+#include <atomic>
+#include <deque>
+#include <exception>
+#include <functional>
+#include <thread>
+
+using namespace ovrin_yaml;
+
 namespace {
 
-void ReadOnThreads(TimerStat& parent, const std::vector<InputFile>& inputs) {
-    TimerStat timer(parent, "Read base, left and right");
+/// A file that is being read along with others, and what went wrong with it.
+struct FileInWork {
+    FileInWork(const InputFile& input, ReaderOptions options)
+        : path(*input.path), file(*input.objects, options) {}
+
+    /// Takes a step of reading, unless an earlier one failed.
+    template <class Step> void Try(const Step& step) {
+        if (failure) return;
+        try {
+            WithFileName(path, step);
+        } catch (...) {
+            failure = std::current_exception();
+        }
+    }
+
+    const std::string& path;
+    ObjectFile file;
+    std::exception_ptr failure;
+};
+
+/// Carries out the tasks on as many threads as the machine has processors, handing them out in their order.
+void RunTasks(const std::vector<std::function<void()>>& tasks) {
+    std::atomic<std::size_t> next = 0;
+    const auto work = [&] {
+        for (std::size_t i = next++; i < tasks.size(); i = next++) tasks[i]();
+    };
+    const std::size_t count =
+        std::min<std::size_t>(tasks.size(), std::max(2u, std::thread::hardware_concurrency()));
     std::vector<Thread> threads;
-    threads.reserve(inputs.size());
-    for (const InputFile& input : inputs)
-        threads.emplace_back([&input] { ReadYAMLPath(*input.path, *input.objects); });
+    threads.reserve(count);
+    while (threads.size() < count) threads.emplace_back(work);
     for (Thread& thread : threads) thread.Join();
     for (const Thread& thread : threads) thread.CheckForExceptions();
 }
 
-} // namespace
+void ReadPieces(FileInWork& work) {
+    for (std::size_t piece = 0; piece < work.file.PieceCount(); ++piece) work.file.ReadPiece(piece);
+}
 
-void ReadInputs(TimerStat& parent, bool useThreads, const std::vector<InputFile>& inputs) {
-    if (useThreads) return ReadOnThreads(parent, inputs);
+/// First the bytes of all files; then, since the first is cut by now, the others are cut along it and read,
+/// while the pieces of the first are shared out; last the objects are put together, in the order of the
+/// files.
+void ReadOnThreads(TimerStat& parent, const std::vector<InputFile>& inputs, ReaderOptions options) {
+    TimerStat timer(parent, "Read base, left and right");
+    std::deque<FileInWork> files;
+    for (const InputFile& input : inputs) files.emplace_back(input, options);
+    FileInWork& first = files.front();
+
+    std::vector<std::function<void()>> tasks;
+    for (FileInWork& work : files)
+        tasks.emplace_back([&] {
+            work.Try([&] { TakeFile(work.path, work.file); });
+            if (&work == &first) work.Try([&] { work.file.Cut(nullptr); });
+        });
+    RunTasks(tasks);
+
+    tasks.clear();
+    for (FileInWork& work : files) {
+        if (&work == &first) continue;
+        tasks.emplace_back([&] {
+            work.Try([&] {
+                work.file.Cut(&first.file);
+                ReadPieces(work);
+            });
+        });
+    }
+    for (std::size_t piece = 0; !first.failure && piece < first.file.PieceCount(); ++piece)
+        tasks.emplace_back([&first, piece] { first.file.ReadPiece(piece); });
+    RunTasks(tasks);
+
+    for (FileInWork& work : files) work.Try([&] { FinishFile(work.file); });
+    for (const FileInWork& work : files)
+        if (work.failure) std::rethrow_exception(work.failure);
+}
+
+void ReadInOrder(TimerStat& parent, const std::vector<InputFile>& inputs, ReaderOptions options) {
+    std::deque<FileInWork> files;
     for (const InputFile& input : inputs) {
         TimerStat timer(parent, input.timerName);
-        ReadYAMLPath(*input.path, *input.objects);
+        FileInWork& work = files.emplace_back(input, options);
+        WithFileName(work.path, [&] {
+            TakeFile(work.path, work.file);
+            work.file.Cut(files.size() == 1 ? nullptr : &files.front().file);
+            ReadPieces(work);
+            FinishFile(work.file);
+        });
     }
+}
+
+} // namespace
+
+void ReadInputs(TimerStat& parent, bool useThreads, const std::vector<InputFile>& inputs,
+                ReaderOptions options) {
+    if (useThreads)
+        ReadOnThreads(parent, inputs, options);
+    else
+        ReadInOrder(parent, inputs, options);
 }

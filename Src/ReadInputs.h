@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/OvrinObjects.h"
+#include "Document/ObjectFile.h"
 
 #include <string>
 #include <vector>
@@ -14,6 +14,9 @@ struct InputFile {
     ovrin_yaml::OvrinObjects* objects; // filled; must be empty
 };
 
-/// Reads the files, each on a thread of its own if wanted. Then all have been read to their end before the
-/// first failure, in the order of `inputs`, is thrown; without threads the first one ends it.
-void ReadInputs(TimerStat& parent, bool useThreads, const std::vector<InputFile>& inputs);
+/// Reads files that are versions of one another, the first being the one that the others share objects with.
+/// With threads all are read at once; then all have been tried before the first failure, in the order of
+/// `inputs`, is thrown. Without threads the first failure ends it. Throws YAMLError with the path and the
+/// fault.
+void ReadInputs(TimerStat& parent, bool useThreads, const std::vector<InputFile>& inputs,
+                ovrin_yaml::ReaderOptions options = {});

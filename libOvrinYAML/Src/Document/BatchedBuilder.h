@@ -27,7 +27,7 @@ public:
 
     /// Carries out what is noted and returns the finished tree, or null.
     YAMLNode* TakeRoot();
-    bool KeptAllPairs() const { return m_Builder.KeptAllPairs(); }
+    bool IsRegular() const { return m_Builder.IsRegular(); }
     void Clear();
 
 private:

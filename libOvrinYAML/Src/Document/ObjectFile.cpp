@@ -164,6 +164,7 @@ void ObjectFile::ReadDocument(WrittenFormReader& reader, Document& document) con
     if (!read.object) return;
     document.object = read.object;
     document.fileID = YAMLScalar::Lookup(read.fileID);
+    document.isLendable = read.isRegular;
     AddHeaderData(*read.object, document.fileID, read.classID, read.isStripped);
     if (!m_Base && read.isAsWritten)
         read.object->m_Source =
@@ -190,14 +191,19 @@ bool ObjectFile::Finish() {
 void ObjectFile::FinishDocuments() {
     YAMLMapping& root = m_Objects.GetMapping();
     root.Reserve(m_Documents.size());
-    for (const Document& own : m_Documents) {
-        const Document& document = own.lender == kNone ? own : m_Base->m_Documents[own.lender];
-        if (document.object) {
-            document.object->m_IsShared = document.object->m_IsShared || own.lender != kNone;
-            root.Append(document.fileID, document.object);
-        } else if (!ReadByLibrary(own, &own == &m_Documents.back())) {
-            return;
+    WrittenFormReader reader;
+    for (Document& document : m_Documents) {
+        const Document* lender = document.lender == kNone ? nullptr : &m_Base->m_Documents[document.lender];
+        if (lender && lender->isLendable) {
+            lender->object->m_IsShared = true;
+            root.Append(lender->fileID, lender->object);
+            continue;
         }
+        if (lender) ReadDocument(reader, document);
+        if (document.object)
+            root.Append(document.fileID, document.object);
+        else if (!ReadByLibrary(document, &document == &m_Documents.back()))
+            return;
     }
 }
 

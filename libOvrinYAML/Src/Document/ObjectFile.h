@@ -35,8 +35,9 @@ struct ReaderOptions {
 /// of a text behind a document that doesn't end where the next header stands.
 ///
 /// Sharing: an object that a second file takes is marked, and whoever changes it copies it first
-/// (YAMLMapping::GetForChange). Only the file that others are cut along keeps its text, with the objects that
-/// are in written form pointing into it: what nobody changes is written as the bytes that came in.
+/// (YAMLMapping::GetForChange). Objects with repeated keys can't be copied and are not shared. Only the file
+/// that others are cut along keeps its text, with the objects that are in written form pointing into it: what
+/// nobody changes is written as the bytes that came in.
 class ObjectFile {
 public:
     /// Fills `objects`, which must be empty and outlive the file.
@@ -64,6 +65,7 @@ private:
         std::size_t lender;            // the base's document in the same words, or kNone
         YAMLMapping* object = nullptr; // null: not read, or left to libyaml
         YAMLScalar* fileID = nullptr;  // of the object
+        bool isLendable = false; // the object may be copied before a change, so another file may have it
     };
     struct Piece {
         std::size_t first, end; // documents

@@ -39,9 +39,6 @@ ScalarTable& ScalarTable::Instance() {
     return table;
 }
 
-ScalarTable::Slots::Slots(std::size_t capacity)
-    : mask(capacity - 1), entries(static_cast<Slot*>(AllocateZeroed(capacity * sizeof(Slot)))) {}
-
 std::uint32_t ScalarTable::HashOf(std::string_view text) {
     return MurmurHash3(text, kScalarSeed);
 }
@@ -63,9 +60,13 @@ void ScalarTable::PrefetchScalar(std::uint32_t hash) const {
 
 void ScalarTable::Reserve(std::size_t count) {
     const std::size_t capacity = std::bit_ceil(2 * count / m_Shards.size() + 1);
+    if (capacity <= kFirstCapacity) return;
+    // One piece for all shards is big enough for huge pages.
+    char* memory = static_cast<char*>(AllocateZeroed(m_Shards.size() * capacity * sizeof(Slot)));
     for (Shard& shard : m_Shards) {
         const Slots* slots = shard.slots.load(std::memory_order_relaxed);
-        if (capacity > kFirstCapacity && (!slots || slots->mask + 1 < capacity)) Grow(shard, capacity);
+        if (!slots || slots->mask + 1 < capacity) Grow(shard, capacity, memory);
+        memory += capacity * sizeof(Slot);
     }
 }
 
@@ -75,11 +76,14 @@ YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t hash, std::
         if (YAMLScalar* scalar = Find(*slots, text, hash)) return scalar;
 
     const std::lock_guard lock(shard.mutex);
-    Slots* slots = shard.slots.load(std::memory_order_relaxed);
+    const Slots* slots = shard.slots.load(std::memory_order_relaxed);
     if (slots)
         if (YAMLScalar* scalar = Find(*slots, text, hash)) return scalar;
     const std::size_t capacity = slots ? slots->mask + 1 : 0;
-    if (2 * (shard.count + 1) > capacity) Grow(shard, std::max(2 * capacity, kFirstCapacity));
+    if (2 * (shard.count + 1) > capacity) {
+        const std::size_t grown = std::max(2 * capacity, kFirstCapacity);
+        Grow(shard, grown, AllocateZeroed(grown * sizeof(Slot)));
+    }
     YAMLScalar* scalar = Make(text, hash, line);
     Fill(*shard.slots.load(std::memory_order_relaxed), scalar);
     ++shard.count;
@@ -111,10 +115,9 @@ YAMLScalar* ScalarTable::Make(std::string_view text, std::uint32_t hash, std::ui
     return new (memory) YAMLScalar(copy, static_cast<std::uint32_t>(text.size()), hash, line);
 }
 
-void ScalarTable::Grow(Shard& shard, std::size_t capacity) {
+void ScalarTable::Grow(Shard& shard, std::size_t capacity, void* memory) {
     const Slots* old = shard.slots.load(std::memory_order_relaxed);
-    shard.all.push_back(std::make_unique<Slots>(capacity));
-    Slots* grown = shard.all.back().get();
+    const auto* grown = new (ArenaAllocate(sizeof(Slots))) Slots{capacity - 1, static_cast<Slot*>(memory)};
     if (old)
         for (std::size_t i = 0; i <= old->mask; ++i)
             if (const std::uint64_t slot = old->entries[i].load(std::memory_order_relaxed))

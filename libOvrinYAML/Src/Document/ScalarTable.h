@@ -4,10 +4,8 @@
 
 #include <array>
 #include <atomic>
-#include <memory>
 #include <mutex>
 #include <string_view>
-#include <vector>
 
 namespace ovrin_yaml {
 
@@ -48,16 +46,14 @@ private:
     using Slot = std::atomic<std::uint64_t>;
 
     struct Slots {
-        explicit Slots(std::size_t capacity);
-        const std::size_t mask;
-        Slot* const entries; // stays until the process ends, as the scalars do
+        std::size_t mask;
+        Slot* entries;
     };
 
     struct alignas(64) Shard {
-        std::atomic<Slots*> slots{nullptr};
+        std::atomic<const Slots*> slots{nullptr};
         std::mutex mutex;
         std::size_t count = 0;
-        std::vector<std::unique_ptr<Slots>> all; // the current table last
     };
 
     static constexpr unsigned kShardBits = 6;
@@ -68,7 +64,8 @@ private:
     static YAMLScalar* Find(const Slots& slots, std::string_view text, std::uint32_t hash);
     static void Fill(const Slots& slots, YAMLScalar* scalar);
     static YAMLScalar* Make(std::string_view text, std::uint32_t hash, std::uint32_t line);
-    static void Grow(Shard& shard, std::size_t capacity);
+    /// Gives the shard an empty table in `memory`, which stays until the process ends, and fills it.
+    static void Grow(Shard& shard, std::size_t capacity, void* memory);
 
     std::array<Shard, std::size_t{1} << kShardBits> m_Shards;
 };

@@ -8,7 +8,7 @@
 namespace ovrin_yaml {
 
 void TreeBuilder::Open(YAMLNode::Kind kind, bool flow, std::uint32_t line) {
-    if (m_Open.empty()) m_KeptAllPairs = true;
+    if (m_Open.empty()) m_IsRegular = true;
     m_Open.push_back({kind, flow, line, m_Nodes.size()});
 }
 
@@ -35,7 +35,7 @@ YAMLNode* TreeBuilder::MakeMapping(const OpenContainer& open) {
         hash = FoldPair(hash, key->m_Hash, m_Nodes[i + 1]->m_Hash, index);
         mapping->Append(key, m_Nodes[i + 1]);
     }
-    m_KeptAllPairs = m_KeptAllPairs && mapping->RawEntries().size() == index;
+    m_IsRegular = m_IsRegular && !mapping->HasDuplicates() && mapping->Size() == index;
     mapping->m_Hash = hash;
     return mapping;
 }

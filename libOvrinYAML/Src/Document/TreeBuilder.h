@@ -28,7 +28,7 @@ public:
     YAMLNode* TakeRoot();
     /// Whether every pair since the builder was last empty is in its mapping: none was dropped for its key,
     /// or for repeating one with an equal value.
-    bool KeptAllPairs() const { return m_KeptAllPairs; }
+    bool IsRegular() const { return m_IsRegular; }
     /// Forgets everything, what was finished and what is open.
     void Clear();
 
@@ -45,7 +45,7 @@ private:
 
     std::vector<YAMLNode*> m_Nodes;
     std::vector<OpenContainer> m_Open;
-    bool m_KeptAllPairs = true;
+    bool m_IsRegular = true;
 };
 
 } // namespace ovrin_yaml

@@ -99,7 +99,8 @@ WrittenFormReader::Document WrittenFormReader::Read(std::string_view text, std::
         YAMLNode* root = m_Builder.TakeRoot();
         root->m_Line = firstLine;
         document.object = AsMapping(root);
-        document.isAsWritten = m_IsAsWritten && m_Builder.KeptAllPairs();
+        document.isRegular = m_Builder.IsRegular();
+        document.isAsWritten = m_IsAsWritten && document.isRegular;
     } catch (const NotSure&) {
         m_Builder.Clear();
     }

@@ -30,7 +30,9 @@ public:
         std::string_view classID;      // both point into the document
         std::string_view fileID;
         bool isStripped = false;
-        /// The writer would write the object as these very bytes.
+        /// No mapping in it has a key twice.
+        bool isRegular = false;
+        /// The writer would write the object as these very bytes. Only said of regular ones.
         bool isAsWritten = false;
     };
 
