@@ -4,6 +4,8 @@
 #include "Thread.h"
 #include "TimerStat.h"
 
+#include "Repair/ObjectTraits.h"
+
 #include <algorithm>
 #include <atomic>
 #include <deque>
@@ -54,36 +56,29 @@ void ReadPieces(FileInWork& work) {
     for (std::size_t piece = 0; piece < work.file.PieceCount(); ++piece) work.file.ReadPiece(piece);
 }
 
-/// First the bytes of all files; then, since the first is cut by now, the others are cut along it and read,
-/// while the pieces of the first are shared out; last the objects are put together, in the order of the
-/// files.
+/// First the bytes of all files. Then the others are cut along the first; by then it is known which of its
+/// objects they want. All pieces are read, in any order, and last the objects are put together in the order
+/// of the files.
 void ReadOnThreads(TimerStat& parent, const std::vector<InputFile>& inputs, ReaderOptions options) {
     TimerStat timer(parent, "Read base, left and right");
     std::deque<FileInWork> files;
     for (const InputFile& input : inputs) files.emplace_back(input, options);
     FileInWork& first = files.front();
 
-    std::vector<std::function<void()>> tasks;
-    for (FileInWork& work : files)
-        tasks.emplace_back([&] {
+    std::vector<std::function<void()>> takes, cuts, pieces;
+    for (FileInWork& work : files) {
+        takes.emplace_back([&] {
             work.Try([&] { TakeFile(work.path, work.file); });
             if (&work == &first) work.Try([&] { work.file.Cut(nullptr); });
         });
-    RunTasks(tasks);
-
-    tasks.clear();
-    for (FileInWork& work : files) {
-        if (&work == &first) continue;
-        tasks.emplace_back([&] {
-            work.Try([&] {
-                work.file.Cut(&first.file);
-                ReadPieces(work);
-            });
-        });
+        if (&work != &first) cuts.emplace_back([&] { work.Try([&] { work.file.Cut(&first.file); }); });
     }
-    for (std::size_t piece = 0; !first.failure && piece < first.file.PieceCount(); ++piece)
-        tasks.emplace_back([&first, piece] { first.file.ReadPiece(piece); });
-    RunTasks(tasks);
+    RunTasks(takes);
+    RunTasks(cuts);
+    for (FileInWork& work : files)
+        for (std::size_t piece = 0; !work.failure && piece < work.file.PieceCount(); ++piece)
+            pieces.emplace_back([&work, piece] { work.file.ReadPiece(piece); });
+    RunTasks(pieces);
 
     for (FileInWork& work : files) work.Try([&] { FinishFile(work.file); });
     for (const FileInWork& work : files)
@@ -105,6 +100,14 @@ void ReadInOrder(TimerStat& parent, const std::vector<InputFile>& inputs, Reader
 }
 
 } // namespace
+
+ReaderOptions DefaultReaderOptions() {
+    ReaderOptions options;
+    options.inspect = InspectObject;
+    // Pre-processing changes them in every file.
+    options.unshared = kHasTransitions;
+    return options;
+}
 
 void ReadInputs(TimerStat& parent, bool useThreads, const std::vector<InputFile>& inputs,
                 ReaderOptions options) {

@@ -14,9 +14,13 @@ struct InputFile {
     ovrin_yaml::OvrinObjects* objects; // filled; must be empty
 };
 
+/// Everything that makes reading fast, with a look at each object for the repair stages
+/// (Repair/ObjectTraits.h).
+ovrin_yaml::ReaderOptions DefaultReaderOptions();
+
 /// Reads files that are versions of one another, the first being the one that the others share objects with.
 /// With threads all are read at once; then all have been tried before the first failure, in the order of
 /// `inputs`, is thrown. Without threads the first failure ends it. Throws YAMLError with the path and the
 /// fault.
 void ReadInputs(TimerStat& parent, bool useThreads, const std::vector<InputFile>& inputs,
-                ovrin_yaml::ReaderOptions options = {});
+                ovrin_yaml::ReaderOptions options = DefaultReaderOptions());

@@ -1,6 +1,7 @@
 #include "Diff/KeyOrder.h"
 
 #include "Diff/CreateDiffOperation.h"
+#include "Diff/MergeRules.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
 #include "Document/YAMLMapping.h"
@@ -49,15 +50,23 @@ const ChangeSequenceOperation* DiffKeyOrder(const YAMLMapping* base, const YAMLM
     Path path = {YAMLScalar::underscore};
     YAMLSequence* baseKeys = KeysOf(base);
     YAMLSequence* destKeys = KeysOf(dest);
-    const Operation* operation = CreateDiffOperation(path, baseKeys, destKeys);
+    // Lists of one hash count as equal, as everywhere; applying such a diff may then fail for its keys.
+    YAMLSequenceRemapper* remapper = CountAsEqual(baseKeys, destKeys)
+                                         ? nullptr
+                                         : YAMLSequenceRemapper::FindKeyListMapping(baseKeys, destKeys);
+    YAMLSequenceDiff* diff = nullptr;
+    if (remapper) {
+        diff = YAMLSequenceDiff::Diff(path, remapper->Arrange(baseKeys->m_Items), destKeys->m_Items);
+    } else {
+        remapper = YAMLSequenceRemapper::MakeIdentity(base->Size());
+        remapper->m_DestinationCount = dest->Size();
+        diff = YAMLAlloc<YAMLSequenceDiff>::create();
+    }
+    const bool mergeable = MergeRules::IsMergeablePath(path, destKeys);
     // The operations inside point at the keys, which outlive their lists.
     YAMLAlloc<YAMLSequence>::free(baseKeys);
     YAMLAlloc<YAMLSequence>::free(destKeys);
-    if (operation) return As<ChangeSequenceOperation>(operation);
-    // Lists of one hash count as equal, as everywhere; applying such a diff may then fail for its keys.
-    YAMLSequenceRemapper* unchanged = YAMLSequenceRemapper::MakeIdentity(base->Size());
-    unchanged->m_DestinationCount = dest->Size();
-    return YAMLAlloc<ChangeSequenceOperation>::create(YAMLAlloc<YAMLSequenceDiff>::create(), unchanged, true);
+    return YAMLAlloc<ChangeSequenceOperation>::create(diff, remapper, mergeable);
 }
 
 bool IsIdentityKeyOrder(const ChangeSequenceOperation* order) {

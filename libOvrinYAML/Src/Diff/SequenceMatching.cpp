@@ -6,6 +6,7 @@
 #include "Document/KeyIndex.h"
 
 #include <algorithm>
+#include <memory>
 
 namespace ovrin_yaml {
 
@@ -37,6 +38,14 @@ private:
     const std::vector<Path>& m_KeyPaths;
     std::vector<Path> m_GuidPaths;
 };
+
+std::unique_ptr<KeyIndex> IndexTexts(const NodeList& texts) {
+    auto indexes = std::make_unique<KeyIndex>();
+    indexes->Reserve(texts.size());
+    for (std::size_t i = 0; i < texts.size(); ++i)
+        indexes->Set(AsScalar(texts[i]), static_cast<std::uint32_t>(i));
+    return indexes;
+}
 
 /// The keys of all elements, or nothing if one has no key or two have the same.
 bool FindUniqueKeys(const ElementKeys& keys, const YAMLSequence* sequence,
@@ -80,6 +89,26 @@ YAMLSequenceRemapper* YAMLSequenceRemapper::FindMapping(const Path& path, const 
         YAMLAlloc<YAMLSequenceRemapper>::create(base->m_Items.size(), dest->m_Items.size(), true);
     for (std::size_t i = 0; i < baseKeys.size(); ++i)
         remapper->m_Mapping[i] = IndexOf(destIndexes, baseKeys[i]);
+    return UnlessIdentity(remapper);
+}
+
+YAMLSequenceRemapper* YAMLSequenceRemapper::FindKeyListMapping(const YAMLSequence* base,
+                                                               const YAMLSequence* dest) {
+    const auto& from = base->m_Items;
+    const auto& to = dest->m_Items;
+    YAMLSequenceRemapper* remapper = YAMLAlloc<YAMLSequenceRemapper>::create(from.size(), to.size(), true);
+    std::unique_ptr<KeyIndex> indexes;
+    std::size_t next = 0;
+    for (std::size_t i = 0; i < from.size(); ++i) {
+        // Most keys stand behind the one that they stood behind: an index is only made when one doesn't.
+        if (next == to.size() || to[next] != from[i]) {
+            if (!indexes) indexes = IndexTexts(to);
+            const std::uint32_t found = indexes->Find(AsScalar(from[i]));
+            if (found == KeyIndex::kMissing) continue;
+            next = found;
+        }
+        remapper->m_Mapping[i] = static_cast<int>(next++);
+    }
     return UnlessIdentity(remapper);
 }
 

@@ -3,39 +3,13 @@
 #include "Diff/CreateDiffOperation.h"
 #include "Diff/KeyOrder.h"
 #include "Diff/MergeRules.h"
-#include "Document/YAMLMapping.h"
+#include "Document/AlignedLookup.h"
 
 namespace ovrin_yaml {
 
-namespace {
-
-/// The pairs of `dest` behind the pair at `hint`, if its key is the wanted one, save the search: most
-/// mappings have the same keys in the same order.
-class AlignedLookup {
-public:
-    explicit AlignedLookup(const YAMLMapping* mapping)
-        : m_Mapping(mapping), m_Next(mapping->begin()), m_End(mapping->end()) {}
-
-    const YAMLNode* Get(const YAMLScalar* key) {
-        if (m_Next != m_End && m_Next->key == key) {
-            const YAMLNode* value = m_Next->value;
-            ++m_Next;
-            return value;
-        }
-        return m_Mapping->Get(key);
-    }
-
-private:
-    const YAMLMapping* m_Mapping;
-    YAMLMapping::Iterator m_Next;
-    YAMLMapping::Iterator m_End;
-};
-
-} // namespace
-
 YAMLMappingDiff* YAMLMappingDiff::Diff(Path& path, const YAMLMapping* base, const YAMLMapping* dest) {
     YAMLMappingDiff* diff = YAMLAlloc<YAMLMappingDiff>::create();
-    AlignedLookup destValues(dest);
+    AlignedLookup destValues(*dest);
     for (const auto& [key, baseValue] : *base) {
         const YAMLNode* destValue = destValues.Get(key);
         if (CountAsEqual(baseValue, destValue)) continue;
@@ -44,7 +18,7 @@ YAMLMappingDiff* YAMLMappingDiff::Diff(Path& path, const YAMLMapping* base, cons
         path.pop_back();
         if (operation) diff->Add(key, operation);
     }
-    AlignedLookup baseValues(base);
+    AlignedLookup baseValues(*base);
     for (const auto& [key, destValue] : *dest) {
         if (baseValues.Get(key)) continue;
         path.push_back(key);

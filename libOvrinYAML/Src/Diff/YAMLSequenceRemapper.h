@@ -33,6 +33,8 @@ public:
     /// its own, by equality otherwise; null if every element stays where it is. `path` chooses the rule.
     static YAMLSequenceRemapper* FindMapping(const Path& path, const YAMLSequence* base,
                                              const YAMLSequence* dest);
+    /// The same for two lists of texts that stand in each of them once, as the keys of mappings do.
+    static YAMLSequenceRemapper* FindKeyListMapping(const YAMLSequence* base, const YAMLSequence* dest);
     /// The same by equality: a common prefix and suffix, which may overlap, and between them each base
     /// element with the first equal destination element that is still free.
     static YAMLSequenceRemapper* FindGenericMapping(const YAMLSequence* base, const YAMLSequence* dest);

@@ -7,6 +7,7 @@
 #include "Document/YAMLScalar.h"
 
 #include <algorithm>
+#include <atomic>
 #include <cstring>
 #include <new>
 
@@ -32,6 +33,10 @@ std::string_view FileIDOf(const char* begin, const char* end) {
 }
 
 } // namespace
+
+std::string_view ObjectFile::FileIDOf(const Document& document) {
+    return ovrin_yaml::FileIDOf(document.begin, document.begin + document.length);
+}
 
 void ObjectFile::Take(std::string bytes) {
     if (std::string_view(bytes).substr(0, kSignature.size() + 4).find(kSignature) == std::string_view::npos)
@@ -62,11 +67,11 @@ bool ObjectFile::HasWrittenHeader() const {
            std::string_view(*m_Text).substr(m_Header.size()).starts_with(kDocumentStart);
 }
 
-void ObjectFile::Cut(const ObjectFile* base) {
+void ObjectFile::Cut(ObjectFile* base) {
     if (!m_Options.fast || !HasWrittenHeader()) return;
     if (base && m_Options.share && !base->m_Documents.empty() && m_Header == base->m_Header) {
         m_Base = base;
-        CutAlong(*base);
+        CutAlong();
     } else {
         CutAlone();
     }
@@ -85,9 +90,16 @@ void ObjectFile::CutAlone() {
     ScalarTable::Instance().Reserve(m_Text->size() / kBytesPerScalar);
     for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
         const char* end = FindDocumentEnd(begin);
-        m_Documents.push_back({begin, static_cast<std::size_t>(end - begin), kNone});
+        AddDocument(begin, static_cast<std::size_t>(end - begin), kNone);
         begin = end;
     }
+}
+
+void ObjectFile::AddDocument(const char* begin, std::size_t length, std::size_t lender) {
+    m_Documents.push_back({begin, length, lender});
+    if (lender == kNone) return;
+    // Left and right may want one object at the same time, and say the same.
+    std::atomic_ref(m_Base->m_Documents[lender].isWanted).store(true, std::memory_order_relaxed);
 }
 
 /// Whether the base's document stands at `position` in the same words and ends there, too.
@@ -101,39 +113,40 @@ bool ObjectFile::StandsAt(const Document& document, const char* position, const 
 
 /// Most documents follow each other as they do in the base, so the base's next one is tried before any
 /// search.
-void ObjectFile::CutAlong(const ObjectFile& base) {
+void ObjectFile::CutAlong() {
+    const std::vector<Document>& known = m_Base->m_Documents;
+    m_Documents.reserve(known.size());
     std::size_t expected = 0;
     for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
-        if (expected < base.m_Documents.size() && StandsAt(base.m_Documents[expected], begin, End())) {
-            m_Documents.push_back({begin, base.m_Documents[expected].length, expected});
+        if (expected < known.size() && StandsAt(known[expected], begin, End())) {
+            AddDocument(begin, known[expected].length, expected);
             ++expected;
         } else {
             const char* end = FindDocumentEnd(begin);
-            const std::size_t lender = FindLender(base, begin, end, expected);
-            m_Documents.push_back({begin, static_cast<std::size_t>(end - begin), lender});
+            AddDocument(begin, static_cast<std::size_t>(end - begin), FindLender(begin, end, expected));
         }
         begin += m_Documents.back().length;
     }
 }
 
 /// For a document that isn't the expected one; `expected` becomes the one behind the base's of the same id.
-std::size_t ObjectFile::FindLender(const ObjectFile& base, const char* begin, const char* end,
-                                   std::size_t& expected) const {
-    const std::size_t index = base.IndexOf(FileIDOf(begin, end));
+std::size_t ObjectFile::FindLender(const char* begin, const char* end, std::size_t& expected) const {
+    const std::vector<Document>& known = m_Base->m_Documents;
+    const std::string_view fileID = ovrin_yaml::FileIDOf(begin, end);
+    const bool isChanged = expected < known.size() && FileIDOf(known[expected]) == fileID;
+    const std::size_t index = isChanged ? expected : m_Base->IndexOf(fileID);
     if (index == kNone) return kNone;
     expected = index + 1;
-    const Document& candidate = base.m_Documents[index];
-    const bool same =
-        candidate.length == static_cast<std::size_t>(end - begin) && StandsAt(candidate, begin, end);
-    return same ? index : kNone;
+    const bool isSame =
+        known[index].length == static_cast<std::size_t>(end - begin) && StandsAt(known[index], begin, end);
+    return isSame ? index : kNone;
 }
 
 std::size_t ObjectFile::IndexOf(std::string_view fileID) const {
     std::call_once(m_IndexOnce, [this] {
         m_Index.reserve(m_Documents.size());
         for (std::size_t i = 0; i < m_Documents.size(); ++i) {
-            const Document& document = m_Documents[i];
-            m_Index.try_emplace(FileIDOf(document.begin, document.begin + document.length), i);
+            m_Index.try_emplace(FileIDOf(m_Documents[i]), i);
         }
     });
     const auto found = m_Index.find(fileID);
@@ -164,8 +177,11 @@ void ObjectFile::ReadDocument(WrittenFormReader& reader, Document& document) con
     if (!read.object) return;
     document.object = read.object;
     document.fileID = YAMLScalar::Lookup(read.fileID);
-    document.isLendable = read.isRegular;
     AddHeaderData(*read.object, document.fileID, read.classID, read.isStripped);
+    if (m_Options.inspect && read.isRegular) read.object->m_Traits = m_Options.inspect(*read.object);
+    document.isLendable = read.isRegular && !(read.object->m_Traits & m_Options.unshared);
+    document.isMarked = document.isLendable && document.isWanted;
+    read.object->m_IsShared = document.isMarked;
     if (!m_Base && read.isAsWritten)
         read.object->m_Source =
             new (ArenaAllocate(sizeof(std::string_view))) std::string_view(document.begin, document.length);
@@ -195,7 +211,8 @@ void ObjectFile::FinishDocuments() {
     for (Document& document : m_Documents) {
         const Document* lender = document.lender == kNone ? nullptr : &m_Base->m_Documents[document.lender];
         if (lender && lender->isLendable) {
-            lender->object->m_IsShared = true;
+            // Nearly always done by now, while the object was at hand.
+            if (!lender->isMarked) lender->object->m_IsShared = true;
             root.Append(lender->fileID, lender->object);
             continue;
         }

@@ -3,6 +3,7 @@
 #include "Document/OvrinObjects.h"
 
 #include <cstddef>
+#include <cstdint>
 #include <memory>
 #include <mutex>
 #include <string>
@@ -18,12 +19,18 @@ class WrittenFormReader;
 struct ReaderOptions {
     bool fast = true;  ///< read documents in written form without libyaml
     bool share = true; ///< share the objects of documents that are the same in two files, to the letter
+    /// Looks at each object right after the fast reader has read it, while it is at hand; what it returns is
+    /// kept as YAMLMapping::m_Traits. Called from any thread. Never called for an object with repeated keys.
+    std::uint8_t (*inspect)(const YAMLMapping& object) = nullptr;
+    /// Objects with one of these traits are never shared.
+    std::uint8_t unshared = 0;
 };
 
 /// An object file on its way from text to objects.
 ///
 ///  1. `Take` tests the signature, and `Cut` cuts the text at the document headers. A file that is cut along
 ///     another finds that one's documents in it: what stands there in the same words needs no reading.
+///     Several files may be cut along one at the same time.
 ///  2. `ReadPiece` reads some documents that are in written form. Pieces are independent of each other: any
 ///  thread
 ///     may read any piece, each once.
@@ -50,8 +57,9 @@ public:
     void Take(std::string bytes);
     /// The same for a text that needs no signature.
     void TakeText(std::string text);
-    /// Cuts the text, along `base` if it is not null; that must be cut already and stay where it is.
-    void Cut(const ObjectFile* base);
+    /// Cuts the text, along `base` if it is not null; that must be cut already, not be read yet if it is to
+    /// lend objects, and stay where it is.
+    void Cut(ObjectFile* base);
     std::size_t PieceCount() const { return m_Pieces.size(); }
     void ReadPiece(std::size_t piece);
     /// All pieces must have been read, those of the base too. Throws YAMLError. Returns false only if a
@@ -65,21 +73,24 @@ private:
         std::size_t lender;            // the base's document in the same words, or kNone
         YAMLMapping* object = nullptr; // null: not read, or left to libyaml
         YAMLScalar* fileID = nullptr;  // of the object
-        bool isLendable = false; // the object may be copied before a change, so another file may have it
+        std::uint8_t isWanted = false; // another file would take the object; set by several threads
+        bool isLendable = false; // the object may be copied before a change, so another file may take it
+        bool isMarked = false;   // the object is marked as shared
     };
     struct Piece {
         std::size_t first, end; // documents
     };
     static constexpr std::size_t kNone = SIZE_MAX;
 
+    static std::string_view FileIDOf(const Document& document);
     bool HasWrittenHeader() const;
     const char* End() const { return m_Text->data() + m_Text->size(); }
     const char* FindDocumentEnd(const char* begin) const;
     bool StandsAt(const Document& document, const char* position, const char* end) const;
-    std::size_t FindLender(const ObjectFile& base, const char* begin, const char* end,
-                           std::size_t& expected) const;
+    std::size_t FindLender(const char* begin, const char* end, std::size_t& expected) const;
     std::size_t IndexOf(std::string_view fileID) const;
-    void CutAlong(const ObjectFile& base);
+    void CutAlong();
+    void AddDocument(const char* begin, std::size_t length, std::size_t lender);
     void CutAlone();
     void MakePieces();
     void ReadDocument(WrittenFormReader& reader, Document& document) const;
@@ -89,7 +100,7 @@ private:
 
     OvrinObjects& m_Objects;
     const ReaderOptions m_Options;
-    const ObjectFile* m_Base = nullptr;
+    ObjectFile* m_Base = nullptr;
     std::shared_ptr<const std::string> m_Text;
     std::string_view m_Header;
     std::vector<Document> m_Documents; // empty: libyaml reads all of the text

@@ -98,6 +98,7 @@ YAMLNode* YAMLMapping::GetForChange(const YAMLScalar* key) {
         Change(key, object);
     }
     object->m_Source = nullptr;
+    object->m_Traits = 0;
     return object;
 }
 
@@ -114,6 +115,12 @@ YAMLMapping::Iterator YAMLMapping::begin() const {
 YAMLMapping::Iterator YAMLMapping::end() const {
     RequireNormalState();
     return {m_Entries.data() + m_Entries.size(), m_Entries.data() + m_Entries.size()};
+}
+
+YAMLMapping::Iterator YAMLMapping::FindKey(const YAMLScalar* key) const {
+    const std::uint32_t position = Find(key);
+    if (position == KeyIndex::kMissing) return end();
+    return {m_Entries.data() + position, m_Entries.data() + m_Entries.size()};
 }
 
 YAMLNode* YAMLMapping::Steal(const YAMLScalar* key) {

@@ -62,6 +62,9 @@ public:
 
     /// The mapping was written in flow style, {...}.
     bool m_Flow;
+    /// What an inspector found in this object when it was read (ReaderOptions::inspect); 0: nobody looked, or
+    /// the object was changed since.
+    std::uint8_t m_Traits = 0;
     /// The mapping is an object that several trees hold: it is never freed, and copied before it is changed.
     bool m_IsShared = false;
     /// The bytes that the writer would give for this object, or null where they aren't known. Valid until the
@@ -94,6 +97,8 @@ public:
     std::size_t Size() const;
     Iterator begin() const;
     Iterator end() const;
+    /// The pair of `key`, or end().
+    Iterator FindKey(const YAMLScalar* key) const;
     /// The first pair's value. The mapping must not be empty.
     YAMLNode* First() const { return begin()->value; }
     /// Takes the pair out and returns its value, or null if there is none. The other keys keep their order.

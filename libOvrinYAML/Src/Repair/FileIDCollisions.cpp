@@ -1,5 +1,6 @@
 #include "Repair/FileIDCollisions.h"
 
+#include "Document/AlignedLookup.h"
 #include "Repair/ObjectAccess.h"
 
 #include <algorithm>
@@ -55,8 +56,9 @@ void RewriteReferences(const std::vector<NewID>& newIDs, YAMLMapping& root) {
 std::vector<const YAMLScalar*>
 CreateConflictingFileIDsRemapper(const YAMLMapping& base, const YAMLMapping& left, const YAMLMapping& right) {
     std::vector<const YAMLScalar*> conflicts;
+    AlignedLookup inBase(base);
     for (const auto& [id, object] : left)
-        if (!base.HasKey(id) && right.HasKey(id)) conflicts.push_back(id);
+        if (!inBase.Get(id) && right.HasKey(id)) conflicts.push_back(id);
     std::sort(conflicts.begin(), conflicts.end(), FileIDCompare());
     return conflicts;
 }

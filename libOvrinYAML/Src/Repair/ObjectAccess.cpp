@@ -1,9 +1,23 @@
 #include "Repair/ObjectAccess.h"
 
+#include "Document/AlignedLookup.h"
+
 namespace ovrin_yaml {
 
-bool RepairRoots::IsRemoved(const YAMLScalar* id) const {
-    return !HasObject(merged, id) && (HasObject(left, id) || HasObject(right, id));
+RepairRoots::RepairRoots(YAMLMapping& mergedRoot, const YAMLMapping& leftRoot, const YAMLMapping& rightRoot)
+    : merged(mergedRoot), left(leftRoot), right(rightRoot) {
+    for (const YAMLMapping* side : {&left, &right}) {
+        AlignedLookup survivors(merged);
+        for (const auto& [id, object] : *side)
+            if (!survivors.Get(id)) removed.insert(id);
+    }
+}
+
+void RepairRoots::RemoveObjects(const std::vector<const YAMLScalar*>& ids) {
+    for (const YAMLScalar* id : ids) {
+        merged.Steal(id);
+        if (left.HasKey(id) || right.HasKey(id)) removed.insert(id);
+    }
 }
 
 const YAMLScalar* GetMappingPath(const YAMLMapping* mapping, std::initializer_list<const YAMLScalar*> keys) {
@@ -41,10 +55,6 @@ void SetReference(YAMLMapping& root, const YAMLScalar* id, const YAMLScalar* cla
                   const YAMLScalar* field, const YAMLScalar* target) {
     YAMLMapping& fields = ToMapping(Editable(root, id).GetRef(classKey));
     ToMapping(fields.GetRef(field)).Change(YAMLScalar::fileID, target->Clone());
-}
-
-void RemoveObjects(YAMLMapping& root, const std::vector<const YAMLScalar*>& ids) {
-    for (const YAMLScalar* id : ids) root.Steal(id);
 }
 
 } // namespace ovrin_yaml

@@ -4,20 +4,46 @@
 #include "Document/YAMLScalar.h"
 #include "Document/YAMLSequence.h"
 
+#include <cstddef>
 #include <initializer_list>
+#include <unordered_set>
 #include <vector>
 
 namespace ovrin_yaml {
 
 /// The three roots that a repair looks at. Only the merged one changes.
 struct RepairRoots {
+    RepairRoots(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right);
+
     YAMLMapping& merged;
     const YAMLMapping& left;
     const YAMLMapping& right;
+    /// The objects that a side has and the merge has not: somebody removed them.
+    std::unordered_set<const YAMLScalar*> removed;
 
-    /// Whether one side has an object `id` and the merge has not: somebody removed it.
-    bool IsRemoved(const YAMLScalar* id) const;
+    bool IsRemoved(const YAMLScalar* id) const { return removed.contains(id); }
+    /// Takes objects out of the merged root, each if it is there. Their trees are not given back.
+    void RemoveObjects(const std::vector<const YAMLScalar*>& ids);
 };
+
+/// Calls visit(id, value) for the objects of a root, but for those of which a look at what was found when
+/// they were read tells that they are of no interest: isOfInterest(traits) is only asked for objects that
+/// were looked at.
+template <class IsOfInterest, class Visit>
+void ForEachObject(const YAMLMapping& root, const IsOfInterest& isOfInterest, const Visit& visit) {
+    // The objects lie far from each other in memory: ask for those that come next.
+    constexpr std::size_t kAhead = 8;
+    root.RequireNormalState();
+    const auto entries = root.RawEntries();
+    for (std::size_t i = 0; i < entries.size(); ++i) {
+        if (i + kAhead < entries.size()) __builtin_prefetch(entries[i + kAhead].value);
+        const auto& [id, value] = entries[i];
+        if (!id) continue;
+        const YAMLMapping* object = AsMapping(value);
+        if (object && object->m_Traits && !isOfInterest(object->m_Traits)) continue;
+        visit(id, value);
+    }
+}
 
 /// The scalar at the end of a path of keys. Null if a key is missing, if the mapping or a value on the way is
 /// null or no mapping, or if the last value is no scalar.
@@ -47,9 +73,6 @@ YAMLMapping& Editable(YAMLMapping& root, const YAMLScalar* id);
 /// `target`.
 void SetReference(YAMLMapping& root, const YAMLScalar* id, const YAMLScalar* classKey,
                   const YAMLScalar* field, const YAMLScalar* target);
-
-/// Takes objects out of a root, each if it is there. Their trees are not given back.
-void RemoveObjects(YAMLMapping& root, const std::vector<const YAMLScalar*>& ids);
 
 /// Adds `node` and what stands below it to `found`, as far as it is a mapping and
 /// wanted(const YAMLScalar* key, const YAMLMapping&) tells so; `key` is what the mapping stands under, null

@@ -2,6 +2,7 @@
 
 #include "Repair/ComponentDependencies.h"
 #include "Repair/ObjectAccess.h"
+#include "Repair/ObjectTraits.h"
 #include "Repair/PreProcess.h"
 #include "Repair/TransformCycles.h"
 
@@ -9,19 +10,23 @@ namespace ovrin_yaml {
 
 namespace {
 
-void RepairPrefabLinks(const RepairRoots& roots) {
+bool MayHavePrefabLink(std::uint8_t traits) {
+    return traits & kHasPrefabLink;
+}
+
+void RepairPrefabLinks(RepairRoots& roots) {
     std::vector<const YAMLScalar*> orphans;
-    for (const auto& [id, object] : roots.merged) {
+    ForEachObject(roots.merged, MayHavePrefabLink, [&](const YAMLScalar* id, const YAMLNode* object) {
         const auto [classKey, fields] = GetTransform(object);
         const YAMLScalar* prefab = GetMappingPath(fields, {YAMLScalar::mPrefabInternal, YAMLScalar::fileID});
-        if (IsNoReference(prefab) || !roots.IsRemoved(prefab)) continue;
+        if (IsNoReference(prefab) || !roots.IsRemoved(prefab)) return;
         const YAMLScalar* gameObject = GetMappingPath(fields, {YAMLScalar::mGameObject, YAMLScalar::fileID});
         if (!IsNoReference(gameObject) && HasObject(roots.merged, gameObject))
             SetReference(roots.merged, id, classKey, YAMLScalar::mPrefabInternal, YAMLScalar::zero);
         else
             orphans.push_back(id);
-    }
-    RemoveObjects(roots.merged, orphans);
+    });
+    roots.RemoveObjects(orphans);
 }
 
 /// Whether a mapping is a prefab link to an object that the file hasn't.
@@ -29,9 +34,7 @@ struct IsDangling {
     const YAMLMapping& root;
 
     bool operator()(const YAMLScalar* key, const YAMLMapping& mapping) const {
-        if (key != YAMLScalar::mPrefabInternal) return false;
-        const YAMLScalar* target = AsScalar(mapping.Get(YAMLScalar::fileID));
-        return target && target != YAMLScalar::zero && !root.HasKey(target);
+        return IsPrefabLink(key, mapping) && !root.HasKey(AsScalar(mapping.Get(YAMLScalar::fileID)));
     }
 };
 
@@ -43,32 +46,32 @@ bool IsPlaceHolderOfNothing(const YAMLMapping& object, const IsDangling& isDangl
     return false;
 }
 
-/// Goes through the whole file, and so is also what notices repeated keys that came through the merge
-/// unseen.
-void RepairDanglingLinks(YAMLMapping& merged) {
-    const IsDangling isDangling{merged};
+/// Goes through all that the merge touched or that has a prefab link, and so is also what notices repeated
+/// keys that came through the merge unseen.
+void RepairDanglingLinks(RepairRoots& roots) {
+    const IsDangling isDangling{roots.merged};
     std::vector<const YAMLScalar*> placeHolders;
-    for (const auto& [id, value] : merged) {
+    ForEachObject(roots.merged, MayHavePrefabLink, [&](const YAMLScalar* id, YAMLNode* value) {
         const YAMLMapping* object = AsMapping(value);
-        if (!object || FindMappings(id, value, isDangling).empty()) continue;
+        if (!object || FindMappings(id, value, isDangling).empty()) return;
         if (IsPlaceHolderOfNothing(*object, isDangling)) {
             placeHolders.push_back(id);
-            continue;
+            return;
         }
-        for (YAMLMapping* link : FindMappings(id, &Editable(merged, id), isDangling))
+        for (YAMLMapping* link : FindMappings(id, &Editable(roots.merged, id), isDangling))
             link->Change(YAMLScalar::fileID, YAMLScalar::zero);
-    }
-    RemoveObjects(merged, placeHolders);
+    });
+    roots.RemoveObjects(placeHolders);
 }
 
 } // namespace
 
 void PostProcessMergeOnly(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
                           ConflictResolver& resolver) {
-    const RepairRoots roots{merged, left, right};
+    RepairRoots roots(merged, left, right);
     RepairPrefabLinks(roots);
     CheckTransformHierarchy(roots, resolver);
-    RepairDanglingLinks(merged);
+    RepairDanglingLinks(roots);
     RestoreRepeatedKeys(merged);
 }
 

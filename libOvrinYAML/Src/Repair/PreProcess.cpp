@@ -1,6 +1,7 @@
 #include "Repair/PreProcess.h"
 
 #include "Repair/ObjectAccess.h"
+#include "Repair/ObjectTraits.h"
 
 namespace ovrin_yaml {
 
@@ -16,16 +17,16 @@ template <class Replace, class Replaced>
 void ReplaceTransitions(YAMLMapping& root, const Replace& replace, const Replaced& replaced) {
     const YAMLScalar* const machine = YAMLScalar::Lookup("AnimatorStateMachine");
     const YAMLScalar* const key = YAMLScalar::Lookup("m_StateMachineTransitions");
-    for (const auto& [id, value] : root) {
+    const auto isOfInterest = [](std::uint8_t traits) { return traits & kHasTransitions; };
+    ForEachObject(root, isOfInterest, [&](const YAMLScalar* id, const YAMLNode* value) {
         const YAMLMapping* object = AsMapping(value);
-        const YAMLMapping* fields = object ? AsMapping(object->Get(machine)) : nullptr;
-        const YAMLNode* transitions = fields ? fields->Get(key) : nullptr;
-        if (!transitions) continue;
+        const YAMLNode* transitions = object ? TransitionsOf(*object) : nullptr;
+        if (!transitions) return;
         YAMLNode* replacement = replace(*key, transitions);
         YAMLMapping& editable = Editable(root, id);
         ToMapping(editable.GetRef(machine)).Change(key, replacement);
         replaced(editable);
-    }
+    });
 }
 
 YAMLNode* ToList(const YAMLScalar& key, const YAMLNode* transitions) {

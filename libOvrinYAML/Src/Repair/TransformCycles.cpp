@@ -1,5 +1,7 @@
 #include "Repair/TransformCycles.h"
 
+#include "Repair/ObjectTraits.h"
+
 #include <stdexcept>
 #include <unordered_map>
 
@@ -9,19 +11,6 @@ namespace {
 
 /// Walks of this length are taken for walks without end.
 constexpr int kMaxAncestors = 100;
-
-/// Of each Transform with a known parent, that parent. Asked for single keys only.
-using TransformParents = std::unordered_map<const YAMLScalar*, const YAMLScalar*>;
-
-/// The parent that a Transform names itself. A removed one is cut off in the tree, but it is still the
-/// result: a walk must notice that it led there.
-const YAMLScalar* OwnParent(const RepairRoots& roots, const YAMLScalar* id,
-                            const TransformFields& transform) {
-    const YAMLScalar* parent = GetMappingPath(transform.fields, {YAMLScalar::mFather, YAMLScalar::fileID});
-    if (roots.IsRemoved(parent))
-        SetReference(roots.merged, id, transform.classKey, YAMLScalar::mFather, YAMLScalar::zero);
-    return parent;
-}
 
 /// The parent of a stripped Transform, which its prefab instance stores.
 const YAMLScalar* PrefabParent(const YAMLMapping& merged, const YAMLScalar* id, const YAMLMapping& fields) {
@@ -41,25 +30,51 @@ const YAMLScalar* PrefabParent(const YAMLMapping& merged, const YAMLScalar* id, 
     return nullptr;
 }
 
-TransformParents RepairParents(const RepairRoots& roots) {
-    TransformParents parents;
-    for (const auto& [id, object] : roots.merged) {
-        const TransformFields transform = GetTransform(object);
-        if (!transform.fields) continue;
-        const YAMLScalar* parent = transform.fields->HasKey(YAMLScalar::mFather)
-                                       ? OwnParent(roots, id, transform)
-                                       : PrefabParent(roots.merged, id, *transform.fields);
-        if (parent) parents.emplace(id, parent);
+/// The parents of all Transforms.
+class TransformParents {
+public:
+    /// Repairs the parents that were removed. A removed one is cut off in the tree, but it is still the
+    /// parent here: a walk must notice that it led there. Throws YAMLError for a stripped Transform without a
+    /// link.
+    explicit TransformParents(const RepairRoots& roots) : m_Merged(roots.merged) {
+        const bool anyRemoved = !roots.removed.empty();
+        const auto isOfInterest = [anyRemoved](std::uint8_t traits) {
+            return (traits & kLacksFather) || (anyRemoved && (traits & kIsTransform));
+        };
+        ForEachObject(roots.merged, isOfInterest, [&](const YAMLScalar* id, const YAMLNode* object) {
+            const TransformFields transform = GetTransform(object);
+            if (!transform.fields) return;
+            const YAMLScalar* parent = ParentOf(id, *transform.fields);
+            if (!transform.fields->HasKey(YAMLScalar::mFather) || !roots.IsRemoved(parent)) return;
+            SetReference(roots.merged, id, transform.classKey, YAMLScalar::mFather, YAMLScalar::zero);
+            m_RemovedParents.emplace(id, parent);
+        });
     }
-    return parents;
-}
+
+    /// Null if the Transform or its parent isn't known.
+    const YAMLScalar* Find(const YAMLScalar* id) const {
+        const auto removed = m_RemovedParents.find(id);
+        if (removed != m_RemovedParents.end()) return removed->second;
+        const TransformFields transform = GetTransform(m_Merged.Get(id));
+        return transform.fields ? ParentOf(id, *transform.fields) : nullptr;
+    }
+
+private:
+    const YAMLScalar* ParentOf(const YAMLScalar* id, const YAMLMapping& fields) const {
+        if (fields.HasKey(YAMLScalar::mFather))
+            return GetMappingPath(&fields, {YAMLScalar::mFather, YAMLScalar::fileID});
+        return PrefabParent(m_Merged, id, fields);
+    }
+
+    const YAMLMapping& m_Merged;
+    std::unordered_map<const YAMLScalar*, const YAMLScalar*> m_RemovedParents; // by Transform
+};
 
 bool IsInCycle(const YAMLScalar* start, const TransformParents& parents) {
     const YAMLScalar* current = start;
     for (int steps = 0; steps < kMaxAncestors; ++steps) {
-        const auto found = parents.find(current);
-        if (found == parents.end()) throw std::runtime_error("Cannot find transform parent for fileID");
-        const YAMLScalar* parent = found->second;
+        const YAMLScalar* parent = parents.Find(current);
+        if (!parent) throw std::runtime_error("Cannot find transform parent for fileID");
         if (IsNoReference(parent)) return false;
         if (parent == start) return true;
         current = parent;
@@ -70,13 +85,16 @@ bool IsInCycle(const YAMLScalar* start, const TransformParents& parents) {
 } // namespace
 
 void CheckTransformHierarchy(const RepairRoots& roots, ConflictResolver& resolver) {
-    const TransformParents parents = RepairParents(roots);
+    const TransformParents parents(roots);
+    std::vector<const YAMLScalar*> inCycle;
     for (const YAMLScalar* start : resolver.ChangedTransforms()) {
         if (!roots.merged.HasKey(start))
             throw std::runtime_error("Cannot find transform mapping from fileID while looking for cycles.");
-        if (IsInCycle(start, parents))
-            resolver.OnTransformCycleDetected(start, Editable(roots.merged, start));
+        if (IsInCycle(start, parents)) inCycle.push_back(start);
     }
+    // The resolver may break cycles: all have been found before it is asked about the first.
+    for (const YAMLScalar* start : inCycle)
+        resolver.OnTransformCycleDetected(start, Editable(roots.merged, start));
 }
 
 } // namespace ovrin_yaml
