@@ -11,13 +11,20 @@ BatchedBuilder::Step& BatchedBuilder::Note(Step::What what) {
     return step;
 }
 
-void BatchedBuilder::AddText(std::string_view text) {
+void BatchedBuilder::AddText(std::string_view text, std::size_t readable) {
+    const bool isShort = text.size() <= ShortTextCache::kLongest;
+    if (isShort) {
+        if (YAMLScalar* known = m_ShortTexts.Find(ShortTextCache::Pack(text, readable)))
+            return AddScalar(known);
+    }
     const std::uint32_t hash = ScalarTable::HashOf(text);
     ScalarTable::Instance().PrefetchSlot(hash);
     Step& step = Note(Step::What::Text);
+    step.isShort = isShort;
     step.hash = hash;
     step.number = static_cast<std::uint32_t>(text.size());
     step.text = text.data();
+    m_ReadableEnd = text.data() + readable;
 }
 
 void BatchedBuilder::AddScalar(YAMLScalar* scalar) {
@@ -43,10 +50,20 @@ void BatchedBuilder::Flush() {
     m_Count = 0;
 }
 
+YAMLScalar* BatchedBuilder::InternText(const Step& step) {
+    const std::string_view text(step.text, step.number);
+    YAMLScalar* scalar = ScalarTable::Instance().Intern(text, step.hash, 0);
+    if (step.isShort) {
+        const auto readable = static_cast<std::size_t>(m_ReadableEnd - step.text);
+        m_ShortTexts.Remember(ShortTextCache::Pack(text, readable), scalar);
+    }
+    return scalar;
+}
+
 void BatchedBuilder::CarryOut(const Step& step) {
     switch (step.what) {
     case Step::What::Text:
-        m_Builder.AddNode(ScalarTable::Instance().Intern({step.text, step.number}, step.hash, 0));
+        m_Builder.AddNode(InternText(step));
         break;
     case Step::What::Scalar:
         m_Builder.AddNode(step.scalar);

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Document/ShortTextCache.h"
 #include "Document/TreeBuilder.h"
 
 #include <array>
@@ -14,13 +15,17 @@ namespace ovrin_yaml {
 /// Steps are noted first. When enough of them wait, the memory of all their scalars is asked for at once, and
 /// then the steps are carried out:
 ///
+/// Short texts that were met lately are found in a cache of the builder's own. For the others steps are
+/// noted:
+///
 ///     noted      open | "m_X" | open flow | "fileID" | "12" | close | ...
 ///     loading    slots of all hashes, then the scalars in them
 ///     built      each text is interned from what is in the cache by now
 class BatchedBuilder {
 public:
-    /// `text` must stay where it is until the builder is flushed or cleared.
-    void AddText(std::string_view text);
+    /// `text` must stay where it is until the tree is taken or the builder cleared, and so must what is
+    /// readable behind it: `readable` bytes from its start on.
+    void AddText(std::string_view text, std::size_t readable);
     void AddScalar(YAMLScalar* scalar);
     void Open(YAMLNode::Kind kind, bool flow, std::uint32_t line);
     void Close();
@@ -35,6 +40,7 @@ private:
         enum class What : std::uint8_t { Text, Scalar, OpenMapping, OpenSequence, Close };
         What what;
         bool flow;
+        bool isShort;         // Text: to be remembered
         std::uint32_t hash;   // Text
         std::uint32_t number; // length of a Text, line of a container
         union {
@@ -46,7 +52,10 @@ private:
     Step& Note(Step::What what);
     void Flush();
     void CarryOut(const Step& step);
+    YAMLScalar* InternText(const Step& step);
 
+    ShortTextCache m_ShortTexts;
+    const char* m_ReadableEnd = nullptr; // of the texts that wait
     std::array<Step, 256> m_Steps;
     std::size_t m_Count = 0;
     TreeBuilder m_Builder;

@@ -21,8 +21,9 @@ constexpr std::string_view kDocumentStart = "--- !o!";
 constexpr std::string_view kNextHeader = "\n--- !o!";
 /// Lines in a header of the usual form; the parser counts them in every document.
 constexpr std::uint32_t kHeaderLines = 2;
-/// Text that is read at one go: enough to forget the handing out of pieces, little enough to share them out.
-constexpr std::size_t kPieceBytes = std::size_t{256} << 10;
+/// Text that is read at one go: enough for a reader to get to know the common texts, little enough to share
+/// out.
+constexpr std::size_t kPieceBytes = std::size_t{1} << 20;
 
 /// The file id in a document's header line, where that has the usual form.
 std::string_view FileIDOf(const char* begin, const char* end) {

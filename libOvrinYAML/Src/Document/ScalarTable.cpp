@@ -33,11 +33,8 @@ YAMLScalar* Unpack(std::uint64_t slot) {
 
 } // namespace
 
-ScalarTable& ScalarTable::Instance() {
-    // Never destroyed: scalars are used until the process ends, by static objects too.
-    static ScalarTable& table = *new ScalarTable;
-    return table;
-}
+// There before any code runs, and never destroyed: scalars are used until the process ends.
+constinit ScalarTable ScalarTable::s_Instance;
 
 std::uint32_t ScalarTable::HashOf(std::string_view text) {
     return MurmurHash3(text, kScalarSeed);

@@ -21,7 +21,8 @@ namespace ovrin_yaml {
 /// still look at it, and they fall through to the lock if it lacks the scalar.
 class ScalarTable {
 public:
-    static ScalarTable& Instance();
+    constexpr ScalarTable() = default;
+    static ScalarTable& Instance() { return s_Instance; }
 
     /// The one scalar of `text`; a new one gets `line`.
     YAMLScalar* Intern(std::string_view text, std::uint32_t line) { return Intern(text, HashOf(text), line); }
@@ -66,6 +67,8 @@ private:
     static YAMLScalar* Make(std::string_view text, std::uint32_t hash, std::uint32_t line);
     /// Gives the shard an empty table in `memory`, which stays until the process ends, and fills it.
     static void Grow(Shard& shard, std::size_t capacity, void* memory);
+
+    static ScalarTable s_Instance;
 
     std::array<Shard, std::size_t{1} << kShardBits> m_Shards;
 };

@@ -29,12 +29,9 @@ YAMLNode* TreeBuilder::MakeMapping(const OpenContainer& open) {
     mapping->Reserve((m_Nodes.size() - open.firstNode) / 2 + headerEntries);
     std::uint32_t hash = 0;
     std::uint32_t index = 0;
-    for (std::size_t i = open.firstNode; i + 1 < m_Nodes.size(); i += 2, ++index) {
-        const YAMLScalar* key = AsScalar(m_Nodes[i]);
-        if (!key) continue;
-        hash = FoldPair(hash, key->m_Hash, m_Nodes[i + 1]->m_Hash, index);
-        mapping->Append(key, m_Nodes[i + 1]);
-    }
+    for (std::size_t i = open.firstNode; i + 1 < m_Nodes.size(); i += 2, ++index)
+        if (AsScalar(m_Nodes[i])) hash = FoldPair(hash, m_Nodes[i]->m_Hash, m_Nodes[i + 1]->m_Hash, index);
+    mapping->AppendPairs(m_Nodes.data() + open.firstNode, m_Nodes.size() - open.firstNode);
     m_IsRegular = m_IsRegular && !mapping->HasDuplicates() && mapping->Size() == index;
     mapping->m_Hash = hash;
     return mapping;

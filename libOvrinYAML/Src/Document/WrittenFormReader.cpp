@@ -161,7 +161,7 @@ void WrittenFormReader::ReadBlockMapping(int indent) {
         const char* end = ScanPlain(m_Position);
         if (*end != ':' || end - m_Position > kLongestKey) throw NotSure();
         NoteKey(m_Position, end);
-        m_Builder.AddText({m_Position, end});
+        AddText(m_Position, end);
         m_Position = end + 1;
         ReadBlockValue(indent);
     } while (m_Indent == indent);
@@ -256,7 +256,7 @@ void WrittenFormReader::ReadPlainLines(int indent) {
     std::ptrdiff_t width = Column(end);
     m_Position = end;
     NextLine();
-    if (m_Indent <= indent) return m_Builder.AddText({begin, end});
+    if (m_Indent <= indent) return AddText(begin, end);
     m_Text.assign(begin, end);
     while (m_Indent > indent) {
         NoteIf(width <= kLineWidth || m_Indent != indent + 2);
@@ -378,7 +378,7 @@ void WrittenFormReader::ReadFlowPlain() {
     // A blank, a line end or a sign that has a meaning of its own is met by the caller, who wants none of
     // them.
     NoteText(m_Position, p);
-    m_Builder.AddText({m_Position, p});
+    AddText(m_Position, p);
     m_Position = p;
 }
 
@@ -394,7 +394,7 @@ void WrittenFormReader::ReadQuoted(bool inFlow) {
     NoteText(m_Position, p);
     const ScalarForms forms = ClassifyScalar(text);
     NoteIf(quote != '\'' || !forms.singleQuoted || (inFlow ? forms.plainInFlow : forms.plainInBlock));
-    m_Builder.AddText(text);
+    AddText(m_Position, p);
     m_Position = p + 1;
 }
 

@@ -46,6 +46,9 @@ private:
 
     void ReadHeaderLine(Document& document);
     std::string_view ReadId();
+    void AddText(const char* begin, const char* end) {
+        m_Builder.AddText({begin, end}, static_cast<std::size_t>(m_End - begin));
+    }
     void NextLine();
     bool AtListItem() const;
     std::ptrdiff_t Column(const char* position) const { return position - m_LineStart; }

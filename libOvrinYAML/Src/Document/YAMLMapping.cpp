@@ -65,6 +65,11 @@ void YAMLMapping::Append(const YAMLScalar* key, YAMLNode* value) {
     m_HasDuplicates = true;
 }
 
+void YAMLMapping::AppendPairs(YAMLNode* const* keysAndValues, std::size_t count) {
+    for (std::size_t i = 0; i + 1 < count; i += 2)
+        if (const YAMLScalar* key = AsScalar(keysAndValues[i])) Append(key, keysAndValues[i + 1]);
+}
+
 void YAMLMapping::Insert(const YAMLScalar* key, YAMLNode* value) {
     RequireNormalState();
     if (Find(key) != KeyIndex::kMissing) throw YAMLError("Cannot add existing key in YAMLMapping");

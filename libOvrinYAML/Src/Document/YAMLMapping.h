@@ -26,6 +26,8 @@ class YAMLSequence;
 /// No operation that throws has changed the mapping. None but RebuildHash touches m_Hash.
 class YAMLMapping final : public YAMLNode {
 public:
+    static constexpr Kind kKind = Kind::Mapping;
+
     struct Entry {
         const YAMLScalar* key; // null: a pair that was removed, passed over by iteration
         YAMLNode* value;
@@ -67,6 +69,13 @@ public:
     std::uint8_t m_Traits = 0;
     /// The mapping is an object that several trees hold: it is never freed, and copied before it is changed.
     bool m_IsShared = false;
+
+private:
+    // Stands here to fill a gap: there are millions of mappings.
+    std::uint32_t m_HasDuplicates : 1 = 0;
+    std::uint32_t m_Removed : 31 = 0; // pairs in m_Entries whose key is null; only where there is an index
+
+public:
     /// The bytes that the writer would give for this object, or null where they aren't known. Valid until the
     /// object is changed; they belong to whoever read the file.
     const std::string_view* m_Source = nullptr;
@@ -81,6 +90,9 @@ public:
     /// Adds a pair at the end. A key that is there already keeps its value if the new one is equal (which is
     /// dropped), and brings on the duplicate state if not. Never throws a YAMLError.
     void Append(const YAMLScalar* key, YAMLNode* value);
+    /// Appends keys and values that stand by turns, `count` of both; pairs whose key is no scalar are left
+    /// out.
+    void AppendPairs(YAMLNode* const* keysAndValues, std::size_t count);
     /// Adds a new pair at the end. Throws "Cannot add existing key in YAMLMapping".
     void Insert(const YAMLScalar* key, YAMLNode* value);
     /// Replaces a value in place and returns the old one. Throws "Cannot change non existing key in
@@ -137,10 +149,15 @@ private:
     void BuildIndex();
     void DropIndex();
 
-    bool m_HasDuplicates = false;
-    std::uint32_t m_Removed = 0; // pairs in m_Entries whose key is null; only where there is an index
     std::vector<Entry, ArenaAllocator<Entry>> m_Entries;
     KeyIndex* m_Index = nullptr; // positions in m_Entries, once there are more than KeyIndex::kSearchLimit
 };
+
+inline YAMLMapping* AsMapping(YAMLNode* node) {
+    return NodeAs<YAMLMapping>(node);
+}
+inline const YAMLMapping* AsMapping(const YAMLNode* node) {
+    return NodeAs<const YAMLMapping>(node);
+}
 
 } // namespace ovrin_yaml

@@ -66,13 +66,11 @@ private:
     const Kind m_Kind;
 };
 
-/// The node as the asked kind, or null if it is null or of another kind.
-YAMLScalar* AsScalar(YAMLNode* node);
-YAMLMapping* AsMapping(YAMLNode* node);
-YAMLSequence* AsSequence(YAMLNode* node);
-const YAMLScalar* AsScalar(const YAMLNode* node);
-const YAMLMapping* AsMapping(const YAMLNode* node);
-const YAMLSequence* AsSequence(const YAMLNode* node);
+/// The node as a T (YAMLScalar, YAMLMapping or YAMLSequence, as const as the node), or null if it is null or
+/// of another kind. AsScalar, AsMapping and AsSequence stand in the headers of these classes.
+template <class T, class Node> T* NodeAs(Node* node) {
+    return node && node->GetKind() == T::kKind ? static_cast<T*>(node) : nullptr;
+}
 
 /// The node as a mapping or a sequence. Throws std::bad_cast if it is null or of another kind.
 YAMLMapping& ToMapping(YAMLNode* node);

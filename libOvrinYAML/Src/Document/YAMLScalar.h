@@ -12,6 +12,8 @@ namespace ovrin_yaml {
 /// 1 and 1.0 are two. m_Hash is the MurmurHash3 of the text.
 class YAMLScalar final : public YAMLNode {
 public:
+    static constexpr Kind kKind = Kind::Scalar;
+
     /// The one scalar of `text`, made if new; never null. May be called from any thread at any time; a text
     /// that is known already is found without a lock. `line` is kept if the scalar is made by this call.
     static YAMLScalar* Lookup(std::string_view text, std::uint32_t line = 0);
@@ -79,6 +81,13 @@ private:
     const std::uint32_t m_Length;
     const char* const m_Value;
 };
+
+inline YAMLScalar* AsScalar(YAMLNode* node) {
+    return NodeAs<YAMLScalar>(node);
+}
+inline const YAMLScalar* AsScalar(const YAMLNode* node) {
+    return NodeAs<const YAMLScalar>(node);
+}
 
 /// Makes the library ready: interns the well-known scalars. Call it once, before anything else of the
 /// library.

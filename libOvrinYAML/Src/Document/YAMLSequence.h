@@ -17,6 +17,8 @@ using NodeList = std::vector<YAMLNode*, ArenaAllocator<YAMLNode*>>;
 /// hashing and writing need all items.
 class YAMLSequence final : public YAMLNode {
 public:
+    static constexpr Kind kKind = Kind::Sequence;
+
     explicit YAMLSequence(bool flow = false) : YAMLNode(Kind::Sequence), m_Flow(flow) {}
     YAMLSequence(const YAMLSequence&) = delete;
     YAMLSequence& operator=(const YAMLSequence&) = delete;
@@ -45,5 +47,12 @@ public:
     void RebuildHash(bool shallow) override;
     void ResetForAlloc();
 };
+
+inline YAMLSequence* AsSequence(YAMLNode* node) {
+    return NodeAs<YAMLSequence>(node);
+}
+inline const YAMLSequence* AsSequence(const YAMLNode* node) {
+    return NodeAs<const YAMLSequence>(node);
+}
 
 } // namespace ovrin_yaml

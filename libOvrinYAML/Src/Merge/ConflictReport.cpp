@@ -32,16 +32,24 @@ constexpr HandlingWord kHandlingWords[] = {
     {ResolveBreakCycle, "BreakCycle", "breakCycle"},
 };
 
-/// Pointers, not copies; std::sort takes the same decisions on them, so that records of one path, which it
-/// may bring into any order, come out in the same one.
-std::vector<const Record*> SortedByPath(const std::vector<Record>& records) {
+bool GoesBefore(const Record* a, const Record* b) {
+    return RecordingConflictResolverRecordComparer()(*a, *b);
+}
+
+/// The records that are to be written, pending ones or all, in the order that std::sort gives all of them by
+/// path.
+///
+/// Pointers are sorted, for which std::sort takes the same decisions as for records, so that those of one
+/// path, which it may bring into any order, come out in the same one. Where no path comes twice among the
+/// pending records, their order is settled without the others.
+std::vector<const Record*> RecordsByPath(const std::vector<Record>& records, bool all) {
     std::vector<const Record*> sorted;
-    sorted.reserve(records.size());
-    for (const Record& record : records) sorted.push_back(&record);
-    std::sort(sorted.begin(), sorted.end(), [](const Record* a, const Record* b) {
-        return RecordingConflictResolverRecordComparer()(*a, *b);
-    });
-    return sorted;
+    for (const Record& record : records)
+        if (all || record.resolve == ResolveConflict) sorted.push_back(&record);
+    std::sort(sorted.begin(), sorted.end(), GoesBefore);
+    const auto haveOnePath = [](const Record* a, const Record* b) { return !GoesBefore(a, b); };
+    if (all || std::adjacent_find(sorted.begin(), sorted.end(), haveOnePath) == sorted.end()) return sorted;
+    return RecordsByPath(records, true);
 }
 
 void OutputSide(YAMLDiffOutput& output, const char* side, const Record& record, const Operation* operation) {
@@ -125,7 +133,7 @@ Path StringToPath(const std::string& text) {
 void OutputConflictRecords(std::ostream& out, const RecordingConflictResolver& resolver, bool describe) {
     constexpr std::size_t kIndentWidth = 2;
     YAMLDiffOutput output(out, kIndentWidth);
-    const std::vector<const Record*> records = SortedByPath(resolver.Records());
+    const std::vector<const Record*> records = RecordsByPath(resolver.Records(), describe);
     output << kConflictHeader << endl;
     for (const Record* record : records)
         if (record->resolve == ResolveConflict) OutputConflict(output, *record);

@@ -4,6 +4,7 @@
 #include "Diff/MergeTreeVisitors.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
+#include "Document/Arena.h"
 #include "Document/YAMLError.h"
 #include "Document/YAMLMapping.h"
 
@@ -16,9 +17,12 @@ bool RecordingConflictResolver::HasPendingConflicts() const {
                        [](const Record& record) { return record.resolve == ResolveConflict; });
 }
 
-void RecordingConflictResolver::PushRecord(ConflictType type, MergeResolve resolve, const Operation* left,
-                                           const Operation* right) {
-    m_Records.push_back({m_Path, type, resolve, left, right});
+void RecordingConflictResolver::PushRecord(const Path& path, ConflictType type, MergeResolve resolve,
+                                           const Operation* left, const Operation* right) {
+    // There may be hundreds of thousands, which are seldom looked at again.
+    auto* copy = static_cast<const YAMLScalar**>(ArenaAllocate(path.size() * sizeof(const YAMLScalar*)));
+    std::copy(path.begin(), path.end(), copy);
+    m_Records.push_back({{copy, path.size()}, type, resolve, left, right});
 }
 
 // One side alone. The default plays no part: a change that nobody conflicts with passes.
@@ -26,7 +30,7 @@ void RecordingConflictResolver::PushRecord(ConflictType type, MergeResolve resol
 const Operation* RecordingConflictResolver::SingleSideResolve(const Operation* operation, ConflictType type) {
     const bool isLeft = IsLeftSide(type);
     const MergeResolve resolve = FindResolve(m_Path).value_or(ResolveMerged);
-    PushRecord(type, resolve, isLeft ? operation : nullptr, isLeft ? nullptr : operation);
+    PushRecord(m_Path, type, resolve, isLeft ? operation : nullptr, isLeft ? nullptr : operation);
     const bool dropped = resolve == ResolveBase || resolve == ResolveConflict ||
                          (resolve == ResolveLeft && !isLeft) || (resolve == ResolveRight && isLeft);
     return dropped ? nullptr : operation;
@@ -99,7 +103,7 @@ const Operation* RecordingConflictResolver::ResolvePair(ConflictType type, const
     const MergeResolve found = FindResolve(m_Path).value_or(ResolveMerged);
     const std::optional<Outcome> decided = Decided(found, left, right);
     const Outcome outcome = decided ? *decided : settle(found == ResolveConflict);
-    PushRecord(type, outcome.resolve, left, right);
+    PushRecord(m_Path, type, outcome.resolve, left, right);
     return outcome.operation;
 }
 
@@ -179,7 +183,7 @@ const Operation* RecordingConflictResolver::OnSameValueAdded(const AddOperation*
             return MergeAddedSequences(left, right);
         const bool equal = sameKind && (kind != YAMLNode::Kind::Scalar || leftValue->Equals(rightValue));
         const Outcome outcome = equal ? Outcome{left, ResolveMerged} : ConflictFallback(left, right, left);
-        PushRecord(ConflictBothAdds, outcome.resolve, left, right);
+        PushRecord(m_Path, ConflictBothAdds, outcome.resolve, left, right);
         return outcome.operation;
     }
     return ResolvePair(ConflictBothAdds, left, right, [&](bool asConflict) {
@@ -220,7 +224,7 @@ const Operation* RecordingConflictResolver::MergeAddedSequences(const AddOperati
 
 RecordingConflictResolver::Record* RecordingConflictResolver::FindObjectRecord(const YAMLScalar* fileID) {
     for (; m_IndexedRecords < m_Records.size(); ++m_IndexedRecords) {
-        const Path& path = m_Records[m_IndexedRecords].path;
+        const auto path = m_Records[m_IndexedRecords].path;
         if (path.size() == 1) m_ObjectRecords.try_emplace(path[0], m_IndexedRecords);
     }
     const auto found = m_ObjectRecords.find(fileID);
@@ -252,8 +256,8 @@ void RecordingConflictResolver::OnTransformCycleDetected(const YAMLScalar* fileI
         if (father && father->HasKey(YAMLScalar::fileID))
             father->Change(YAMLScalar::fileID, blank ? YAMLScalar::empty : YAMLScalar::zero)->Free();
     }
-    m_Records.push_back({path, ConflictTransformCycle, breaks && !blank ? ResolveBreakCycle : ResolveConflict,
-                         nullptr, nullptr});
+    PushRecord(path, ConflictTransformCycle, breaks && !blank ? ResolveBreakCycle : ResolveConflict, nullptr,
+               nullptr);
 }
 
 bool RecordingConflictResolverRecordComparer::operator()(const RecordingConflictResolver::Record& a,

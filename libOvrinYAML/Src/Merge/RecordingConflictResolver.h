@@ -4,6 +4,7 @@
 #include "Merge/YAMLConflict.h"
 
 #include <optional>
+#include <span>
 #include <unordered_map>
 #include <vector>
 
@@ -15,7 +16,8 @@ namespace ovrin_yaml {
 class RecordingConflictResolver final : public ConflictResolver {
 public:
     struct Record {
-        Path path;
+        /// Stays as long as the process.
+        std::span<const YAMLScalar* const> path;
         ConflictType type;
         /// How it was settled; ResolveConflict marks a pending conflict.
         MergeResolve resolve;
@@ -63,7 +65,8 @@ private:
     };
 
     std::optional<MergeResolve> FindResolve(const Path& path) const { return m_Resolves.Find(path); }
-    void PushRecord(ConflictType type, MergeResolve resolve, const Operation* left, const Operation* right);
+    void PushRecord(const Path& path, ConflictType type, MergeResolve resolve, const Operation* left,
+                    const Operation* right);
     /// The first record whose path is this id alone, or null.
     Record* FindObjectRecord(const YAMLScalar* fileID);
     const Operation* SingleSideResolve(const Operation* operation, ConflictType type);

@@ -4,7 +4,7 @@
 
 namespace ovrin_yaml {
 
-std::string PathToString(const Path& path) {
+std::string PathToString(std::span<const YAMLScalar* const> path) {
     std::string text;
     for (std::size_t i = 0; i < path.size(); ++i) {
         if (i > 0) text += '.';

@@ -5,6 +5,7 @@
 #include "Merge/ConflictType.h"
 #include "Merge/MergeResolve.h"
 
+#include <span>
 #include <string>
 #include <unordered_set>
 #include <vector>
@@ -12,7 +13,7 @@
 namespace ovrin_yaml {
 
 /// The elements' texts joined by ".".
-std::string PathToString(const Path& path);
+std::string PathToString(std::span<const YAMLScalar* const> path);
 
 /// A removal that broke what a component needs. The component's file id stands on the side that still has it.
 struct ComponentDependencyConflict {
