@@ -114,6 +114,11 @@ std::string GetDataFilesDir() {
     return {};
 }
 
+std::size_t FileSize(const std::string& path) {
+    struct stat status;
+    return stat(OvrinToNativePath(path).c_str(), &status) == 0 ? static_cast<std::size_t>(status.st_size) : 0;
+}
+
 ReadResult ReadWholeFile(const std::string& path, std::string& bytes) {
     const FileDescriptor file(open(OvrinToNativePath(path).c_str(), O_RDONLY | O_CLOEXEC));
     if (file.Get() < 0) return ReadResult::CannotOpen;

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <string>
 
 /// The value of HOME, or "~" where it is not set.
@@ -23,6 +24,9 @@ std::string GetFileExtension(const std::string& path);
 /// The directory of the executable, which holds the data files, with its separator at the end. Empty, and
 /// reported, where it can't be found.
 std::string GetDataFilesDir();
+
+/// Bytes in a file; 0 if that can't be told beforehand.
+std::size_t FileSize(const std::string& path);
 
 enum class ReadResult { Complete, CannotOpen, CannotRead };
 

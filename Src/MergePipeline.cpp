@@ -76,11 +76,12 @@ void PreProcessMappings(TimerStat& root, const MergeConfig& config, MergeFiles& 
 }
 
 MergeDiffs DiffOnThreads(TimerStat& timer, const MergeFiles& files) {
+    constexpr std::size_t kFewObjects = 1000;
+    const YAMLMapping& base = files.base.GetMapping();
+    const bool isLittle = base.Size() < kFewObjects;
     MergeDiffs diffs;
-    Thread left(
-        [&] { diffs.left = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.left.GetMapping()); });
-    Thread right(
-        [&] { diffs.right = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.right.GetMapping()); });
+    Thread left([&] { diffs.left = YAMLMappingDiff::Diff(&base, &files.left.GetMapping()); }, isLittle);
+    Thread right([&] { diffs.right = YAMLMappingDiff::Diff(&base, &files.right.GetMapping()); }, isLittle);
     {
         TimerStat waitTimer(timer, "Waiting for left diff");
         left.Join();

@@ -1,5 +1,6 @@
 #include "ReadInputs.h"
 
+#include "FileUtils.h"
 #include "InputFiles.h"
 #include "Thread.h"
 #include "TimerStat.h"
@@ -37,17 +38,26 @@ struct FileInWork {
     std::exception_ptr failure;
 };
 
+/// Below this size of all files together, threads cost more than they bring.
+constexpr std::size_t kLittleWork = std::size_t{1} << 20;
+
+bool IsLittleWork(const std::vector<InputFile>& inputs) {
+    std::size_t bytes = 0;
+    for (const InputFile& input : inputs) bytes += FileSize(*input.path);
+    return bytes < kLittleWork;
+}
+
 /// Carries out the tasks on as many threads as the machine has processors, handing them out in their order.
-void RunTasks(const std::vector<std::function<void()>>& tasks) {
+void RunTasks(const std::vector<std::function<void()>>& tasks, bool isLittle) {
     std::atomic<std::size_t> next = 0;
     const auto work = [&] {
         for (std::size_t i = next++; i < tasks.size(); i = next++) tasks[i]();
     };
-    const std::size_t count =
-        std::min<std::size_t>(tasks.size(), std::max(2u, std::thread::hardware_concurrency()));
+    const std::size_t processors = isLittle ? 1 : std::max(2u, std::thread::hardware_concurrency());
+    const std::size_t count = std::min(tasks.size(), processors);
     std::vector<Thread> threads;
     threads.reserve(count);
-    while (threads.size() < count) threads.emplace_back(work);
+    while (threads.size() < count) threads.emplace_back(work, isLittle);
     for (Thread& thread : threads) thread.Join();
     for (const Thread& thread : threads) thread.CheckForExceptions();
 }
@@ -73,12 +83,13 @@ void ReadOnThreads(TimerStat& parent, const std::vector<InputFile>& inputs, Read
         });
         if (&work != &first) cuts.emplace_back([&] { work.Try([&] { work.file.Cut(&first.file); }); });
     }
-    RunTasks(takes);
-    RunTasks(cuts);
+    const bool isLittle = IsLittleWork(inputs);
+    RunTasks(takes, isLittle);
+    RunTasks(cuts, isLittle);
     for (FileInWork& work : files)
         for (std::size_t piece = 0; !work.failure && piece < work.file.PieceCount(); ++piece)
             pieces.emplace_back([&work, piece] { work.file.ReadPiece(piece); });
-    RunTasks(pieces);
+    RunTasks(pieces, isLittle);
 
     for (FileInWork& work : files) work.Try([&] { FinishFile(work.file); });
     for (const FileInWork& work : files)

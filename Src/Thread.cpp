@@ -2,7 +2,11 @@
 
 #include <system_error>
 
-Thread::Thread(std::function<void()> body) : m_Work(new Work{std::move(body), nullptr}) {
+Thread::Thread(std::function<void()> body, bool isLittle) : m_Work(new Work{std::move(body), nullptr}) {
+    if (isLittle) {
+        m_Work->Run();
+        return;
+    }
     try {
         m_Thread = std::jthread([work = m_Work.get()] { work->Run(); });
     } catch (const std::system_error&) {

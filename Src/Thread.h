@@ -9,8 +9,9 @@
 /// any for its exception: then no failure leaves another thread running.
 class Thread {
 public:
-    /// Starts `body`, or runs it here and now if no thread is to be had.
-    explicit Thread(std::function<void()> body);
+    /// Starts `body`, or runs it here and now if no thread is to be had, or if it is so little work that
+    /// starting a thread would take longer.
+    explicit Thread(std::function<void()> body, bool isLittle = false);
     Thread(Thread&&) = default;
     Thread& operator=(Thread&&) = delete;
 
