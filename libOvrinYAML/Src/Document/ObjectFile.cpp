@@ -79,16 +79,29 @@ void ObjectFile::Cut(ObjectFile* base) {
     MakePieces();
 }
 
+/// Looks for the first "!" of "\n--- !o!": a sign that stands in headers and seldom elsewhere is found many
+/// times faster than one that stands in every line.
 const char* ObjectFile::FindDocumentEnd(const char* begin) const {
-    const std::size_t offset = static_cast<std::size_t>(begin - m_Text->data());
-    const std::size_t next = m_Text->find(kNextHeader, offset + kMarker.size());
-    return next == std::string::npos ? End() : m_Text->data() + next + 1;
+    constexpr std::size_t kSignAt = kNextHeader.find('!');
+    const char* position = begin + kDocumentStart.size();
+    while (position < End()) {
+        const auto* sign =
+            static_cast<const char*>(std::memchr(position, '!', static_cast<std::size_t>(End() - position)));
+        if (!sign) break;
+        const char* header = sign - kSignAt;
+        if (std::string_view(header, static_cast<std::size_t>(End() - header)).starts_with(kNextHeader))
+            return header + 1;
+        position = sign + 1;
+    }
+    return End();
 }
 
 void ObjectFile::CutAlone() {
     // A guess that spares the table most of its growing.
     constexpr std::size_t kBytesPerScalar = 64;
     ScalarTable::Instance().Reserve(m_Text->size() / kBytesPerScalar);
+    constexpr std::size_t kBytesPerDocument = 400;
+    m_Documents.reserve(m_Text->size() / kBytesPerDocument);
     for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
         const char* end = FindDocumentEnd(begin);
         AddDocument(begin, static_cast<std::size_t>(end - begin), kNone);

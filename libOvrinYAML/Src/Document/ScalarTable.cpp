@@ -70,30 +70,33 @@ void ScalarTable::Reserve(std::size_t count) {
 YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t hash, std::uint32_t line) {
     Shard& shard = ShardOf(hash);
     if (const Slots* slots = shard.slots.load(std::memory_order_acquire))
-        if (YAMLScalar* scalar = Find(*slots, text, hash)) return scalar;
+        if (YAMLScalar* scalar = Find(*slots, text, hash).scalar) return scalar;
 
     const std::lock_guard lock(shard.mutex);
     const Slots* slots = shard.slots.load(std::memory_order_relaxed);
-    if (slots)
-        if (YAMLScalar* scalar = Find(*slots, text, hash)) return scalar;
     const std::size_t capacity = slots ? slots->mask + 1 : 0;
     if (2 * (shard.count + 1) > capacity) {
         const std::size_t grown = std::max(2 * capacity, kFirstCapacity);
         Grow(shard, grown, AllocateZeroed(grown * sizeof(Slot)));
+        slots = shard.slots.load(std::memory_order_relaxed);
     }
+    // Another thread may have been here meanwhile.
+    const Place place = Find(*slots, text, hash);
+    if (place.scalar) return place.scalar;
     YAMLScalar* scalar = Make(text, hash, line);
-    Fill(*shard.slots.load(std::memory_order_relaxed), scalar);
+    place.slot->store(Pack(scalar), std::memory_order_release);
     ++shard.count;
     return scalar;
 }
 
-YAMLScalar* ScalarTable::Find(const Slots& slots, std::string_view text, std::uint32_t hash) {
+ScalarTable::Place ScalarTable::Find(const Slots& slots, std::string_view text, std::uint32_t hash) {
     for (std::size_t place = hash;; ++place) {
-        const std::uint64_t slot = slots.entries[place & slots.mask].load(std::memory_order_acquire);
-        if (!slot) return nullptr;
+        Slot& position = slots.entries[place & slots.mask];
+        const std::uint64_t slot = position.load(std::memory_order_acquire);
+        if (!slot) return {nullptr, &position};
         if (slot >> kTagShift != Tag(hash)) continue;
         YAMLScalar* scalar = Unpack(slot);
-        if (scalar->m_Hash == hash && scalar->Value() == text) return scalar;
+        if (scalar->m_Hash == hash && scalar->Value() == text) return {scalar, nullptr};
     }
 }
 

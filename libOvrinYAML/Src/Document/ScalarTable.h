@@ -62,7 +62,12 @@ private:
 
     Shard& ShardOf(std::uint32_t hash) { return m_Shards[hash >> (32 - kShardBits)]; }
     const Slot* SlotOf(std::uint32_t hash) const;
-    static YAMLScalar* Find(const Slots& slots, std::string_view text, std::uint32_t hash);
+    /// What stands where a text belongs: its scalar, or the empty slot that it would take.
+    struct Place {
+        YAMLScalar* scalar;
+        Slot* slot;
+    };
+    static Place Find(const Slots& slots, std::string_view text, std::uint32_t hash);
     static void Fill(const Slots& slots, YAMLScalar* scalar);
     static YAMLScalar* Make(std::string_view text, std::uint32_t hash, std::uint32_t line);
     /// Gives the shard an empty table in `memory`, which stays until the process ends, and fills it.
