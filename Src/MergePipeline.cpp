@@ -121,8 +121,7 @@ bool ReadResolveFile(TimerStat& root, const MergeConfig& config, RecordingConfli
 }
 
 /// Null where no premerge can follow: nobody else reads the base once it is changed.
-std::unique_ptr<OvrinObjects> CloneBase(TimerStat& root, const MergeConfig& config,
-                                        const OvrinObjects& base) {
+std::unique_ptr<OvrinObjects> CloneBase(TimerStat& root, const MergeConfig& config, OvrinObjects& base) {
     TimerStat timer(root, "Cloning base roots");
     if (config.premergeBaseDest.empty() || config.premergeRightDest.empty()) return nullptr;
     return std::unique_ptr<OvrinObjects>(base.Clone());

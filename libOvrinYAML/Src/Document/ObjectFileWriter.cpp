@@ -59,9 +59,10 @@ void OvrinObjects::Output(std::ostream& stream) const {
     stream.flush();
 }
 
-OvrinObjects* OvrinObjects::Clone() const {
+OvrinObjects* OvrinObjects::Clone() {
     auto copy = std::make_unique<OvrinObjects>();
-    m_Root.CloneInto(copy->m_Root);
+    m_Root.ShareInto(copy->m_Root);
+    copy->m_Text = m_Text;
     return copy.release();
 }
 

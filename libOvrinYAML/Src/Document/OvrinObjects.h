@@ -22,8 +22,10 @@ public:
     /// an object lost the entry, and the duplicate-keys text when an object holds repeated keys at its top.
     void Output(std::ostream& stream) const;
 
-    /// A deep copy, owned by the caller.
-    OvrinObjects* Clone() const;
+    /// A copy, owned by the caller. The two share their objects from now on: each is copied by whoever
+    /// changes it first, so that either may be changed while another thread uses the other. Throws the
+    /// duplicate-keys text.
+    OvrinObjects* Clone();
 
     /// Keeps the text that objects point into with their source bytes.
     void KeepText(std::shared_ptr<const std::string> text) { m_Text = std::move(text); }

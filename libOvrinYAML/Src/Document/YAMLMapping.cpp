@@ -182,15 +182,26 @@ YAMLSequence* YAMLMapping::ToSequence() const {
     return sequence;
 }
 
-void YAMLMapping::CloneInto(YAMLMapping& target) const {
+void YAMLMapping::CopyInto(YAMLMapping& target) const {
     RequireNormalState();
-    target.m_Entries.clear();
     target.m_Flow = m_Flow;
     target.m_Hash = m_Hash;
     target.m_Line = m_Line;
+    target.m_Entries.clear();
     target.m_Entries.reserve(Size());
-    for (const Entry& entry : *this) target.m_Entries.push_back({entry.key, entry.value->Clone()});
+    for (const Entry& entry : *this) target.m_Entries.push_back(entry);
     if (target.m_Entries.size() > KeyIndex::kSearchLimit) target.BuildIndex();
+}
+
+void YAMLMapping::CloneInto(YAMLMapping& target) const {
+    CopyInto(target);
+    for (Entry& entry : target.m_Entries) entry.value = entry.value->Clone();
+}
+
+void YAMLMapping::ShareInto(YAMLMapping& target) {
+    CopyInto(target);
+    for (const Entry& entry : target.m_Entries)
+        if (YAMLMapping* object = AsMapping(entry.value)) object->m_IsShared = true;
 }
 
 YAMLNode* YAMLMapping::Clone() const {

@@ -129,6 +129,8 @@ public:
     YAMLSequence* ToSequence() const;
     /// Fills an empty mapping with a deep copy.
     void CloneInto(YAMLMapping& target) const;
+    /// Fills an empty mapping with the same pairs and marks the values that are mappings as shared.
+    void ShareInto(YAMLMapping& target);
     /// Frees all values and empties the mapping; it stays in its state.
     void Clear();
 
@@ -145,6 +147,7 @@ public:
 private:
     /// Position of `key` in m_Entries, or KeyIndex::kMissing.
     std::uint32_t Find(const YAMLScalar* key) const;
+    void CopyInto(YAMLMapping& target) const;
     void PushBack(const YAMLScalar* key, YAMLNode* value);
     void BuildIndex();
     void DropIndex();

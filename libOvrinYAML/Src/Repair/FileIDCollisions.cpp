@@ -36,19 +36,22 @@ template <class IsTaken> const YAMLScalar* NextFreeID(const YAMLScalar& id, cons
     throw YAMLError("Cannot create new fileID for conflicting fileID: " + std::string(id.Value()));
 }
 
+/// Goes through the file even where no id moved, and so is also what notices repeated keys in it; objects
+/// that are known to have none are passed over then.
 void RewriteReferences(const std::vector<NewID>& newIDs, YAMLMapping& root) {
     std::unordered_map<const YAMLScalar*, const YAMLScalar*> remap;
     for (const NewID& newID : newIDs) remap.emplace(newID.from, newID.to);
     const auto refersToMoved = [&](const YAMLScalar*, const YAMLMapping& mapping) {
         return remap.contains(AsScalar(mapping.Get(YAMLScalar::fileID))) && !mapping.HasKey(YAMLScalar::guid);
     };
-    for (const auto& [id, object] : root) {
-        if (FindMappings(id, object, refersToMoved).empty()) continue;
+    const auto isOfInterest = [&](std::uint8_t) { return !newIDs.empty(); };
+    ForEachObject(root, isOfInterest, [&](const YAMLScalar* id, YAMLNode* object) {
+        if (FindMappings(id, object, refersToMoved).empty()) return;
         for (YAMLMapping* reference : FindMappings(id, &Editable(root, id), refersToMoved)) {
             const YAMLScalar* target = AsScalar(reference->Get(YAMLScalar::fileID));
             reference->Change(YAMLScalar::fileID, remap.at(target)->Clone());
         }
-    }
+    });
 }
 
 } // namespace
@@ -75,8 +78,6 @@ void RemapCollidingAddFileIDs(const std::vector<const YAMLScalar*>& conflicts, c
         newIDs.push_back({id, NextFreeID(*id, isTaken)});
         handedOut.insert(newIDs.back().to);
     }
-    if (newIDs.empty()) return;
-
     for (const NewID& newID : newIDs) {
         right.ChangeKey(newID.from, newID.to);
         Editable(right, newID.to).Change(YAMLScalar::fileIDPlaceHolderName, newID.to->Clone());
