@@ -177,4 +177,33 @@ TEST_F(BadInput, CarriageReturnsAreNone) {
     EXPECT_EQ(directory.Read("dest.ovrin"), merged);
 }
 
+/// Merges a folder of Examples in an empty directory, with the report in "report".
+int MergeExample(const program::WorkingDirectory& directory, const std::string& folder) {
+    const std::string scene = OVRIN_SOURCE_DIR "/" + folder;
+    return directory.Run("$OVRIN merge --fallback none -o report " + scene + "/base.ovrin " + scene +
+                         "/left.ovrin " + scene + "/right.ovrin merged.ovrin");
+}
+
+TEST(Examples, TheFirstHasOneConflict) {
+    const program::WorkingDirectory directory;
+    EXPECT_EQ(MergeExample(directory, "Examples"), 2);
+    EXPECT_EQ(directory.Read("report"), "Conflicts:\n"
+                                        "Left  734813.MonoBehaviour.m_Brightness change to 6\n...\n"
+                                        "Right 734813.MonoBehaviour.m_Brightness change to 2.5\n...\n"
+                                        "Conflict handling:\n");
+}
+
+TEST(Examples, TheSecondHasALoopAndAnIdGivenTwice) {
+    const program::WorkingDirectory directory;
+    EXPECT_EQ(MergeExample(directory, "Examples/hierarchy"), 2);
+    EXPECT_EQ(directory.Read("report"), "Conflicts:\n"
+                                        "BreakCycle  201.Transform.m_Father.fileID \n"
+                                        "BreakCycle  301.Transform.m_Father.fileID \n"
+                                        "Conflict handling:\n");
+    const std::string merged = directory.Read("merged.ovrin");
+    EXPECT_NE(merged.find("--- !o!108 &400\nLight:"), std::string::npos);
+    EXPECT_NE(merged.find("--- !o!82 &401\nAudioSource:"), std::string::npos);
+    EXPECT_NE(merged.find("- component: {fileID: 401}"), std::string::npos);
+}
+
 } // namespace
