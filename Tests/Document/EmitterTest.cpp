@@ -207,7 +207,8 @@ TEST_F(ObjectFileWriter, RefusesObjectsWithoutClassOrWithRepeatedKeys) {
 TEST_F(ObjectFileWriter, CloneIsACopyOfItsOwn) {
     Add("1", {{"A", Block({{"m", "1"}})}, {"MERGE_ClassID", "4"}});
     const std::unique_ptr<OvrinObjects> clone(m_Objects.Clone());
-    ToMapping(m_Objects.GetMapping().First()).Change(YAMLScalar::Lookup("A"), YAMLScalar::Lookup("2"));
+    YAMLNode* object = m_Objects.GetMapping().GetForChange(YAMLScalar::Lookup("1"));
+    ToMapping(object).Change(YAMLScalar::Lookup("A"), YAMLScalar::Lookup("2"));
     EXPECT_EQ(Body(*clone), "--- !o!4 &1\nA:\n  m: 1\n");
     EXPECT_EQ(Body(m_Objects), "--- !o!4 &1\nA: 2\n");
 }
