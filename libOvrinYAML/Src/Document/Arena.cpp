@@ -35,6 +35,14 @@ void* AllocateZeroed(std::size_t bytes) {
 }
 
 #if defined(__SANITIZE_ADDRESS__)
+#define OVRIN_SINGLE_ALLOCATIONS
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define OVRIN_SINGLE_ALLOCATIONS
+#endif
+#endif
+
+#if defined(OVRIN_SINGLE_ALLOCATIONS)
 
 void* ArenaAllocate(std::size_t bytes) {
     return ::operator new(bytes);
