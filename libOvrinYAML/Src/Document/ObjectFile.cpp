@@ -203,6 +203,8 @@ void ObjectFile::ReadDocument(WrittenFormReader& reader, Document& document) con
 
 bool ObjectFile::Finish() {
     YAMLMapping& root = m_Objects.GetMapping();
+    // What comes before a failure points into it as well.
+    if (!m_Base && !m_Documents.empty()) m_Objects.KeepText(m_Text);
     // A text that ends behind the first marker holds no document.
     if (m_Text->size() <= m_Header.size() + 5) return true;
     try {
@@ -214,7 +216,6 @@ bool ObjectFile::Finish() {
         return false;
     }
     root.RebuildHash(true);
-    if (!m_Base && !m_Documents.empty()) m_Objects.KeepText(m_Text);
     return true;
 }
 
