@@ -25,6 +25,16 @@ constexpr std::uint32_t kHeaderLines = 2;
 /// out.
 constexpr std::size_t kPieceBytes = std::size_t{1} << 20;
 
+/// Whether the body has keys that header data gets in an object: these meet or follow it.
+bool HasHeaderKeys(const YAMLMapping& body) {
+    const auto entries = body.RawEntries();
+    return std::any_of(entries.begin(), entries.end(), [](const YAMLMapping::Entry& entry) {
+        return entry.key == YAMLScalar::fileIDPlaceHolderName ||
+               entry.key == YAMLScalar::classIDPlaceHolderName ||
+               entry.key == YAMLScalar::strippedPrefabPlaceHolderName;
+    });
+}
+
 /// The file id in a document's header line, where that has the usual form.
 std::string_view FileIDOf(const char* begin, const char* end) {
     const std::string_view line(begin, static_cast<std::size_t>(std::find(begin, end, '\n') - begin));
@@ -188,7 +198,7 @@ void ObjectFile::ReadPiece(std::size_t piece) {
 
 void ObjectFile::ReadDocument(WrittenFormReader& reader, Document& document) const {
     const auto read = reader.Read({document.begin, document.length}, kHeaderLines);
-    if (!read.object) return;
+    if (!read.object || HasHeaderKeys(*read.object)) return;
     document.object = read.object;
     document.fileID = YAMLScalar::Lookup(read.fileID);
     AddHeaderData(*read.object, document.fileID, read.classID, read.isStripped);
