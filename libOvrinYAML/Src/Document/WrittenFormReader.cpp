@@ -284,7 +284,8 @@ void WrittenFormReader::NoteText(const char* begin, const char* end) {
 
 void WrittenFormReader::NoteKey(const char* begin, const char* end) {
     const std::string_view text(begin, static_cast<std::size_t>(end - begin));
-    NoteIf(text.starts_with("---") || text.starts_with("...") || end - begin > kLongestSimpleKey);
+    NoteIf(text.starts_with("---") || text.starts_with("...") || text.ends_with(':') ||
+           end - begin > kLongestSimpleKey);
 }
 
 // Flow style. Each function begins at the first character of its node and ends behind the last.
