@@ -233,9 +233,10 @@ const char* WrittenFormReader::ScanPlain(const char* from) const {
         case '\n':
             return p;
         case ':':
-            if (p[1] == ' ' || p[1] == '\n') return p;
-            break;
-        case ' ': // not before a comment, and not at the end, where the parser would drop it
+            if (p[1] != ' ' && p[1] != '\n') break;
+            if (p[-1] == ' ') throw NotSure();
+            return p;
+        case ' ': // not before a comment, and not at an end, where the parser would drop it
             if (p[1] == '#' || p[1] == '\n') throw NotSure();
             break;
         case '#':
