@@ -6,6 +6,7 @@
 
 /// Defaults of the options that name a file: "auto" stands for the file the program finds by itself.
 inline const std::string kDefaultSpecFile = "auto";
+inline const std::string kNoSpecFile = "none"; // no external tool at all
 inline const std::string kDefaultRulesFile = "auto";
 inline const std::string kDefaultTypeInfoFile;
 

@@ -184,7 +184,7 @@ std::string SubstituteMergePlaceholderFilePaths(const std::string& arguments, co
 int FallbackMergeTool(const std::string& base, const std::string& left, const std::string& right,
                       const std::string& dest, const std::string& specFile) {
     constexpr int kNoTool = 1;
-    if (specFile == "none") return kNoTool;
+    if (specFile == kNoSpecFile) return kNoTool;
     const std::string specPath = GetSpecFilename(specFile);
     const FallbackCommandMap fallbacks = PopulateFallbacks(specPath);
     if (fallbacks.empty()) return kNoTool;

@@ -80,7 +80,7 @@ int MergeSmartly(MergeConfig& config, const std::string& output, bool useFallbac
 int ProcessMergeCommand(MergeConfig& config) {
     const std::string extension = GetFileExtension(config.leftFile);
     const bool smart = config.force || IsSmartExtension(extension);
-    const bool useFallback = config.fallbackSpecFile != "none";
+    const bool useFallback = config.fallbackSpecFile != kNoSpecFile;
     const std::string output = CreateTempFile();
     if (output.empty()) return Fail("Couldn't create temporary output file for merge result");
     if (const int failure = SetupPremergePaths(config)) return failure;

@@ -6,7 +6,6 @@
 #include "DriverErrors.h"
 #include "ErrMsg.h"
 #include "FileUtils.h"
-#include "InputFiles.h"
 #include "OutputFile.h"
 #include "Premerge.h"
 #include "ReadInputs.h"
@@ -42,14 +41,7 @@ struct MergeDiffs {
 
 void ReadFiles(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
     TimerStat timer(root, "Read files");
-    {
-        TimerStat rulesTimer(timer, "Reading unique keys");
-        SetupRules(config.rulesFile);
-    }
-    if (config.typeInfoFile != kDefaultTypeInfoFile) {
-        TimerStat typesTimer(root, "Read type info");
-        SetupTypeInfo(config.typeInfoFile);
-    }
+    SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
     ReadInputs(timer, config.useThreads,
                {{"Read base", &config.baseFile, &files.base},
                 {"Read left", &config.leftFile, &files.left},

@@ -1,5 +1,6 @@
 #include "ReadInputs.h"
 
+#include "CommandSettings.h"
 #include "FileUtils.h"
 #include "InputFiles.h"
 #include "Thread.h"
@@ -111,6 +112,17 @@ void ReadInOrder(TimerStat& parent, const std::vector<InputFile>& inputs, Reader
 }
 
 } // namespace
+
+void SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
+                        const std::string& typeInfoFile) {
+    {
+        TimerStat timer(reading, "Reading unique keys");
+        SetupRules(rulesFile);
+    }
+    if (typeInfoFile == kDefaultTypeInfoFile) return;
+    TimerStat timer(root, "Read type info");
+    SetupTypeInfo(typeInfoFile);
+}
 
 ReaderOptions DefaultReaderOptions() {
     ReaderOptions options;

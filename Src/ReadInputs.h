@@ -7,6 +7,11 @@
 
 class TimerStat;
 
+/// Loads the rules and, if there is one, the type info file, before any object file is read. `reading` is the
+/// stage that this belongs to, `root` its parent. Throws as SetupRules and SetupTypeInfo do.
+void SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
+                        const std::string& typeInfoFile);
+
 /// One object file to be read.
 struct InputFile {
     const char* timerName; // of its own reading stage, without threads

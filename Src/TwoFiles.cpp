@@ -1,7 +1,6 @@
 #include "TwoFiles.h"
 
 #include "CommandSettings.h"
-#include "InputFiles.h"
 #include "ReadInputs.h"
 #include "TimerStat.h"
 
@@ -13,14 +12,7 @@ using namespace ovrin_yaml;
 void ReadAndDiff(TimerStat& root, const TwoFileConfig& config, TwoFiles& files) {
     {
         TimerStat timer(root, "Read files");
-        {
-            TimerStat rulesTimer(timer, "Reading unique keys");
-            SetupRules(config.rulesFile);
-        }
-        if (config.typeInfoFile != kDefaultTypeInfoFile) {
-            TimerStat typesTimer(root, "Read type info");
-            SetupTypeInfo(config.typeInfoFile);
-        }
+        SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
         // The left file plays the base and the right one the changed side, in the names too.
         ReadInputs(
             timer, config.useThreads,
