@@ -15,9 +15,8 @@ namespace ovrin_yaml {
 /// cost. Equal elements have equal hashes, with two exceptions that are kept apart:
 ///
 ///     bucket of each hash     positions, ascending: [5, 9, 11]; taken ones leave at the front
-///     odd positions           mappings with repeated keys and unhashed containers that aren't empty: an
-///     element
-///                             of another hash may equal them
+///     odd positions           mappings with repeated keys and unhashed containers that aren't empty:
+///                             an element of another hash may equal them
 ///
 /// An element that is odd itself is compared with the whole stretch.
 class EqualityMatcher {

@@ -12,11 +12,9 @@ namespace ovrin_yaml {
 
 /// A TreeBuilder that interns its scalars many at a time.
 ///
-/// Steps are noted first. When enough of them wait, the memory of all their scalars is asked for at once, and
-/// then the steps are carried out:
-///
-/// Short texts that were met lately are found in a cache of the builder's own. For the others steps are
-/// noted:
+/// Short texts that were met lately are found in a cache of the builder's own. All others wait, among the
+/// steps that they belong to. When enough steps wait, the memory of all their scalars is asked for at once,
+/// and then they are carried out:
 ///
 ///     noted      open | "m_X" | open flow | "fileID" | "12" | close | ...
 ///     loading    slots of all hashes, then the scalars in them

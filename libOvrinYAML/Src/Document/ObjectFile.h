@@ -31,12 +31,10 @@ struct ReaderOptions {
 ///  1. `Take` tests the signature, and `Cut` cuts the text at the document headers. A file that is cut along
 ///     another finds that one's documents in it: what stands there in the same words needs no reading.
 ///     Several files may be cut along one at the same time.
-///  2. `ReadPiece` reads some documents that are in written form. Pieces are independent of each other: any
-///  thread
-///     may read any piece, each once.
+///  2. `ReadPiece` reads some documents that are in written form. Pieces are independent of each other:
+///     any thread may read any piece, each once.
 ///  3. `Finish` adds the objects to the root in file order. A document that the fast reader wasn't sure of
-///  goes to
-///     libyaml here, so that the first failure in file order is the one that is thrown.
+///     goes to libyaml here, so that the first failure in file order is the one that is thrown.
 ///
 /// A text whose header hasn't the usual form goes to libyaml as a whole (ChunkWalker), and so does the rest
 /// of a text behind a document that doesn't end where the next header stands.
@@ -57,8 +55,8 @@ public:
     void Take(std::string bytes);
     /// The same for a text that needs no signature.
     void TakeText(std::string text);
-    /// Cuts the text, along `base` if it is not null; that must be cut already, not be read yet if it is to
-    /// lend objects, and stay where it is.
+    /// Cuts the text, along `base` if it is not null; that must be cut already and stay where it is. Objects
+    /// that are wanted before they are read are marked as shared while they are at hand.
     void Cut(ObjectFile* base);
     std::size_t PieceCount() const { return m_Pieces.size(); }
     void ReadPiece(std::size_t piece);

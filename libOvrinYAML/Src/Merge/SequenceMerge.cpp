@@ -7,9 +7,8 @@
 //     merged numbering  A=0 x=1 B=2 y=3 C=4      result A x B y C
 //
 //  1. If only one side moved, added or removed elements, its numbering is the merged one.
-//  2. Otherwise: equal changes under the default keys are one; elements that both sides added under one key
-//  are
-//     settled among themselves, and the right side forgets its own.
+//  2. Otherwise: equal changes under the default keys are one; elements that both sides added under one
+//     key are settled among themselves, and the right side forgets its own.
 //  3. The two numberings are merged: surviving base elements in base order, each side's additions behind the
 //     element that they follow, the left ones first.
 //  4. Both diffs are brought into the merged numbering and merged index by index.
