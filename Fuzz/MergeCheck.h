@@ -1,0 +1,14 @@
+#pragma once
+
+#include "MergeInput.h"
+
+#include <string>
+
+namespace ovrin_fuzz {
+
+/// Merges the files in every way to read them: with the library alone, with the reader for the written form,
+/// with shared objects, one file after the other and all at once. All must give the same. Returns the first
+/// difference, or an empty text.
+std::string CheckMerge(const MergeTexts& texts);
+
+} // namespace ovrin_fuzz

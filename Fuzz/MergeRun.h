@@ -1,0 +1,33 @@
+#pragma once
+
+#include "Document/OvrinObjects.h"
+
+#include <array>
+#include <functional>
+#include <memory>
+#include <string>
+
+namespace ovrin_fuzz {
+
+/// The three files of a merge. The result is built in the base.
+struct MergeFiles {
+    ovrin_yaml::OvrinObjects base, left, right;
+};
+
+/// All that a merge gives.
+struct MergeOutcome {
+    std::string failure; // "none", or what was thrown
+    std::string report;  // with the decisions that were no conflicts
+    std::string result;
+    std::array<std::string, 2> premerged; // with blanks and with the right side's values at conflicts
+    std::shared_ptr<MergeFiles> files;    // as they are at the end
+};
+
+/// Reads three files with `read` and takes them all the way to the result and two premerged files, in this
+/// thread.
+MergeOutcome RunMerge(const std::function<void(MergeFiles&)>& read);
+
+/// What the second of two outcomes of the same merge has different, or an empty text.
+std::string CompareOutcomes(const MergeOutcome& expected, const MergeOutcome& actual);
+
+} // namespace ovrin_fuzz

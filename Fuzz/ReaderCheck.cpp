@@ -1,0 +1,121 @@
+#include "ReaderCheck.h"
+
+#include "TreeComparison.h"
+
+#include "Document/ObjectFileReader.h"
+#include "Document/YAMLScalar.h"
+#include "Document/YAMLSequence.h"
+#include "Repair/ObjectTraits.h"
+
+#include <sstream>
+
+using namespace ovrin_yaml;
+
+namespace ovrin_fuzz {
+
+const char* const kFileHeader = "%YAML 1.1\n%TAG !o! tag:ovrin.dev,2011:\n";
+
+namespace {
+
+/// What `act` throws as a YAMLError, or "none".
+template <class Act> std::string FailureOf(const Act& act) {
+    try {
+        act();
+    } catch (const YAMLError& error) {
+        return error.what();
+    }
+    return "none";
+}
+
+struct ReadFile {
+    ReadFile(std::string_view file, bool fast) {
+        ReaderOptions options;
+        options.fast = fast;
+        options.inspect = InspectObject;
+        // A copy without spare room: reading behind its end is seen.
+        failure = FailureOf([&] { ParseYAMLFile(std::string(file), objects, options); });
+    }
+
+    std::string Written() const {
+        std::ostringstream stream;
+        const std::string writeFailure = FailureOf([&] { objects.Output(stream); });
+        return stream.str() + "\nfailure: " + writeFailure;
+    }
+
+    OvrinObjects objects;
+    std::string failure;
+};
+
+/// The value of a key by a plain search.
+const YAMLNode* Search(const YAMLNode* node, std::string_view key) {
+    const YAMLMapping* mapping = AsMapping(node);
+    if (!mapping) return nullptr;
+    for (const YAMLMapping::Entry& entry : mapping->RawEntries())
+        if (entry.key && entry.key->Value() == key) return entry.value;
+    return nullptr;
+}
+
+bool HasLinkBelow(std::string_view key, const YAMLNode& node) {
+    if (const YAMLMapping* mapping = AsMapping(&node)) {
+        const YAMLScalar* target = AsScalar(Search(mapping, "fileID"));
+        bool found = key == "m_PrefabInternal" && target && target->Value() != "0";
+        for (const YAMLMapping::Entry& entry : mapping->RawEntries())
+            found = found || (entry.key && HasLinkBelow(entry.key->Value(), *entry.value));
+        return found;
+    }
+    bool found = false;
+    if (const YAMLSequence* sequence = AsSequence(&node))
+        for (const YAMLNode* item : sequence->m_Items) found = found || HasLinkBelow("", *item);
+    return found;
+}
+
+/// The traits of an object, found by looking at everything each time.
+std::uint8_t PlainTraits(const YAMLMapping& object) {
+    const YAMLNode* fields = Search(&object, "Transform");
+    if (!fields) fields = Search(&object, "RectTransform");
+    int traits = kTraitsKnown;
+    if (Search(Search(&object, "AnimatorStateMachine"), "m_StateMachineTransitions"))
+        traits |= kHasTransitions;
+    if (HasLinkBelow("", object)) traits |= kHasPrefabLink;
+    if (AsMapping(fields)) traits |= kIsTransform;
+    if (AsMapping(fields) && !Search(fields, "m_Father")) traits |= kLacksFather;
+    return static_cast<std::uint8_t>(traits);
+}
+
+/// The source bytes and the traits of the objects.
+std::string CheckNotes(const YAMLMapping& root) {
+    for (const YAMLMapping::Entry& entry : root.RawEntries()) {
+        const YAMLMapping& object = *AsMapping(entry.value);
+        const std::string id(entry.key->Value());
+        if (object.m_Traits && object.m_Traits != PlainTraits(object))
+            return "traits of " + id + ": " + std::to_string(object.m_Traits);
+        if (!object.m_Source) continue;
+        OvrinObjects alone;
+        alone.GetMapping().Append(entry.key, object.Clone());
+        std::ostringstream stream;
+        alone.Output(stream);
+        const std::string written = stream.str();
+        if (written.substr(written.find("---")) != *object.m_Source)
+            return "source of " + id + ":\n" + std::string(*object.m_Source) + "written:\n" + written;
+    }
+    return "";
+}
+
+} // namespace
+
+std::string FileOfInput(std::string_view input) {
+    if (input.starts_with('%')) return std::string(input);
+    return std::string(kFileHeader) + "--- !o!4 &12\n" + std::string(input);
+}
+
+std::string CheckReader(std::string_view file) {
+    const ReadFile fast(file, true), plain(file, false);
+    if (fast.failure != plain.failure) return "failures: '" + fast.failure + "' and '" + plain.failure + "'";
+    const std::string difference = FirstDifference(fast.objects.GetMapping(), plain.objects.GetMapping());
+    if (!difference.empty()) return "trees:" + difference;
+    const std::string notes = CheckNotes(fast.objects.GetMapping());
+    if (!notes.empty()) return notes;
+    return fast.Written() == plain.Written() ? "" : "written:\n" + fast.Written() + "and\n" + plain.Written();
+}
+
+} // namespace ovrin_fuzz

@@ -1,0 +1,6 @@
+#include "FuzzTarget.h"
+#include "ReaderCheck.h"
+
+std::string CheckInput(std::string_view input) {
+    return ovrin_fuzz::CheckReader(ovrin_fuzz::FileOfInput(input));
+}
