@@ -45,13 +45,13 @@ void ReadAtOnce(const MergeTexts& texts, ReaderOptions options, MergeFiles& file
 } // namespace
 
 std::string CheckMerge(const MergeTexts& texts) {
-    const auto run = [&](auto read, bool fast, bool share) {
+    const auto run = [&](auto read, bool fast, bool share, PremergeFrom from = PremergeFrom::Clone) {
         ReaderOptions options = DefaultReaderOptions();
         options.fast = fast;
         options.share = share;
-        return RunMerge([&](MergeFiles& files) { read(texts, options, files); });
+        return RunMerge([&](MergeFiles& files) { read(texts, options, files); }, from);
     };
-    const MergeOutcome expected = run(ReadInTurn, false, false);
+    const MergeOutcome expected = run(ReadInTurn, false, false, PremergeFrom::Reading);
     const MergeOutcome unshared = run(ReadInTurn, true, false);
     const MergeOutcome inTurn = run(ReadInTurn, true, true);
     const MergeOutcome atOnce = run(ReadAtOnce, true, true);

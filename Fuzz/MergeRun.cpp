@@ -11,6 +11,7 @@
 
 #include <exception>
 #include <sstream>
+#include <vector>
 
 using namespace ovrin_yaml;
 
@@ -24,44 +25,69 @@ template <class Write> std::string Written(const Write& write) {
     return stream.str();
 }
 
-std::string Premerge(MergeResolve resolve, OvrinObjects& base, const MergeFiles& files,
-                     const YAMLMappingDiff* left, const YAMLMappingDiff* right) {
-    RecordingConflictResolver resolver(resolve);
-    YAMLMappingDiff::Merge(left, right, resolver)->Apply(base.GetMapping());
-    PostProcessMergeOnly(base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), resolver);
-    return Written([&](std::ostream& stream) { base.Output(stream); });
-}
+struct MergeDiffs {
+    const YAMLMappingDiff* left;
+    const YAMLMappingDiff* right;
+};
 
-void Merge(MergeFiles& files, MergeOutcome& outcome) {
+/// All that comes before the merge itself.
+MergeDiffs Prepare(MergeFiles& files) {
     YAMLMapping &base = files.base.GetMapping(), &left = files.left.GetMapping(),
                 &right = files.right.GetMapping();
     for (YAMLMapping* root : {&base, &left, &right}) PreProcess(*root);
     RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
-    const YAMLMappingDiff* leftDiff = YAMLMappingDiff::Diff(&base, &left);
-    const YAMLMappingDiff* rightDiff = YAMLMappingDiff::Diff(&base, &right);
-    RecordingConflictResolver resolver(ResolveBase);
-    const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(leftDiff, rightDiff, resolver);
-    const std::unique_ptr<OvrinObjects> forBlank(files.base.Clone()), forRight(files.base.Clone());
+    return {YAMLMappingDiff::Diff(&base, &left), YAMLMappingDiff::Diff(&base, &right)};
+}
 
-    merged->Apply(base);
+void Merge(MergeFiles& files, const MergeDiffs& diffs, MergeOutcome& outcome) {
+    RecordingConflictResolver resolver(ResolveBase);
+    YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver)->Apply(files.base.GetMapping());
     bool hasBrokenDependencies = false;
-    PostProcess(base, left, right, resolver, hasBrokenDependencies);
+    PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), resolver,
+                hasBrokenDependencies);
     outcome.report = Written([&](std::ostream& stream) { OutputConflictRecords(stream, resolver, true); }) +
                      (hasBrokenDependencies ? "broken dependencies" : "");
     outcome.result = Written([&](std::ostream& stream) { files.base.Output(stream); });
-    outcome.premerged[0] = Premerge(ResolveBlank, *forBlank, files, leftDiff, rightDiff);
-    outcome.premerged[1] = Premerge(ResolveRight, *forRight, files, leftDiff, rightDiff);
+}
+
+std::string Premerge(MergeResolve resolve, OvrinObjects& base, const MergeFiles& sides,
+                     const MergeDiffs& diffs) {
+    RecordingConflictResolver resolver(resolve);
+    YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver)->Apply(base.GetMapping());
+    PostProcessMergeOnly(base.GetMapping(), sides.left.GetMapping(), sides.right.GetMapping(), resolver);
+    return Written([&](std::ostream& stream) { base.Output(stream); });
+}
+
+constexpr MergeResolve kPremerges[] = {ResolveBlank, ResolveRight};
+
+void MergeAll(const std::function<void(MergeFiles&)>& read, PremergeFrom from, MergeOutcome& outcome) {
+    MergeFiles& files = *outcome.files;
+    read(files);
+    const MergeDiffs diffs = Prepare(files);
+    std::vector<std::unique_ptr<OvrinObjects>> clones;
+    if (from == PremergeFrom::Clone)
+        for (std::size_t i = 0; i < std::size(kPremerges); ++i) clones.emplace_back(files.base.Clone());
+    Merge(files, diffs, outcome);
+    for (std::size_t i = 0; i < std::size(kPremerges); ++i) {
+        if (from == PremergeFrom::Clone) {
+            outcome.premerged[i] = Premerge(kPremerges[i], *clones[i], files, diffs);
+        } else {
+            MergeFiles again;
+            read(again);
+            const MergeDiffs ownDiffs = Prepare(again);
+            outcome.premerged[i] = Premerge(kPremerges[i], again.base, again, ownDiffs);
+        }
+    }
 }
 
 } // namespace
 
-MergeOutcome RunMerge(const std::function<void(MergeFiles&)>& read) {
+MergeOutcome RunMerge(const std::function<void(MergeFiles&)>& read, PremergeFrom from) {
     MergeOutcome outcome;
     outcome.files = std::make_shared<MergeFiles>();
     outcome.failure = "none";
     try {
-        read(*outcome.files);
-        Merge(*outcome.files, outcome);
+        MergeAll(read, from, outcome);
     } catch (const YAMLError& error) {
         outcome.failure = error.what();
     } catch (const YAMLError* error) { // of a cycle that can't be broken

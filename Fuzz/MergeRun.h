@@ -23,9 +23,15 @@ struct MergeOutcome {
     std::shared_ptr<MergeFiles> files;    // as they are at the end
 };
 
+/// Where the premerged files begin.
+enum class PremergeFrom {
+    Clone,  // the base as it was copied before the merge, with the sides that the merge used
+    Reading // files that are read once more for each
+};
+
 /// Reads three files with `read` and takes them all the way to the result and two premerged files, in this
 /// thread.
-MergeOutcome RunMerge(const std::function<void(MergeFiles&)>& read);
+MergeOutcome RunMerge(const std::function<void(MergeFiles&)>& read, PremergeFrom from = PremergeFrom::Clone);
 
 /// What the second of two outcomes of the same merge has different, or an empty text.
 std::string CompareOutcomes(const MergeOutcome& expected, const MergeOutcome& actual);
