@@ -2,9 +2,7 @@
 
 #include "Document/TreeBuilder.h"
 #include "Document/YAMLError.h"
-#include "Document/YAMLMapping.h"
 #include "Document/YAMLScalar.h"
-#include "Document/YAMLSequence.h"
 
 #include <yaml.h>
 
@@ -92,28 +90,6 @@ bool HasIncompatibleVersion(std::string_view text) {
 
 std::string_view Text(const yaml_char_t* text) {
     return text ? reinterpret_cast<const char*>(text) : "";
-}
-
-/// A copy of a tree that keeps mappings with repeated keys as they are.
-YAMLNode* CopyExactly(const YAMLNode* node) {
-    if (const YAMLMapping* mapping = AsMapping(node)) {
-        YAMLMapping* copy = YAMLAlloc<YAMLMapping>::create(mapping->m_Flow);
-        copy->Reserve(mapping->RawEntries().size());
-        for (const YAMLMapping::Entry& entry : mapping->RawEntries())
-            copy->Append(entry.key, CopyExactly(entry.value));
-        copy->m_Hash = mapping->m_Hash;
-        copy->m_Line = mapping->m_Line;
-        return copy;
-    }
-    if (const YAMLSequence* sequence = AsSequence(node)) {
-        YAMLSequence* copy = YAMLAlloc<YAMLSequence>::create(sequence->m_Flow);
-        copy->m_Items.reserve(sequence->m_Items.size());
-        for (const YAMLNode* item : sequence->m_Items) copy->m_Items.push_back(CopyExactly(item));
-        copy->m_Hash = sequence->m_Hash;
-        copy->m_Line = sequence->m_Line;
-        return copy;
-    }
-    return node->Clone();
 }
 
 /// Turns the events between the start and the end of a document into a tree.

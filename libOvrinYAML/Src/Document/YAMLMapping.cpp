@@ -99,7 +99,7 @@ YAMLNode* YAMLMapping::GetForChange(const YAMLScalar* key) {
     YAMLMapping* object = AsMapping(value);
     if (!object) return value;
     if (object->m_IsShared) {
-        object = AsMapping(object->Clone());
+        object = AsMapping(CopyExactly(object));
         Change(key, object);
     }
     object->m_Source = nullptr;

@@ -72,6 +72,9 @@ template <class T, class Node> T* NodeAs(Node* node) {
     return node && node->GetKind() == T::kKind ? static_cast<T*>(node) : nullptr;
 }
 
+/// A deep copy, as YAMLNode::Clone, that keeps mappings in the duplicate state as they are.
+YAMLNode* CopyExactly(const YAMLNode* node);
+
 /// The node as a mapping or a sequence. Throws std::bad_cast if it is null or of another kind.
 YAMLMapping& ToMapping(YAMLNode* node);
 YAMLSequence& ToSequence(YAMLNode* node);
