@@ -89,14 +89,14 @@ std::string CheckNotes(const YAMLMapping& root) {
         const std::string id(entry.key->Value());
         if (object.m_Traits && object.m_Traits != PlainTraits(object))
             return "traits of " + id + ": " + std::to_string(object.m_Traits);
-        if (!object.m_Source) continue;
+        if (object.Source().empty()) continue;
         OvrinObjects alone;
         alone.GetMapping().Append(entry.key, object.Clone());
         std::ostringstream stream;
         alone.Output(stream);
         const std::string written = stream.str();
-        if (written.substr(written.find("---")) != *object.m_Source)
-            return "source of " + id + ":\n" + std::string(*object.m_Source) + "written:\n" + written;
+        if (written.substr(written.find("---")) != object.Source())
+            return "source of " + id + ":\n" + std::string(object.Source()) + "written:\n" + written;
     }
     return "";
 }

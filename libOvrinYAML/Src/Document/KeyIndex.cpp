@@ -1,5 +1,7 @@
 #include "Document/KeyIndex.h"
 
+#include "Document/Arena.h"
+
 #include <bit>
 
 namespace ovrin_yaml {
@@ -31,7 +33,10 @@ std::size_t KeyIndex::PlaceOf(const YAMLScalar* key) const {
 }
 
 void KeyIndex::Rehash(std::size_t capacity) {
-    std::vector<Slot> old(capacity);
+    std::vector<Slot> old;
+    old.reserve(capacity);
+    AdviseHugePages(old.data(), capacity * sizeof(Slot));
+    old.resize(capacity);
     old.swap(m_Slots);
     for (const Slot& slot : old)
         if (slot.key) m_Slots[PlaceOf(slot.key)] = slot;

@@ -12,8 +12,9 @@ class YAMLScalar;
 /// Only ever asked for single keys, so that no order can come out of the addresses.
 class KeyIndex {
 public:
-    /// Arrays up to this length are searched in order: at twenty keys that is as fast as any table.
-    static constexpr std::size_t kSearchLimit = 16;
+    /// Arrays up to this length are searched in order: at twenty keys that is as fast as any table, and a
+    /// table takes more memory than the keys and values.
+    static constexpr std::size_t kSearchLimit = 32;
 
     static constexpr std::uint32_t kMissing = UINT32_MAX;
 

@@ -1,6 +1,5 @@
 #include "Document/ObjectFile.h"
 
-#include "Document/Arena.h"
 #include "Document/ChunkWalker.h"
 #include "Document/ScalarTable.h"
 #include "Document/WrittenFormReader.h"
@@ -206,9 +205,7 @@ void ObjectFile::ReadDocument(WrittenFormReader& reader, Document& document) con
     document.isLendable = read.isRegular && !(read.object->m_Traits & m_Options.unshared);
     document.isMarked = document.isLendable && document.isWanted;
     read.object->m_IsShared = document.isMarked;
-    if (!m_Base && read.isAsWritten)
-        read.object->m_Source =
-            new (ArenaAllocate(sizeof(std::string_view))) std::string_view(document.begin, document.length);
+    if (!m_Base && read.isAsWritten) read.object->SetSource({document.begin, document.length});
 }
 
 bool ObjectFile::Finish() {

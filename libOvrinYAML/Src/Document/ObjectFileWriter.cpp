@@ -45,8 +45,8 @@ void OvrinObjects::Output(std::ostream& stream) const {
     std::string text = kFileHeader;
     for (const YAMLMapping::Entry& entry : m_Root) {
         const YAMLMapping& object = ToMapping(entry.value);
-        if (object.m_Source) {
-            text += *object.m_Source;
+        if (!object.Source().empty()) {
+            text += object.Source();
         } else {
             AppendHeaderLine(*entry.key, object, text);
             AppendBody(object, text);

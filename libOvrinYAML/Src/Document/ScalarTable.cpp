@@ -106,13 +106,12 @@ void ScalarTable::Fill(const Slots& slots, YAMLScalar* scalar) {
     slots.entries[place & slots.mask].store(Pack(scalar), std::memory_order_release);
 }
 
+static_assert(sizeof(YAMLScalar) == 16, "there are millions of them");
+
 YAMLScalar* ScalarTable::Make(std::string_view text, std::uint32_t hash, std::uint32_t line) {
-    // One piece of memory for the object and, behind it, the text with a NUL.
-    char* memory = static_cast<char*>(ArenaAllocate(sizeof(YAMLScalar) + text.size() + 1));
-    char* copy = memory + sizeof(YAMLScalar);
-    if (!text.empty()) std::memcpy(copy, text.data(), text.size());
-    copy[text.size()] = '\0';
-    return new (memory) YAMLScalar(copy, static_cast<std::uint32_t>(text.size()), hash, line);
+    char* memory = static_cast<char*>(ArenaAllocate(sizeof(YAMLScalar) + text.size()));
+    if (!text.empty()) std::memcpy(memory + sizeof(YAMLScalar), text.data(), text.size());
+    return new (memory) YAMLScalar(static_cast<std::uint32_t>(text.size()), hash, line);
 }
 
 void ScalarTable::Grow(Shard& shard, std::size_t capacity, void* memory) {

@@ -8,8 +8,15 @@
 
 namespace ovrin_yaml {
 
+static_assert(sizeof(YAMLMapping) == 40, "there are millions of them");
+
 YAMLMapping::~YAMLMapping() {
     DropIndex();
+}
+
+YAMLMapping::Extra& YAMLMapping::NeedExtra() {
+    if (!m_Extra) m_Extra = new (ArenaAllocate(sizeof(Extra))) Extra;
+    return *m_Extra;
 }
 
 void YAMLMapping::RequireNormalState() const {
@@ -17,9 +24,9 @@ void YAMLMapping::RequireNormalState() const {
 }
 
 std::uint32_t YAMLMapping::Find(const YAMLScalar* key) const {
-    if (m_Index) {
+    if (const KeyIndex* index = Index()) {
         // The index keeps keys that were removed since; their positions hold null or, after a move, others.
-        const std::uint32_t position = m_Index->Find(key);
+        const std::uint32_t position = index->Find(key);
         const bool there = position < m_Entries.size() && m_Entries[position].key == key;
         return there ? position : KeyIndex::kMissing;
     }
@@ -30,21 +37,23 @@ std::uint32_t YAMLMapping::Find(const YAMLScalar* key) const {
 
 void YAMLMapping::PushBack(const YAMLScalar* key, YAMLNode* value) {
     m_Entries.push_back({key, value});
-    if (m_Index)
-        m_Index->Set(key, static_cast<std::uint32_t>(m_Entries.size() - 1));
+    if (KeyIndex* index = Index())
+        index->Set(key, static_cast<std::uint32_t>(m_Entries.size() - 1));
     else if (m_Entries.size() > KeyIndex::kSearchLimit)
         BuildIndex();
 }
 
 void YAMLMapping::BuildIndex() {
-    if (!m_Index) m_Index = new KeyIndex;
-    m_Index->Reserve(m_Entries.capacity());
-    for (std::uint32_t i = 0; i < m_Entries.size(); ++i) m_Index->Set(m_Entries[i].key, i);
+    KeyIndex*& index = NeedExtra().index;
+    if (!index) index = new KeyIndex;
+    index->Reserve(m_Entries.capacity());
+    for (std::uint32_t i = 0; i < m_Entries.size(); ++i) index->Set(m_Entries[i].key, i);
 }
 
 void YAMLMapping::DropIndex() {
-    delete m_Index;
-    m_Index = nullptr;
+    if (!m_Extra) return;
+    delete m_Extra->index;
+    m_Extra->index = nullptr;
 }
 
 void YAMLMapping::Append(const YAMLScalar* key, YAMLNode* value) {
@@ -58,7 +67,7 @@ void YAMLMapping::Append(const YAMLScalar* key, YAMLNode* value) {
         return;
     }
     if (m_Entries[position].value->Equals(value)) return;
-    std::erase_if(m_Entries, [](const Entry& entry) { return !entry.key; });
+    m_Entries.erase_if([](const Entry& entry) { return !entry.key; });
     m_Removed = 0;
     DropIndex();
     m_Entries.push_back({key, value});
@@ -102,7 +111,7 @@ YAMLNode* YAMLMapping::GetForChange(const YAMLScalar* key) {
         object = AsMapping(CopyExactly(object));
         Change(key, object);
     }
-    object->m_Source = nullptr;
+    if (object->m_Extra) object->m_Extra->source = {};
     object->m_Traits = 0;
     return object;
 }
@@ -133,11 +142,11 @@ YAMLNode* YAMLMapping::Steal(const YAMLScalar* key) {
     const std::uint32_t position = Find(key);
     if (position == KeyIndex::kMissing) return nullptr;
     YAMLNode* value = m_Entries[position].value;
-    if (m_Index) {
+    if (Index()) {
         m_Entries[position] = {nullptr, nullptr};
         ++m_Removed;
     } else {
-        m_Entries.erase(m_Entries.begin() + position);
+        m_Entries.erase(position);
     }
     return value;
 }
@@ -152,12 +161,12 @@ void YAMLMapping::ChangeKey(const YAMLScalar* from, const YAMLScalar* to) {
     if (position == KeyIndex::kMissing)
         throw YAMLError("Cannot change key of non existing key in YAMLMapping");
     m_Entries[position].key = to;
-    if (m_Index) m_Index->Set(to, position);
+    if (KeyIndex* index = Index()) index->Set(to, position);
 }
 
 void YAMLMapping::Reorder(const std::vector<const YAMLScalar*>& order) {
     RequireNormalState();
-    decltype(m_Entries) ordered;
+    ArenaArray<Entry> ordered;
     ordered.reserve(Size());
     for (const YAMLScalar* key : order) {
         const std::uint32_t position = Find(key);
@@ -168,7 +177,7 @@ void YAMLMapping::Reorder(const std::vector<const YAMLScalar*>& order) {
     if (ordered.size() != Size()) throw YAMLError("Unmapped key when trying to reorder mapping keys");
     m_Entries.swap(ordered);
     m_Removed = 0;
-    if (m_Index) BuildIndex();
+    if (Index()) BuildIndex();
 }
 
 YAMLSequence* YAMLMapping::ToSequence() const {

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/Arena.h"
+#include "Document/ArenaArray.h"
 #include "Document/KeyIndex.h"
 #include "Document/YAMLAlloc.h"
 #include "Document/YAMLError.h"
@@ -76,9 +76,10 @@ private:
     std::uint32_t m_Removed : 31 = 0; // pairs in m_Entries whose key is null; only where there is an index
 
 public:
-    /// The bytes that the writer would give for this object, or null where they aren't known. Valid until the
-    /// object is changed; they belong to whoever read the file.
-    const std::string_view* m_Source = nullptr;
+    /// The bytes that the writer would give for this object, or nothing where they aren't known. Valid until
+    /// the object is changed; they belong to whoever read the file.
+    std::string_view Source() const { return m_Extra ? m_Extra->source : std::string_view(); }
+    void SetSource(std::string_view source) { NeedExtra().source = source; }
 
     bool HasDuplicates() const { return m_HasDuplicates; }
     /// Throws the duplicate-keys YAMLError in the duplicate state.
@@ -134,14 +135,13 @@ public:
     /// Frees all values and empties the mapping; it stays in its state.
     void Clear();
 
-    void Free() override {
+    void Free() {
         if (!m_IsShared) YAMLAlloc<YAMLMapping>::free(this);
     }
-    YAMLNode* Clone() const override;
-    bool Equals(const YAMLNode* other) const override;
-    bool EqualsExpensive(const YAMLNode* other) const override;
-    void Accept(YAMLNodeVisitor& visitor) override { visitor.Visit(*this); }
-    void RebuildHash(bool shallow) override;
+    YAMLNode* Clone() const;
+    bool Equals(const YAMLNode* other) const;
+    bool EqualsExpensive(const YAMLNode* other) const;
+    void RebuildHash(bool shallow);
     void ResetForAlloc() { Clear(); }
 
 private:
@@ -152,8 +152,16 @@ private:
     void BuildIndex();
     void DropIndex();
 
-    std::vector<Entry, ArenaAllocator<Entry>> m_Entries;
-    KeyIndex* m_Index = nullptr; // positions in m_Entries, once there are more than KeyIndex::kSearchLimit
+    /// What few mappings have.
+    struct Extra {
+        std::string_view source;
+        KeyIndex* index = nullptr; // positions in m_Entries, once there are more than KeyIndex::kSearchLimit
+    };
+    KeyIndex* Index() const { return m_Extra ? m_Extra->index : nullptr; }
+    Extra& NeedExtra();
+
+    ArenaArray<Entry> m_Entries;
+    Extra* m_Extra = nullptr;
 };
 
 inline YAMLMapping* AsMapping(YAMLNode* node) {

@@ -25,7 +25,8 @@ protected:
 /// Mappings and sequences belong to exactly one tree, which one thread uses at a time, and are released with
 /// `Free`, never by deletion. Scalars are interned: one object per text in the process, owned by nobody,
 /// immutable, shared by all threads; `Free` does nothing to them and `Clone` returns the scalar itself, so
-/// that code treats all values alike.
+/// that code treats all values alike. What a node can do depends on its kind; there are millions of nodes, so
+/// the kind is a byte, where virtual functions would cost each a pointer.
 class YAMLNode {
 public:
     enum class Kind : std::uint8_t { Scalar, Mapping, Sequence };
@@ -40,19 +41,19 @@ public:
     Kind GetKind() const { return m_Kind; }
 
     /// Gives the node back to its pool, with everything below it.
-    virtual void Free() = 0;
+    void Free();
     /// A deep copy that shares scalars only, owned by the caller. Throws YAMLError when a mapping in the
     /// duplicate state stands anywhere in it.
-    virtual YAMLNode* Clone() const = 0;
+    YAMLNode* Clone() const;
     /// Equality by identity for scalars and by hash for containers: where both hashes are known the contents
     /// are not looked at, and neither is the kind of `other`. `other` must not be null.
-    virtual bool Equals(const YAMLNode* other) const = 0;
+    bool Equals(const YAMLNode* other) const;
     /// Equality that walks: item by item for sequences; for mappings the key lists alone decide.
-    virtual bool EqualsExpensive(const YAMLNode* other) const = 0;
-    virtual void Accept(YAMLNodeVisitor& visitor) = 0;
+    bool EqualsExpensive(const YAMLNode* other) const;
+    void Accept(YAMLNodeVisitor& visitor);
     /// Builds m_Hash anew, with `shallow` from the children's hashes as they stand. All items must be
     /// non-null.
-    virtual void RebuildHash(bool shallow) = 0;
+    void RebuildHash(bool shallow);
 
     /// The node as a YAML document of its own, without the final line break. Behind a plain scalar stands a
     /// line "...".

@@ -21,19 +21,19 @@ public:
     /// Interns the well-known scalars below. Called once, by `initialize`, before anything else is used.
     static void initializeConstants();
 
-    std::string_view Value() const { return {m_Value, m_Length}; }
+    /// The text, which stands right behind the object.
+    std::string_view Value() const { return {reinterpret_cast<const char*>(this + 1), m_Length}; }
 
     /// The text as a decimal number as a stream in the "C" locale reads it: what does not begin with a number
     /// is 0, what stands behind the number is ignored, and what is out of range is the nearest limit.
     int GetIntValue() const;
     float GetFloatValue() const;
 
-    void Free() override {}
-    YAMLNode* Clone() const override { return const_cast<YAMLScalar*>(this); }
-    bool Equals(const YAMLNode* other) const override { return this == other; }
-    bool EqualsExpensive(const YAMLNode* other) const override { return this == other; }
-    void Accept(YAMLNodeVisitor& visitor) override { visitor.Visit(*this); }
-    void RebuildHash(bool) override {}
+    void Free() {}
+    YAMLNode* Clone() const { return const_cast<YAMLScalar*>(this); }
+    bool Equals(const YAMLNode* other) const { return this == other; }
+    bool EqualsExpensive(const YAMLNode* other) const { return this == other; }
+    void RebuildHash(bool) {}
 
     static YAMLScalar* const null;
     static YAMLScalar* underscore;
@@ -72,14 +72,13 @@ public:
 private:
     friend class ScalarTable;
 
-    YAMLScalar(const char* text, std::uint32_t length, std::uint32_t hash, std::uint32_t line)
-        : YAMLNode(Kind::Scalar), m_Length(length), m_Value(text) {
+    YAMLScalar(std::uint32_t length, std::uint32_t hash, std::uint32_t line)
+        : YAMLNode(Kind::Scalar), m_Length(length) {
         m_Hash = hash;
         m_Line = line;
     }
 
     const std::uint32_t m_Length;
-    const char* const m_Value;
 };
 
 inline YAMLScalar* AsScalar(YAMLNode* node) {

@@ -39,12 +39,11 @@ public:
     /// A deep copy; holes stay.
     YAMLSequence* StaticClone() const;
 
-    void Free() override { YAMLAlloc<YAMLSequence>::free(this); }
-    YAMLNode* Clone() const override { return StaticClone(); }
-    bool Equals(const YAMLNode* other) const override;
-    bool EqualsExpensive(const YAMLNode* other) const override;
-    void Accept(YAMLNodeVisitor& visitor) override { visitor.Visit(*this); }
-    void RebuildHash(bool shallow) override;
+    void Free() { YAMLAlloc<YAMLSequence>::free(this); }
+    YAMLNode* Clone() const { return StaticClone(); }
+    bool Equals(const YAMLNode* other) const;
+    bool EqualsExpensive(const YAMLNode* other) const;
+    void RebuildHash(bool shallow);
     void ResetForAlloc();
 };
 
