@@ -69,10 +69,14 @@ void ScalarTable::Reserve(std::size_t count) {
 
 YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t hash, std::uint32_t line) {
     Shard& shard = ShardOf(hash);
-    if (const Slots* slots = shard.slots.load(std::memory_order_acquire))
-        if (YAMLScalar* scalar = Find(*slots, text, hash).scalar) return scalar;
+    const Slots* slots = shard.slots.load(std::memory_order_acquire);
+    const Place place = slots ? Find(*slots, text, hash) : Place{};
+    return place.scalar ? place.scalar : InternNew(shard, {text, hash, line}, slots, place.slot);
+}
 
-    const std::lock_guard lock(shard.mutex);
+/// `empty` was the text's place in `seen`, a moment ago.
+YAMLScalar* ScalarTable::InternNew(Shard& shard, const NewScalar& wanted, const Slots* seen, Slot* empty) {
+    const std::lock_guard lock(shard.lock);
     const Slots* slots = shard.slots.load(std::memory_order_relaxed);
     const std::size_t capacity = slots ? slots->mask + 1 : 0;
     if (2 * (shard.count + 1) > capacity) {
@@ -80,11 +84,14 @@ YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t hash, std::
         Grow(shard, grown, AllocateZeroed(grown * sizeof(Slot)));
         slots = shard.slots.load(std::memory_order_relaxed);
     }
-    // Another thread may have been here meanwhile.
-    const Place place = Find(*slots, text, hash);
-    if (place.scalar) return place.scalar;
-    YAMLScalar* scalar = Make(text, hash, line);
-    place.slot->store(Pack(scalar), std::memory_order_release);
+    if (slots != seen || empty->load(std::memory_order_relaxed)) {
+        // Another thread may have made the scalar meanwhile.
+        const Place place = Find(*slots, wanted.text, wanted.hash);
+        if (place.scalar) return place.scalar;
+        empty = place.slot;
+    }
+    YAMLScalar* scalar = Make(wanted);
+    empty->store(Pack(scalar), std::memory_order_release);
     ++shard.count;
     return scalar;
 }
@@ -108,10 +115,11 @@ void ScalarTable::Fill(const Slots& slots, YAMLScalar* scalar) {
 
 static_assert(sizeof(YAMLScalar) == 16, "there are millions of them");
 
-YAMLScalar* ScalarTable::Make(std::string_view text, std::uint32_t hash, std::uint32_t line) {
+YAMLScalar* ScalarTable::Make(const NewScalar& wanted) {
+    const std::string_view text = wanted.text;
     char* memory = static_cast<char*>(ArenaAllocate(sizeof(YAMLScalar) + text.size()));
     if (!text.empty()) std::memcpy(memory + sizeof(YAMLScalar), text.data(), text.size());
-    return new (memory) YAMLScalar(static_cast<std::uint32_t>(text.size()), hash, line);
+    return new (memory) YAMLScalar(static_cast<std::uint32_t>(text.size()), wanted.hash, wanted.line);
 }
 
 void ScalarTable::Grow(Shard& shard, std::size_t capacity, void* memory) {

@@ -1,10 +1,10 @@
 #pragma once
 
+#include "Document/SpinLock.h"
 #include "Document/YAMLScalar.h"
 
 #include <array>
 #include <atomic>
-#include <mutex>
 #include <string_view>
 
 namespace ovrin_yaml {
@@ -53,7 +53,7 @@ private:
 
     struct alignas(64) Shard {
         std::atomic<const Slots*> slots{nullptr};
-        std::mutex mutex;
+        SpinLock lock; // held for a few instructions, or seldom for those of Grow
         std::size_t count = 0;
     };
 
@@ -67,9 +67,15 @@ private:
         YAMLScalar* scalar;
         Slot* slot;
     };
+    struct NewScalar {
+        std::string_view text;
+        std::uint32_t hash;
+        std::uint32_t line;
+    };
+    static YAMLScalar* InternNew(Shard& shard, const NewScalar& wanted, const Slots* seen, Slot* empty);
     static Place Find(const Slots& slots, std::string_view text, std::uint32_t hash);
     static void Fill(const Slots& slots, YAMLScalar* scalar);
-    static YAMLScalar* Make(std::string_view text, std::uint32_t hash, std::uint32_t line);
+    static YAMLScalar* Make(const NewScalar& wanted);
     /// Gives the shard an empty table in `memory`, which stays until the process ends, and fills it.
     static void Grow(Shard& shard, std::size_t capacity, void* memory);
 
