@@ -34,35 +34,11 @@ void* AllocateZeroed(std::size_t bytes) {
     return memory;
 }
 
-#if defined(__SANITIZE_ADDRESS__)
-#define OVRIN_SINGLE_ALLOCATIONS
-#elif defined(__has_feature)
-#if __has_feature(address_sanitizer)
-#define OVRIN_SINGLE_ALLOCATIONS
-#endif
-#endif
-
-#if defined(OVRIN_SINGLE_ALLOCATIONS)
-
-void* ArenaAllocate(std::size_t bytes) {
-    return ::operator new(bytes);
-}
-
-#else
+#if !defined(OVRIN_SINGLE_ALLOCATIONS)
 
 namespace {
 
-constexpr std::size_t kAlignment = 8;
-constexpr std::size_t kFirstChunk = std::size_t{64} << 10;
 constexpr std::size_t kLargestChunk = 2 * kHugePage;
-
-struct ThreadArena {
-    char* position = nullptr;
-    std::size_t left = 0;
-    std::size_t nextChunk = kFirstChunk;
-};
-
-thread_local ThreadArena t_Arena;
 
 char* AllocateChunk(std::size_t bytes) {
     if (bytes < kHugePage) return static_cast<char*>(::operator new(bytes));
@@ -71,26 +47,16 @@ char* AllocateChunk(std::size_t bytes) {
     return chunk;
 }
 
-/// Small programs touch little memory, large ones ask for chunks seldom: chunks double up to a bound.
-void* AllocateFromNewChunk(ThreadArena& arena, std::size_t bytes) {
-    if (bytes > arena.nextChunk / 4) return ::operator new(bytes);
-    arena.position = AllocateChunk(arena.nextChunk);
-    arena.left = arena.nextChunk - bytes;
-    arena.nextChunk = std::min(arena.nextChunk * 2, kLargestChunk);
-    char* piece = arena.position;
-    arena.position += bytes;
-    return piece;
-}
-
 } // namespace
 
-void* ArenaAllocate(std::size_t bytes) {
-    bytes = (bytes + kAlignment - 1) & ~(kAlignment - 1);
-    ThreadArena& arena = t_Arena;
-    if (bytes > arena.left) return AllocateFromNewChunk(arena, bytes);
-    char* piece = arena.position;
-    arena.position += bytes;
-    arena.left -= bytes;
+/// Small programs touch little memory, large ones ask for chunks seldom: chunks double up to a bound.
+void* ThreadArena::AllocateFromNewChunk(std::size_t bytes) {
+    if (bytes > nextChunk / 4) return ::operator new(bytes);
+    position = AllocateChunk(nextChunk);
+    left = nextChunk - bytes;
+    nextChunk = std::min(nextChunk * 2, kLargestChunk);
+    char* piece = position;
+    position += bytes;
     return piece;
 }
 

@@ -1,6 +1,15 @@
 #pragma once
 
 #include <cstddef>
+#include <new>
+
+#if defined(__SANITIZE_ADDRESS__)
+#define OVRIN_SINGLE_ALLOCATIONS
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define OVRIN_SINGLE_ALLOCATIONS
+#endif
+#endif
 
 namespace ovrin_yaml {
 
@@ -12,7 +21,7 @@ namespace ovrin_yaml {
 /// that overruns are seen.
 ///
 /// Returns `bytes` bytes, aligned for any pointer or integer. Throws std::bad_alloc when there is no memory.
-void* ArenaAllocate(std::size_t bytes);
+inline void* ArenaAllocate(std::size_t bytes);
 
 /// The same for a single big piece that is zero throughout, which costs nothing before it is used.
 void* AllocateZeroed(std::size_t bytes);
@@ -34,5 +43,42 @@ template <class T> struct ArenaAllocator {
 
     template <class U> bool operator==(const ArenaAllocator<U>&) const { return true; }
 };
+
+#if defined(OVRIN_SINGLE_ALLOCATIONS)
+
+inline void* ArenaAllocate(std::size_t bytes) {
+    return ::operator new(bytes);
+}
+
+#else
+
+/// What is left of the chunk that a thread carves its requests from.
+struct ThreadArena {
+    static constexpr std::size_t kAlignment = 8;
+
+    char* position = nullptr;
+    std::size_t left = 0;
+    std::size_t nextChunk = std::size_t{64} << 10;
+
+    /// The same as ArenaAllocate, where nothing fits into what is left.
+    void* AllocateFromNewChunk(std::size_t bytes);
+
+    static ThreadArena& OfThread() {
+        static constinit thread_local ThreadArena arena;
+        return arena;
+    }
+};
+
+inline void* ArenaAllocate(std::size_t bytes) {
+    bytes = (bytes + ThreadArena::kAlignment - 1) & ~(ThreadArena::kAlignment - 1);
+    ThreadArena& arena = ThreadArena::OfThread();
+    if (bytes > arena.left) return arena.AllocateFromNewChunk(bytes);
+    char* piece = arena.position;
+    arena.position += bytes;
+    arena.left -= bytes;
+    return piece;
+}
+
+#endif
 
 } // namespace ovrin_yaml

@@ -18,6 +18,9 @@ template <class T> class ArenaArray {
 
 public:
     ArenaArray() = default;
+    /// An empty array with room for `capacity` values in `memory`, which must come from the arena.
+    ArenaArray(T* memory, std::size_t capacity)
+        : m_Data(memory), m_Capacity(static_cast<std::uint32_t>(capacity)) {}
     ArenaArray(const ArenaArray&) = delete;
     ArenaArray& operator=(const ArenaArray&) = delete;
 
@@ -40,6 +43,13 @@ public:
             Grow(value);
         else
             m_Data[m_Size++] = value;
+    }
+    /// Appends `count` values that the caller must fill in, and returns the first.
+    T* append_blank(std::size_t count) {
+        reserve(m_Size + count);
+        T* first = end();
+        m_Size += static_cast<std::uint32_t>(count);
+        return first;
     }
     void erase(std::size_t index) {
         std::copy(m_Data + index + 1, end(), m_Data + index);

@@ -1,93 +1,110 @@
 #include "Document/BatchedBuilder.h"
 
+#include "Document/Hash.h"
 #include "Document/ScalarTable.h"
+#include "Document/YAMLSequence.h"
 
 namespace ovrin_yaml {
 
-BatchedBuilder::Step& BatchedBuilder::Note(Step::What what) {
-    if (m_Count == m_Steps.size()) Flush();
-    Step& step = m_Steps[m_Count++];
-    step.what = what;
-    return step;
-}
-
-void BatchedBuilder::AddText(std::string_view text, std::size_t readable) {
-    const bool isShort = text.size() <= ShortTextCache::kLongest;
-    if (isShort) {
-        if (YAMLScalar* known = m_ShortTexts.Find(ShortTextCache::Pack(text, readable)))
-            return AddScalar(known);
-    }
+void BatchedBuilder::AddNewShort(std::string_view text, const ShortTextCache::Words& words,
+                                 ShortTextCache::Entry& entry) {
     const std::uint32_t hash = ScalarTable::HashOf(text);
     ScalarTable::Instance().PrefetchSlot(hash);
-    Step& step = Note(Step::What::Text);
-    step.isShort = isShort;
-    step.hash = hash;
-    step.number = static_cast<std::uint32_t>(text.size());
-    step.text = text.data();
-    m_ReadableEnd = text.data() + readable;
+    entry = {words.low, words.high, nullptr, hash, static_cast<std::uint16_t>(words.length), 0};
+    AddLate(text, hash, &entry);
 }
 
-void BatchedBuilder::AddScalar(YAMLScalar* scalar) {
-    Note(Step::What::Scalar).scalar = scalar;
+void BatchedBuilder::AddLong(std::string_view text) {
+    const std::uint32_t hash = ScalarTable::HashOf(text);
+    ScalarTable::Instance().PrefetchSlot(hash);
+    AddLate(text, hash, nullptr);
 }
 
-void BatchedBuilder::Open(YAMLNode::Kind kind, bool flow, std::uint32_t line) {
-    const bool isMapping = kind == YAMLNode::Kind::Mapping;
-    Step& step = Note(isMapping ? Step::What::OpenMapping : Step::What::OpenSequence);
-    step.flow = flow;
-    step.number = line;
+void BatchedBuilder::AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry* entry) {
+    if (m_LateCount == kMostLate) InternTexts();
+    m_Late[m_LateCount++] = {text.data(), static_cast<std::uint32_t>(text.size()),
+                             hash,        static_cast<std::uint32_t>(m_Stack.size()),
+                             entry,       nullptr};
+    if (entry) entry->user = static_cast<std::uint16_t>(m_LateCount);
+    m_Stack.push_back({nullptr, hash, static_cast<std::uint32_t>(m_LateCount)});
 }
 
-void BatchedBuilder::Close() {
-    Note(Step::What::Close);
-}
-
-void BatchedBuilder::Flush() {
-    const ScalarTable& table = ScalarTable::Instance();
-    for (std::size_t i = 0; i < m_Count; ++i)
-        if (m_Steps[i].what == Step::What::Text) table.PrefetchScalar(m_Steps[i].hash);
-    for (std::size_t i = 0; i < m_Count; ++i) CarryOut(m_Steps[i]);
-    m_Count = 0;
-}
-
-YAMLScalar* BatchedBuilder::InternText(const Step& step) {
-    const std::string_view text(step.text, step.number);
-    YAMLScalar* scalar = ScalarTable::Instance().Intern(text, step.hash, 0);
-    if (step.isShort) {
-        const auto readable = static_cast<std::size_t>(m_ReadableEnd - step.text);
-        m_ShortTexts.Remember(ShortTextCache::Pack(text, readable), scalar);
+YAMLScalar* BatchedBuilder::Intern(std::string_view text) {
+    if (text.size() > ShortTextCache::kLongest) return ScalarTable::Instance().Intern(text, 0);
+    const ShortTextCache::Words words = Pack(text);
+    ShortTextCache::Entry& entry = m_ShortTexts.At(words);
+    if (!entry.Holds(words) || !entry.scalar) {
+        YAMLScalar* scalar = ScalarTable::Instance().Intern(text, 0);
+        entry = {words.low, words.high, scalar, scalar->m_Hash, static_cast<std::uint16_t>(words.length), 0};
     }
-    return scalar;
+    return entry.scalar;
 }
 
-void BatchedBuilder::CarryOut(const Step& step) {
-    switch (step.what) {
-    case Step::What::Text:
-        m_Builder.AddNode(InternText(step));
-        break;
-    case Step::What::Scalar:
-        m_Builder.AddNode(step.scalar);
-        break;
-    case Step::What::OpenMapping:
-        m_Builder.Open(YAMLNode::Kind::Mapping, step.flow, step.number);
-        break;
-    case Step::What::OpenSequence:
-        m_Builder.Open(YAMLNode::Kind::Sequence, step.flow, step.number);
-        break;
-    case Step::What::Close:
-        m_Builder.Close();
-        break;
+void BatchedBuilder::InternTexts() {
+    ScalarTable& table = ScalarTable::Instance();
+    for (std::size_t i = 0; i < m_LateCount; ++i) table.PrefetchScalar(m_Late[i].hash);
+    for (std::size_t i = 0; i < m_LateCount; ++i) {
+        const LateText& late = m_Late[i];
+        YAMLScalar* scalar = table.Intern({late.text, late.length}, late.hash, 0);
+        if (late.entry && late.entry->user == i + 1) {
+            late.entry->scalar = scalar;
+            late.entry->user = 0;
+        }
+        if (late.place)
+            *late.place = scalar;
+        else
+            m_Stack[late.index] = {scalar, late.hash, 0};
     }
+    m_LateCount = m_FirstLate = 0;
+}
+
+bool BatchedBuilder::CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed) {
+    const Node* nodes = m_Stack.data() + mark;
+    const std::size_t count = (m_Stack.size() - mark) / 2;
+    YAMLMapping* mapping = YAMLMapping::CreateWithRoom(flow, count);
+    YAMLMapping::Entry* entries = mapping->AppendBlank(count);
+    for (std::size_t i = 0; i < count; ++i) {
+        const Node &key = nodes[2 * i], &value = nodes[2 * i + 1];
+        entries[i] = {static_cast<YAMLScalar*>(key.node), value.node};
+        SetPlace(value, &entries[i].value);
+    }
+    std::uint32_t hash = 0;
+    for (std::uint32_t i = 0; i < count - unhashed; ++i)
+        hash = FoldPair(hash, nodes[2 * i].hash, nodes[2 * i + 1].hash, i);
+    mapping->m_Hash = hash;
+    mapping->m_Line = line;
+    m_Stack.resize(mark);
+    m_Stack.push_back({mapping, hash, 0});
+    return mapping->AdoptBlank();
+}
+
+void BatchedBuilder::CloseSequence(std::size_t mark, bool flow, std::uint32_t line) {
+    const Node* nodes = m_Stack.data() + mark;
+    const std::size_t count = m_Stack.size() - mark;
+    YAMLSequence* sequence = YAMLAlloc<YAMLSequence>::create(flow);
+    sequence->m_Items.resize(count);
+    std::uint32_t hash = 0;
+    for (std::size_t i = 0; i < count; ++i) {
+        sequence->m_Items[i] = nodes[i].node;
+        SetPlace(nodes[i], &sequence->m_Items[i]);
+        hash = FoldItem(hash, nodes[i].hash, static_cast<std::uint32_t>(i));
+    }
+    sequence->m_Hash = hash;
+    sequence->m_Line = line;
+    m_Stack.resize(mark);
+    m_Stack.push_back({sequence, hash, 0});
 }
 
 YAMLNode* BatchedBuilder::TakeRoot() {
-    Flush();
-    return m_Builder.TakeRoot();
+    YAMLNode* root = m_Stack.front().node;
+    m_Stack.clear();
+    m_FirstLate = m_LateCount;
+    return root;
 }
 
 void BatchedBuilder::Clear() {
-    m_Count = 0;
-    m_Builder.Clear();
+    m_Stack.clear();
+    m_LateCount = m_FirstLate;
 }
 
 } // namespace ovrin_yaml

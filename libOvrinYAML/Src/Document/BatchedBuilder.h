@@ -1,62 +1,102 @@
 #pragma once
 
 #include "Document/ShortTextCache.h"
-#include "Document/TreeBuilder.h"
+#include "Document/YAMLMapping.h"
+#include "Document/YAMLScalar.h"
 
 #include <array>
 #include <cstddef>
 #include <cstdint>
 #include <string_view>
+#include <vector>
 
 namespace ovrin_yaml {
 
-/// A TreeBuilder that interns its scalars many at a time.
+/// Builds value trees without repeated keys from the inside out, as a reader meets their parts, and interns
+/// their texts many at a time.
 ///
-/// Short texts that were met lately are found in a cache of the builder's own. All others wait, among the
-/// steps that they belong to. When enough steps wait, the memory of all their scalars is asked for at once,
-/// and then they are carried out:
+/// Nodes that wait for their container stand on one stack; closing a container takes its part of the stack,
+/// so that each container is made once, with its final size.
 ///
-///     noted      open | "m_X" | open flow | "fileID" | "12" | close | ...
-///     loading    slots of all hashes, then the scalars in them
-///     built      each text is interned from what is in the cache by now
+/// Short texts that were met lately are found in a cache of the builder's own. Any other text is late: only
+/// its hash is known at first, which is all that the hash of a container needs, and the memory of its scalar
+/// is asked for. The scalar itself comes when enough texts wait, into the place where its node stands by
+/// then.
+///
+///     "m_X" open "fileID" "12" close      stack  m_X | fileID | late 0, hash of "12"
+///                                                m_X | {fileID: null}     late 0 -> place of the null
+///     InternTexts                                m_X | {fileID: 12}
 class BatchedBuilder {
 public:
-    /// `text` must stay where it is until the tree is taken or the builder cleared, and so must what is
-    /// readable behind it: `readable` bytes from its start on.
-    void AddText(std::string_view text, std::size_t readable);
-    void AddScalar(YAMLScalar* scalar);
-    void Open(YAMLNode::Kind kind, bool flow, std::uint32_t line);
-    void Close();
+    /// Texts must stay where they are until they are interned. All that is in front of `readableEnd` may be
+    /// read.
+    explicit BatchedBuilder(const char* readableEnd) : m_ReadableEnd(readableEnd) {}
 
-    /// Carries out what is noted and returns the finished tree, or null.
+    void AddNode(YAMLNode* node, std::uint32_t hash) { m_Stack.push_back({node, hash, 0}); }
+    void AddScalar(YAMLScalar* scalar) { AddNode(scalar, scalar->m_Hash); }
+    void AddText(std::string_view text) {
+        if (text.size() <= ShortTextCache::kLongest) {
+            const ShortTextCache::Words words = Pack(text);
+            ShortTextCache::Entry& entry = m_ShortTexts.At(words);
+            if (!entry.Holds(words))
+                AddNewShort(text, words, entry);
+            else if (entry.scalar)
+                AddNode(entry.scalar, entry.hash);
+            else
+                AddLate(text, entry.hash, &entry);
+        } else {
+            AddLong(text);
+        }
+    }
+    /// The scalar of a text that may be read as the others, at once.
+    YAMLScalar* Intern(std::string_view text);
+
+    /// Where the stack ends: what is added from now on belongs to the container closed with it.
+    std::size_t Mark() const { return m_Stack.size(); }
+    /// Makes a mapping of the keys and values behind the mark, the last `unhashed` pairs left out of its
+    /// hash. Keys must be interned scalars. False if one of them stands there twice.
+    bool CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed = 0);
+    void CloseSequence(std::size_t mark, bool flow, std::uint32_t line);
+
+    /// Takes the tree that is the only node on the stack. Its late scalars are null until they are interned.
     YAMLNode* TakeRoot();
-    bool IsRegular() const { return m_Builder.IsRegular(); }
+    /// Completes all trees taken so far.
+    void InternTexts();
+    /// Forgets the tree under way.
     void Clear();
 
 private:
-    struct Step {
-        enum class What : std::uint8_t { Text, Scalar, OpenMapping, OpenSequence, Close };
-        What what;
-        bool flow;
-        bool isShort;         // Text: to be remembered
-        std::uint32_t hash;   // Text
-        std::uint32_t number; // length of a Text, line of a container
-        union {
-            const char* text;
-            YAMLScalar* scalar;
-        };
+    struct Node {
+        YAMLNode* node;
+        std::uint32_t hash;
+        std::uint32_t late; // number of the late text + 1, or 0
     };
+    struct LateText {
+        const char* text;
+        std::uint32_t length;
+        std::uint32_t hash;
+        std::uint32_t index;          // on the stack
+        ShortTextCache::Entry* entry; // to be completed if it is still the text's; null without one
+        YAMLNode** place;             // null while the node is on the stack
+    };
+    static constexpr std::size_t kMostLate = 256;
 
-    Step& Note(Step::What what);
-    void Flush();
-    void CarryOut(const Step& step);
-    YAMLScalar* InternText(const Step& step);
+    ShortTextCache::Words Pack(std::string_view text) const {
+        return ShortTextCache::Pack(text, static_cast<std::size_t>(m_ReadableEnd - text.data()));
+    }
+    void AddNewShort(std::string_view text, const ShortTextCache::Words& words, ShortTextCache::Entry& entry);
+    void AddLong(std::string_view text);
+    void AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry* entry);
+    void SetPlace(const Node& node, YAMLNode** place) {
+        if (node.late) m_Late[node.late - 1].place = place;
+    }
 
+    const char* const m_ReadableEnd;
+    std::vector<Node> m_Stack;
+    std::size_t m_LateCount = 0;
+    std::size_t m_FirstLate = 0; // of the tree under way
+    std::array<LateText, kMostLate> m_Late;
     ShortTextCache m_ShortTexts;
-    const char* m_ReadableEnd = nullptr; // of the texts that wait
-    std::array<Step, 256> m_Steps;
-    std::size_t m_Count = 0;
-    TreeBuilder m_Builder;
 };
 
 } // namespace ovrin_yaml

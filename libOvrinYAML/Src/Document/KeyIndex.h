@@ -24,6 +24,8 @@ public:
     void Set(const YAMLScalar* key, std::uint32_t position);
     /// The position last set for `key`, or kMissing.
     std::uint32_t Find(const YAMLScalar* key) const;
+    /// Keys that have a position.
+    std::size_t Count() const { return m_Count; }
 
 private:
     struct Slot {

@@ -1,5 +1,6 @@
 #include "Document/ObjectFile.h"
 
+#include "Document/Arena.h"
 #include "Document/ChunkWalker.h"
 #include "Document/ScalarTable.h"
 #include "Document/WrittenFormReader.h"
@@ -23,16 +24,6 @@ constexpr std::uint32_t kHeaderLines = 2;
 /// Text that is read at one go: enough for a reader to get to know the common texts, little enough to share
 /// out.
 constexpr std::size_t kPieceBytes = std::size_t{1} << 20;
-
-/// Whether the body has keys that header data gets in an object: these meet or follow it.
-bool HasHeaderKeys(const YAMLMapping& body) {
-    const auto entries = body.RawEntries();
-    return std::any_of(entries.begin(), entries.end(), [](const YAMLMapping::Entry& entry) {
-        return entry.key == YAMLScalar::fileIDPlaceHolderName ||
-               entry.key == YAMLScalar::classIDPlaceHolderName ||
-               entry.key == YAMLScalar::strippedPrefabPlaceHolderName;
-    });
-}
 
 /// The file id in a document's header line, where that has the usual form.
 std::string_view FileIDOf(const char* begin, const char* end) {
@@ -110,12 +101,17 @@ void ObjectFile::CutAlone() {
     constexpr std::size_t kBytesPerScalar = 64;
     ScalarTable::Instance().Reserve(m_Text->size() / kBytesPerScalar);
     constexpr std::size_t kBytesPerDocument = 400;
-    m_Documents.reserve(m_Text->size() / kBytesPerDocument);
+    ReserveDocuments(m_Text->size() / kBytesPerDocument);
     for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
         const char* end = FindDocumentEnd(begin);
         AddDocument(begin, static_cast<std::size_t>(end - begin), kNone);
         begin = end;
     }
+}
+
+void ObjectFile::ReserveDocuments(std::size_t count) {
+    m_Documents.reserve(count);
+    AdviseHugePages(m_Documents.data(), count * sizeof(Document));
 }
 
 void ObjectFile::AddDocument(const char* begin, std::size_t length, std::size_t lender) {
@@ -138,7 +134,7 @@ bool ObjectFile::StandsAt(const Document& document, const char* position, const 
 /// search.
 void ObjectFile::CutAlong() {
     const std::vector<Document>& known = m_Base->m_Documents;
-    m_Documents.reserve(known.size());
+    ReserveDocuments(known.size());
     std::size_t expected = 0;
     for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
         if (expected < known.size() && StandsAt(known[expected], begin, End())) {
@@ -190,22 +186,36 @@ void ObjectFile::MakePieces() {
 }
 
 void ObjectFile::ReadPiece(std::size_t piece) {
-    WrittenFormReader reader;
-    for (std::size_t i = m_Pieces[piece].first; i < m_Pieces[piece].end; ++i)
-        if (m_Documents[i].lender == kNone) ReadDocument(reader, m_Documents[i]);
+    constexpr std::size_t kAtOnce = 32;
+    WrittenFormReader reader(End());
+    for (std::size_t i = m_Pieces[piece].first; i < m_Pieces[piece].end; i += kAtOnce)
+        ReadDocuments(reader, {&m_Documents[i], std::min(kAtOnce, m_Pieces[piece].end - i)});
 }
 
-void ObjectFile::ReadDocument(WrittenFormReader& reader, Document& document) const {
+/// Reads those that no other file lends.
+void ObjectFile::ReadDocuments(WrittenFormReader& reader, std::span<Document> documents) const {
+    for (Document& document : documents)
+        if (document.lender == kNone) Read(reader, document);
+    reader.InternTexts();
+    for (Document& document : documents)
+        if (document.object) Complete(document);
+}
+
+void ObjectFile::Read(WrittenFormReader& reader, Document& document) const {
     const auto read = reader.Read({document.begin, document.length}, kHeaderLines);
-    if (!read.object || HasHeaderKeys(*read.object)) return;
     document.object = read.object;
-    document.fileID = YAMLScalar::Lookup(read.fileID);
-    AddHeaderData(*read.object, document.fileID, read.classID, read.isStripped);
-    if (m_Options.inspect && read.isRegular) read.object->m_Traits = m_Options.inspect(*read.object);
-    document.isLendable = read.isRegular && !(read.object->m_Traits & m_Options.unshared);
+    document.isAsWritten = read.isAsWritten;
+}
+
+/// What there is to do with an object that the fast reader has read, as long as it is at hand.
+void ObjectFile::Complete(Document& document) const {
+    YAMLMapping& object = *document.object;
+    document.fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
+    if (m_Options.inspect) object.m_Traits = m_Options.inspect(object);
+    document.isLendable = !(object.m_Traits & m_Options.unshared);
     document.isMarked = document.isLendable && document.isWanted;
-    read.object->m_IsShared = document.isMarked;
-    if (!m_Base && read.isAsWritten) read.object->SetSource({document.begin, document.length});
+    object.m_IsShared = document.isMarked;
+    if (!m_Base && document.isAsWritten) object.SetSource({document.begin, document.length});
 }
 
 bool ObjectFile::Finish() {
@@ -229,7 +239,7 @@ bool ObjectFile::Finish() {
 void ObjectFile::FinishDocuments() {
     YAMLMapping& root = m_Objects.GetMapping();
     root.Reserve(m_Documents.size());
-    WrittenFormReader reader;
+    WrittenFormReader reader(End());
     for (Document& document : m_Documents) {
         const Document* lender = document.lender == kNone ? nullptr : &m_Base->m_Documents[document.lender];
         if (lender && lender->isLendable) {
@@ -238,7 +248,10 @@ void ObjectFile::FinishDocuments() {
             root.Append(lender->fileID, lender->object);
             continue;
         }
-        if (lender) ReadDocument(reader, document);
+        if (lender) {
+            document.lender = kNone;
+            ReadDocuments(reader, {&document, 1});
+        }
         if (document.object)
             root.Append(document.fileID, document.object);
         else if (!ReadByLibrary(document, &document == &m_Documents.back()))

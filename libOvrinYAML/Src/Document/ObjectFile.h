@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <memory>
 #include <mutex>
+#include <span>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -20,7 +21,7 @@ struct ReaderOptions {
     bool fast = true;  ///< read documents in written form without libyaml
     bool share = true; ///< share the objects of documents that are the same in two files, to the letter
     /// Looks at each object right after the fast reader has read it, while it is at hand; what it returns is
-    /// kept as YAMLMapping::m_Traits. Called from any thread. Never called for an object with repeated keys.
+    /// kept as YAMLMapping::m_Traits. Called from any thread, only for objects without repeated keys.
     std::uint8_t (*inspect)(const YAMLMapping& object) = nullptr;
     /// Objects with one of these traits are never shared.
     std::uint8_t unshared = 0;
@@ -40,9 +41,9 @@ struct ReaderOptions {
 /// of a text behind a document that doesn't end where the next header stands.
 ///
 /// Sharing: an object that a second file takes is marked, and whoever changes it copies it first
-/// (YAMLMapping::GetForChange). Objects with repeated keys can't be copied and are not shared. Only the file
-/// that others are cut along keeps its text, with the objects that are in written form pointing into it: what
-/// nobody changes is written as the bytes that came in.
+/// (YAMLMapping::GetForChange). Objects with repeated keys are left to libyaml and are not shared. Only the
+/// file that others are cut along keeps its text, with the objects that are in written form pointing into it:
+/// what nobody changes is written as the bytes that came in.
 class ObjectFile {
 public:
     /// Fills `objects`, which must be empty and outlive the file.
@@ -74,6 +75,7 @@ private:
         std::uint8_t isWanted = false; // another file would take the object; set by several threads
         bool isLendable = false; // the object may be copied before a change, so another file may take it
         bool isMarked = false;   // the object is marked as shared
+        bool isAsWritten = false;
     };
     struct Piece {
         std::size_t first, end; // documents
@@ -88,10 +90,13 @@ private:
     std::size_t FindLender(const char* begin, const char* end, std::size_t& expected) const;
     std::size_t IndexOf(std::string_view fileID) const;
     void CutAlong();
+    void ReserveDocuments(std::size_t count);
     void AddDocument(const char* begin, std::size_t length, std::size_t lender);
     void CutAlone();
     void MakePieces();
-    void ReadDocument(WrittenFormReader& reader, Document& document) const;
+    void ReadDocuments(WrittenFormReader& reader, std::span<Document> documents) const;
+    void Read(WrittenFormReader& reader, Document& document) const;
+    void Complete(Document& document) const;
     void FinishDocuments();
     bool ReadByLibrary(const Document& document, bool isLast);
     void ReadRestByLibrary(std::size_t offset);

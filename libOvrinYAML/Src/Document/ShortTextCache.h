@@ -1,13 +1,13 @@
 #pragma once
 
+#include "Document/YAMLScalar.h"
+
 #include <array>
 #include <cstdint>
 #include <cstring>
 #include <string_view>
 
 namespace ovrin_yaml {
-
-class YAMLScalar;
 
 /// Remembers scalars of short texts that were met lately: the keys and the small numbers of a scene come
 /// again and again.
@@ -24,15 +24,13 @@ public:
     struct Words {
         std::uint64_t low = 0;
         std::uint64_t high = 0;
-        std::uint32_t length = 0;
-
-        bool operator==(const Words&) const = default;
+        std::uint64_t length = 0;
     };
 
     /// `readable` is the number of bytes from the text's start on that may be read.
     static Words Pack(std::string_view text, std::size_t readable) {
         Words words;
-        words.length = static_cast<std::uint32_t>(text.size());
+        words.length = text.size();
         if (readable < kLongest) {
             char copy[kLongest] = {};
             std::memcpy(copy, text.data(), text.size());
@@ -42,29 +40,42 @@ public:
         }
         std::memcpy(&words.low, text.data(), 8);
         std::memcpy(&words.high, text.data() + 8, 8);
-        words.low &= Mask(text.size());
-        words.high &= text.size() > 8 ? Mask(text.size() - 8) : 0;
+        words.low &= kMasks[text.size()].low;
+        words.high &= kMasks[text.size()].high;
         return words;
     }
 
-    /// The scalar, or null if it isn't remembered.
-    YAMLScalar* Find(const Words& words) const {
-        const Entry& entry = m_Entries[PlaceOf(words)];
-        return entry.words == words ? entry.scalar : nullptr;
-    }
-    void Remember(const Words& words, YAMLScalar* scalar) { m_Entries[PlaceOf(words)] = {words, scalar}; }
+    struct Entry {
+        std::uint64_t low = 0;
+        std::uint64_t high = 0;
+        YAMLScalar* scalar = nullptr; // null as long as it isn't interned
+        std::uint32_t hash = 0;       // of the text
+        std::uint16_t length = UINT16_MAX;
+        std::uint16_t user = 0; // free for those who put in texts that aren't interned
+
+        bool Holds(const Words& words) const {
+            return low == words.low && high == words.high && length == words.length;
+        }
+    };
+
+    /// Where the text stands, or would stand in place of what is there.
+    Entry& At(const Words& words) { return m_Entries[PlaceOf(words)]; }
 
 private:
-    struct Entry {
-        Words words;
-        YAMLScalar* scalar = nullptr;
-    };
     static constexpr unsigned kPlaceBits = 11;
 
-    /// The lowest `bytes` bytes, of which there are eight at the most.
-    static std::uint64_t Mask(std::size_t bytes) {
-        return bytes >= 8 ? ~std::uint64_t{0} : (std::uint64_t{1} << 8 * bytes) - 1;
-    }
+    struct Mask {
+        std::uint64_t low, high;
+    };
+    /// The lowest bytes of a pair of words, by their number.
+    static constexpr std::array<Mask, kLongest + 1> kMasks = [] {
+        const auto lowest = [](std::size_t bytes) {
+            return bytes >= 8 ? ~std::uint64_t{0} : (std::uint64_t{1} << 8 * bytes) - 1;
+        };
+        std::array<Mask, kLongest + 1> masks{};
+        for (std::size_t i = 0; i <= kLongest; ++i) masks[i] = {lowest(i), i > 8 ? lowest(i - 8) : 0};
+        return masks;
+    }();
     static std::size_t PlaceOf(const Words& words) {
         return (words.low ^ words.high * 0x9e3779b97f4a7c15u ^ words.length) * 0xd6e8feb86659fd93u >>
                (64 - kPlaceBits);

@@ -8,7 +8,6 @@
 namespace ovrin_yaml {
 
 void TreeBuilder::Open(YAMLNode::Kind kind, bool flow, std::uint32_t line) {
-    if (m_Open.empty()) m_IsRegular = true;
     m_Open.push_back({kind, flow, line, m_Nodes.size()});
 }
 
@@ -32,7 +31,6 @@ YAMLNode* TreeBuilder::MakeMapping(const OpenContainer& open) {
     for (std::size_t i = open.firstNode; i + 1 < m_Nodes.size(); i += 2, ++index)
         if (AsScalar(m_Nodes[i])) hash = FoldPair(hash, m_Nodes[i]->m_Hash, m_Nodes[i + 1]->m_Hash, index);
     mapping->AppendPairs(m_Nodes.data() + open.firstNode, m_Nodes.size() - open.firstNode);
-    m_IsRegular = m_IsRegular && !mapping->HasDuplicates() && mapping->Size() == index;
     mapping->m_Hash = hash;
     return mapping;
 }
@@ -51,11 +49,6 @@ YAMLNode* TreeBuilder::TakeRoot() {
     YAMLNode* root = m_Nodes.empty() ? nullptr : m_Nodes.front();
     m_Nodes.clear();
     return root;
-}
-
-void TreeBuilder::Clear() {
-    m_Nodes.clear();
-    m_Open.clear();
 }
 
 } // namespace ovrin_yaml

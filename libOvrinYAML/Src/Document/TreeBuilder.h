@@ -7,7 +7,8 @@
 
 namespace ovrin_yaml {
 
-/// Builds a value tree from the inside out, with hashes and lines, as a parser meets its parts.
+/// Builds a value tree from the inside out, with hashes and lines, as libyaml meets its parts. Takes any
+/// tree, with repeated keys and keys that are no scalars.
 ///
 /// Nodes that wait for their container stand on one stack; closing a container takes its part of the stack,
 /// so that each container is made once, with its final size.
@@ -26,11 +27,6 @@ public:
     std::size_t Depth() const { return m_Open.size(); }
     /// The finished tree, or null. Empties the builder.
     YAMLNode* TakeRoot();
-    /// Whether every pair since the builder was last empty is in its mapping: none was dropped for its key,
-    /// or for repeating one with an equal value.
-    bool IsRegular() const { return m_IsRegular; }
-    /// Forgets everything, what was finished and what is open.
-    void Clear();
 
 private:
     struct OpenContainer {
@@ -45,7 +41,6 @@ private:
 
     std::vector<YAMLNode*> m_Nodes;
     std::vector<OpenContainer> m_Open;
-    bool m_IsRegular = true;
 };
 
 } // namespace ovrin_yaml

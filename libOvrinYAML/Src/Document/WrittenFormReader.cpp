@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <array>
+#include <bit>
 #include <cstring>
 
 namespace ovrin_yaml {
@@ -16,7 +17,8 @@ constexpr int kMaximumDepth = 100;
 /// The parser looks for the colon behind a key within 1024 characters.
 constexpr std::ptrdiff_t kLongestKey = 1000;
 /// The writer gives longer keys another form, and breaks lines behind this column.
-constexpr std::ptrdiff_t kLongestSimpleKey = 128;
+constexpr std::size_t kLongestSimpleKey = 128;
+static_assert(kLongestSimpleKey <= KnownKey::kLongest);
 constexpr std::ptrdiff_t kLineWidth = 80;
 
 enum CharClass : std::uint8_t {
@@ -47,6 +49,29 @@ constexpr std::array<std::uint8_t, 256> kClasses = MakeClasses();
 
 bool Is(char c, CharClass wanted) {
     return kClasses[static_cast<unsigned char>(c)] & wanted;
+}
+
+/// How many of the eight bytes from `text` on are digits, or one of "-./", before another byte comes. These
+/// are most of what stands in a scene, and plain in both styles wherever they don't begin a text.
+std::size_t NumberLength(const char* text) {
+    constexpr std::uint64_t kOnes = 0x0101010101010101u, kHighBits = 0x80 * kOnes;
+    std::uint64_t word;
+    std::memcpy(&word, text, sizeof word);
+    // Each byte by itself: the high bit is set where it is at least '-', or above '9', or not ASCII.
+    const std::uint64_t fromFirst = (word | kHighBits) - '-' * kOnes;
+    const std::uint64_t behindLast = (word & ~kHighBits) + (0x7f - '9') * kOnes;
+    const std::uint64_t others = (~fromFirst | behindLast | word) & kHighBits;
+    return others ? static_cast<std::size_t>(std::countr_zero(others)) / 8 : 8;
+}
+
+/// Whether a text could be taken for the marker at the start or the end of a document.
+bool IsLikeMarker(std::string_view text) {
+    return text.starts_with("---") || text.starts_with("...");
+}
+
+/// Whether the writer gives a plain or quoted key this form.
+bool IsKeyAsWritten(std::string_view text) {
+    return !IsLikeMarker(text) && !text.ends_with(':') && text.size() <= kLongestSimpleKey;
 }
 
 void AppendUTF8(std::string& text, std::uint32_t c) {
@@ -92,35 +117,60 @@ WrittenFormReader::Document WrittenFormReader::Read(std::string_view text, std::
     m_Depth = 0;
     m_IsAsWritten = true;
     try {
-        ReadHeaderLine(document);
-        if (m_Indent != 0) throw NotSure();
-        ReadBlockMapping(0);
-        if (m_Indent != -1) throw NotSure();
-        YAMLNode* root = m_Builder.TakeRoot();
-        root->m_Line = firstLine;
-        document.object = AsMapping(root);
-        document.isRegular = m_Builder.IsRegular();
-        document.isAsWritten = m_IsAsWritten && document.isRegular;
+        document.object = ReadObject(firstLine);
+        document.isAsWritten = m_IsAsWritten;
     } catch (const NotSure&) {
         m_Builder.Clear();
     }
     return document;
 }
 
-void WrittenFormReader::ReadHeaderLine(Document& document) {
+YAMLMapping* WrittenFormReader::ReadObject(std::uint32_t firstLine) {
+    const Header header = ReadHeaderLine();
+    if (m_Indent != 0) throw NotSure();
+    ReadPairs(0, m_KnownKeys.Root());
+    if (m_Indent != -1) throw NotSure();
+    const std::size_t headerPairs = AddHeaderData(header);
+    CloseMapping(0, false, firstLine, headerPairs);
+    YAMLMapping* object = AsMapping(m_Builder.TakeRoot());
+    // A body's own entry would be taken for the header's.
+    if (!header.isStripped && object->HasKey(YAMLScalar::strippedPrefabPlaceHolderName)) throw NotSure();
+    return object;
+}
+
+WrittenFormReader::Header WrittenFormReader::ReadHeaderLine() {
     constexpr std::string_view kMarker = "--- !o!", kAnchor = " &", kStripped = " stripped";
     const auto skip = [this](std::string_view text) {
         if (!std::string_view(m_Position, m_End - m_Position).starts_with(text)) return false;
         m_Position += text.size();
         return true;
     };
+    Header header;
     if (!skip(kMarker)) throw NotSure();
-    document.classID = ReadId();
+    header.classID = ReadId();
     if (!skip(kAnchor)) throw NotSure();
-    document.fileID = ReadId();
-    document.isStripped = skip(kStripped);
+    header.fileID = ReadId();
+    header.isStripped = skip(kStripped);
     if (*m_Position != '\n') throw NotSure();
     NextLine();
+    return header;
+}
+
+/// The number of pairs.
+std::size_t WrittenFormReader::AddHeaderData(const Header& header) {
+    m_Builder.AddScalar(YAMLScalar::fileIDPlaceHolderName);
+    m_Builder.AddText(header.fileID);
+    m_Builder.AddScalar(YAMLScalar::classIDPlaceHolderName);
+    m_Builder.AddText(header.classID);
+    if (!header.isStripped) return 2;
+    m_Builder.AddScalar(YAMLScalar::strippedPrefabPlaceHolderName);
+    m_Builder.AddScalar(YAMLScalar::one);
+    return 3;
+}
+
+/// A mapping that repeats a key is left to the library's path.
+void WrittenFormReader::CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed) {
+    if (!m_Builder.CloseMapping(mark, flow, line, unhashed)) throw NotSure();
 }
 
 std::string_view WrittenFormReader::ReadId() {
@@ -153,54 +203,95 @@ bool WrittenFormReader::AtListItem() const {
 // Block style. Each function begins at the first character of its node and ends at that of the next line that
 // is not its own, with m_Indent set.
 
-void WrittenFormReader::ReadBlockMapping(int indent) {
+void WrittenFormReader::ReadBlockMapping(int indent, KnownKey& parent) {
     const Nesting nesting(*this);
-    m_Builder.Open(YAMLNode::Kind::Mapping, false, m_Line);
-    do {
-        if (!Is(*m_Position, kPlainStart)) throw NotSure();
-        const char* end = ScanPlain(m_Position);
-        if (*end != ':' || end - m_Position > kLongestKey) throw NotSure();
-        NoteKey(m_Position, end);
-        AddText(m_Position, end);
-        m_Position = end + 1;
-        ReadBlockValue(indent);
-    } while (m_Indent == indent);
-    m_Builder.Close();
+    const std::size_t mark = m_Builder.Mark();
+    const std::uint32_t line = m_Line;
+    ReadPairs(indent, parent);
+    CloseMapping(mark, false, line);
 }
 
-void WrittenFormReader::ReadBlockValue(int indent) {
+void WrittenFormReader::ReadPairs(int indent, KnownKey& parent) {
+    KeyGuess* guess = &parent.inside;
+    do {
+        KnownKey& key = ReadBlockKey(parent, *guess);
+        ReadBlockValue(indent, key);
+        guess = &key.next;
+    } while (m_Indent == indent);
+}
+
+/// The key here, if it is one of those that are expected.
+KnownKey* WrittenFormReader::GuessKey(KeyGuess& guess) const {
+    const bool isReadable = m_ReadableEnd - m_Position > static_cast<std::ptrdiff_t>(KnownKey::kLongest + 1);
+    return isReadable ? KnownKeys::Find(guess, m_Position) : nullptr;
+}
+
+/// Ends behind the colon.
+KnownKey& WrittenFormReader::ReadBlockKey(const KnownKey& parent, KeyGuess& guess) {
+    if (KnownKey* known = GuessKey(guess)) {
+        const char* behind = m_Position + known->length + 1;
+        if (*behind == ' ' || *behind == '\n') {
+            m_Builder.AddNode(known->scalar, known->hash);
+            m_Position = behind;
+            return *known;
+        }
+    }
+    if (!Is(*m_Position, kPlainStart)) throw NotSure();
+    const char* end = ScanPlain(m_Position);
+    if (*end != ':' || end - m_Position > kLongestKey) throw NotSure();
+    return AddKey(end, parent, guess);
+}
+
+/// Adds a key that wasn't guessed. It can be guessed from now on if it is the same in any place, whatever
+/// stands around it: plain in both styles, without blanks, and what the writer writes for it. Ends behind the
+/// colon.
+KnownKey& WrittenFormReader::AddKey(const char* end, const KnownKey& parent, KeyGuess& guess) {
+    const std::string_view text(m_Position, static_cast<std::size_t>(end - m_Position));
+    YAMLScalar* scalar = m_Builder.Intern(text);
+    m_Builder.AddScalar(scalar);
+    m_Position = end + 1;
+    const bool isWritten = IsKeyAsWritten(text);
+    NoteIf(!isWritten);
+    const bool isSame = Is(text[0], kPlainStart) &&
+                        std::all_of(text.begin(), text.end(), [](char c) { return Is(c, kFlow); });
+    return isWritten && isSame ? m_KnownKeys.Learn(parent, scalar, guess) : m_KnownKeys.Unknown();
+}
+
+void WrittenFormReader::ReadBlockValue(int indent, KnownKey& parent) {
     const bool hasBlank = *m_Position == ' ';
-    if (hasBlank && *++m_Position != '\n') return ReadInline(indent);
+    if (hasBlank && *++m_Position != '\n') return ReadInline(indent, parent);
     NextLine();
     const bool isList = m_Indent == indent && AtListItem();
     const bool isEmpty = m_Indent <= indent && !isList;
     NoteIf(hasBlank != isEmpty);
     if (isList)
-        ReadBlockSequence(indent);
+        ReadBlockSequence(indent, parent);
     else if (isEmpty)
         m_Builder.AddScalar(YAMLScalar::empty);
     else if (m_Indent == indent + 2 && !AtListItem())
-        ReadBlockMapping(m_Indent);
+        ReadBlockMapping(m_Indent, parent);
     else
         throw NotSure();
 }
 
-void WrittenFormReader::ReadBlockSequence(int indent) {
+void WrittenFormReader::ReadBlockSequence(int indent, KnownKey& parent) {
     const Nesting nesting(*this);
-    m_Builder.Open(YAMLNode::Kind::Sequence, false, m_Line);
+    const std::size_t mark = m_Builder.Mark();
+    const std::uint32_t line = m_Line;
     do {
-        ReadItem(indent);
+        ReadItem(indent, parent);
     } while (m_Indent == indent && AtListItem());
-    m_Builder.Close();
+    m_Builder.CloseSequence(mark, false, line);
 }
 
-void WrittenFormReader::ReadItem(int indent) {
+void WrittenFormReader::ReadItem(int indent, KnownKey& parent) {
     const bool hasBlank = *++m_Position == ' ';
     if (hasBlank && *++m_Position != '\n') {
         m_Indent = indent + 2;
-        if (AtListItem()) return ReadBlockSequence(m_Indent);
-        if (Is(*m_Position, kPlainStart) && *ScanPlain(m_Position) == ':') return ReadBlockMapping(m_Indent);
-        return ReadInline(indent);
+        if (AtListItem()) return ReadBlockSequence(m_Indent, parent);
+        if (Is(*m_Position, kPlainStart) && *ScanPlain(m_Position) == ':')
+            return ReadBlockMapping(m_Indent, parent);
+        return ReadInline(indent, parent);
     }
     NextLine();
     if (m_Indent > indent) throw NotSure();
@@ -209,13 +300,13 @@ void WrittenFormReader::ReadItem(int indent) {
 }
 
 /// A value that begins on the line of its key or dash. What is further in than `indent` continues it.
-void WrittenFormReader::ReadInline(int indent) {
+void WrittenFormReader::ReadInline(int indent, KnownKey& parent) {
     const char first = *m_Position;
     if (first == '{' || first == '[') {
         m_FlowIndent = indent;
-        ReadFlow();
+        ReadFlow(parent);
     } else if (first == '\'' || first == '"') {
-        ReadQuoted(false);
+        AddQuoted(ReadQuoted(false));
     } else {
         ReadPlainLines(indent);
         return;
@@ -225,9 +316,13 @@ void WrittenFormReader::ReadInline(int indent) {
     if (m_Indent > indent) throw NotSure();
 }
 
+const char* WrittenFormReader::SkipNumber(const char* from) const {
+    return m_ReadableEnd - from >= 8 ? from + NumberLength(from) : from;
+}
+
 /// The end of the plain text on this line: the line end, or a colon that ends a key.
 const char* WrittenFormReader::ScanPlain(const char* from) const {
-    for (const char* p = from;; ++p) {
+    for (const char* p = SkipNumber(from);; ++p) {
         while (Is(*p, kPlain)) ++p;
         switch (*p) {
         case '\n':
@@ -257,7 +352,7 @@ void WrittenFormReader::ReadPlainLines(int indent) {
     std::ptrdiff_t width = Column(end);
     m_Position = end;
     NextLine();
-    if (m_Indent <= indent) return AddText(begin, end);
+    if (m_Indent <= indent) return m_Builder.AddText({begin, end});
     m_Text.assign(begin, end);
     while (m_Indent > indent) {
         NoteIf(width <= kLineWidth || m_Indent != indent + 2);
@@ -276,81 +371,91 @@ void WrittenFormReader::ReadPlainLines(int indent) {
 /// A text that stands plain on this line: the writer breaks lines at blanks behind the width, and quotes what
 /// could be taken for a document marker.
 void WrittenFormReader::NoteText(const char* begin, const char* end) {
-    const std::string_view text(begin, static_cast<std::size_t>(end - begin));
-    NoteIf(text.starts_with("---") || text.starts_with("..."));
+    if (*begin == '-' || *begin == '.') NoteIf(IsLikeMarker({begin, end}));
     if (Column(end) <= kLineWidth) return;
     const char* const behindWidth = std::max(begin, m_LineStart + kLineWidth + 1);
     NoteIf(behindWidth < end && std::memchr(behindWidth, ' ', static_cast<std::size_t>(end - behindWidth)));
 }
 
-void WrittenFormReader::NoteKey(const char* begin, const char* end) {
-    const std::string_view text(begin, static_cast<std::size_t>(end - begin));
-    NoteIf(text.starts_with("---") || text.starts_with("...") || text.ends_with(':') ||
-           end - begin > kLongestSimpleKey);
-}
-
 // Flow style. Each function begins at the first character of its node and ends behind the last.
 
-void WrittenFormReader::ReadFlow() {
+void WrittenFormReader::ReadFlow(KnownKey& parent) {
     const Nesting nesting(*this);
     m_FlowIndent += 2;
     if (*m_Position == '{')
-        ReadFlowMapping();
+        ReadFlowMapping(parent);
     else
-        ReadFlowSequence();
+        ReadFlowSequence(parent);
     m_FlowIndent -= 2;
 }
 
-void WrittenFormReader::OpenFlow(YAMLNode::Kind kind) {
-    m_Builder.Open(kind, true, m_Line);
-    ++m_Position;
-}
-
-void WrittenFormReader::ReadFlowMapping() {
-    OpenFlow(YAMLNode::Kind::Mapping);
-    if (*m_Position == '}') {
+void WrittenFormReader::ReadFlowMapping(KnownKey& parent) {
+    const std::size_t mark = m_Builder.Mark();
+    const std::uint32_t line = m_Line;
+    if (*++m_Position == '}') {
         ++m_Position;
     } else {
         NoteIf(Column(m_Position) > kLineWidth);
+        KeyGuess* guess = &parent.inside;
         do {
-            const char* begin = m_Position;
-            const std::uint32_t line = m_Line;
-            const bool isQuoted = *begin == '\'' || *begin == '"';
-            if (isQuoted)
-                ReadQuoted(true);
-            else
-                ReadFlowPlain();
-            if (m_Line != line || m_Position - begin > kLongestKey) throw NotSure();
-            NoteKey(begin, m_Position);
-            if (*m_Position != ':' || m_Position[1] != ' ') throw NotSure();
-            m_Position += 2;
-            ReadFlowValue();
+            KnownKey& key = ReadFlowKey(parent, *guess);
+            ReadFlowValue(key);
+            guess = &key.next;
         } while (ReadFlowSeparator('}'));
     }
-    m_Builder.Close();
+    CloseMapping(mark, true, line);
 }
 
-void WrittenFormReader::ReadFlowSequence() {
-    OpenFlow(YAMLNode::Kind::Sequence);
-    if (*m_Position == ']') {
+/// Ends at the first character of the value.
+KnownKey& WrittenFormReader::ReadFlowKey(const KnownKey& parent, KeyGuess& guess) {
+    KnownKey* known = GuessKey(guess);
+    if (known && m_Position[known->length + 1] == ' ') {
+        m_Builder.AddNode(known->scalar, known->hash);
+        m_Position += known->length + 2;
+        return *known;
+    }
+    const char* begin = m_Position;
+    KnownKey* key = &m_KnownKeys.Unknown();
+    if (*begin == '\'' || *begin == '"') {
+        const std::uint32_t line = m_Line;
+        m_Builder.AddScalar(YAMLScalar::Lookup(ReadQuoted(true)));
+        if (m_Line != line) throw NotSure();
+        NoteIf(!IsKeyAsWritten({begin, m_Position}));
+        if (*m_Position++ != ':') throw NotSure();
+    } else {
+        const char* end = ScanFlowPlain();
+        if (*end != ':') throw NotSure();
+        key = &AddKey(end, parent, guess);
+    }
+    if (m_Position - begin > kLongestKey + 1 || *m_Position++ != ' ') throw NotSure();
+    return *key;
+}
+
+void WrittenFormReader::ReadFlowSequence(KnownKey& parent) {
+    const std::size_t mark = m_Builder.Mark();
+    const std::uint32_t line = m_Line;
+    if (*++m_Position == ']') {
         ++m_Position;
     } else {
         NoteIf(Column(m_Position) > kLineWidth);
         do {
-            ReadFlowValue();
+            ReadFlowValue(parent);
         } while (ReadFlowSeparator(']'));
     }
-    m_Builder.Close();
+    m_Builder.CloseSequence(mark, true, line);
 }
 
-void WrittenFormReader::ReadFlowValue() {
+void WrittenFormReader::ReadFlowValue(KnownKey& parent) {
     const char first = *m_Position;
-    if (first == '{' || first == '[')
-        ReadFlow();
-    else if (first == '\'' || first == '"')
-        ReadQuoted(true);
-    else
-        ReadFlowPlain();
+    if (first == '{' || first == '[') {
+        ReadFlow(parent);
+    } else if (first == '\'' || first == '"') {
+        AddQuoted(ReadQuoted(true));
+    } else {
+        const char* end = ScanFlowPlain();
+        m_Builder.AddText({m_Position, end});
+        m_Position = end;
+    }
 }
 
 /// Behind an entry: true at the first character of the next, false behind the closing bracket.
@@ -373,20 +478,29 @@ bool WrittenFormReader::ReadFlowSeparator(char close) {
     return true;
 }
 
-void WrittenFormReader::ReadFlowPlain() {
+/// The end of the plain text. A blank, a line end or a sign that has a meaning of its own is met by the
+/// caller, who wants none of them.
+const char* WrittenFormReader::ScanFlowPlain() {
     const char* p = m_Position;
     if (!Is(*p, kPlainStart) && !(*p == '-' && Is(p[1], kFlow))) throw NotSure();
+    p = SkipNumber(p);
     while (Is(*p, kFlow) || (*p == ' ' && Is(p[1], kFlow))) ++p;
-    // A blank, a line end or a sign that has a meaning of its own is met by the caller, who wants none of
-    // them.
     NoteText(m_Position, p);
-    AddText(m_Position, p);
-    m_Position = p;
+    return p;
 }
 
 // Quoted texts.
 
-void WrittenFormReader::ReadQuoted(bool inFlow) {
+void WrittenFormReader::AddQuoted(std::string_view text) {
+    // A text in m_Text will not stay.
+    if (text.data() == m_Text.data())
+        m_Builder.AddScalar(YAMLScalar::Lookup(text));
+    else
+        m_Builder.AddText(text);
+}
+
+/// The text, which stands in the document or in m_Text.
+std::string_view WrittenFormReader::ReadQuoted(bool inFlow) {
     const char quote = *m_Position++;
     const char* p = m_Position;
     const char other = quote == '"' ? '\'' : '"';
@@ -396,12 +510,12 @@ void WrittenFormReader::ReadQuoted(bool inFlow) {
     NoteText(m_Position, p);
     const ScalarForms forms = ClassifyScalar(text);
     NoteIf(quote != '\'' || !forms.singleQuoted || (inFlow ? forms.plainInFlow : forms.plainInBlock));
-    AddText(m_Position, p);
     m_Position = p + 1;
+    return text;
 }
 
 /// Up to `from` the text stands for itself, unless it ends in blanks: these are looked at again.
-void WrittenFormReader::ReadQuotedWithFolds(const char* from) {
+std::string_view WrittenFormReader::ReadQuotedWithFolds(const char* from) {
     m_IsAsWritten = false;
     const char quote = m_Position[-1];
     while (from != m_Position && from[-1] == ' ') --from;
@@ -422,7 +536,7 @@ void WrittenFormReader::ReadQuotedWithFolds(const char* from) {
         }
     }
     ++m_Position;
-    m_Builder.AddScalar(YAMLScalar::Lookup(m_Text));
+    return m_Text;
 }
 
 /// Blanks inside a line stand for themselves. Around line ends they count for nothing: one line end is a

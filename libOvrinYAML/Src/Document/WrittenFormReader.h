@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Document/BatchedBuilder.h"
+#include "Document/KnownKeys.h"
 #include "Document/YAMLMapping.h"
 
 #include <cstdint>
@@ -22,65 +23,84 @@ namespace ovrin_yaml {
 /// means. For what it accepts the tree is the one that the parser's events give, with the same hashes and
 /// lines.
 ///
-/// One reader serves any number of documents, on one thread.
+/// One reader serves any number of documents of one file, on one thread.
 class WrittenFormReader {
 public:
     struct Document {
-        YAMLMapping* object = nullptr; // owned by the caller; null: not sure
-        std::string_view classID;      // both point into the document
-        std::string_view fileID;
-        bool isStripped = false;
-        /// No mapping in it has a key twice.
-        bool isRegular = false;
-        /// The writer would write the object as these very bytes. Only said of regular ones.
+        /// Owned by the caller, with header data behind the body. Null: not sure. Its texts are missing up to
+        /// the next InternTexts.
+        YAMLMapping* object = nullptr;
+        /// The writer would write the object as these very bytes.
         bool isAsWritten = false;
     };
 
-    /// `text` reaches from the "---" of the document up to that of the next or to the end of the file; the
-    /// byte behind it must be readable. `firstLine` is the zero-based line of the "---".
+    /// Everything in front of `readableEnd` may be read.
+    explicit WrittenFormReader(const char* readableEnd)
+        : m_ReadableEnd(readableEnd), m_Builder(readableEnd) {}
+
+    /// `text` reaches from the "---" of the document up to that of the next or to the end of the file; it
+    /// must stay up to the next InternTexts, and the byte behind it must be readable. `firstLine` is the
+    /// zero-based line of the "---". No mapping of an object that is given back has a key twice.
     Document Read(std::string_view text, std::uint32_t firstLine);
+    /// Completes the objects read so far. Better for many of them than for each.
+    void InternTexts() { m_Builder.InternTexts(); }
 
 private:
     /// Thrown where the reader isn't sure, and caught by Read.
     struct NotSure {};
 
-    void ReadHeaderLine(Document& document);
+    struct Header {
+        std::string_view classID;
+        std::string_view fileID;
+        bool isStripped;
+    };
+
+    YAMLMapping* ReadObject(std::uint32_t firstLine);
+    Header ReadHeaderLine();
     std::string_view ReadId();
-    void AddText(const char* begin, const char* end) {
-        m_Builder.AddText({begin, end}, static_cast<std::size_t>(m_End - begin));
-    }
+    void ReadPairs(int indent, KnownKey& parent);
+    std::size_t AddHeaderData(const Header& header);
+    void CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed = 0);
     void NextLine();
     bool AtListItem() const;
     std::ptrdiff_t Column(const char* position) const { return position - m_LineStart; }
     void NoteIf(bool differs) { m_IsAsWritten = m_IsAsWritten && !differs; }
     void NoteText(const char* begin, const char* end);
-    void NoteKey(const char* begin, const char* end);
 
-    void ReadBlockMapping(int indent);
-    void ReadBlockValue(int indent);
-    void ReadBlockSequence(int indent);
-    void ReadItem(int indent);
-    void ReadInline(int indent);
+    // `parent` is the key that a value stands under.
+
+    void ReadBlockMapping(int indent, KnownKey& parent);
+    KnownKey* GuessKey(KeyGuess& guess) const;
+    KnownKey& ReadBlockKey(const KnownKey& parent, KeyGuess& guess);
+    KnownKey& AddKey(const char* end, const KnownKey& parent, KeyGuess& guess);
+    void ReadBlockValue(int indent, KnownKey& parent);
+    void ReadBlockSequence(int indent, KnownKey& parent);
+    void ReadItem(int indent, KnownKey& parent);
+    void ReadInline(int indent, KnownKey& parent);
     void ReadPlainLines(int indent);
+    const char* SkipNumber(const char* from) const;
     const char* ScanPlain(const char* from) const;
 
-    void ReadFlow();
-    void ReadFlowMapping();
-    void ReadFlowSequence();
-    void ReadFlowValue();
-    void OpenFlow(YAMLNode::Kind kind);
+    void ReadFlow(KnownKey& parent);
+    void ReadFlowMapping(KnownKey& parent);
+    KnownKey& ReadFlowKey(const KnownKey& parent, KeyGuess& guess);
+    void ReadFlowSequence(KnownKey& parent);
+    void ReadFlowValue(KnownKey& parent);
     bool ReadFlowSeparator(char close);
-    void ReadFlowPlain();
+    const char* ScanFlowPlain();
 
-    void ReadQuoted(bool inFlow);
-    void ReadQuotedWithFolds(const char* from);
+    void AddQuoted(std::string_view text);
+    std::string_view ReadQuoted(bool inFlow);
+    std::string_view ReadQuotedWithFolds(const char* from);
     void FoldLines();
     void Unescape();
     std::uint32_t ReadHex(int digits);
 
     class Nesting;
 
+    const char* const m_ReadableEnd;
     BatchedBuilder m_Builder;
+    KnownKeys m_KnownKeys;
     std::string m_Text; // of a scalar that doesn't stand in the document as it is
     const char* m_Position = nullptr;
     const char* m_End = nullptr;

@@ -74,6 +74,17 @@ void YAMLMapping::Append(const YAMLScalar* key, YAMLNode* value) {
     m_HasDuplicates = true;
 }
 
+bool YAMLMapping::AdoptBlank() {
+    if (m_Entries.size() > KeyIndex::kSearchLimit) {
+        BuildIndex();
+        return Index()->Count() == m_Entries.size();
+    }
+    for (const Entry* entry = m_Entries.begin(); entry != m_Entries.end(); ++entry)
+        for (const Entry* earlier = m_Entries.begin(); earlier != entry; ++earlier)
+            if (earlier->key == entry->key) return false;
+    return true;
+}
+
 void YAMLMapping::AppendPairs(YAMLNode* const* keysAndValues, std::size_t count) {
     for (std::size_t i = 0; i + 1 < count; i += 2)
         if (const YAMLScalar* key = AsScalar(keysAndValues[i])) Append(key, keysAndValues[i + 1]);

@@ -58,6 +58,9 @@ public:
     };
 
     explicit YAMLMapping(bool flow = false) : YAMLNode(Kind::Mapping), m_Flow(flow) {}
+    /// With room for `capacity` pairs in `memory`, which must come from the arena.
+    YAMLMapping(bool flow, Entry* memory, std::size_t capacity)
+        : YAMLNode(Kind::Mapping), m_Flow(flow), m_Entries(memory, capacity) {}
     YAMLMapping(const YAMLMapping&) = delete;
     YAMLMapping& operator=(const YAMLMapping&) = delete;
     ~YAMLMapping();
@@ -76,6 +79,13 @@ private:
     std::uint32_t m_Removed : 31 = 0; // pairs in m_Entries whose key is null; only where there is an index
 
 public:
+    /// A new block or flow mapping with room for `capacity` pairs, which stand right behind it in memory.
+    static YAMLMapping* CreateWithRoom(bool flow, std::size_t capacity) {
+        void* memory = ArenaAllocate(sizeof(YAMLMapping) + capacity * sizeof(Entry));
+        void* behind = static_cast<YAMLMapping*>(memory) + 1;
+        return new (memory) YAMLMapping(flow, static_cast<Entry*>(behind), capacity);
+    }
+
     /// The bytes that the writer would give for this object, or nothing where they aren't known. Valid until
     /// the object is changed; they belong to whoever read the file.
     std::string_view Source() const { return m_Extra ? m_Extra->source : std::string_view(); }
@@ -91,6 +101,10 @@ public:
     /// Adds a pair at the end. A key that is there already keeps its value if the new one is equal (which is
     /// dropped), and brings on the duplicate state if not. Never throws a YAMLError.
     void Append(const YAMLScalar* key, YAMLNode* value);
+    /// Appends pairs to be filled in by the caller, who then calls AdoptBlank.
+    Entry* AppendBlank(std::size_t count) { return m_Entries.append_blank(count); }
+    /// Takes in what was filled in. False if a key stands in the mapping twice, which must be given up then.
+    bool AdoptBlank();
     /// Appends keys and values that stand by turns, `count` of both; pairs whose key is no scalar are left
     /// out.
     void AppendPairs(YAMLNode* const* keysAndValues, std::size_t count);
