@@ -50,7 +50,7 @@ struct ReadFile {
 const YAMLNode* Search(const YAMLNode* node, std::string_view key) {
     const YAMLMapping* mapping = AsMapping(node);
     if (!mapping) return nullptr;
-    for (const YAMLMapping::Entry& entry : mapping->RawEntries())
+    for (const YAMLMapping::Entry entry : mapping->RawEntries())
         if (entry.key && entry.key->Value() == key) return entry.value;
     return nullptr;
 }
@@ -59,7 +59,7 @@ bool HasLinkBelow(std::string_view key, const YAMLNode& node) {
     if (const YAMLMapping* mapping = AsMapping(&node)) {
         const YAMLScalar* target = AsScalar(Search(mapping, "fileID"));
         bool found = key == "m_PrefabInternal" && target && target->Value() != "0";
-        for (const YAMLMapping::Entry& entry : mapping->RawEntries())
+        for (const YAMLMapping::Entry entry : mapping->RawEntries())
             found = found || (entry.key && HasLinkBelow(entry.key->Value(), *entry.value));
         return found;
     }
@@ -84,7 +84,7 @@ std::uint8_t PlainTraits(const YAMLMapping& object) {
 
 /// The source bytes and the traits of the objects.
 std::string CheckNotes(const YAMLMapping& root) {
-    for (const YAMLMapping::Entry& entry : root.RawEntries()) {
+    for (const YAMLMapping::Entry entry : root.RawEntries()) {
         const YAMLMapping& object = *AsMapping(entry.value);
         const std::string id(entry.key->Value());
         if (object.m_Traits && object.m_Traits != PlainTraits(object))

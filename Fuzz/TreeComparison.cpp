@@ -27,8 +27,9 @@ std::string CompareContainers(const YAMLNode& left, const YAMLNode& right, bool 
 }
 
 std::vector<YAMLMapping::Entry> EntriesOf(const YAMLMapping& mapping) {
-    std::vector<YAMLMapping::Entry> entries(mapping.RawEntries().begin(), mapping.RawEntries().end());
-    std::erase_if(entries, [](const YAMLMapping::Entry& entry) { return !entry.key; });
+    std::vector<YAMLMapping::Entry> entries;
+    for (const YAMLMapping::Entry entry : mapping.RawEntries())
+        if (entry.key) entries.push_back(entry);
     return entries;
 }
 

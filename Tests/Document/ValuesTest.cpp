@@ -192,6 +192,36 @@ TEST(DuplicateKeys, ABigMappingKeepsItsOrderWhenItFallsIntoTheState) {
     EXPECT_EQ(Show(mapping), "{" + expected + "k7: other}");
 }
 
+TEST(Mappings, AChangeOfKeysLeavesThoseOfOtherMappingsAlone) {
+    const std::function<void(YAMLMapping&)> changes[] = {
+        [](YAMLMapping& m) { m.Insert(S("d"), YAMLScalar::zero); },
+        [](YAMLMapping& m) { m.Append(S("b"), YAMLScalar::zero); }, // the duplicate state
+        [](YAMLMapping& m) { m.Steal(S("a")); },
+        [](YAMLMapping& m) { m.ChangeKey(S("a"), S("z")); },
+        [](YAMLMapping& m) {
+            m.Reorder({S("c"), S("b"), S("a")});
+        },
+        [](YAMLMapping& m) { m.Change(S("b"), YAMLScalar::zero); },
+        [](YAMLMapping& m) { m.Clear(); },
+    };
+    for (const auto& change : changes) {
+        YAMLSequence* list = List("[{a: 1, b: 2, c: 3}, {a: 4, b: 5, c: 6}]");
+        YAMLMapping& first = ToMapping(list->m_Items[0]);
+        const std::string second = Dump(list->m_Items[1]);
+        YAMLNode* const copy = first.Clone();
+        const std::string before = Dump(&first);
+        ASSERT_EQ(Dump(copy), before);
+        change(first);
+        const std::string changed = Dump(&first);
+        EXPECT_NE(changed, before);
+        EXPECT_EQ(Dump(CopyExactly(&first)), changed);
+        EXPECT_EQ(Dump(list->m_Items[1]), second);
+        EXPECT_EQ(Dump(copy), before);
+        ToMapping(copy).Steal(S("c"));
+        EXPECT_EQ(Dump(&first), changed);
+    }
+}
+
 TEST(Mappings, FailuresAreToldAndChangeNothing) {
     YAMLMapping* mapping = Doc("{a: 1, b: 2}");
     const std::pair<std::function<void()>, const char*> cases[] = {

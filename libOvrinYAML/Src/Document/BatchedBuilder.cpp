@@ -61,12 +61,17 @@ void BatchedBuilder::InternTexts() {
 bool BatchedBuilder::CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed) {
     const Node* nodes = m_Stack.data() + mark;
     const std::size_t count = (m_Stack.size() - mark) / 2;
-    YAMLMapping* mapping = YAMLMapping::CreateWithRoom(flow, count);
-    YAMLMapping::Entry* entries = mapping->AppendBlank(count);
+    std::uint32_t keysHash = 0;
+    for (std::size_t i = 0; i < count; ++i) keysHash = KeyLists::Fold(keysHash, nodes[2 * i].hash);
+    const KeyLists::List keys = m_KeyLists.Get(
+        count, keysHash, [nodes](std::size_t i) { return static_cast<YAMLScalar*>(nodes[2 * i].node); });
+    if (!keys) return false;
+    YAMLMapping* mapping = YAMLMapping::Create(flow, keys, count);
+    YAMLNode** values = mapping->Values();
     for (std::size_t i = 0; i < count; ++i) {
-        const Node &key = nodes[2 * i], &value = nodes[2 * i + 1];
-        entries[i] = {static_cast<YAMLScalar*>(key.node), value.node};
-        SetPlace(value, &entries[i].value);
+        const Node& value = nodes[2 * i + 1];
+        values[i] = value.node;
+        SetPlace(value, &values[i]);
     }
     std::uint32_t hash = 0;
     for (std::uint32_t i = 0; i < count - unhashed; ++i)
@@ -75,7 +80,7 @@ bool BatchedBuilder::CloseMapping(std::size_t mark, bool flow, std::uint32_t lin
     mapping->m_Line = line;
     m_Stack.resize(mark);
     m_Stack.push_back({mapping, hash, 0});
-    return mapping->AdoptBlank();
+    return true;
 }
 
 void BatchedBuilder::CloseSequence(std::size_t mark, bool flow, std::uint32_t line) {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Document/KeyLists.h"
 #include "Document/ShortTextCache.h"
 #include "Document/YAMLMapping.h"
 #include "Document/YAMLScalar.h"
@@ -97,6 +98,7 @@ private:
     std::size_t m_FirstLate = 0; // of the tree under way
     std::array<LateText, kMostLate> m_Late;
     ShortTextCache m_ShortTexts;
+    KeyLists m_KeyLists;
 };
 
 } // namespace ovrin_yaml

@@ -32,10 +32,14 @@ void AppendHeaderLine(const YAMLScalar& rootKey, const YAMLMapping& object, std:
 }
 
 void AppendBody(const YAMLMapping& object, std::string& text) {
-    std::vector<YAMLMapping::Entry> body;
-    for (const YAMLMapping::Entry& entry : object)
-        if (!IsPlaceHolder(entry.key)) body.push_back(entry);
-    YAMLEmitter(text).EmitDocument(body, object.m_Flow);
+    std::vector<const YAMLScalar*> keys;
+    std::vector<YAMLNode*> values;
+    for (const YAMLMapping::Entry entry : object) {
+        if (IsPlaceHolder(entry.key)) continue;
+        keys.push_back(entry.key);
+        values.push_back(entry.value);
+    }
+    YAMLEmitter(text).EmitDocument({keys.data(), values.data(), keys.size()}, object.m_Flow);
     text.push_back('\n');
 }
 
@@ -43,7 +47,7 @@ void AppendBody(const YAMLMapping& object, std::string& text) {
 
 void OvrinObjects::Output(std::ostream& stream) const {
     std::string text = kFileHeader;
-    for (const YAMLMapping::Entry& entry : m_Root) {
+    for (const YAMLMapping::Entry entry : m_Root) {
         const YAMLMapping& object = ToMapping(entry.value);
         if (!object.Source().empty()) {
             text += object.Source();

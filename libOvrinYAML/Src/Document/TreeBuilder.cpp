@@ -22,16 +22,35 @@ YAMLNode* TreeBuilder::Close() {
 }
 
 YAMLNode* TreeBuilder::MakeMapping(const OpenContainer& open) {
-    YAMLMapping* mapping = YAMLAlloc<YAMLMapping>::create(open.flow);
+    const std::span<YAMLNode* const> nodes(m_Nodes.data() + open.firstNode, m_Nodes.size() - open.firstNode);
     // An object gets its header data behind the keys of its body.
-    const std::size_t headerEntries = m_Open.empty() ? 3 : 0;
-    mapping->Reserve((m_Nodes.size() - open.firstNode) / 2 + headerEntries);
+    YAMLMapping* mapping = m_Open.empty() ? nullptr : MakeUsualMapping(open, nodes);
+    if (!mapping) {
+        mapping = YAMLAlloc<YAMLMapping>::create(open.flow);
+        mapping->Reserve(nodes.size() / 2 + (m_Open.empty() ? 3 : 0));
+        mapping->AppendPairs(nodes.data(), nodes.size());
+    }
     std::uint32_t hash = 0;
     std::uint32_t index = 0;
-    for (std::size_t i = open.firstNode; i + 1 < m_Nodes.size(); i += 2, ++index)
-        if (AsScalar(m_Nodes[i])) hash = FoldPair(hash, m_Nodes[i]->m_Hash, m_Nodes[i + 1]->m_Hash, index);
-    mapping->AppendPairs(m_Nodes.data() + open.firstNode, m_Nodes.size() - open.firstNode);
+    for (std::size_t i = 0; i + 1 < nodes.size(); i += 2, ++index)
+        if (AsScalar(nodes[i])) hash = FoldPair(hash, nodes[i]->m_Hash, nodes[i + 1]->m_Hash, index);
     mapping->m_Hash = hash;
+    return mapping;
+}
+
+/// Null if a key is no scalar or stands there twice.
+YAMLMapping* TreeBuilder::MakeUsualMapping(const OpenContainer& open, std::span<YAMLNode* const> nodes) {
+    const std::size_t count = nodes.size() / 2;
+    std::uint32_t hash = 0;
+    for (std::size_t i = 0; i < count; ++i) {
+        if (!AsScalar(nodes[2 * i])) return nullptr;
+        hash = KeyLists::Fold(hash, nodes[2 * i]->m_Hash);
+    }
+    const KeyLists::List keys =
+        m_KeyLists.Get(count, hash, [nodes](std::size_t i) { return AsScalar(nodes[2 * i]); });
+    if (!keys) return nullptr;
+    YAMLMapping* mapping = YAMLMapping::Create(open.flow, keys, count);
+    for (std::size_t i = 0; i < count; ++i) mapping->Values()[i] = nodes[2 * i + 1];
     return mapping;
 }
 

@@ -1,8 +1,10 @@
 #pragma once
 
+#include "Document/KeyLists.h"
 #include "Document/YAMLNode.h"
 
 #include <cstdint>
+#include <span>
 #include <vector>
 
 namespace ovrin_yaml {
@@ -37,10 +39,12 @@ private:
     };
 
     YAMLNode* MakeMapping(const OpenContainer& open);
+    YAMLMapping* MakeUsualMapping(const OpenContainer& open, std::span<YAMLNode* const> nodes);
     YAMLNode* MakeSequence(const OpenContainer& open) const;
 
     std::vector<YAMLNode*> m_Nodes;
     std::vector<OpenContainer> m_Open;
+    KeyLists m_KeyLists;
 };
 
 } // namespace ovrin_yaml

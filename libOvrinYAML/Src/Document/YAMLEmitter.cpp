@@ -20,8 +20,10 @@ bool IsSimpleKey(std::string_view key, ScalarForms forms) {
     return !forms.lineBreaks && key.size() <= kLongestSimpleKey;
 }
 
-bool IsEmpty(std::span<const YAMLMapping::Entry> pairs) {
-    return std::all_of(pairs.begin(), pairs.end(), [](const auto& pair) { return !pair.key; });
+bool IsEmpty(const YAMLMapping::Pairs& pairs) {
+    for (const YAMLMapping::Entry pair : pairs)
+        if (pair.key) return false;
+    return true;
 }
 
 /// Indentation of a flow collection, and of the lines that a scalar folds into. Even at the root that is a
@@ -44,7 +46,7 @@ void YAMLEmitter::EmitDocument(const YAMLNode& root) {
     }
 }
 
-void YAMLEmitter::EmitDocument(Pairs pairs, bool flow) {
+void YAMLEmitter::EmitDocument(const Pairs& pairs, bool flow) {
     if (flow || IsEmpty(pairs))
         EmitFlowMapping(pairs, kOutsideRoot, Behind::Nothing);
     else
@@ -66,9 +68,9 @@ void YAMLEmitter::EmitBlockNode(const YAMLNode& node, int outer, Behind behind) 
     EmitFlowNode(node, outer, behind);
 }
 
-void YAMLEmitter::EmitBlockMapping(Pairs pairs, int outer, Behind behind) {
+void YAMLEmitter::EmitBlockMapping(const Pairs& pairs, int outer, Behind behind) {
     const int indent = outer + kStep;
-    for (const YAMLMapping::Entry& pair : pairs) {
+    for (const YAMLMapping::Entry pair : pairs) {
         if (!pair.key) continue;
         BeginBlockEntry(indent, behind);
         EmitBlockPair(pair, indent);
@@ -121,12 +123,12 @@ void YAMLEmitter::EmitFlowNode(const YAMLNode& node, int outer, Behind behind) {
     }
 }
 
-void YAMLEmitter::EmitFlowMapping(Pairs pairs, int outer, Behind behind) {
+void YAMLEmitter::EmitFlowMapping(const Pairs& pairs, int outer, Behind behind) {
     Separate(behind);
     m_Output.Put('{');
     const int indent = ContinuationIndent(outer);
     bool first = true;
-    for (const YAMLMapping::Entry& pair : pairs) {
+    for (const YAMLMapping::Entry pair : pairs) {
         if (!pair.key) continue;
         EmitFlowPair(pair, indent, BeginFlowEntry(indent, first));
         first = false;

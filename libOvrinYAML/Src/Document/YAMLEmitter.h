@@ -5,7 +5,6 @@
 #include "Document/YAMLMapping.h"
 #include "Document/YAMLNode.h"
 
-#include <span>
 #include <string>
 #include <string_view>
 
@@ -29,10 +28,10 @@ public:
     /// "...".
     void EmitDocument(const YAMLNode& root);
     /// The root is a mapping of `pairs`; those with a null key are passed over.
-    void EmitDocument(std::span<const YAMLMapping::Entry> pairs, bool flow);
+    void EmitDocument(const YAMLMapping::Pairs& pairs, bool flow);
 
 private:
-    using Pairs = std::span<const YAMLMapping::Entry>;
+    using Pairs = YAMLMapping::Pairs;
 
     /// What stands before a node: all there is to know of the line.
     enum class Behind {
@@ -43,13 +42,13 @@ private:
 
     // `outer` is the indentation of the enclosing collection.
     void EmitBlockNode(const YAMLNode& node, int outer, Behind behind);
-    void EmitBlockMapping(Pairs pairs, int outer, Behind behind);
+    void EmitBlockMapping(const Pairs& pairs, int outer, Behind behind);
     void EmitBlockPair(const YAMLMapping::Entry& pair, int indent);
     void EmitBlockSequence(const YAMLSequence& sequence, int outer, Behind behind);
     void BeginBlockEntry(int indent, Behind behind);
 
     void EmitFlowNode(const YAMLNode& node, int outer, Behind behind);
-    void EmitFlowMapping(Pairs pairs, int outer, Behind behind);
+    void EmitFlowMapping(const Pairs& pairs, int outer, Behind behind);
     void EmitFlowPair(const YAMLMapping::Entry& pair, int indent, Behind behind);
     void EmitFlowSequence(const YAMLSequence& sequence, int outer, Behind behind);
     Behind BeginFlowEntry(int indent, bool first);

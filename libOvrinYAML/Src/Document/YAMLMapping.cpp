@@ -8,7 +8,7 @@
 
 namespace ovrin_yaml {
 
-static_assert(sizeof(YAMLMapping) == 40, "there are millions of them");
+static_assert(sizeof(YAMLMapping) == 32, "there are millions of them");
 
 YAMLMapping::~YAMLMapping() {
     DropIndex();
@@ -23,31 +23,71 @@ void YAMLMapping::RequireNormalState() const {
     if (m_HasDuplicates) throw YAMLError("Cannot perform this operation on a YAML file with duplicate keys");
 }
 
+void YAMLMapping::MoveTo(std::size_t room) {
+    void* memory = ArenaAllocate(room * (sizeof(YAMLNode*) + sizeof(YAMLScalar*)));
+    auto** values = static_cast<YAMLNode**>(memory);
+    auto** keys = static_cast<const YAMLScalar**>(static_cast<void*>(values + room));
+    std::copy_n(Values(), m_Size, values);
+    std::copy_n(m_Keys, m_Size, keys);
+    Extra& extra = NeedExtra();
+    extra.values = values;
+    extra.room = static_cast<std::uint32_t>(room);
+    m_Keys = keys;
+    m_OwnsKeys = true;
+}
+
+void YAMLMapping::Reserve(std::size_t count) {
+    if (count > Room() || !m_OwnsKeys) MoveTo(std::max<std::size_t>(count, m_Size));
+}
+
+const YAMLScalar** YAMLMapping::OwnKeys() {
+    if (!m_OwnsKeys) {
+        auto** keys = static_cast<const YAMLScalar**>(ArenaAllocate(Room() * sizeof(YAMLScalar*)));
+        m_Keys = std::copy_n(m_Keys, m_Size, keys) - m_Size;
+        m_OwnsKeys = true;
+    }
+    return const_cast<const YAMLScalar**>(m_Keys);
+}
+
+/// A list of the keys that will not change.
+const YAMLScalar* const* YAMLMapping::KeysForCopy() const {
+    if (!m_OwnsKeys) return m_Keys;
+    auto** keys = static_cast<const YAMLScalar**>(ArenaAllocate(m_Size * sizeof(YAMLScalar*)));
+    std::copy_if(m_Keys, m_Keys + m_Size, keys, [](const YAMLScalar* key) { return key; });
+    return keys;
+}
+
 std::uint32_t YAMLMapping::Find(const YAMLScalar* key) const {
     if (const KeyIndex* index = Index()) {
         // The index keeps keys that were removed since; their positions hold null or, after a move, others.
         const std::uint32_t position = index->Find(key);
-        const bool there = position < m_Entries.size() && m_Entries[position].key == key;
-        return there ? position : KeyIndex::kMissing;
+        return position < m_Size && m_Keys[position] == key ? position : KeyIndex::kMissing;
     }
-    for (std::uint32_t i = 0; i < m_Entries.size(); ++i)
-        if (m_Entries[i].key == key) return i;
+    for (std::uint32_t i = 0; i < m_Size; ++i)
+        if (m_Keys[i] == key) return i;
     return KeyIndex::kMissing;
 }
 
+void YAMLMapping::PushRaw(const YAMLScalar* key, YAMLNode* value) {
+    if (m_Size == Room() || !m_OwnsKeys) MoveTo(std::max<std::size_t>(2 * std::size_t{m_Size}, 4));
+    OwnKeys()[m_Size] = key;
+    m_Extra->values[m_Size] = value;
+    ++m_Size;
+}
+
 void YAMLMapping::PushBack(const YAMLScalar* key, YAMLNode* value) {
-    m_Entries.push_back({key, value});
+    PushRaw(key, value);
     if (KeyIndex* index = Index())
-        index->Set(key, static_cast<std::uint32_t>(m_Entries.size() - 1));
-    else if (m_Entries.size() > KeyIndex::kSearchLimit)
+        index->Set(key, m_Size - 1);
+    else if (m_Size > KeyIndex::kSearchLimit)
         BuildIndex();
 }
 
 void YAMLMapping::BuildIndex() {
     KeyIndex*& index = NeedExtra().index;
     if (!index) index = new KeyIndex;
-    index->Reserve(m_Entries.capacity());
-    for (std::uint32_t i = 0; i < m_Entries.size(); ++i) index->Set(m_Entries[i].key, i);
+    index->Reserve(Room());
+    for (std::uint32_t i = 0; i < m_Size; ++i) index->Set(m_Keys[i], i);
 }
 
 void YAMLMapping::DropIndex() {
@@ -56,9 +96,22 @@ void YAMLMapping::DropIndex() {
     m_Extra->index = nullptr;
 }
 
+void YAMLMapping::DropRemoved() {
+    if (RemovedCount() == 0) return;
+    const YAMLScalar** keys = OwnKeys();
+    std::uint32_t kept = 0;
+    for (std::uint32_t i = 0; i < m_Size; ++i) {
+        if (!keys[i]) continue;
+        Values()[kept] = Values()[i];
+        keys[kept++] = keys[i];
+    }
+    m_Size = kept;
+    m_Extra->removed = 0;
+}
+
 void YAMLMapping::Append(const YAMLScalar* key, YAMLNode* value) {
     if (m_HasDuplicates) {
-        m_Entries.push_back({key, value});
+        PushRaw(key, value);
         return;
     }
     const std::uint32_t position = Find(key);
@@ -66,23 +119,11 @@ void YAMLMapping::Append(const YAMLScalar* key, YAMLNode* value) {
         PushBack(key, value);
         return;
     }
-    if (m_Entries[position].value->Equals(value)) return;
-    m_Entries.erase_if([](const Entry& entry) { return !entry.key; });
-    m_Removed = 0;
+    if (Values()[position]->Equals(value)) return;
+    DropRemoved();
     DropIndex();
-    m_Entries.push_back({key, value});
+    PushRaw(key, value);
     m_HasDuplicates = true;
-}
-
-bool YAMLMapping::AdoptBlank() {
-    if (m_Entries.size() > KeyIndex::kSearchLimit) {
-        BuildIndex();
-        return Index()->Count() == m_Entries.size();
-    }
-    for (const Entry* entry = m_Entries.begin(); entry != m_Entries.end(); ++entry)
-        for (const Entry* earlier = m_Entries.begin(); earlier != entry; ++earlier)
-            if (earlier->key == entry->key) return false;
-    return true;
 }
 
 void YAMLMapping::AppendPairs(YAMLNode* const* keysAndValues, std::size_t count) {
@@ -100,13 +141,13 @@ YAMLNode* YAMLMapping::Change(const YAMLScalar* key, YAMLNode* value) {
     RequireNormalState();
     const std::uint32_t position = Find(key);
     if (position == KeyIndex::kMissing) throw YAMLError("Cannot change non existing key in YAMLMapping");
-    return std::exchange(m_Entries[position].value, value);
+    return std::exchange(Values()[position], value);
 }
 
 YAMLNode* YAMLMapping::Get(const YAMLScalar* key) const {
     RequireNormalState();
     const std::uint32_t position = Find(key);
-    return position == KeyIndex::kMissing ? nullptr : m_Entries[position].value;
+    return position == KeyIndex::kMissing ? nullptr : RawEntries()[position].value;
 }
 
 YAMLNode* YAMLMapping::GetRef(const YAMLScalar* key) const {
@@ -129,35 +170,40 @@ YAMLNode* YAMLMapping::GetForChange(const YAMLScalar* key) {
 
 std::size_t YAMLMapping::Size() const {
     RequireNormalState();
-    return m_Entries.size() - m_Removed;
+    return m_Size - RemovedCount();
 }
 
 YAMLMapping::Iterator YAMLMapping::begin() const {
     RequireNormalState();
-    return {m_Entries.data(), m_Entries.data() + m_Entries.size()};
+    return {RawEntries(), 0};
 }
 
 YAMLMapping::Iterator YAMLMapping::end() const {
     RequireNormalState();
-    return {m_Entries.data() + m_Entries.size(), m_Entries.data() + m_Entries.size()};
+    return {RawEntries(), m_Size};
 }
 
 YAMLMapping::Iterator YAMLMapping::FindKey(const YAMLScalar* key) const {
     const std::uint32_t position = Find(key);
     if (position == KeyIndex::kMissing) return end();
-    return {m_Entries.data() + position, m_Entries.data() + m_Entries.size()};
+    return {RawEntries(), position};
 }
 
 YAMLNode* YAMLMapping::Steal(const YAMLScalar* key) {
     RequireNormalState();
     const std::uint32_t position = Find(key);
     if (position == KeyIndex::kMissing) return nullptr;
-    YAMLNode* value = m_Entries[position].value;
+    const YAMLScalar** keys = OwnKeys();
+    YAMLNode** values = Values();
+    YAMLNode* value = values[position];
     if (Index()) {
-        m_Entries[position] = {nullptr, nullptr};
-        ++m_Removed;
+        keys[position] = nullptr;
+        values[position] = nullptr;
+        ++m_Extra->removed;
     } else {
-        m_Entries.erase(position);
+        std::copy(keys + position + 1, keys + m_Size, keys + position);
+        std::copy(values + position + 1, values + m_Size, values + position);
+        --m_Size;
     }
     return value;
 }
@@ -171,70 +217,78 @@ void YAMLMapping::ChangeKey(const YAMLScalar* from, const YAMLScalar* to) {
     const std::uint32_t position = Find(from);
     if (position == KeyIndex::kMissing)
         throw YAMLError("Cannot change key of non existing key in YAMLMapping");
-    m_Entries[position].key = to;
+    OwnKeys()[position] = to;
     if (KeyIndex* index = Index()) index->Set(to, position);
 }
 
 void YAMLMapping::Reorder(const std::vector<const YAMLScalar*>& order) {
     RequireNormalState();
-    ArenaArray<Entry> ordered;
+    std::vector<Entry> ordered;
     ordered.reserve(Size());
     for (const YAMLScalar* key : order) {
         const std::uint32_t position = Find(key);
         if (position == KeyIndex::kMissing) continue;
         if (ordered.size() == Size()) throw YAMLError("Unmapped key when trying to reorder mapping keys");
-        ordered.push_back(m_Entries[position]);
+        ordered.push_back(RawEntries()[position]);
     }
     if (ordered.size() != Size()) throw YAMLError("Unmapped key when trying to reorder mapping keys");
-    m_Entries.swap(ordered);
-    m_Removed = 0;
+    const YAMLScalar** keys = OwnKeys();
+    for (std::size_t i = 0; i < ordered.size(); ++i) {
+        keys[i] = ordered[i].key;
+        Values()[i] = ordered[i].value;
+    }
+    m_Size = static_cast<std::uint32_t>(ordered.size());
+    if (m_Extra) m_Extra->removed = 0;
     if (Index()) BuildIndex();
 }
 
 YAMLSequence* YAMLMapping::ToSequence() const {
     YAMLSequence* sequence = YAMLAlloc<YAMLSequence>::create(m_Flow);
-    for (const Entry& entry : m_Entries) {
+    for (const Entry entry : RawEntries()) {
         if (!entry.key) continue;
-        YAMLMapping* pair = YAMLAlloc<YAMLMapping>::create(false);
-        pair->Insert(entry.key, entry.value->Clone());
+        auto** key = static_cast<const YAMLScalar**>(ArenaAllocate(sizeof(YAMLScalar*)));
+        *key = entry.key;
+        YAMLMapping* pair = Create(false, key, 1);
+        pair->Values()[0] = entry.value->Clone();
         sequence->m_Items.push_back(pair);
     }
     return sequence;
 }
 
-void YAMLMapping::CopyInto(YAMLMapping& target) const {
-    RequireNormalState();
-    target.m_Flow = m_Flow;
-    target.m_Hash = m_Hash;
-    target.m_Line = m_Line;
-    target.m_Entries.clear();
-    target.m_Entries.reserve(Size());
-    for (const Entry& entry : *this) target.m_Entries.push_back(entry);
-    if (target.m_Entries.size() > KeyIndex::kSearchLimit) target.BuildIndex();
-}
-
-void YAMLMapping::CloneInto(YAMLMapping& target) const {
-    CopyInto(target);
-    for (Entry& entry : target.m_Entries) entry.value = entry.value->Clone();
+YAMLMapping* YAMLMapping::CopyWith(YAMLNode* (*copyValue)(const YAMLNode*)) const {
+    // An index finds no key that is there twice.
+    YAMLMapping* copy = Create(m_Flow, KeysForCopy(), m_Size - RemovedCount());
+    copy->m_HasDuplicates = m_HasDuplicates;
+    if (m_HasDuplicates) copy->DropIndex();
+    copy->m_Hash = m_Hash;
+    copy->m_Line = m_Line;
+    YAMLNode** values = copy->Values();
+    for (const Entry entry : RawEntries())
+        if (entry.key) *values++ = copyValue(entry.value);
+    return copy;
 }
 
 void YAMLMapping::ShareInto(YAMLMapping& target) {
-    CopyInto(target);
-    for (const Entry& entry : target.m_Entries)
+    target.m_Flow = m_Flow;
+    target.m_Hash = m_Hash;
+    target.m_Line = m_Line;
+    target.Reserve(Size());
+    for (const Entry entry : *this) {
+        target.PushBack(entry.key, entry.value);
         if (YAMLMapping* object = AsMapping(entry.value)) object->m_IsShared = true;
+    }
 }
 
 YAMLNode* YAMLMapping::Clone() const {
-    YAMLMapping* clone = YAMLAlloc<YAMLMapping>::create(m_Flow);
-    CloneInto(*clone);
-    return clone;
+    RequireNormalState();
+    return CopyWith([](const YAMLNode* value) { return value->Clone(); });
 }
 
 void YAMLMapping::Clear() {
-    for (const Entry& entry : m_Entries)
+    for (const Entry entry : RawEntries())
         if (entry.value) entry.value->Free();
-    m_Entries.clear();
-    m_Removed = 0;
+    m_Size = 0;
+    if (m_Extra) m_Extra->removed = 0;
     DropIndex();
 }
 
@@ -243,23 +297,27 @@ bool YAMLMapping::Equals(const YAMLNode* other) const {
     return EqualsExpensive(other);
 }
 
-bool YAMLMapping::EqualsExpensive(const YAMLNode* other) const {
-    const YAMLMapping* mapping = AsMapping(other);
+bool YAMLMapping::EqualsExpensive(const YAMLNode* node) const {
+    const YAMLMapping* mapping = AsMapping(node);
     if (!mapping) return false;
     // In the duplicate state there are no keys to tell two mappings apart by.
     static const YAMLMapping none;
     const YAMLMapping& left = m_HasDuplicates ? none : *this;
     const YAMLMapping& right = mapping->m_HasDuplicates ? none : *mapping;
-    return left.Size() == right.Size() &&
-           std::equal(left.begin(), left.end(), right.begin(),
-                      [](const Entry& a, const Entry& b) { return a.key == b.key; });
+    if (left.Size() != right.Size()) return false;
+    Iterator other = right.begin();
+    for (const Entry entry : left) {
+        if (entry.key != other->key) return false;
+        ++other;
+    }
+    return true;
 }
 
 void YAMLMapping::RebuildHash(bool shallow) {
     std::uint32_t hash = 0;
     std::uint32_t index = 0;
     if (!m_HasDuplicates) {
-        for (const Entry& entry : *this) {
+        for (const Entry entry : *this) {
             if (!shallow) entry.value->RebuildHash(false);
             hash = FoldPair(hash, entry.key->m_Hash, entry.value->m_Hash, index++);
         }

@@ -1,13 +1,11 @@
 #pragma once
 
-#include "Document/ArenaArray.h"
 #include "Document/KeyIndex.h"
 #include "Document/YAMLAlloc.h"
 #include "Document/YAMLError.h"
 #include "Document/YAMLNode.h"
 
 #include <cstddef>
-#include <span>
 #include <string_view>
 #include <vector>
 
@@ -24,6 +22,15 @@ class YAMLSequence;
 ///    included, so that the mapping can be converted (ToSequence) or written as it was read. Everything else
 ///    throws YAMLError "Cannot perform this operation on a YAML file with duplicate keys".
 /// No operation that throws has changed the mapping. None but RebuildHash touches m_Hash.
+///
+/// There are millions of mappings, and few lists of keys: one that a reader made refers to a list that it has
+/// in common with others, and its values stand right behind it.
+///
+///     {x: 1, y: 2}    [ mapping | 1 | 2 ]  ->  [ x | y ]
+///     {x: 5, y: 7}    [ mapping | 5 | 7 ]  ------^
+///
+/// A change of the keys gives the mapping a list of its own, and new pairs give it new arrays for both. At
+/// most 2^30 - 1 pairs.
 class YAMLMapping final : public YAMLNode {
 public:
     static constexpr Kind kKind = Kind::Mapping;
@@ -33,34 +40,66 @@ public:
         YAMLNode* value;
     };
 
+    /// Keys and values that stand in two arrays, which must outlive the view.
+    class Pairs {
+    public:
+        Pairs(const YAMLScalar* const* keys, YAMLNode* const* values, std::size_t size)
+            : m_Keys(keys), m_Values(values), m_Size(size) {}
+
+        std::size_t size() const { return m_Size; }
+        Entry operator[](std::size_t index) const { return {m_Keys[index], m_Values[index]}; }
+
+        class Iterator {
+        public:
+            Iterator(const Pairs& pairs, std::size_t index) : m_Pairs(pairs), m_Index(index) {}
+            Entry operator*() const { return m_Pairs[m_Index]; }
+            Iterator& operator++() {
+                ++m_Index;
+                return *this;
+            }
+            bool operator==(const Iterator& other) const { return m_Index == other.m_Index; }
+
+        private:
+            const Pairs& m_Pairs;
+            std::size_t m_Index;
+        };
+        Iterator begin() const { return {*this, 0}; }
+        Iterator end() const { return {*this, m_Size}; }
+
+    private:
+        const YAMLScalar* const* m_Keys;
+        YAMLNode* const* m_Values;
+        std::size_t m_Size;
+    };
+
     /// Iterates over the pairs in document order. The mapping must not gain or lose keys meanwhile.
     class Iterator {
     public:
-        Iterator(const Entry* position, const Entry* end) : m_Position(position), m_End(end) {
-            SkipRemoved();
-        }
-        const Entry& operator*() const { return *m_Position; }
-        const Entry* operator->() const { return m_Position; }
+        Iterator(const Pairs& pairs, std::size_t index) : m_Pairs(pairs), m_Index(index) { SkipRemoved(); }
+        Entry operator*() const { return m_Pairs[m_Index]; }
         Iterator& operator++() {
-            ++m_Position;
+            ++m_Index;
             SkipRemoved();
             return *this;
         }
-        bool operator==(const Iterator& other) const { return m_Position == other.m_Position; }
+        bool operator==(const Iterator& other) const { return m_Index == other.m_Index; }
+
+        struct Arrow {
+            Entry entry;
+            const Entry* operator->() const { return &entry; }
+        };
+        Arrow operator->() const { return {**this}; }
 
     private:
         void SkipRemoved() {
-            while (m_Position != m_End && !m_Position->key) ++m_Position;
+            while (m_Index != m_Pairs.size() && !m_Pairs[m_Index].key) ++m_Index;
         }
 
-        const Entry* m_Position;
-        const Entry* m_End;
+        Pairs m_Pairs;
+        std::size_t m_Index;
     };
 
     explicit YAMLMapping(bool flow = false) : YAMLNode(Kind::Mapping), m_Flow(flow) {}
-    /// With room for `capacity` pairs in `memory`, which must come from the arena.
-    YAMLMapping(bool flow, Entry* memory, std::size_t capacity)
-        : YAMLNode(Kind::Mapping), m_Flow(flow), m_Entries(memory, capacity) {}
     YAMLMapping(const YAMLMapping&) = delete;
     YAMLMapping& operator=(const YAMLMapping&) = delete;
     ~YAMLMapping();
@@ -73,18 +112,19 @@ public:
     /// The mapping is an object that several trees hold: it is never freed, and copied before it is changed.
     bool m_IsShared = false;
 
-private:
-    // Stands here to fill a gap: there are millions of mappings.
-    std::uint32_t m_HasDuplicates : 1 = 0;
-    std::uint32_t m_Removed : 31 = 0; // pairs in m_Entries whose key is null; only where there is an index
-
-public:
-    /// A new block or flow mapping with room for `capacity` pairs, which stand right behind it in memory.
-    static YAMLMapping* CreateWithRoom(bool flow, std::size_t capacity) {
-        void* memory = ArenaAllocate(sizeof(YAMLMapping) + capacity * sizeof(Entry));
-        void* behind = static_cast<YAMLMapping*>(memory) + 1;
-        return new (memory) YAMLMapping(flow, static_cast<Entry*>(behind), capacity);
+    /// A new mapping of keys that are all different, with the values, which stand right behind it in memory,
+    /// to be filled in by the caller. The array of keys may be that of many mappings; it must stay as it is
+    /// until the process ends.
+    static YAMLMapping* Create(bool flow, const YAMLScalar* const* keys, std::size_t count) {
+        void* memory = ArenaAllocate(sizeof(YAMLMapping) + count * sizeof(YAMLNode*));
+        YAMLMapping* mapping = new (memory) YAMLMapping(flow);
+        mapping->m_Keys = keys;
+        mapping->m_Size = static_cast<std::uint32_t>(count);
+        if (count > KeyIndex::kSearchLimit) mapping->BuildIndex();
+        return mapping;
     }
+    /// The values, in the order of RawEntries.
+    YAMLNode** Values() { return m_Extra && m_Extra->values ? m_Extra->values : ValuesBehind(); }
 
     /// The bytes that the writer would give for this object, or nothing where they aren't known. Valid until
     /// the object is changed; they belong to whoever read the file.
@@ -95,16 +135,13 @@ public:
     /// Throws the duplicate-keys YAMLError in the duplicate state.
     void RequireNormalState() const;
     /// All pairs, in either state. In the normal state some may have been removed (their key is null).
-    std::span<const Entry> RawEntries() const { return {m_Entries.data(), m_Entries.size()}; }
+    Pairs RawEntries() const { return {m_Keys, const_cast<YAMLMapping*>(this)->Values(), m_Size}; }
 
-    void Reserve(std::size_t count) { m_Entries.reserve(count); }
+    /// Makes room for `count` pairs in all.
+    void Reserve(std::size_t count);
     /// Adds a pair at the end. A key that is there already keeps its value if the new one is equal (which is
     /// dropped), and brings on the duplicate state if not. Never throws a YAMLError.
     void Append(const YAMLScalar* key, YAMLNode* value);
-    /// Appends pairs to be filled in by the caller, who then calls AdoptBlank.
-    Entry* AppendBlank(std::size_t count) { return m_Entries.append_blank(count); }
-    /// Takes in what was filled in. False if a key stands in the mapping twice, which must be given up then.
-    bool AdoptBlank();
     /// Appends keys and values that stand by turns, `count` of both; pairs whose key is no scalar are left
     /// out.
     void AppendPairs(YAMLNode* const* keysAndValues, std::size_t count);
@@ -142,8 +179,8 @@ public:
     /// A new sequence with a block mapping of one key for every pair, in either state; values are cloned.
     /// Hashes are not built.
     YAMLSequence* ToSequence() const;
-    /// Fills an empty mapping with a deep copy.
-    void CloneInto(YAMLMapping& target) const;
+    /// A copy in the same state, owned by the caller, of what `copyValue` makes of each value.
+    YAMLMapping* CopyWith(YAMLNode* (*copyValue)(const YAMLNode*)) const;
     /// Fills an empty mapping with the same pairs and marks the values that are mappings as shared.
     void ShareInto(YAMLMapping& target);
     /// Frees all values and empties the mapping; it stays in its state.
@@ -159,22 +196,36 @@ public:
     void ResetForAlloc() { Clear(); }
 
 private:
-    /// Position of `key` in m_Entries, or KeyIndex::kMissing.
+    /// What few mappings have.
+    struct Extra {
+        std::string_view source;
+        KeyIndex* index = nullptr;   // positions, once there are more than KeyIndex::kSearchLimit
+        YAMLNode** values = nullptr; // where they went when there was no more room behind the mapping
+        std::uint32_t room = 0;      // for values there, and for keys that are the mapping's own
+        std::uint32_t removed = 0;   // pairs whose key is null; only where there is an index
+    };
+    Extra& NeedExtra();
+    KeyIndex* Index() const { return m_Extra ? m_Extra->index : nullptr; }
+    std::uint32_t RemovedCount() const { return m_Extra ? m_Extra->removed : 0; }
+
+    YAMLNode** ValuesBehind() { return reinterpret_cast<YAMLNode**>(this + 1); }
+    /// The keys, for a change: a list that may be that of other mappings is copied first.
+    const YAMLScalar** OwnKeys();
+    const YAMLScalar* const* KeysForCopy() const;
+    std::size_t Room() const { return m_Extra && m_Extra->values ? m_Extra->room : m_Size; }
+    void MoveTo(std::size_t room);
+    void DropRemoved();
+    /// Position of `key`, or KeyIndex::kMissing.
     std::uint32_t Find(const YAMLScalar* key) const;
-    void CopyInto(YAMLMapping& target) const;
+    void PushRaw(const YAMLScalar* key, YAMLNode* value);
     void PushBack(const YAMLScalar* key, YAMLNode* value);
     void BuildIndex();
     void DropIndex();
 
-    /// What few mappings have.
-    struct Extra {
-        std::string_view source;
-        KeyIndex* index = nullptr; // positions in m_Entries, once there are more than KeyIndex::kSearchLimit
-    };
-    KeyIndex* Index() const { return m_Extra ? m_Extra->index : nullptr; }
-    Extra& NeedExtra();
-
-    ArenaArray<Entry> m_Entries;
+    std::uint32_t m_HasDuplicates : 1 = 0;
+    std::uint32_t m_OwnsKeys : 1 = 0;
+    std::uint32_t m_Size : 30 = 0; // pairs, those removed included
+    const YAMLScalar* const* m_Keys = nullptr;
     Extra* m_Extra = nullptr;
 };
 

@@ -51,15 +51,7 @@ void YAMLNode::RebuildHash(bool shallow) {
 }
 
 YAMLNode* CopyExactly(const YAMLNode* node) {
-    if (const YAMLMapping* mapping = AsMapping(node)) {
-        YAMLMapping* copy = YAMLAlloc<YAMLMapping>::create(mapping->m_Flow);
-        copy->Reserve(mapping->RawEntries().size());
-        for (const auto& [key, value] : mapping->RawEntries())
-            if (key) copy->Append(key, CopyExactly(value));
-        copy->m_Hash = mapping->m_Hash;
-        copy->m_Line = mapping->m_Line;
-        return copy;
-    }
+    if (const YAMLMapping* mapping = AsMapping(node)) return mapping->CopyWith(CopyExactly);
     if (const YAMLSequence* sequence = AsSequence(node)) {
         YAMLSequence* copy = YAMLAlloc<YAMLSequence>::create(sequence->m_Flow);
         copy->m_Items.reserve(sequence->m_Items.size());

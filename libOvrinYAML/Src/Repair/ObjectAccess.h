@@ -82,7 +82,7 @@ void CollectMappings(const YAMLScalar* key, YAMLNode* node, const Wanted& wanted
                      std::vector<YAMLMapping*>& found) {
     if (YAMLMapping* mapping = AsMapping(node)) {
         if (wanted(key, *mapping)) found.push_back(mapping);
-        for (const YAMLMapping::Entry& entry : *mapping)
+        for (const YAMLMapping::Entry entry : *mapping)
             if (!AsScalar(entry.value)) CollectMappings(entry.key, entry.value, wanted, found);
     } else if (YAMLSequence* sequence = AsSequence(node)) {
         for (YAMLNode* item : sequence->m_Items) CollectMappings(nullptr, item, wanted, found);

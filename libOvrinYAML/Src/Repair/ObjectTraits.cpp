@@ -9,7 +9,7 @@ namespace {
 bool HasPrefabLink(const YAMLScalar* key, const YAMLNode* node) {
     if (const YAMLMapping* mapping = AsMapping(node)) {
         if (IsPrefabLink(key, *mapping)) return true;
-        for (const YAMLMapping::Entry& entry : *mapping)
+        for (const YAMLMapping::Entry entry : *mapping)
             if (!AsScalar(entry.value) && HasPrefabLink(entry.key, entry.value)) return true;
     } else if (const YAMLSequence* sequence = AsSequence(node)) {
         for (const YAMLNode* item : sequence->m_Items)

@@ -1,0 +1,53 @@
+#pragma once
+
+#include "Document/YAMLScalar.h"
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <span>
+
+namespace ovrin_yaml {
+
+/// Remembers lists of keys that were met lately: there are millions of {x, y, z}, and one list is enough for
+/// them all. Of two lists with one place the later one stays. Belongs to one thread; the lists themselves
+/// belong to nobody, never change and stay until the process ends.
+class KeyLists {
+public:
+    using List = const YAMLScalar* const*;
+
+    /// Folds one key into the hash of a list.
+    static std::uint32_t Fold(std::uint32_t hash, std::uint32_t key) { return (hash + key) * 0x9e3779b1u; }
+
+    /// The list of keyAt(0), ..., keyAt(count - 1), whose hashes were folded into `hash`, from 0 on. Null if
+    /// a key is there twice.
+    template <class KeyAt> List Get(std::size_t count, std::uint32_t hash, const KeyAt& keyAt) {
+        Known& known = m_Known[hash >> (32 - kPlaceBits)];
+        const auto holds = [&] {
+            for (std::size_t i = 0; i < count; ++i)
+                if (known.list[i] != keyAt(i)) return false;
+            return true;
+        };
+        if (known.count == count && holds()) return known.list;
+        const YAMLScalar** list = Allocate(count);
+        for (std::size_t i = 0; i < count; ++i) list[i] = keyAt(i);
+        if (HasRepeatedKey({list, count})) return nullptr;
+        known = {list, count};
+        return list;
+    }
+
+private:
+    static constexpr unsigned kPlaceBits = 8;
+
+    struct Known {
+        List list;
+        std::size_t count = SIZE_MAX;
+    };
+
+    static const YAMLScalar** Allocate(std::size_t count);
+    static bool HasRepeatedKey(std::span<const YAMLScalar* const> keys);
+
+    std::array<Known, std::size_t{1} << kPlaceBits> m_Known;
+};
+
+} // namespace ovrin_yaml
