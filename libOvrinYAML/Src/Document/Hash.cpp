@@ -14,6 +14,10 @@ std::uint32_t Scramble(std::uint32_t block) {
     return std::rotl(block * kFactor1, 15) * kFactor2;
 }
 
+std::uint32_t FoldBlock(std::uint32_t hash, std::uint32_t block) {
+    return std::rotl(hash ^ Scramble(block), 13) * 5 + 0xe6546b64u;
+}
+
 std::uint32_t Finalise(std::uint32_t hash) {
     hash = (hash ^ (hash >> 16)) * 0x85ebca6bu;
     hash = (hash ^ (hash >> 13)) * 0xc2b2ae35u;
@@ -30,13 +34,23 @@ std::uint32_t MurmurHash3(std::string_view text, std::uint32_t seed) {
     for (std::size_t i = 0; i < blocks; ++i) {
         std::uint32_t block;
         std::memcpy(&block, bytes + 4 * i, 4);
-        hash = std::rotl(hash ^ Scramble(block), 13) * 5 + 0xe6546b64u;
+        hash = FoldBlock(hash, block);
     }
     std::uint32_t tail = 0;
     for (std::size_t i = text.size(); i > 4 * blocks; --i)
         tail = tail << 8 | static_cast<unsigned char>(bytes[i - 1]);
     if (text.size() % 4) hash ^= Scramble(tail);
     return Finalise(hash ^ static_cast<std::uint32_t>(text.size()));
+}
+
+std::uint32_t MurmurHash3(std::uint64_t low, std::uint64_t high, std::size_t length, std::uint32_t seed) {
+    const std::uint64_t words[] = {low, low >> 32, high, high >> 32, 0};
+    const std::size_t blocks = length / 4;
+    std::uint32_t hash = seed;
+    for (std::size_t i = 0; i < blocks; ++i) hash = FoldBlock(hash, static_cast<std::uint32_t>(words[i]));
+    // Without a rest this is zero, which changes nothing.
+    if (length % 4) hash ^= Scramble(static_cast<std::uint32_t>(words[blocks]));
+    return Finalise(hash ^ static_cast<std::uint32_t>(length));
 }
 
 } // namespace ovrin_yaml

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <string_view>
 
@@ -7,6 +8,10 @@ namespace ovrin_yaml {
 
 /// MurmurHash3 by Austin Appleby, 32-bit x86 form, over the bytes of `text` (public domain, smhasher).
 std::uint32_t MurmurHash3(std::string_view text, std::uint32_t seed);
+
+/// The same for a text of at most 16 bytes that stands in two words, the first byte lowest, with zeros behind
+/// it.
+std::uint32_t MurmurHash3(std::uint64_t low, std::uint64_t high, std::size_t length, std::uint32_t seed);
 
 /// Folds one value into a running container hash. Order counts.
 inline std::uint32_t CombineHash(std::uint32_t seed, std::uint32_t value) {

@@ -98,7 +98,7 @@ const char* ObjectFile::FindDocumentEnd(const char* begin) const {
 
 void ObjectFile::CutAlone() {
     // A guess that spares the table most of its growing.
-    constexpr std::size_t kBytesPerScalar = 64;
+    constexpr std::size_t kBytesPerScalar = 56;
     ScalarTable::Instance().Reserve(m_Text->size() / kBytesPerScalar);
     constexpr std::size_t kBytesPerDocument = 400;
     ReserveDocuments(m_Text->size() / kBytesPerDocument);

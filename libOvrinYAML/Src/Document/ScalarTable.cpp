@@ -1,10 +1,8 @@
 #include "Document/ScalarTable.h"
 
 #include "Document/Arena.h"
-#include "Document/Hash.h"
 
 #include <algorithm>
-#include <bit>
 #include <cstring>
 #include <new>
 
@@ -12,15 +10,12 @@ namespace ovrin_yaml {
 
 namespace {
 
-/// Scalar hashes enter container hashes, which decide what counts as equal: the seed is part of the system.
-constexpr std::uint32_t kScalarSeed = 42;
-
 constexpr unsigned kTagShift = 48;
 constexpr std::uint64_t kAddressMask = (std::uint64_t{1} << kTagShift) - 1;
 
-/// The top bits of a hash choose the shard and its low bits the place, so the tag comes from between.
+/// The top bits of a hash choose the shard and the place, so the tag comes from the low ones.
 std::uint64_t Tag(std::uint32_t hash) {
-    return hash >> 10 & 0xffffu;
+    return hash & 0xffffu;
 }
 
 std::uint64_t Pack(YAMLScalar* scalar) {
@@ -36,13 +31,9 @@ YAMLScalar* Unpack(std::uint64_t slot) {
 // There before any code runs, and never destroyed: scalars are used until the process ends.
 constinit ScalarTable ScalarTable::s_Instance;
 
-std::uint32_t ScalarTable::HashOf(std::string_view text) {
-    return MurmurHash3(text, kScalarSeed);
-}
-
 const ScalarTable::Slot* ScalarTable::SlotOf(std::uint32_t hash) const {
     const Slots* slots = m_Shards[hash >> (32 - kShardBits)].slots.load(std::memory_order_acquire);
-    return slots ? &slots->entries[hash & slots->mask] : nullptr;
+    return slots ? &slots->entries[slots->PlaceOf(hash)] : nullptr;
 }
 
 void ScalarTable::PrefetchSlot(std::uint32_t hash) const {
@@ -56,14 +47,27 @@ void ScalarTable::PrefetchScalar(std::uint32_t hash) const {
 }
 
 void ScalarTable::Reserve(std::size_t count) {
-    const std::size_t capacity = std::bit_ceil(2 * count / m_Shards.size() + 1);
+    const std::size_t capacity = count * 3 / 2 / m_Shards.size() + 1;
     if (capacity <= kFirstCapacity) return;
     // One piece for all shards is big enough for huge pages.
     char* memory = static_cast<char*>(AllocateZeroed(m_Shards.size() * capacity * sizeof(Slot)));
     for (Shard& shard : m_Shards) {
         const Slots* slots = shard.slots.load(std::memory_order_relaxed);
-        if (!slots || slots->mask + 1 < capacity) Grow(shard, capacity, memory);
+        if (!slots || slots->capacity < capacity) Grow(shard, capacity, memory);
         memory += capacity * sizeof(Slot);
+    }
+}
+
+// Part of the way of every text.
+[[gnu::always_inline]] inline ScalarTable::Place ScalarTable::Find(const Slots& slots, std::string_view text,
+                                                                   std::uint32_t hash) {
+    for (std::size_t place = slots.PlaceOf(hash);; place = slots.Behind(place)) {
+        Slot& position = slots.entries[place];
+        const std::uint64_t slot = position.load(std::memory_order_acquire);
+        if (!slot) return {nullptr, &position};
+        if (slot >> kTagShift != Tag(hash)) continue;
+        YAMLScalar* scalar = Unpack(slot);
+        if (scalar->m_Hash == hash && scalar->Value() == text) return {scalar, nullptr};
     }
 }
 
@@ -78,8 +82,8 @@ YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t hash, std::
 YAMLScalar* ScalarTable::InternNew(Shard& shard, const NewScalar& wanted, const Slots* seen, Slot* empty) {
     const std::lock_guard lock(shard.lock);
     const Slots* slots = shard.slots.load(std::memory_order_relaxed);
-    const std::size_t capacity = slots ? slots->mask + 1 : 0;
-    if (2 * (shard.count + 1) > capacity) {
+    const std::size_t capacity = slots ? slots->capacity : 0;
+    if (3 * (shard.count + 1) > 2 * capacity) {
         const std::size_t grown = std::max(2 * capacity, kFirstCapacity);
         Grow(shard, grown, AllocateZeroed(grown * sizeof(Slot)));
         slots = shard.slots.load(std::memory_order_relaxed);
@@ -96,21 +100,10 @@ YAMLScalar* ScalarTable::InternNew(Shard& shard, const NewScalar& wanted, const 
     return scalar;
 }
 
-ScalarTable::Place ScalarTable::Find(const Slots& slots, std::string_view text, std::uint32_t hash) {
-    for (std::size_t place = hash;; ++place) {
-        Slot& position = slots.entries[place & slots.mask];
-        const std::uint64_t slot = position.load(std::memory_order_acquire);
-        if (!slot) return {nullptr, &position};
-        if (slot >> kTagShift != Tag(hash)) continue;
-        YAMLScalar* scalar = Unpack(slot);
-        if (scalar->m_Hash == hash && scalar->Value() == text) return {scalar, nullptr};
-    }
-}
-
 void ScalarTable::Fill(const Slots& slots, YAMLScalar* scalar) {
-    std::size_t place = scalar->m_Hash;
-    while (slots.entries[place & slots.mask].load(std::memory_order_relaxed)) ++place;
-    slots.entries[place & slots.mask].store(Pack(scalar), std::memory_order_release);
+    std::size_t place = slots.PlaceOf(scalar->m_Hash);
+    while (slots.entries[place].load(std::memory_order_relaxed)) place = slots.Behind(place);
+    slots.entries[place].store(Pack(scalar), std::memory_order_release);
 }
 
 static_assert(sizeof(YAMLScalar) == 16, "there are millions of them");
@@ -124,9 +117,9 @@ YAMLScalar* ScalarTable::Make(const NewScalar& wanted) {
 
 void ScalarTable::Grow(Shard& shard, std::size_t capacity, void* memory) {
     const Slots* old = shard.slots.load(std::memory_order_relaxed);
-    const auto* grown = new (ArenaAllocate(sizeof(Slots))) Slots{capacity - 1, static_cast<Slot*>(memory)};
+    const auto* grown = new (ArenaAllocate(sizeof(Slots))) Slots{capacity, static_cast<Slot*>(memory)};
     if (old)
-        for (std::size_t i = 0; i <= old->mask; ++i)
+        for (std::size_t i = 0; i < old->capacity; ++i)
             if (const std::uint64_t slot = old->entries[i].load(std::memory_order_relaxed))
                 Fill(*grown, Unpack(slot));
     shard.slots.store(grown, std::memory_order_release);

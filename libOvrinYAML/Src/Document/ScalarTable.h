@@ -1,5 +1,7 @@
 #pragma once
 
+#include "Document/Hash.h"
+#include "Document/ShortTextCache.h"
 #include "Document/SpinLock.h"
 #include "Document/YAMLScalar.h"
 
@@ -11,7 +13,7 @@ namespace ovrin_yaml {
 
 /// The set of all interned scalars: a hash table cut into shards by the upper bits of the hash.
 ///
-///     shard 0   slots -> [ . s . . s s . . ]     open addressing, linear probing, at most half full
+///     shard 0   slots -> [ . s s . s s . . ]     open addressing, linear probing, at most two thirds full
 ///     ...
 ///     shard 63  slots -> [ s . . . ]
 ///
@@ -31,7 +33,10 @@ public:
     // scalar that it holds. Who has many texts asks for all slots, then for all scalars, and then for the
     // results.
 
-    static std::uint32_t HashOf(std::string_view text);
+    static std::uint32_t HashOf(std::string_view text) { return MurmurHash3(text, kScalarSeed); }
+    static std::uint32_t HashOf(const ShortTextCache::Words& text) {
+        return MurmurHash3(text.low, text.high, text.length, kScalarSeed);
+    }
     /// Starts to load the slot of a text with this hash.
     void PrefetchSlot(std::uint32_t hash) const;
     /// Starts to load the scalar that the slot of a text with this hash holds.
@@ -42,13 +47,25 @@ public:
     void Reserve(std::size_t count);
 
 private:
+    static constexpr unsigned kShardBits = 6;
+
+    /// Scalar hashes enter container hashes, which decide what counts as equal: the seed is part of the
+    /// system.
+    static constexpr std::uint32_t kScalarSeed = 42;
+
     /// A scalar's address with 16 bits of its hash above it, so that most probes of other scalars need not
     /// look into memory elsewhere. User addresses have 47 bits on the platforms served.
     using Slot = std::atomic<std::uint64_t>;
 
     struct Slots {
-        std::size_t mask;
+        std::size_t capacity;
         Slot* entries;
+
+        /// The place of a hash: the bits behind those of the shard, as a part of the capacity.
+        std::size_t PlaceOf(std::uint32_t hash) const {
+            return std::uint64_t{hash << kShardBits} * capacity >> 32;
+        }
+        std::size_t Behind(std::size_t place) const { return place + 1 == capacity ? 0 : place + 1; }
     };
 
     struct alignas(64) Shard {
@@ -57,7 +74,6 @@ private:
         std::size_t count = 0;
     };
 
-    static constexpr unsigned kShardBits = 6;
     static constexpr std::size_t kFirstCapacity = 64;
 
     Shard& ShardOf(std::uint32_t hash) { return m_Shards[hash >> (32 - kShardBits)]; }
