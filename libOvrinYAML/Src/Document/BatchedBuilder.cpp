@@ -8,7 +8,7 @@ namespace ovrin_yaml {
 
 void BatchedBuilder::AddNewShort(std::string_view text, const ShortTextCache::Words& words,
                                  ShortTextCache::Entry& entry) {
-    const std::uint32_t hash = ScalarTable::HashOf(text);
+    const std::uint32_t hash = ScalarTable::HashOf(words);
     ScalarTable::Instance().PrefetchSlot(hash);
     entry = {words.low, words.high, nullptr, hash, static_cast<std::uint16_t>(words.length), 0};
     AddLate(text, hash, &entry);
@@ -21,17 +21,17 @@ void BatchedBuilder::AddLong(std::string_view text) {
 }
 
 void BatchedBuilder::AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry* entry) {
-    if (m_LateCount == kMostLate) InternTexts();
     m_Late[m_LateCount++] = {text.data(), static_cast<std::uint32_t>(text.size()),
                              hash,        static_cast<std::uint32_t>(m_Stack.size()),
                              entry,       nullptr};
     if (entry) entry->user = static_cast<std::uint16_t>(m_LateCount);
     m_Stack.push_back({nullptr, hash, static_cast<std::uint32_t>(m_LateCount)});
+    if (m_LateCount == kMostLate) InternTexts();
 }
 
 YAMLScalar* BatchedBuilder::Intern(std::string_view text) {
     if (text.size() > ShortTextCache::kLongest) return ScalarTable::Instance().Intern(text, 0);
-    const ShortTextCache::Words words = Pack(text);
+    const ShortTextCache::Words words = ShortTextCache::Pack(text);
     ShortTextCache::Entry& entry = m_ShortTexts.At(words);
     if (!entry.Holds(words) || !entry.scalar) {
         YAMLScalar* scalar = ScalarTable::Instance().Intern(text, 0);
@@ -61,21 +61,18 @@ void BatchedBuilder::InternTexts() {
 bool BatchedBuilder::CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed) {
     const Node* nodes = m_Stack.data() + mark;
     const std::size_t count = (m_Stack.size() - mark) / 2;
-    std::uint32_t keysHash = 0;
-    for (std::size_t i = 0; i < count; ++i) keysHash = KeyLists::Fold(keysHash, nodes[2 * i].hash);
-    const KeyLists::List keys = m_KeyLists.Get(
-        count, keysHash, [nodes](std::size_t i) { return static_cast<YAMLScalar*>(nodes[2 * i].node); });
+    const KeyLists::List keys =
+        m_KeyLists.Get(count, [nodes](std::size_t i) { return static_cast<YAMLScalar*>(nodes[2 * i].node); });
     if (!keys) return false;
     YAMLMapping* mapping = YAMLMapping::Create(flow, keys, count);
     YAMLNode** values = mapping->Values();
+    std::uint32_t hash = 0;
     for (std::size_t i = 0; i < count; ++i) {
-        const Node& value = nodes[2 * i + 1];
+        const Node &key = nodes[2 * i], &value = nodes[2 * i + 1];
         values[i] = value.node;
         SetPlace(value, &values[i]);
+        if (i < count - unhashed) hash = FoldPair(hash, key.hash, value.hash, static_cast<std::uint32_t>(i));
     }
-    std::uint32_t hash = 0;
-    for (std::uint32_t i = 0; i < count - unhashed; ++i)
-        hash = FoldPair(hash, nodes[2 * i].hash, nodes[2 * i + 1].hash, i);
     mapping->m_Hash = hash;
     mapping->m_Line = line;
     m_Stack.resize(mark);

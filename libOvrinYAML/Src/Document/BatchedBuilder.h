@@ -29,15 +29,16 @@ namespace ovrin_yaml {
 ///     InternTexts                                m_X | {fileID: 12}
 class BatchedBuilder {
 public:
-    /// Texts must stay where they are until they are interned. All that is in front of `readableEnd` may be
-    /// read.
-    explicit BatchedBuilder(const char* readableEnd) : m_ReadableEnd(readableEnd) {}
+    // Texts must stay where they are until they are interned, and kReadAhead bytes from their start on must
+    // be readable.
+
+    static constexpr std::size_t kReadAhead = ShortTextCache::kLongest;
 
     void AddNode(YAMLNode* node, std::uint32_t hash) { m_Stack.push_back({node, hash, 0}); }
     void AddScalar(YAMLScalar* scalar) { AddNode(scalar, scalar->m_Hash); }
     void AddText(std::string_view text) {
         if (text.size() <= ShortTextCache::kLongest) {
-            const ShortTextCache::Words words = Pack(text);
+            const ShortTextCache::Words words = ShortTextCache::Pack(text);
             ShortTextCache::Entry& entry = m_ShortTexts.At(words);
             if (!entry.Holds(words))
                 AddNewShort(text, words, entry);
@@ -82,9 +83,6 @@ private:
     };
     static constexpr std::size_t kMostLate = 256;
 
-    ShortTextCache::Words Pack(std::string_view text) const {
-        return ShortTextCache::Pack(text, static_cast<std::size_t>(m_ReadableEnd - text.data()));
-    }
     void AddNewShort(std::string_view text, const ShortTextCache::Words& words, ShortTextCache::Entry& entry);
     void AddLong(std::string_view text);
     void AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry* entry);
@@ -92,7 +90,6 @@ private:
         if (node.late) m_Late[node.late - 1].place = place;
     }
 
-    const char* const m_ReadableEnd;
     std::vector<Node> m_Stack;
     std::size_t m_LateCount = 0;
     std::size_t m_FirstLate = 0; // of the tree under way

@@ -16,13 +16,9 @@ class KeyLists {
 public:
     using List = const YAMLScalar* const*;
 
-    /// Folds one key into the hash of a list.
-    static std::uint32_t Fold(std::uint32_t hash, std::uint32_t key) { return (hash + key) * 0x9e3779b1u; }
-
-    /// The list of keyAt(0), ..., keyAt(count - 1), whose hashes were folded into `hash`, from 0 on. Null if
-    /// a key is there twice.
-    template <class KeyAt> List Get(std::size_t count, std::uint32_t hash, const KeyAt& keyAt) {
-        Known& known = m_Known[hash >> (32 - kPlaceBits)];
+    /// The list of keyAt(0), ..., keyAt(count - 1). Null if a key is there twice.
+    template <class KeyAt> List Get(std::size_t count, const KeyAt& keyAt) {
+        Known& known = m_Known[PlaceOf(count, keyAt)];
         const auto holds = [&] {
             for (std::size_t i = 0; i < count; ++i)
                 if (known.list[i] != keyAt(i)) return false;
@@ -44,6 +40,13 @@ private:
         std::size_t count = SIZE_MAX;
     };
 
+    /// Three keys tell most lists from each other.
+    template <class KeyAt> static std::size_t PlaceOf(std::size_t count, const KeyAt& keyAt) {
+        if (count == 0) return 0;
+        const std::size_t hash =
+            keyAt(0)->m_Hash + 3 * keyAt(count / 2)->m_Hash + 5 * keyAt(count - 1)->m_Hash;
+        return (hash + count) * 0x9e3779b97f4a7c15u >> (64 - kPlaceBits);
+    }
     static const YAMLScalar** Allocate(std::size_t count);
     static bool HasRepeatedKey(std::span<const YAMLScalar* const> keys);
 

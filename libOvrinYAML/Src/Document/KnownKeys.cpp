@@ -4,6 +4,15 @@
 
 namespace ovrin_yaml {
 
+KnownKey* KnownKeys::FindOther(KeyGuess& guess, const char* position) {
+    for (KnownKey* key : {guess.earlier, guess.latest->next.latest}) {
+        if (!key->StandsAt(position)) continue;
+        guess.Take(*key);
+        return key;
+    }
+    return nullptr;
+}
+
 KnownKey& KnownKeys::PlaceOf(const KnownKey& parent, const YAMLScalar* scalar) {
     // Numbers, not addresses: what is guessed must not depend on them.
     const auto seed = static_cast<std::uint32_t>(&parent - m_Keys.data());

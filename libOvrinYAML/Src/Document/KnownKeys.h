@@ -25,8 +25,9 @@ struct KeyGuess {
 /// A key that was met before in mappings under a certain parent.
 struct KnownKey {
     YAMLScalar* scalar = nullptr;
-    /// The first eight bytes of the text and the colon behind it, and which of their bits count.
-    std::uint64_t word = 0;
+    /// The first eight bytes of the text and the colon behind it, and which of their bits count. Without a
+    /// key there is nothing that they could be.
+    std::uint64_t word = 1;
     std::uint64_t wordMask = 0;
     std::uint32_t length = 0; // of the text
     std::uint32_t hash = 0;
@@ -38,7 +39,7 @@ struct KnownKey {
     /// Whether the key stands at `position` with a colon behind it. The bytes up to kLongest + 1 behind it
     /// must be readable.
     bool StandsAt(const char* position) const {
-        if ((Load(position) & wordMask) != word || !scalar) return false;
+        if ((Load(position) & wordMask) != word) return false;
         if (length < 8) return true;
         const char* text = scalar->Value().data();
         for (std::uint32_t i = 8; i + 8 < length; i += 8)
@@ -82,12 +83,7 @@ public:
     /// The key that stands at `position`, or null if it isn't one of those guessed.
     static KnownKey* Find(KeyGuess& guess, const char* position) {
         if (guess.latest->StandsAt(position)) return guess.latest;
-        for (KnownKey* key : {guess.earlier, guess.latest->next.latest}) {
-            if (!key->StandsAt(position)) continue;
-            guess.Take(*key);
-            return key;
-        }
-        return nullptr;
+        return FindOther(guess, position);
     }
 
     /// The place of a key under `parent`, which `guess` takes for the next time.
@@ -100,6 +96,7 @@ private:
     static constexpr std::size_t kProbes = 4;
     static constexpr std::size_t kFirstPlace = 2;
 
+    static KnownKey* FindOther(KeyGuess& guess, const char* position);
     KnownKey& PlaceOf(const KnownKey& parent, const YAMLScalar* scalar);
 
     std::array<KnownKey, kFirstPlace + (std::size_t{1} << kPlaceBits) + kProbes> m_Keys;

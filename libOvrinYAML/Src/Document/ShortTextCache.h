@@ -27,17 +27,10 @@ public:
         std::uint64_t length = 0;
     };
 
-    /// `readable` is the number of bytes from the text's start on that may be read.
-    static Words Pack(std::string_view text, std::size_t readable) {
+    /// kLongest bytes from the text's start on must be readable.
+    static Words Pack(std::string_view text) {
         Words words;
         words.length = text.size();
-        if (readable < kLongest) {
-            char copy[kLongest] = {};
-            std::memcpy(copy, text.data(), text.size());
-            std::memcpy(&words.low, copy, 8);
-            std::memcpy(&words.high, copy + 8, 8);
-            return words;
-        }
         std::memcpy(&words.low, text.data(), 8);
         std::memcpy(&words.high, text.data() + 8, 8);
         words.low &= kMasks[text.size()].low;

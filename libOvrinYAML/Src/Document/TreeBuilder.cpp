@@ -41,13 +41,10 @@ YAMLNode* TreeBuilder::MakeMapping(const OpenContainer& open) {
 /// Null if a key is no scalar or stands there twice.
 YAMLMapping* TreeBuilder::MakeUsualMapping(const OpenContainer& open, std::span<YAMLNode* const> nodes) {
     const std::size_t count = nodes.size() / 2;
-    std::uint32_t hash = 0;
-    for (std::size_t i = 0; i < count; ++i) {
+    for (std::size_t i = 0; i < count; ++i)
         if (!AsScalar(nodes[2 * i])) return nullptr;
-        hash = KeyLists::Fold(hash, nodes[2 * i]->m_Hash);
-    }
     const KeyLists::List keys =
-        m_KeyLists.Get(count, hash, [nodes](std::size_t i) { return AsScalar(nodes[2 * i]); });
+        m_KeyLists.Get(count, [nodes](std::size_t i) { return AsScalar(nodes[2 * i]); });
     if (!keys) return nullptr;
     YAMLMapping* mapping = YAMLMapping::Create(open.flow, keys, count);
     for (std::size_t i = 0; i < count; ++i) mapping->Values()[i] = nodes[2 * i + 1];

@@ -51,17 +51,43 @@ bool Is(char c, CharClass wanted) {
     return kClasses[static_cast<unsigned char>(c)] & wanted;
 }
 
-/// How many of the eight bytes from `text` on are digits, or one of "-./", before another byte comes. These
-/// are most of what stands in a scene, and plain in both styles wherever they don't begin a text.
-std::size_t NumberLength(const char* text) {
-    constexpr std::uint64_t kOnes = 0x0101010101010101u, kHighBits = 0x80 * kOnes;
+/// Bytes behind a document that must be readable: what is compared or tested at one go.
+constexpr std::ptrdiff_t kReadAhead = 160;
+static_assert(kReadAhead >= static_cast<std::ptrdiff_t>(KnownKey::kLongest + 2));
+static_assert(kReadAhead >= static_cast<std::ptrdiff_t>(BatchedBuilder::kReadAhead));
+
+constexpr std::uint64_t EachByte(std::uint64_t byte) {
+    return byte * 0x0101010101010101u;
+}
+
+std::uint64_t LoadWord(const char* from) {
     std::uint64_t word;
-    std::memcpy(&word, text, sizeof word);
-    // Each byte by itself: the high bit is set where it is at least '-', or above '9', or not ASCII.
-    const std::uint64_t fromFirst = (word | kHighBits) - '-' * kOnes;
-    const std::uint64_t behindLast = (word & ~kHighBits) + (0x7f - '9') * kOnes;
-    const std::uint64_t others = (~fromFirst | behindLast | word) & kHighBits;
-    return others ? static_cast<std::size_t>(std::countr_zero(others)) / 8 : 8;
+    std::memcpy(&word, from, sizeof word);
+    return word;
+}
+
+/// Letters, digits and "-./_" are most of what stands in a scene, and plain in both styles wherever they
+/// don't begin a text.
+const char* SkipWord(const char* p) {
+    using Bytes [[gnu::vector_size(16)]] = std::uint8_t;
+    constexpr std::uint8_t kFirst = '-', kSpan = '9' - '-', kLetter = 'a', kLetters = 'z' - 'a';
+    constexpr std::uint8_t kCase = 0x20, kUnderscore = '_';
+    for (;; p += sizeof(Bytes)) {
+        Bytes bytes;
+        std::memcpy(&bytes, p, sizeof bytes);
+        // Ranges begin at zero, so that one comparison tells what is in them.
+        const auto others =
+            ~((bytes - kFirst <= kSpan) | ((bytes | kCase) - kLetter <= kLetters) | (bytes == kUnderscore));
+        std::uint64_t halves[2];
+        std::memcpy(halves, &others, sizeof halves);
+        if (halves[0]) return p + std::countr_zero(halves[0]) / 8;
+        if (halves[1]) return p + 8 + std::countr_zero(halves[1]) / 8;
+    }
+}
+
+const char* SkipBlanks(const char* p) {
+    for (;; p += 8)
+        if (const std::uint64_t others = LoadWord(p) ^ EachByte(' ')) return p + std::countr_zero(others) / 8;
 }
 
 /// Whether a text could be taken for the marker at the start or the end of a document.
@@ -110,12 +136,7 @@ private:
 WrittenFormReader::Document WrittenFormReader::Read(std::string_view text, std::uint32_t firstLine) {
     Document document;
     if (text.empty() || text.back() != '\n') return document;
-    m_Position = text.data();
-    m_End = m_Position + text.size();
-    m_LineStart = m_Position;
-    m_Line = firstLine;
-    m_Depth = 0;
-    m_IsAsWritten = true;
+    Begin(text, firstLine);
     try {
         document.object = ReadObject(firstLine);
         document.isAsWritten = m_IsAsWritten;
@@ -123,6 +144,25 @@ WrittenFormReader::Document WrittenFormReader::Read(std::string_view text, std::
         m_Builder.Clear();
     }
     return document;
+}
+
+void WrittenFormReader::Begin(std::string_view text, std::uint32_t firstLine) {
+    if (m_ReadableEnd - (text.data() + text.size()) < kReadAhead) {
+        std::string& copy = m_Copies.emplace_back(text);
+        copy.append(kReadAhead, '\0');
+        text = std::string_view(copy).substr(0, text.size());
+    }
+    m_Position = text.data();
+    m_End = m_Position + text.size();
+    m_LineStart = m_Position;
+    m_Line = firstLine;
+    m_Depth = 0;
+    m_IsAsWritten = true;
+}
+
+void WrittenFormReader::InternTexts() {
+    m_Builder.InternTexts();
+    m_Copies.clear();
 }
 
 YAMLMapping* WrittenFormReader::ReadObject(std::uint32_t firstLine) {
@@ -189,7 +229,7 @@ void WrittenFormReader::NextLine() {
         m_Indent = -1;
         return;
     }
-    while (*m_Position == ' ') ++m_Position;
+    m_Position = SkipBlanks(line);
     m_Indent = static_cast<int>(m_Position - line);
     if (*m_Position == '\n') throw NotSure();
     // At the first column three dashes or dots would end the document.
@@ -221,20 +261,19 @@ void WrittenFormReader::ReadPairs(int indent, KnownKey& parent) {
 }
 
 /// The key here, if it is one of those that are expected.
-KnownKey* WrittenFormReader::GuessKey(KeyGuess& guess) const {
-    const bool isReadable = m_ReadableEnd - m_Position > static_cast<std::ptrdiff_t>(KnownKey::kLongest + 1);
-    return isReadable ? KnownKeys::Find(guess, m_Position) : nullptr;
+inline KnownKey* WrittenFormReader::GuessBlockKey(KeyGuess& guess) const {
+    KnownKey* known = KnownKeys::Find(guess, m_Position);
+    if (!known) return nullptr;
+    const char behind = m_Position[known->length + 1];
+    return behind == ' ' || behind == '\n' ? known : nullptr;
 }
 
 /// Ends behind the colon.
 KnownKey& WrittenFormReader::ReadBlockKey(const KnownKey& parent, KeyGuess& guess) {
-    if (KnownKey* known = GuessKey(guess)) {
-        const char* behind = m_Position + known->length + 1;
-        if (*behind == ' ' || *behind == '\n') {
-            m_Builder.AddNode(known->scalar, known->hash);
-            m_Position = behind;
-            return *known;
-        }
+    if (KnownKey* known = GuessBlockKey(guess)) {
+        m_Builder.AddNode(known->scalar, known->hash);
+        m_Position += known->length + 1;
+        return *known;
     }
     if (!Is(*m_Position, kPlainStart)) throw NotSure();
     const char* end = ScanPlain(m_Position);
@@ -289,7 +328,8 @@ void WrittenFormReader::ReadItem(int indent, KnownKey& parent) {
     if (hasBlank && *++m_Position != '\n') {
         m_Indent = indent + 2;
         if (AtListItem()) return ReadBlockSequence(m_Indent, parent);
-        if (Is(*m_Position, kPlainStart) && *ScanPlain(m_Position) == ':')
+        const bool isGuessed = GuessBlockKey(parent.inside);
+        if (isGuessed || (Is(*m_Position, kPlainStart) && *ScanPlain(m_Position) == ':'))
             return ReadBlockMapping(m_Indent, parent);
         return ReadInline(indent, parent);
     }
@@ -316,14 +356,9 @@ void WrittenFormReader::ReadInline(int indent, KnownKey& parent) {
     if (m_Indent > indent) throw NotSure();
 }
 
-const char* WrittenFormReader::SkipNumber(const char* from) const {
-    return m_ReadableEnd - from >= 8 ? from + NumberLength(from) : from;
-}
-
 /// The end of the plain text on this line: the line end, or a colon that ends a key.
 const char* WrittenFormReader::ScanPlain(const char* from) const {
-    for (const char* p = SkipNumber(from);; ++p) {
-        while (Is(*p, kPlain)) ++p;
+    for (const char* p = SkipWord(from);; p = SkipWord(p + 1)) {
         switch (*p) {
         case '\n':
             return p;
@@ -337,7 +372,7 @@ const char* WrittenFormReader::ScanPlain(const char* from) const {
         case '#':
             break;
         default:
-            throw NotSure();
+            if (!Is(*p, kPlain)) throw NotSure();
         }
     }
 }
@@ -371,8 +406,11 @@ void WrittenFormReader::ReadPlainLines(int indent) {
 /// A text that stands plain on this line: the writer breaks lines at blanks behind the width, and quotes what
 /// could be taken for a document marker.
 void WrittenFormReader::NoteText(const char* begin, const char* end) {
-    if (*begin == '-' || *begin == '.') NoteIf(IsLikeMarker({begin, end}));
-    if (Column(end) <= kLineWidth) return;
+    if (begin[0] == begin[1] && (*begin == '-' || *begin == '.')) NoteIf(IsLikeMarker({begin, end}));
+    if (Column(end) > kLineWidth) NoteLongText(begin, end);
+}
+
+void WrittenFormReader::NoteLongText(const char* begin, const char* end) {
     const char* const behindWidth = std::max(begin, m_LineStart + kLineWidth + 1);
     NoteIf(behindWidth < end && std::memchr(behindWidth, ' ', static_cast<std::size_t>(end - behindWidth)));
 }
@@ -401,14 +439,14 @@ void WrittenFormReader::ReadFlowMapping(KnownKey& parent) {
             KnownKey& key = ReadFlowKey(parent, *guess);
             ReadFlowValue(key);
             guess = &key.next;
-        } while (ReadFlowSeparator('}'));
+        } while (SkipUsualSeparator() || ReadFlowSeparator('}'));
     }
     CloseMapping(mark, true, line);
 }
 
 /// Ends at the first character of the value.
 KnownKey& WrittenFormReader::ReadFlowKey(const KnownKey& parent, KeyGuess& guess) {
-    KnownKey* known = GuessKey(guess);
+    KnownKey* known = KnownKeys::Find(guess, m_Position);
     if (known && m_Position[known->length + 1] == ' ') {
         m_Builder.AddNode(known->scalar, known->hash);
         m_Position += known->length + 2;
@@ -440,7 +478,7 @@ void WrittenFormReader::ReadFlowSequence(KnownKey& parent) {
         NoteIf(Column(m_Position) > kLineWidth);
         do {
             ReadFlowValue(parent);
-        } while (ReadFlowSeparator(']'));
+        } while (SkipUsualSeparator() || ReadFlowSeparator(']'));
     }
     m_Builder.CloseSequence(mark, true, line);
 }
@@ -456,6 +494,13 @@ void WrittenFormReader::ReadFlowValue(KnownKey& parent) {
         m_Builder.AddText({m_Position, end});
         m_Position = end;
     }
+}
+
+/// The same as ReadFlowSeparator for what nearly always stands there.
+inline bool WrittenFormReader::SkipUsualSeparator() {
+    if (m_Position[0] != ',' || m_Position[1] != ' ' || Column(m_Position) >= kLineWidth) return false;
+    m_Position += 2;
+    return true;
 }
 
 /// Behind an entry: true at the first character of the next, false behind the closing bracket.
@@ -483,8 +528,8 @@ bool WrittenFormReader::ReadFlowSeparator(char close) {
 const char* WrittenFormReader::ScanFlowPlain() {
     const char* p = m_Position;
     if (!Is(*p, kPlainStart) && !(*p == '-' && Is(p[1], kFlow))) throw NotSure();
-    p = SkipNumber(p);
-    while (Is(*p, kFlow) || (*p == ' ' && Is(p[1], kFlow))) ++p;
+    p = SkipWord(p);
+    while (Is(*p, kFlow) || (*p == ' ' && Is(p[1], kFlow))) p = SkipWord(p + 1);
     NoteText(m_Position, p);
     return p;
 }

@@ -5,6 +5,7 @@
 #include "Document/YAMLMapping.h"
 
 #include <cstdint>
+#include <deque>
 #include <string>
 #include <string_view>
 
@@ -35,15 +36,14 @@ public:
     };
 
     /// Everything in front of `readableEnd` may be read.
-    explicit WrittenFormReader(const char* readableEnd)
-        : m_ReadableEnd(readableEnd), m_Builder(readableEnd) {}
+    explicit WrittenFormReader(const char* readableEnd) : m_ReadableEnd(readableEnd) {}
 
     /// `text` reaches from the "---" of the document up to that of the next or to the end of the file; it
-    /// must stay up to the next InternTexts, and the byte behind it must be readable. `firstLine` is the
-    /// zero-based line of the "---". No mapping of an object that is given back has a key twice.
+    /// must stay up to the next InternTexts. `firstLine` is the zero-based line of the "---". No mapping of
+    /// an object that is given back has a key twice.
     Document Read(std::string_view text, std::uint32_t firstLine);
     /// Completes the objects read so far. Better for many of them than for each.
-    void InternTexts() { m_Builder.InternTexts(); }
+    void InternTexts();
 
 private:
     /// Thrown where the reader isn't sure, and caught by Read.
@@ -55,6 +55,7 @@ private:
         bool isStripped;
     };
 
+    void Begin(std::string_view text, std::uint32_t firstLine);
     YAMLMapping* ReadObject(std::uint32_t firstLine);
     Header ReadHeaderLine();
     std::string_view ReadId();
@@ -66,11 +67,12 @@ private:
     std::ptrdiff_t Column(const char* position) const { return position - m_LineStart; }
     void NoteIf(bool differs) { m_IsAsWritten = m_IsAsWritten && !differs; }
     void NoteText(const char* begin, const char* end);
+    void NoteLongText(const char* begin, const char* end);
 
     // `parent` is the key that a value stands under.
 
     void ReadBlockMapping(int indent, KnownKey& parent);
-    KnownKey* GuessKey(KeyGuess& guess) const;
+    KnownKey* GuessBlockKey(KeyGuess& guess) const;
     KnownKey& ReadBlockKey(const KnownKey& parent, KeyGuess& guess);
     KnownKey& AddKey(const char* end, const KnownKey& parent, KeyGuess& guess);
     void ReadBlockValue(int indent, KnownKey& parent);
@@ -78,7 +80,6 @@ private:
     void ReadItem(int indent, KnownKey& parent);
     void ReadInline(int indent, KnownKey& parent);
     void ReadPlainLines(int indent);
-    const char* SkipNumber(const char* from) const;
     const char* ScanPlain(const char* from) const;
 
     void ReadFlow(KnownKey& parent);
@@ -86,6 +87,7 @@ private:
     KnownKey& ReadFlowKey(const KnownKey& parent, KeyGuess& guess);
     void ReadFlowSequence(KnownKey& parent);
     void ReadFlowValue(KnownKey& parent);
+    bool SkipUsualSeparator();
     bool ReadFlowSeparator(char close);
     const char* ScanFlowPlain();
 
@@ -101,7 +103,8 @@ private:
     const char* const m_ReadableEnd;
     BatchedBuilder m_Builder;
     KnownKeys m_KnownKeys;
-    std::string m_Text; // of a scalar that doesn't stand in the document as it is
+    std::deque<std::string> m_Copies; // of documents at the end of what may be read
+    std::string m_Text;               // of a scalar that doesn't stand in the document as it is
     const char* m_Position = nullptr;
     const char* m_End = nullptr;
     const char* m_LineStart = nullptr;
