@@ -36,7 +36,7 @@ private:
     static constexpr unsigned kPlaceBits = 8;
 
     struct Known {
-        List list;
+        List list = nullptr;
         std::size_t count = SIZE_MAX;
     };
 

@@ -51,20 +51,21 @@ public:
 
         class Iterator {
         public:
-            Iterator(const Pairs& pairs, std::size_t index) : m_Pairs(pairs), m_Index(index) {}
-            Entry operator*() const { return m_Pairs[m_Index]; }
+            Iterator(const YAMLScalar* const* key, YAMLNode* const* value) : m_Key(key), m_Value(value) {}
+            Entry operator*() const { return {*m_Key, *m_Value}; }
             Iterator& operator++() {
-                ++m_Index;
+                ++m_Key;
+                ++m_Value;
                 return *this;
             }
-            bool operator==(const Iterator& other) const { return m_Index == other.m_Index; }
+            bool operator==(const Iterator& other) const { return m_Key == other.m_Key; }
 
         private:
-            const Pairs& m_Pairs;
-            std::size_t m_Index;
+            const YAMLScalar* const* m_Key;
+            YAMLNode* const* m_Value;
         };
-        Iterator begin() const { return {*this, 0}; }
-        Iterator end() const { return {*this, m_Size}; }
+        Iterator begin() const { return {m_Keys, m_Values}; }
+        Iterator end() const { return {m_Keys + m_Size, m_Values + m_Size}; }
 
     private:
         const YAMLScalar* const* m_Keys;
