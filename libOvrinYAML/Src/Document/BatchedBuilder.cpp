@@ -11,20 +11,20 @@ void BatchedBuilder::AddNewShort(std::string_view text, const ShortTextCache::Wo
     const std::uint32_t hash = ScalarTable::HashOf(words);
     ScalarTable::Instance().PrefetchSlot(hash);
     entry = {words.low, words.high, nullptr, hash, static_cast<std::uint16_t>(words.length), 0};
-    AddLate(text, hash, &entry);
+    AddLate(text, hash, entry);
 }
 
 void BatchedBuilder::AddLong(std::string_view text) {
     const std::uint32_t hash = ScalarTable::HashOf(text);
     ScalarTable::Instance().PrefetchSlot(hash);
-    AddLate(text, hash, nullptr);
+    AddLate(text, hash, m_LongTexts);
 }
 
-void BatchedBuilder::AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry* entry) {
-    m_Late[m_LateCount++] = {text.data(), static_cast<std::uint32_t>(text.size()),
+void BatchedBuilder::AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry& entry) {
+    m_Late[++m_LateCount] = {text.data(), static_cast<std::uint32_t>(text.size()),
                              hash,        static_cast<std::uint32_t>(m_Stack.size()),
-                             entry,       nullptr};
-    if (entry) entry->user = static_cast<std::uint16_t>(m_LateCount);
+                             &entry,      nullptr};
+    entry.user = static_cast<std::uint16_t>(m_LateCount);
     m_Stack.push_back({nullptr, hash, static_cast<std::uint32_t>(m_LateCount)});
     if (m_LateCount == kMostLate) InternTexts();
 }
@@ -42,14 +42,13 @@ YAMLScalar* BatchedBuilder::Intern(std::string_view text) {
 
 void BatchedBuilder::InternTexts() {
     ScalarTable& table = ScalarTable::Instance();
-    for (std::size_t i = 0; i < m_LateCount; ++i) table.PrefetchScalar(m_Late[i].hash);
-    for (std::size_t i = 0; i < m_LateCount; ++i) {
+    for (std::size_t i = 1; i <= m_LateCount; ++i) table.PrefetchScalar(m_Late[i].hash);
+    for (std::size_t i = 1; i <= m_LateCount; ++i) {
         const LateText& late = m_Late[i];
         YAMLScalar* scalar = table.Intern({late.text, late.length}, late.hash, 0);
-        if (late.entry && late.entry->user == i + 1) {
-            late.entry->scalar = scalar;
-            late.entry->user = 0;
-        }
+        ShortTextCache::Entry* entry = late.entry->user == i ? late.entry : &m_LongTexts;
+        entry->scalar = scalar;
+        entry->user = 0;
         if (late.place)
             *late.place = scalar;
         else

@@ -45,7 +45,7 @@ public:
             else if (entry.scalar)
                 AddNode(entry.scalar, entry.hash);
             else
-                AddLate(text, entry.hash, &entry);
+                AddLate(text, entry.hash, entry);
         } else {
             AddLong(text);
         }
@@ -71,29 +71,30 @@ private:
     struct Node {
         YAMLNode* node;
         std::uint32_t hash;
-        std::uint32_t late; // number of the late text + 1, or 0
+        std::uint32_t late; // place in m_Late, or 0
     };
     struct LateText {
         const char* text;
         std::uint32_t length;
         std::uint32_t hash;
         std::uint32_t index;          // on the stack
-        ShortTextCache::Entry* entry; // to be completed if it is still the text's; null without one
+        ShortTextCache::Entry* entry; // to be completed if it is still the text's
         YAMLNode** place;             // null while the node is on the stack
     };
     static constexpr std::size_t kMostLate = 256;
 
     void AddNewShort(std::string_view text, const ShortTextCache::Words& words, ShortTextCache::Entry& entry);
     void AddLong(std::string_view text);
-    void AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry* entry);
-    void SetPlace(const Node& node, YAMLNode** place) {
-        if (node.late) m_Late[node.late - 1].place = place;
-    }
+    void AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry& entry);
+    void SetPlace(const Node& node, YAMLNode** place) { m_Late[node.late].place = place; }
 
     std::vector<Node> m_Stack;
     std::size_t m_LateCount = 0;
     std::size_t m_FirstLate = 0; // of the tree under way
-    std::array<LateText, kMostLate> m_Late;
+    // The first is nobody's: which texts are late is hard to foretell, so that writing where nobody reads is
+    // cheaper than a branch. For the same reason long texts have an entry.
+    std::array<LateText, kMostLate + 1> m_Late;
+    ShortTextCache::Entry m_LongTexts;
     ShortTextCache m_ShortTexts;
     KeyLists m_KeyLists;
 };

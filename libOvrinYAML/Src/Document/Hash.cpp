@@ -44,12 +44,14 @@ std::uint32_t MurmurHash3(std::string_view text, std::uint32_t seed) {
 }
 
 std::uint32_t MurmurHash3(std::uint64_t low, std::uint64_t high, std::size_t length, std::uint32_t seed) {
-    const std::uint64_t words[] = {low, low >> 32, high, high >> 32, 0};
-    const std::size_t blocks = length / 4;
-    std::uint32_t hash = seed;
-    for (std::size_t i = 0; i < blocks; ++i) hash = FoldBlock(hash, static_cast<std::uint32_t>(words[i]));
-    // Without a rest this is zero, which changes nothing.
-    if (length % 4) hash ^= Scramble(static_cast<std::uint32_t>(words[blocks]));
+    const std::uint32_t blocks[] = {static_cast<std::uint32_t>(low), static_cast<std::uint32_t>(low >> 32),
+                                    static_cast<std::uint32_t>(high), static_cast<std::uint32_t>(high >> 32),
+                                    0};
+    // The length is hard to foretell, so that all blocks are cheaper than the right number of them. A rest of
+    // nothing is zero, which changes nothing.
+    std::uint32_t hashes[5] = {seed};
+    for (std::size_t i = 0; i < 4; ++i) hashes[i + 1] = FoldBlock(hashes[i], blocks[i]);
+    const std::uint32_t hash = hashes[length / 4] ^ Scramble(blocks[length / 4]);
     return Finalise(hash ^ static_cast<std::uint32_t>(length));
 }
 

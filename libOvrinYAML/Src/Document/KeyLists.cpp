@@ -7,12 +7,29 @@
 
 namespace ovrin_yaml {
 
+namespace {
+
+/// False only if no two of the keys are the same. Each sets a bit in both of two words.
+bool MayRepeatKey(std::span<const YAMLScalar* const> keys) {
+    std::uint64_t first = 0, second = 0, both = 0;
+    for (const YAMLScalar* key : keys) {
+        const unsigned bit = key->m_Hash % 64, other = key->m_Hash / 64 % 64;
+        both |= first >> bit & second >> other;
+        first |= std::uint64_t{1} << bit;
+        second |= std::uint64_t{1} << other;
+    }
+    return both & 1;
+}
+
+} // namespace
+
 const YAMLScalar** KeyLists::Allocate(std::size_t count) {
     // Null tells of a repeated key, so even an empty list is somewhere.
     return static_cast<const YAMLScalar**>(ArenaAllocate(std::max<std::size_t>(count, 1) * sizeof(List)));
 }
 
 bool KeyLists::HasRepeatedKey(std::span<const YAMLScalar* const> keys) {
+    if (!MayRepeatKey(keys)) return false;
     if (keys.size() > KeyIndex::kSearchLimit) {
         KeyIndex index;
         index.Reserve(keys.size());

@@ -19,12 +19,11 @@ public:
     /// The list of keyAt(0), ..., keyAt(count - 1). Null if a key is there twice.
     template <class KeyAt> List Get(std::size_t count, const KeyAt& keyAt) {
         Known& known = m_Known[PlaceOf(count, keyAt)];
-        const auto holds = [&] {
-            for (std::size_t i = 0; i < count; ++i)
-                if (known.list[i] != keyAt(i)) return false;
-            return true;
-        };
-        if (known.count == count && holds()) return known.list;
+        if (known.count == count) {
+            bool isSame = true;
+            for (std::size_t i = 0; i < count; ++i) isSame &= known.list[i] == keyAt(i);
+            if (isSame) return known.list;
+        }
         const YAMLScalar** list = Allocate(count);
         for (std::size_t i = 0; i < count; ++i) list[i] = keyAt(i);
         if (HasRepeatedKey({list, count})) return nullptr;

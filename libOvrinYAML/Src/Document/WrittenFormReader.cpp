@@ -66,6 +66,12 @@ std::uint64_t LoadWord(const char* from) {
     return word;
 }
 
+/// The lowest bits of the eight bytes, side by side: the factor moves each of them to its place in the top
+/// byte.
+std::uint64_t BitOfEachByte(std::uint64_t bytes) {
+    return (bytes & EachByte(1)) * 0x0102040810204080u >> 56;
+}
+
 /// Letters, digits and "-./_" are most of what stands in a scene, and plain in both styles wherever they
 /// don't begin a text.
 const char* SkipWord(const char* p) {
@@ -80,8 +86,9 @@ const char* SkipWord(const char* p) {
             ~((bytes - kFirst <= kSpan) | ((bytes | kCase) - kLetter <= kLetters) | (bytes == kUnderscore));
         std::uint64_t halves[2];
         std::memcpy(halves, &others, sizeof halves);
-        if (halves[0]) return p + std::countr_zero(halves[0]) / 8;
-        if (halves[1]) return p + 8 + std::countr_zero(halves[1]) / 8;
+        // Where a word ends is hard to foretell, so both halves are looked at without a branch.
+        const std::uint64_t bits = BitOfEachByte(halves[0]) | BitOfEachByte(halves[1]) << 8;
+        if (bits) return p + std::countr_zero(bits);
     }
 }
 
