@@ -81,12 +81,14 @@ def bring_memory(size):
     """Has another process touch that much memory and give it back, so that the system has it at hand.
 
     Where a host takes the free memory of a virtual machine away, the first touch of a page costs several times as
-    much if nobody used it for some seconds: a command would pay for the time that its neighbour took.
+    much if nobody used it for some seconds: a command would pay for the time that its neighbour took. Huge pages,
+    because the system hands out single pages again before it makes new huge ones of them.
     """
     touch = ("import mmap, sys; m = mmap.mmap(-1, int(sys.argv[1]), mmap.MAP_PRIVATE | mmap.MAP_ANONYMOUS); "
-             "m[::4096] = bytes(len(m[::4096]))")
+             "m.madvise(mmap.MADV_HUGEPAGE); m[::4096] = bytes(len(m[::4096]))")
+    available = os.sysconf("SC_AVPHYS_PAGES") * mmap.PAGESIZE
     if size >= mmap.PAGESIZE:
-        subprocess.run([sys.executable, "-c", touch, str(size)], check=True)
+        subprocess.run([sys.executable, "-c", touch, str(min(size, available // 2))], check=True)
 
 
 def measure(commands, runs, memory_at_hand=True):
@@ -95,7 +97,7 @@ def measure(commands, runs, memory_at_hand=True):
     needed = max((sample.peak for sample in first if sample), default=0) if memory_at_hand else 0
     for _ in range(runs):
         for command in commands:
-            bring_memory(needed * 5 // 4)
+            bring_memory(2 * needed)
             sample = command.run()
             if sample:
                 command.samples.append(sample)
@@ -223,7 +225,7 @@ class Bench:
         """A line of the summary: our command against another, or alone if other is None."""
         self.findings.append([
             work, seconds(ours), other.name if other else "", seconds(other) if other else "",
-            number(ratio(ours, other, "wall", scale) if other else None) if other else "",
+            number(ratio(ours, other, "wall", scale), "%.3g") if other else "",
             megabytes(ours), number(ratio(ours, other, "peak")) if other else "", wanted])
 
     # Rows
@@ -302,7 +304,7 @@ class Bench:
         for state, memory_at_hand, wanted in (("", True, "time 0.125"), (", memory as it comes", False, "")):
             ours = Command("reader", [self.reader, scene.base])
             loader = self.loader([scene.base], "--nothreads")
-            measure([ours, loader], self.runs(self.big()), memory_at_hand)
+            measure([ours, loader], 3 * self.runs(self.big()), memory_at_hand)
             self.finding("reading %d MB on one thread%s" % (self.big(), state), ours, loader, wanted)
         self.drop_scenes()
 
