@@ -24,8 +24,8 @@ namespace ovrin_yaml {
 /// is asked for. The scalar itself comes when enough texts wait, into the place where its node stands by
 /// then.
 ///
-///     "m_X" open "fileID" "12" close      stack  m_X | fileID | late 0, hash of "12"
-///                                                m_X | {fileID: null}     late 0 -> place of the null
+///     "m_X" open "fileID" "12" close      stack  m_X | fileID | late 1, hash of "12"
+///                                                m_X | {fileID: null}     late 1 -> place of the null
 ///     InternTexts                                m_X | {fileID: 12}
 class BatchedBuilder {
 public:

@@ -60,12 +60,6 @@ constexpr std::uint64_t EachByte(std::uint64_t byte) {
     return byte * 0x0101010101010101u;
 }
 
-std::uint64_t LoadWord(const char* from) {
-    std::uint64_t word;
-    std::memcpy(&word, from, sizeof word);
-    return word;
-}
-
 /// The lowest bits of the eight bytes, side by side: the factor moves each of them to its place in the top
 /// byte.
 std::uint64_t BitOfEachByte(std::uint64_t bytes) {
@@ -94,7 +88,8 @@ const char* SkipWord(const char* p) {
 
 const char* SkipBlanks(const char* p) {
     for (;; p += 8)
-        if (const std::uint64_t others = LoadWord(p) ^ EachByte(' ')) return p + std::countr_zero(others) / 8;
+        if (const std::uint64_t others = KnownKey::Load(p) ^ EachByte(' '))
+            return p + std::countr_zero(others) / 8;
 }
 
 /// Whether a text could be taken for the marker at the start or the end of a document.
