@@ -22,6 +22,7 @@ int HandleDiffCommand(DiffConfig& config) {
     text << "Diff '" << config.leftFile << "' vs. '" << config.rightFile << "':\n";
     ovrin_yaml::YAMLDiffOutput output(text, kIndentWidth);
     files.diff->Output(output);
+    output.Finish();
     WriteOutput(config.destFile, [&](std::ostream& stream) { stream << text.view(); });
     return 0;
 }

@@ -60,6 +60,10 @@ void YAMLDiffOutput::WriteAligned(std::string_view text) {
     m_Indent = indent;
 }
 
+void YAMLDiffOutput::Finish() {
+    while (!m_Pending.empty()) *this << "";
+}
+
 YAMLDiffOutput& endl(YAMLDiffOutput& output) {
     return output << "\n";
 }

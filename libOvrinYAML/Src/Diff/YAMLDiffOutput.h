@@ -11,8 +11,8 @@ namespace ovrin_yaml {
 ///
 /// What is given is cut into pieces of at most 511 bytes that end at line feeds. Each call writes pieces up
 /// to and including the first that has no line feed; the rest waits for the next call, in order. So a run of
-/// more than 511 bytes without a line feed comes out late, and what still waits at the end is dropped. Every
-/// line is indented, an empty one too. Belongs to one thread; the stream must outlive it.
+/// more than 511 bytes without a line feed comes out late; what still waits at the end comes with Finish.
+/// Every line is indented, an empty one too. Belongs to one thread; the stream must outlive it.
 class YAMLDiffOutput {
 public:
     YAMLDiffOutput(std::ostream& stream, std::size_t indentWidth)
@@ -30,6 +30,8 @@ public:
     void EndLineIfOpen();
     /// Writes `text` so that its further lines stand under its first character.
     void WriteAligned(std::string_view text);
+    /// Writes all that still waits, as further calls without text would. To be called at the end.
+    void Finish();
 
 private:
     /// Writes the next piece that waits; true if it ended a line.

@@ -85,6 +85,13 @@ void OutputNonConflict(YAMLDiffOutput& output, const Record& record) {
     }
 }
 
+void OutputNonConflicts(YAMLDiffOutput& output, const std::vector<const Record*>& records) {
+    output << kNonConflictHandlingHeader << endl;
+    for (const Record* record : records)
+        if (record->resolve != ResolveConflict && record->type != ConflictBothChanges)
+            OutputNonConflict(output, *record);
+}
+
 bool BeginsWith(const std::string& line, const char* header) {
     return std::string_view(line).starts_with(header);
 }
@@ -140,11 +147,8 @@ void OutputConflictRecords(std::ostream& out, const RecordingConflictResolver& r
     output.EndLineIfOpen();
     output << kConflictHandlingHeader << endl;
     for (const RecordResolve& decision : resolver.Resolves()) OutputResolve(output, decision);
-    if (!describe) return;
-    output << kNonConflictHandlingHeader << endl;
-    for (const Record* record : records)
-        if (record->resolve != ResolveConflict && record->type != ConflictBothChanges)
-            OutputNonConflict(output, *record);
+    if (describe) OutputNonConflicts(output, records);
+    output.Finish();
 }
 
 void InputConflictRecords(std::istream& in, RecordingConflictResolver& resolver) {
