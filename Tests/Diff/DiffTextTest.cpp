@@ -62,7 +62,14 @@ TEST_F(DiffText, AnObjectIsShownWithoutItsHeader) {
     EXPECT_EQ(Show(&objects.GetMapping()), before);
 }
 
-/// What the writer puts out for some calls; a text "+" and "-" indents and unindents.
+TEST_F(DiffText, AnAddedObjectShowsRepeatedKeysAsTheyStand) {
+    OvrinObjects objects;
+    ParseYAMLString(ObjectText("--- !o!1 &5\nC:\n  a: '1,'\n  a: '2,'\n"), objects);
+    EXPECT_EQ(Text(YAMLMappingDiff::Diff(Doc(""), &objects.GetMapping())),
+              "  5 add as C:\n             a: 1,\n             a: 2,\n");
+}
+
+/// What the writer puts out for some calls; a text "+" and "-" indents and unindents, "." is the end.
 std::string Piecewise(const std::vector<std::string>& calls) {
     std::ostringstream stream;
     YAMLDiffOutput output(stream, 2);
@@ -71,6 +78,8 @@ std::string Piecewise(const std::vector<std::string>& calls) {
             output.Indent();
         else if (call == "-")
             output.Unindent();
+        else if (call == ".")
+            output.Finish();
         else
             output << call;
     }
@@ -89,7 +98,8 @@ TEST_F(DiffText, LongRunsComeOutPieceByPiece) {
     EXPECT_EQ(Piecewise({piece + "z\n"}), piece);
     EXPECT_EQ(Piecewise({piece + "z\n", ""}), piece + "z\n");
     EXPECT_EQ(Piecewise({piece + rest, "\n"}), piece + rest + "\n");
-    EXPECT_EQ(Piecewise({piece + piece + rest, "\n"}), piece + piece) << "what still waits is dropped";
+    EXPECT_EQ(Piecewise({piece + piece + rest, "\n"}), piece + piece);
+    EXPECT_EQ(Piecewise({piece + piece + rest, "\n", "."}), piece + piece + rest + "\n");
     EXPECT_EQ(Piecewise({"+", piece + "z", "\na\n", "b"}), "  " + piece + "z\n  a\n  b");
     EXPECT_EQ(Piecewise({"+", piece, "\n", "a"}), "  " + piece + "\n  a");
 }

@@ -5,6 +5,7 @@
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
+#include "Document/ObjectFileWriter.h"
 #include "Document/YAMLMapping.h"
 
 namespace ovrin_yaml {
@@ -15,12 +16,8 @@ namespace {
 std::string TextOf(const YAMLNode* value) {
     const YAMLMapping* mapping = AsMapping(value);
     if (!mapping || !mapping->HasKey(YAMLScalar::classIDPlaceHolderName)) return value->GetYAMLString();
-    YAMLMapping* body = AsMapping(mapping->Clone());
-    body->Remove(YAMLScalar::classIDPlaceHolderName);
-    body->Remove(YAMLScalar::fileIDPlaceHolderName);
-    body->Remove(YAMLScalar::strippedPrefabPlaceHolderName);
-    std::string text = body->GetYAMLString();
-    body->Free();
+    std::string text;
+    AppendObjectBody(*mapping, text);
     return text;
 }
 

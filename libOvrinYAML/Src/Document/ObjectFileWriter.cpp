@@ -1,3 +1,5 @@
+#include "Document/ObjectFileWriter.h"
+
 #include "Document/OvrinObjects.h"
 #include "Document/YAMLEmitter.h"
 #include "Document/YAMLScalar.h"
@@ -16,11 +18,6 @@ constexpr std::size_t kPieceSize = std::size_t{1} << 20;
 
 constexpr const char* kFileHeader = "%YAML 1.1\n%TAG !o! tag:" OVRIN_TAG_AUTHORITY ",2011:\n";
 
-bool IsPlaceHolder(const YAMLScalar* key) {
-    return key == YAMLScalar::fileIDPlaceHolderName || key == YAMLScalar::classIDPlaceHolderName ||
-           key == YAMLScalar::strippedPrefabPlaceHolderName;
-}
-
 void AppendHeaderLine(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text) {
     const YAMLScalar* fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
     const YAMLScalar* classID = AsScalar(object.Get(YAMLScalar::classIDPlaceHolderName));
@@ -31,19 +28,18 @@ void AppendHeaderLine(const YAMLScalar& rootKey, const YAMLMapping& object, std:
     text.push_back('\n');
 }
 
-void AppendBody(const YAMLMapping& object, std::string& text) {
+} // namespace
+
+void AppendObjectBody(const YAMLMapping& object, std::string& text) {
     std::vector<const YAMLScalar*> keys;
     std::vector<YAMLNode*> values;
     for (const YAMLMapping::Entry entry : object) {
-        if (IsPlaceHolder(entry.key)) continue;
+        if (IsPlaceHolderKey(entry.key)) continue;
         keys.push_back(entry.key);
         values.push_back(entry.value);
     }
     YAMLEmitter(text).EmitDocument({keys.data(), values.data(), keys.size()}, object.m_Flow);
-    text.push_back('\n');
 }
-
-} // namespace
 
 void OvrinObjects::Output(std::ostream& stream) const {
     std::string text = kFileHeader;
@@ -53,7 +49,8 @@ void OvrinObjects::Output(std::ostream& stream) const {
             text += object.Source();
         } else {
             AppendHeaderLine(*entry.key, object, text);
-            AppendBody(object, text);
+            AppendObjectBody(object, text);
+            text.push_back('\n');
         }
         if (text.size() < kPieceSize) continue;
         stream.write(text.data(), static_cast<std::streamsize>(text.size()));

@@ -1,12 +1,19 @@
 #pragma once
 
 #include "Document/YAMLMapping.h"
+#include "Document/YAMLScalar.h"
 
 #include <iosfwd>
 #include <memory>
 #include <string>
 
 namespace ovrin_yaml {
+
+/// Whether an object's entry under `key` holds data of its header line.
+inline bool IsPlaceHolderKey(const YAMLScalar* key) {
+    return key == YAMLScalar::fileIDPlaceHolderName || key == YAMLScalar::classIDPlaceHolderName ||
+           key == YAMLScalar::strippedPrefabPlaceHolderName;
+}
 
 /// One object file: a root mapping from file-id scalar to object mapping, in file order.
 ///
