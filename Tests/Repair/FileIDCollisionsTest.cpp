@@ -1,5 +1,6 @@
 #include "Repair/FileIDCollisions.h"
 
+#include "Document/YAMLSequence.h"
 #include "Support/ObjectText.h"
 
 #include <gtest/gtest.h>
@@ -14,6 +15,17 @@ std::string Remapped(Scene&& base, Scene&& left, Scene&& right) {
     const std::string failure =
         FailureOf([&] { RemapCollidingAddFileIDs(conflicts, base.Root(), left.Root(), right.Root()); });
     return failure.empty() ? right.Text() : failure;
+}
+
+/// The hashes of a tree, parents in front of their children.
+std::string Hashes(const YAMLNode& node) {
+    std::string text = std::to_string(node.m_Hash) + " ";
+    if (const YAMLMapping* mapping = AsMapping(&node))
+        for (const auto& entry : *mapping)
+            if (!IsPlaceHolderKey(entry.key)) text += Hashes(*entry.value);
+    if (const YAMLSequence* sequence = AsSequence(&node))
+        for (const YAMLNode* item : sequence->m_Items) text += Hashes(*item);
+    return text;
 }
 
 /// Objects of the class B with the ids from `first` to `last`.
@@ -52,6 +64,18 @@ TEST(FileIDCollisions, ReferencesWithinTheRightFileFollow) {
               "2 &6 B: {self: {fileID: 6}, far: {fileID: 5, guid: abc}}\n"
               "2 &8 B: {list: [{fileID: 6}, 5, [{r: {fileID: 6}}]], fileID: 6, other: 5}\n"
               "2 &9 B: {fileID: [5], r: {fileID: 4}}\n");
+}
+
+/// Else two additions that differ in nothing but the id would count as one.
+TEST(FileIDCollisions, WhatHoldsAMovedIdHasTheHashOfBeingRead) {
+    const auto objects = [](const char* id) {
+        const std::string text = id;
+        return "2 &" + text + " B: {l: [{fileID: " + text + "}, {r: [[{fileID: " + text +
+               "}]]}], o: {a: 1}}\n" + "4 &8 stripped T: {f: {fileID: " + text + "}}\n";
+    };
+    Scene base(""), left("1 &5 A: {}\n"), right(objects("5")), wanted(objects("6"));
+    RemapCollidingAddFileIDs({Id("5")}, base.Root(), left.Root(), right.Root());
+    for (const auto& [id, object] : wanted.Root()) EXPECT_EQ(Hashes(*right.Root().Get(id)), Hashes(*object));
 }
 
 TEST(FileIDCollisions, ReferencesMoveOnceThoughIdsFollowEachOther) {

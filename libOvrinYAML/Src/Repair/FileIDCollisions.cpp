@@ -1,6 +1,8 @@
 #include "Repair/FileIDCollisions.h"
 
 #include "Document/AlignedLookup.h"
+#include "Document/Hash.h"
+#include "Document/OvrinObjects.h"
 #include "Repair/ObjectAccess.h"
 
 #include <algorithm>
@@ -36,21 +38,65 @@ template <class IsTaken> const YAMLScalar* NextFreeID(const YAMLScalar& id, cons
     throw YAMLError("Cannot create new fileID for conflicting fileID: " + std::string(id.Value()));
 }
 
+/// Brings references to their new ids. What holds one gets the hash that reading it with the new id would
+/// give: two additions that differ in nothing but the id must not count as one.
+class ReferenceRewriter {
+public:
+    explicit ReferenceRewriter(const std::vector<NewID>& newIDs) {
+        for (const NewID& newID : newIDs) m_Remap.emplace(newID.from, newID.to);
+    }
+
+    bool RefersToMoved(const YAMLMapping& mapping) const {
+        return m_Remap.contains(AsScalar(mapping.Get(YAMLScalar::fileID))) &&
+               !mapping.HasKey(YAMLScalar::guid);
+    }
+
+    /// Rewrites the references in an object.
+    void RewriteObject(YAMLMapping& object) const {
+        RewriteInside(object);
+        std::uint32_t hash = 0, index = 0;
+        for (const YAMLMapping::Entry entry : object)
+            if (!IsPlaceHolderKey(entry.key))
+                hash = FoldPair(hash, entry.key->m_Hash, entry.value->m_Hash, index++);
+        object.m_Hash = hash;
+    }
+
+private:
+    /// Rewrites below a node. Returns whether there was a reference.
+    bool Rewrite(YAMLNode* node) const {
+        bool isChanged = false;
+        if (YAMLMapping* mapping = AsMapping(node))
+            isChanged = RewriteInside(*mapping);
+        else if (YAMLSequence* sequence = AsSequence(node))
+            for (YAMLNode* item : sequence->m_Items) isChanged |= Rewrite(item);
+        if (isChanged) node->RebuildHash(true);
+        return isChanged;
+    }
+
+    bool RewriteInside(YAMLMapping& mapping) const {
+        const bool isReference = RefersToMoved(mapping);
+        if (isReference) {
+            const YAMLScalar* target = AsScalar(mapping.Get(YAMLScalar::fileID));
+            mapping.Change(YAMLScalar::fileID, m_Remap.at(target)->Clone());
+        }
+        bool isChanged = isReference;
+        for (const YAMLMapping::Entry entry : mapping) isChanged |= Rewrite(entry.value);
+        return isChanged;
+    }
+
+    std::unordered_map<const YAMLScalar*, const YAMLScalar*> m_Remap;
+};
+
 /// Goes through the file even where no id moved, and so is also what notices repeated keys in it; objects
 /// that are known to have none are passed over then.
 void RewriteReferences(const std::vector<NewID>& newIDs, YAMLMapping& root) {
-    std::unordered_map<const YAMLScalar*, const YAMLScalar*> remap;
-    for (const NewID& newID : newIDs) remap.emplace(newID.from, newID.to);
+    const ReferenceRewriter rewriter(newIDs);
     const auto refersToMoved = [&](const YAMLScalar*, const YAMLMapping& mapping) {
-        return remap.contains(AsScalar(mapping.Get(YAMLScalar::fileID))) && !mapping.HasKey(YAMLScalar::guid);
+        return rewriter.RefersToMoved(mapping);
     };
     const auto isOfInterest = [&](std::uint8_t) { return !newIDs.empty(); };
     ForEachObject(root, isOfInterest, [&](const YAMLScalar* id, YAMLNode* object) {
-        if (FindMappings(id, object, refersToMoved).empty()) return;
-        for (YAMLMapping* reference : FindMappings(id, &Editable(root, id), refersToMoved)) {
-            const YAMLScalar* target = AsScalar(reference->Get(YAMLScalar::fileID));
-            reference->Change(YAMLScalar::fileID, remap.at(target)->Clone());
-        }
+        if (!FindMappings(id, object, refersToMoved).empty()) rewriter.RewriteObject(Editable(root, id));
     });
 }
 
