@@ -4,15 +4,18 @@
 #include "Document/YAMLError.h"
 
 #include <exception>
+#include <new>
 #include <string>
 
 /// Takes a step of reading the file `path`. What it throws is thrown again as YAMLError with the path and the
-/// fault.
+/// fault, but for std::bad_alloc: no file is at fault.
 template <class Step> void WithFileName(const std::string& path, const Step& step) {
     try {
         step();
     } catch (const ovrin_yaml::YAMLError& error) {
         throw ovrin_yaml::YAMLError("Error parsing file '" + path + "': " + error.what());
+    } catch (const std::bad_alloc&) {
+        throw;
     } catch (const std::exception& error) {
         throw ovrin_yaml::YAMLError("Error parsing file '" + path +
                                     "' caught unknown exception: " + error.what());

@@ -14,6 +14,7 @@
 #include <exception>
 #include <iostream>
 #include <iterator>
+#include <new>
 
 std::stringstream g_DriverErrors;
 
@@ -66,6 +67,8 @@ int MergeSmartly(MergeConfig& config, const std::string& output, bool useFallbac
         result = HandleMergeCommand(config, output);
     } catch (const ovrin_yaml::YAMLError& error) {
         return Fail(error.what());
+    } catch (const std::bad_alloc&) {
+        throw; // no memory for a message either: main has one ready
     } catch (const std::exception& error) {
         return Fail(error.what());
     }
