@@ -13,6 +13,7 @@
 #include <deque>
 #include <exception>
 #include <functional>
+#include <optional>
 #include <thread>
 
 using namespace ovrin_yaml;
@@ -21,8 +22,20 @@ namespace {
 
 /// A file that is being read along with others, and what went wrong with it.
 struct FileInWork {
+    /// What has no size may be a pipe. One program may fill several of them, in an order of its own, so each
+    /// is taken on a thread of its own, which begins at once.
     FileInWork(const InputFile& input, ReaderOptions options)
-        : path(*input.path), file(*input.objects, options) {}
+        : path(*input.path), file(*input.objects, options) {
+        if (FileSize(path) == 0) m_Stream.emplace([this] { TakeHere(); });
+    }
+
+    /// Gets hold of the bytes.
+    void Take() {
+        if (m_Stream)
+            m_Stream->Join();
+        else
+            TakeHere();
+    }
 
     /// Takes a step of reading, unless an earlier one failed.
     template <class Step> void Try(const Step& step) {
@@ -37,6 +50,13 @@ struct FileInWork {
     const std::string& path;
     ObjectFile file;
     std::exception_ptr failure;
+
+private:
+    void TakeHere() {
+        Try([this] { TakeFile(path, file); });
+    }
+
+    std::optional<Thread> m_Stream;
 };
 
 /// Below this size of all files together, threads cost more than they bring.
@@ -79,7 +99,7 @@ void ReadOnThreads(TimerStat& parent, const std::vector<InputFile>& inputs, Read
     std::vector<std::function<void()>> takes, cuts, pieces;
     for (FileInWork& work : files) {
         takes.emplace_back([&] {
-            work.Try([&] { TakeFile(work.path, work.file); });
+            work.Take();
             if (&work == &first) work.Try([&] { work.file.Cut(nullptr); });
         });
         if (&work != &first) cuts.emplace_back([&] { work.Try([&] { work.file.Cut(&first.file); }); });
@@ -99,15 +119,17 @@ void ReadOnThreads(TimerStat& parent, const std::vector<InputFile>& inputs, Read
 
 void ReadInOrder(TimerStat& parent, const std::vector<InputFile>& inputs, ReaderOptions options) {
     std::deque<FileInWork> files;
-    for (const InputFile& input : inputs) {
-        TimerStat timer(parent, input.timerName);
-        FileInWork& work = files.emplace_back(input, options);
-        WithFileName(work.path, [&] {
-            TakeFile(work.path, work.file);
-            work.file.Cut(files.size() == 1 ? nullptr : &files.front().file);
+    for (const InputFile& input : inputs) files.emplace_back(input, options);
+    for (std::size_t i = 0; i < inputs.size(); ++i) {
+        TimerStat timer(parent, inputs[i].timerName);
+        FileInWork& work = files[i];
+        work.Take();
+        work.Try([&] {
+            work.file.Cut(i == 0 ? nullptr : &files.front().file);
             ReadPieces(work);
             FinishFile(work.file);
         });
+        if (work.failure) std::rethrow_exception(work.failure);
     }
 }
 

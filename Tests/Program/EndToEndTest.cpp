@@ -166,6 +166,35 @@ TEST_F(BadInput, AFileCutAnywhereIsMergedOrRefused) {
     }
 }
 
+/// One program fills all three, in any order, and waits for each to be read.
+TEST_F(BadInput, PipesAreNone) {
+    ASSERT_EQ(Merge(), 0);
+    const std::string merged = directory.Read("dest.ovrin");
+    for (const char* order : {"base left right", "right left base", "left right base"}) {
+        for (const char* option : {"", "--nothreads "}) {
+            const std::string command =
+                "mkfifo base left right; (for f in " + std::string(order) +
+                "; do cat $f.ovrin > $f; done) & \"$OVRIN\" merge " + option +
+                "--force --fallback none base left right dest.ovrin; s=$?; wait; rm base left right; exit $s";
+            EXPECT_EQ(directory.Run("timeout 20 sh -c '" + command + "'"), 0) << order << option;
+            EXPECT_EQ(directory.Read("dest.ovrin"), merged) << order << option;
+        }
+    }
+}
+
+TEST_F(BadInput, MoreThanTheMemoryIsTold) {
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+    GTEST_SKIP() << "sanitizers need more memory than the test leaves";
+#endif
+    directory.Run("truncate -s 300M left.ovrin");
+    for (const char* command : {"merge --fallback none base.ovrin left.ovrin right.ovrin dest.ovrin",
+                                "diff base.ovrin left.ovrin dest.ovrin"}) {
+        EXPECT_EQ(directory.Run(std::string("ulimit -v 200000; \"$OVRIN\" ") + command), 1) << command;
+        EXPECT_EQ(directory.Read("stderr"), "Out of memory\n") << command;
+        EXPECT_EQ(directory.Read("dest.ovrin"), "untouched\n");
+    }
+}
+
 TEST_F(BadInput, CarriageReturnsAreNone) {
     ASSERT_EQ(Merge(), 0);
     const std::string merged = directory.Read("dest.ovrin");
