@@ -54,6 +54,34 @@ TEST_F(SequenceMerge, AKeyListKeepsWhatOneSideKept) {
     EXPECT_EQ(Merged(base, "c: 1\na: 1\nb: 1", "a: 1\nb: 1\nc: 1\nd: 1"), "{a: 1, b: 1, c: 1, d: 1}");
 }
 
+TEST_F(SequenceMerge, KeyListsOfOneHashAreNotEqual) {
+    const char* const base = "p0: 1\nb13183: 1";
+    EXPECT_EQ(Merged(base, "a278043: 1", "p0: 2\nb13183: 1"), "{a278043: 1, p0: 1}") << "a conflict about p0";
+    EXPECT_EQ(Merged(base, "a278043: 1", "p0: 1\nb13183: 1\nn: 1"), "{a278043: 1, n: 1}");
+}
+
+TEST_F(SequenceMerge, TakesAnyTwoMaps) {
+    std::vector<YAMLSequenceRemapper> maps;
+    for (const std::size_t count : {0, 1, 3})
+        for (const std::vector<int>& mapping : std::vector<std::vector<int>>{
+                 {}, {0}, {-1}, {-7}, {1 << 30}, {0, 0}, {2, 1, 0}, {3, 2}, {0, 9, 1, -2, 2, 1}}) {
+            maps.emplace_back(0, count, true);
+            maps.back().m_Mapping = mapping;
+        }
+    for (const YAMLSequenceRemapper& left : maps) {
+        for (const YAMLSequenceRemapper& right : maps) {
+            YAMLSequenceRemapper *leftToMerged, *rightToMerged;
+            const auto* merged =
+                YAMLSequenceRemapper::Merge(&left, &right, leftToMerged, rightToMerged, &left < &right);
+            EXPECT_EQ(merged->m_Mapping.size(), left.m_Mapping.size());
+            for (const auto* map :
+                 std::initializer_list<const YAMLSequenceRemapper*>{merged, leftToMerged, rightToMerged})
+                for (const int target : map->m_Mapping)
+                    EXPECT_LT(target, static_cast<int>(merged->m_DestinationCount));
+        }
+    }
+}
+
 TEST_F(SequenceMerge, AnElementThatBothAddedUnderOneKeyIsThereOnce) {
     const char* const base = "l: [{fileID: 1}]";
     EXPECT_EQ(Merged(base, "l: [{fileID: 1}, {fileID: 2}, {fileID: 3}]",

@@ -1,6 +1,5 @@
 #include "Diff/KeyOrder.h"
 
-#include "Diff/CreateDiffOperation.h"
 #include "Diff/MergeRules.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
@@ -17,7 +16,6 @@ YAMLSequence* KeysOf(const YAMLMapping* mapping) {
     YAMLSequence* keys = YAMLAlloc<YAMLSequence>::create();
     keys->m_Items.reserve(mapping->Size());
     for (const auto& entry : *mapping) keys->Append(entry.key);
-    keys->RebuildHash(false);
     return keys;
 }
 
@@ -50,18 +48,11 @@ const ChangeSequenceOperation* DiffKeyOrder(const YAMLMapping* base, const YAMLM
     Path path = {YAMLScalar::underscore};
     YAMLSequence* baseKeys = KeysOf(base);
     YAMLSequence* destKeys = KeysOf(dest);
-    // Lists of one hash count as equal, as everywhere; applying such a diff may then fail for its keys.
-    YAMLSequenceRemapper* remapper = CountAsEqual(baseKeys, destKeys)
-                                         ? nullptr
-                                         : YAMLSequenceRemapper::FindKeyListMapping(baseKeys, destKeys);
-    YAMLSequenceDiff* diff = nullptr;
-    if (remapper) {
-        diff = YAMLSequenceDiff::Diff(path, remapper->Arrange(baseKeys->m_Items), destKeys->m_Items);
-    } else {
-        remapper = YAMLSequenceRemapper::MakeIdentity(base->Size());
-        remapper->m_DestinationCount = dest->Size();
-        diff = YAMLAlloc<YAMLSequenceDiff>::create();
-    }
+    // Never null: the lists differ. They are told apart by their keys, for lists of one hash need not be
+    // equal.
+    const YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindKeyListMapping(baseKeys, destKeys);
+    const YAMLSequenceDiff* diff =
+        YAMLSequenceDiff::Diff(path, remapper->Arrange(baseKeys->m_Items), destKeys->m_Items);
     const bool mergeable = MergeRules::IsMergeablePath(path, destKeys);
     // The operations inside point at the keys, which outlive their lists.
     YAMLAlloc<YAMLSequence>::free(baseKeys);

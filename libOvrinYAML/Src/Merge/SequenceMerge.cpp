@@ -118,13 +118,18 @@ const YAMLSequenceRemapper* TakeOnlyNumbering(Side& left, Side& right) {
     return left.remapper ? left.remapper : right.remapper;
 }
 
+/// The destination index of base element `index`; -1 also for one that the destination doesn't have.
+int TargetInDestination(const YAMLSequenceRemapper* remapper, std::size_t index) {
+    const int target = remapper->Target(index);
+    return target >= 0 && static_cast<std::size_t>(target) < remapper->m_DestinationCount ? target : -1;
+}
+
 /// Base element of each destination index, -1 for a new one.
 std::vector<int> Invert(const YAMLSequenceRemapper* remapper) {
     std::vector<int> inverse(remapper->m_DestinationCount, -1);
     for (std::size_t i = 0; i < remapper->m_Mapping.size(); ++i) {
-        const int target = remapper->m_Mapping[i];
-        if (target != -1 && static_cast<std::size_t>(target) < inverse.size())
-            inverse[target] = static_cast<int>(i);
+        const int target = TargetInDestination(remapper, i);
+        if (target != -1) inverse[target] = static_cast<int>(i);
     }
     return inverse;
 }
@@ -151,7 +156,7 @@ YAMLSequenceRemapper* YAMLSequenceRemapper::Merge(const YAMLSequenceRemapper* le
     NumberAdditions(0, rightInverse, rightToMerged, next);
     YAMLSequenceRemapper* merged = Alloc::create(left->m_Mapping.size(), 0, left->m_IsSet && right->m_IsSet);
     for (std::size_t i = 0; i < left->m_Mapping.size(); ++i) {
-        const int l = left->Target(i), r = right->Target(i);
+        const int l = TargetInDestination(left, i), r = TargetInDestination(right, i);
         const bool goes = (l == -1 && r == -1) || (removeUnmatched && (l == -1 || r == -1));
         if (!goes) {
             if (l != -1) leftToMerged->m_Mapping[l] = next;
