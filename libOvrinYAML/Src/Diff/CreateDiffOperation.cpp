@@ -28,16 +28,6 @@ bool WithinTolerance(float a, float b, float relative, float absolute) {
     return std::max(absolute, relative * magnitude) > std::fabs(a - b);
 }
 
-const Operation* DiffScalars(const Path& path, const YAMLScalar* base, const YAMLScalar* dest) {
-    for (const auto& [pattern, bounds] : MergeRules::s_ComparisonFieldPaths) {
-        if (!MergeRules::MatchesPath(pattern, path)) continue;
-        const auto [relative, absolute] = bounds;
-        if (WithinTolerance(base->GetFloatValue(), dest->GetFloatValue(), relative, absolute)) return nullptr;
-        break;
-    }
-    return YAMLAlloc<ChangeOperation>::create(dest);
-}
-
 /// A reference is written in flow style and changes as a whole, but for its file id.
 bool IsMergeableByStyle(const YAMLMapping* base, const YAMLMapping* dest) {
     if (!base->m_Flow && !dest->m_Flow) return true;
@@ -84,6 +74,15 @@ const Operation* DiffSequences(Path& path, const YAMLSequence* base, const YAMLS
 
 } // namespace
 
+bool ScalarsDiffer(const Path& path, const YAMLScalar* base, const YAMLScalar* dest) {
+    for (const auto& [pattern, bounds] : MergeRules::s_ComparisonFieldPaths) {
+        if (!MergeRules::MatchesPath(pattern, path)) continue;
+        const auto [relative, absolute] = bounds;
+        return !WithinTolerance(base->GetFloatValue(), dest->GetFloatValue(), relative, absolute);
+    }
+    return true;
+}
+
 bool CountAsEqual(const YAMLNode* base, const YAMLNode* dest) {
     if (base == dest) return true;
     if (!base || !dest || base->m_Hash != dest->m_Hash) return false;
@@ -103,7 +102,8 @@ const Operation* CreateDiffOperation(Path& path, const YAMLNode* base, const YAM
     if (base->GetKind() != dest->GetKind()) return YAMLAlloc<ChangeOperation>::create(dest);
     switch (base->GetKind()) {
     case YAMLNode::Kind::Scalar:
-        return DiffScalars(path, AsScalar(base), AsScalar(dest));
+        if (!ScalarsDiffer(path, AsScalar(base), AsScalar(dest))) return nullptr;
+        return YAMLAlloc<ChangeOperation>::create(dest);
     case YAMLNode::Kind::Mapping:
         return DiffMappings(path, AsMapping(base), AsMapping(dest));
     case YAMLNode::Kind::Sequence:

@@ -17,4 +17,7 @@ const Operation* CreateDiffOperation(Path& path, const YAMLNode* base, const YAM
 /// they build the path of a pair of children.
 bool CountAsEqual(const YAMLNode* base, const YAMLNode* dest);
 
+/// Whether two scalars that aren't the same differ by more than the tolerance for `path`.
+bool ScalarsDiffer(const Path& path, const YAMLScalar* base, const YAMLScalar* dest);
+
 } // namespace ovrin_yaml

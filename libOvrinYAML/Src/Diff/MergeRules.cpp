@@ -54,6 +54,16 @@ bool MergeRules::MatchesPath(const Path& pattern, const Path& path) {
                       });
 }
 
+std::size_t MergeRules::LongestPath() {
+    std::size_t longest = 1; // that of key lists
+    const auto count = [&](const Path& pattern) { longest = std::max(longest, pattern.size()); };
+    for (const SequenceInfo& rule : s_ArrayUniqueKeyMap) count(rule.path);
+    for (const auto& rule : s_ExclusionFieldPaths) count(rule.first);
+    for (const auto& rule : s_ComparisonFieldPaths) count(rule.first);
+    for (const ExclusionInfo& rule : s_DiffExclusionFieldPaths) count(rule.path);
+    return longest;
+}
+
 const std::vector<Path>& MergeRules::SelectKeyPaths(const Path& path) {
     if (path.size() == 1 && path[0] == YAMLScalar::underscore) return defaultDirectPath;
     for (const SequenceInfo& rule : s_ArrayUniqueKeyMap)

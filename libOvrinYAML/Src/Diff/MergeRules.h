@@ -63,6 +63,8 @@ public:
     static void ResetForTests();
 
     static bool MatchesPath(const Path& pattern, const Path& path);
+    /// Elements of the longest path that a rule can match; at longer ones no rule makes a difference.
+    static std::size_t LongestPath();
     /// The field paths that form the keys of the list at `path`; none if it is matched by equality.
     static const std::vector<Path>& SelectKeyPaths(const Path& path);
     /// The node at a field path, or null. Throws YAMLError at a mapping in the duplicate state.

@@ -1,30 +1,17 @@
 #include "Diff/YAMLMappingDiff.h"
 
-#include "Diff/CreateDiffOperation.h"
+#include "Diff/ChildPairs.h"
 #include "Diff/KeyOrder.h"
-#include "Diff/MergeRules.h"
-#include "Document/AlignedLookup.h"
 
 namespace ovrin_yaml {
 
 YAMLMappingDiff* YAMLMappingDiff::Diff(Path& path, const YAMLMapping* base, const YAMLMapping* dest) {
     YAMLMappingDiff* diff = YAMLAlloc<YAMLMappingDiff>::create();
-    AlignedLookup destValues(*dest);
-    for (const auto& [key, baseValue] : *base) {
-        const YAMLNode* destValue = destValues.Get(key);
-        if (CountAsEqual(baseValue, destValue)) continue;
-        path.push_back(key);
-        const Operation* operation = CreateDiffOperation(path, baseValue, destValue);
-        path.pop_back();
-        if (operation) diff->Add(key, operation);
-    }
-    AlignedLookup baseValues(*base);
-    for (const auto& [key, destValue] : *dest) {
-        if (baseValues.Get(key)) continue;
-        path.push_back(key);
-        diff->Add(key, CreateDiffOperation(path, nullptr, destValue));
-        path.pop_back();
-    }
+    ForEachChildPair(path, base, dest,
+                     [&](const YAMLScalar* key, const YAMLNode* baseValue, const YAMLNode* destValue) {
+                         if (const Operation* operation = CreateDiffOperation(path, baseValue, destValue))
+                             diff->Add(key, operation);
+                     });
     diff->m_KeyOrder = DiffKeyOrder(base, dest);
     return diff;
 }

@@ -1,25 +1,18 @@
 #include "Diff/YAMLSequenceDiff.h"
 
-#include "Diff/CreateDiffOperation.h"
+#include "Diff/ChildPairs.h"
 #include "Diff/YAMLSequenceRemapper.h"
 
 #include <algorithm>
-#include <map>
 
 namespace ovrin_yaml {
 
 YAMLSequenceDiff* YAMLSequenceDiff::Diff(Path& path, const NodeList& base, const NodeList& dest) {
     YAMLSequenceDiff* diff = YAMLAlloc<YAMLSequenceDiff>::create();
-    const std::size_t count = std::max(base.size(), dest.size());
-    for (std::size_t i = 0; i < count; ++i) {
-        const YAMLNode* baseItem = i < base.size() ? base[i] : nullptr;
-        const YAMLNode* destItem = i < dest.size() ? dest[i] : nullptr;
-        if (CountAsEqual(baseItem, destItem)) continue;
-        path.push_back(IndexScalar(static_cast<int>(i)));
-        const Operation* operation = CreateDiffOperation(path, baseItem, destItem);
-        path.pop_back();
-        if (operation) diff->Add(static_cast<int>(i), operation);
-    }
+    ForEachChildPair(path, base, dest, [&](int index, const YAMLNode* baseItem, const YAMLNode* destItem) {
+        if (const Operation* operation = CreateDiffOperation(path, baseItem, destItem))
+            diff->Add(index, operation);
+    });
     return diff;
 }
 

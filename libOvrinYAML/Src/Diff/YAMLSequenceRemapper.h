@@ -45,9 +45,9 @@ public:
     /// The texts joined by ":".
     static std::string CollapseKeyElementValues(const std::vector<const YAMLScalar*>& values);
 
-    /// Merges the maps of two sides over one base; see SequenceMerge.cpp. All three results are new. Takes any
-    /// map: a target beyond its destination counts as none, base elements beyond the left map don't count, and
-    /// those beyond the right one have no place there.
+    /// Merges the maps of two sides over one base; see SequenceMerge.cpp. All three results are new. Takes
+    /// any map: a target beyond its destination counts as none, base elements beyond the left map don't
+    /// count, and those beyond the right one have no place there.
     static YAMLSequenceRemapper* Merge(const YAMLSequenceRemapper* left, const YAMLSequenceRemapper* right,
                                        YAMLSequenceRemapper*& leftToMerged,
                                        YAMLSequenceRemapper*& rightToMerged, bool removeUnmatched);

@@ -176,10 +176,10 @@ const Operation* RecordingConflictResolver::OnSameValueAdded(const AddOperation*
         const bool sameKind = kind == rightValue->GetKind();
         // Containers that differ are merged inside, which leaves its own records.
         if (sameKind && kind == YAMLNode::Kind::Mapping &&
-            !YAMLMappingDiff::Diff(AsMapping(leftValue), AsMapping(rightValue))->Entries().empty())
+            m_DifferenceCheck.Differ(AsMapping(leftValue), AsMapping(rightValue)))
             return MergeAddedMappings(left, right);
         if (sameKind && kind == YAMLNode::Kind::Sequence &&
-            !YAMLSequenceDiff::Diff(AsSequence(leftValue), AsSequence(rightValue))->Entries().empty())
+            m_DifferenceCheck.Differ(AsSequence(leftValue), AsSequence(rightValue)))
             return MergeAddedSequences(left, right);
         const bool equal = sameKind && (kind != YAMLNode::Kind::Scalar || leftValue->Equals(rightValue));
         const Outcome outcome = equal ? Outcome{left, ResolveMerged} : ConflictFallback(left, right, left);

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Diff/DifferenceCheck.h"
 #include "Merge/ResolveTable.h"
 #include "Merge/YAMLConflict.h"
 
@@ -27,6 +28,7 @@ public:
     };
     using RecordResolve = ovrin_yaml::RecordResolve;
 
+    /// The rules must have been read, and stay.
     explicit RecordingConflictResolver(MergeResolve defaultResolve) : m_DefaultResolve(defaultResolve) {}
 
     /// The decisions to go by, in place of earlier ones. Of several that match a path the first counts.
@@ -89,6 +91,7 @@ private:
     std::unordered_map<const YAMLScalar*, std::size_t> m_ObjectRecords; // of the first m_IndexedRecords ones
     std::size_t m_IndexedRecords = 0;
     ResolveTable m_Resolves;
+    DifferenceCheck m_DifferenceCheck; // of values that both sides added
     const MergeResolve m_DefaultResolve;
 };
 
