@@ -1,5 +1,6 @@
 #include "Merge/RecordingConflictResolver.h"
 
+#include "Diff/KeyOrder.h"
 #include "Diff/MergeRules.h"
 #include "Diff/MergeTreeVisitors.h"
 #include "Diff/YAMLMappingDiff.h"
@@ -192,16 +193,30 @@ const Operation* RecordingConflictResolver::OnSameValueAdded(const AddOperation*
     });
 }
 
+namespace {
+
+/// The value that a merged addition brings, for a tree that takes it as its own. One of a side belongs to the
+/// side's tree and is cloned; one that the merge has made itself is used nowhere else, and cloning it at each
+/// level of what it holds would be dear.
+YAMLNode* TakeValue(const Operation* merged, const Operation* left, const Operation* right) {
+    const YAMLNode* value = As<AddOperation>(merged)->m_Value;
+    return merged == left || merged == right ? value->Clone() : const_cast<YAMLNode*>(value);
+}
+
+} // namespace
+
 const Operation* RecordingConflictResolver::MergeAddedMappings(const AddOperation* left,
                                                                const AddOperation* right) {
     const YAMLMapping nothing;
     const YAMLMapping* leftValue = AsMapping(left->m_Value);
-    const YAMLMappingDiff* merged =
-        YAMLMappingDiff::Merge(YAMLMappingDiff::Diff(&nothing, leftValue),
-                               YAMLMappingDiff::Diff(&nothing, AsMapping(right->m_Value)), *this);
+    const YAMLMappingDiff* leftDiff = YAMLMappingDiff::Diff(&nothing, leftValue);
+    const YAMLMappingDiff* rightDiff = YAMLMappingDiff::Diff(&nothing, AsMapping(right->m_Value));
+    const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(leftDiff, rightDiff, *this);
     if (merged->Entries().empty() && m_DefaultResolve == ResolveBase) return nullptr;
     YAMLMapping* value = YAMLAlloc<YAMLMapping>::create(leftValue->m_Flow);
-    merged->Apply(*value);
+    for (const auto& [key, operation] : merged->Entries())
+        value->Insert(key, TakeValue(operation, leftDiff->Find(key), rightDiff->Find(key)));
+    ApplyKeyOrder(merged->m_KeyOrder, {}, *value);
     return YAMLAlloc<AddOperation>::create(value, true);
 }
 
@@ -209,14 +224,14 @@ const Operation* RecordingConflictResolver::MergeAddedSequences(const AddOperati
                                                                 const AddOperation* right) {
     const YAMLSequence nothing;
     const YAMLSequence* leftValue = AsSequence(left->m_Value);
+    const YAMLSequenceDiff* leftDiff = YAMLSequenceDiff::Diff(&nothing, leftValue);
+    const YAMLSequenceDiff* rightDiff = YAMLSequenceDiff::Diff(&nothing, AsSequence(right->m_Value));
     std::set<int> ignoredDropped;
-    const YAMLSequenceDiff* merged = YAMLSequenceDiff::Merge(
-        YAMLSequenceDiff::Diff(&nothing, leftValue),
-        YAMLSequenceDiff::Diff(&nothing, AsSequence(right->m_Value)), ignoredDropped, *this);
+    const YAMLSequenceDiff* merged = YAMLSequenceDiff::Merge(leftDiff, rightDiff, ignoredDropped, *this);
     if (merged->Entries().empty() && m_DefaultResolve == ResolveBase) return nullptr;
     YAMLSequence* value = YAMLAlloc<YAMLSequence>::create(leftValue->m_Flow);
-    merged->Apply(*value);
-    value->DropHoles();
+    for (const auto& [index, operation] : merged->Entries())
+        value->m_Items.push_back(TakeValue(operation, leftDiff->Find(index), rightDiff->Find(index)));
     return YAMLAlloc<AddOperation>::create(value, true);
 }
 
