@@ -57,7 +57,8 @@ public:
 private:
     const Operation* Note(const char* question, const Operation* left, const Operation* right,
                           ConflictType type = ConflictNone) {
-        asked += (asked.empty() ? "" : " ") + (m_Path.empty() ? "" : PathToString(m_Path) + ":") + question;
+        asked += (asked.empty() ? "" : " ") +
+                 (m_Path.Elements().empty() ? "" : PathToString(m_Path.Elements()) + ":") + question;
         if (type != ConflictNone) asked += IsLeftSide(type) ? "<" : ">";
         lastLeft = left;
         lastRight = right;
@@ -104,7 +105,7 @@ TEST_F(OperationMerge, EveryPairAsksItsOneQuestion) {
 std::string Questions(const std::string& base, const std::string& left, const std::string& right) {
     AskedResolver resolver;
     YAMLMappingDiff::Merge(DiffOf(base, left), DiffOf(base, right), resolver);
-    EXPECT_TRUE(resolver.m_Path.empty());
+    EXPECT_TRUE(resolver.m_Path.Elements().empty());
     return resolver.asked;
 }
 

@@ -191,7 +191,7 @@ TEST_F(Resolver, PathsNoteTheTransformsWhoseParentIsVisited) {
     RecordingConflictResolver resolver(ResolveBase);
     const auto visit = [&](const std::string& path) {
         for (const YAMLScalar* element : PathOf(path)) resolver.PushPath(element);
-        resolver.m_Path.clear();
+        resolver.m_Path = {};
         return resolver.ChangedTransforms().size();
     };
     EXPECT_EQ(visit("m_Father"), 0u);

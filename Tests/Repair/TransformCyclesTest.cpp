@@ -25,7 +25,8 @@ struct Check {
         failure = FailureOf([&] {
             CheckTransformHierarchy({scene.Root(), left.Root(), none.Root()}, resolver);
         });
-        for (const auto& record : resolver.Records()) cycles += std::string(record.path[0]->Value()) + " ";
+        for (const auto& record : resolver.Records())
+            cycles += std::string(record.path.Elements()[0]->Value()) + " ";
     }
 
     Scene scene;

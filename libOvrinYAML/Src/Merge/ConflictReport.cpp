@@ -1,8 +1,10 @@
 #include "Merge/ConflictReport.h"
 
 #include "Diff/YAMLDiffOutput.h"
+#include "Merge/PathRanks.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <istream>
 #include <ostream>
 #include <stdexcept>
@@ -32,22 +34,31 @@ constexpr HandlingWord kHandlingWords[] = {
     {ResolveBreakCycle, "BreakCycle", "breakCycle"},
 };
 
-bool GoesBefore(const Record* a, const Record* b) {
-    return RecordingConflictResolverRecordComparer()(*a, *b);
-}
+/// A record and the place of its path among those of all that are sorted.
+struct RankedRecord {
+    std::uint32_t rank;
+    const Record* record;
+};
 
 /// The records that are to be written, pending ones or all, in the order that std::sort gives all of them by
 /// path.
 ///
-/// Pointers are sorted, for which std::sort takes the same decisions as for records, so that those of one
-/// path, which it may bring into any order, come out in the same one. Where no path comes twice among the
-/// pending records, their order is settled without the others.
-std::vector<const Record*> RecordsByPath(const std::vector<Record>& records, bool all) {
-    std::vector<const Record*> sorted;
-    for (const Record& record : records)
-        if (all || record.resolve == ResolveConflict) sorted.push_back(&record);
-    std::sort(sorted.begin(), sorted.end(), GoesBefore);
-    const auto haveOnePath = [](const Record* a, const Record* b) { return !GoesBefore(a, b); };
+/// Places are compared, for which std::sort takes the same decisions as for the paths of records, so that
+/// those of one path, which it may bring into any order, come out in the same one. Where no path comes twice
+/// among the pending records, their order is settled without the others.
+std::vector<RankedRecord> RecordsByPath(const std::vector<Record>& records, bool all) {
+    std::vector<RankedRecord> sorted;
+    PathRanks ranks;
+    for (const Record& record : records) {
+        if (!all && record.resolve != ResolveConflict) continue;
+        sorted.push_back({0, &record});
+        ranks.Add(record.path);
+    }
+    ranks.Number();
+    for (RankedRecord& ranked : sorted) ranked.rank = ranks.Of(ranked.record->path);
+    std::sort(sorted.begin(), sorted.end(),
+              [](const RankedRecord& a, const RankedRecord& b) { return a.rank < b.rank; });
+    const auto haveOnePath = [](const RankedRecord& a, const RankedRecord& b) { return a.rank == b.rank; };
     if (all || std::adjacent_find(sorted.begin(), sorted.end(), haveOnePath) == sorted.end()) return sorted;
     return RecordsByPath(records, true);
 }
@@ -85,9 +96,9 @@ void OutputNonConflict(YAMLDiffOutput& output, const Record& record) {
     }
 }
 
-void OutputNonConflicts(YAMLDiffOutput& output, const std::vector<const Record*>& records) {
+void OutputNonConflicts(YAMLDiffOutput& output, const std::vector<RankedRecord>& records) {
     output << kNonConflictHandlingHeader << endl;
-    for (const Record* record : records)
+    for (const auto& [rank, record] : records)
         if (record->resolve != ResolveConflict && record->type != ConflictBothChanges)
             OutputNonConflict(output, *record);
 }
@@ -140,9 +151,9 @@ Path StringToPath(const std::string& text) {
 void OutputConflictRecords(std::ostream& out, const RecordingConflictResolver& resolver, bool describe) {
     constexpr std::size_t kIndentWidth = 2;
     YAMLDiffOutput output(out, kIndentWidth);
-    const std::vector<const Record*> records = RecordsByPath(resolver.Records(), describe);
+    const std::vector<RankedRecord> records = RecordsByPath(resolver.Records(), describe);
     output << kConflictHeader << endl;
-    for (const Record* record : records)
+    for (const auto& [rank, record] : records)
         if (record->resolve == ResolveConflict) OutputConflict(output, *record);
     output.EndLineIfOpen();
     output << kConflictHandlingHeader << endl;

@@ -19,10 +19,10 @@ const ChangeSequenceOperation* MergeKeyOrder(const ChangeSequenceOperation* left
                                              ConflictResolver& resolver) {
     if (!left || !right) return right ? right : left;
     if (left == right && IsIdentityKeyOrder(left)) return left;
-    Path ancestry = {YAMLScalar::underscore};
-    ancestry.swap(resolver.m_Path);
+    WalkedPath path = Path{YAMLScalar::underscore};
+    std::swap(path, resolver.m_Path);
     const ChangeSequenceOperation* merged = ChangeSequenceOperation::Merge(left, right, resolver, false);
-    ancestry.swap(resolver.m_Path);
+    std::swap(path, resolver.m_Path);
     return merged;
 }
 

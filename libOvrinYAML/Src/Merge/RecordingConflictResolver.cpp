@@ -5,7 +5,6 @@
 #include "Diff/MergeTreeVisitors.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
-#include "Document/Arena.h"
 #include "Document/YAMLError.h"
 #include "Document/YAMLMapping.h"
 
@@ -18,20 +17,17 @@ bool RecordingConflictResolver::HasPendingConflicts() const {
                        [](const Record& record) { return record.resolve == ResolveConflict; });
 }
 
-void RecordingConflictResolver::PushRecord(const Path& path, ConflictType type, MergeResolve resolve,
-                                           const Operation* left, const Operation* right) {
-    // There may be hundreds of thousands, which are seldom looked at again.
-    auto* copy = static_cast<const YAMLScalar**>(ArenaAllocate(path.size() * sizeof(const YAMLScalar*)));
-    std::copy(path.begin(), path.end(), copy);
-    m_Records.push_back({{copy, path.size()}, type, resolve, left, right});
+void RecordingConflictResolver::PushRecord(ConflictType type, MergeResolve resolve, const Operation* left,
+                                           const Operation* right) {
+    m_Records.push_back({m_Path.Keep(), type, resolve, left, right});
 }
 
 // One side alone. The default plays no part: a change that nobody conflicts with passes.
 
 const Operation* RecordingConflictResolver::SingleSideResolve(const Operation* operation, ConflictType type) {
     const bool isLeft = IsLeftSide(type);
-    const MergeResolve resolve = FindResolve(m_Path).value_or(ResolveMerged);
-    PushRecord(m_Path, type, resolve, isLeft ? operation : nullptr, isLeft ? nullptr : operation);
+    const MergeResolve resolve = FindResolve(m_Path.Elements()).value_or(ResolveMerged);
+    PushRecord(type, resolve, isLeft ? operation : nullptr, isLeft ? nullptr : operation);
     const bool dropped = resolve == ResolveBase || resolve == ResolveConflict ||
                          (resolve == ResolveLeft && !isLeft) || (resolve == ResolveRight && isLeft);
     return dropped ? nullptr : operation;
@@ -101,10 +97,10 @@ RecordingConflictResolver::Outcome RecordingConflictResolver::ConflictFallback(c
 template <class Settle>
 const Operation* RecordingConflictResolver::ResolvePair(ConflictType type, const Operation* left,
                                                         const Operation* right, const Settle& settle) {
-    const MergeResolve found = FindResolve(m_Path).value_or(ResolveMerged);
+    const MergeResolve found = FindResolve(m_Path.Elements()).value_or(ResolveMerged);
     const std::optional<Outcome> decided = Decided(found, left, right);
     const Outcome outcome = decided ? *decided : settle(found == ResolveConflict);
-    PushRecord(m_Path, type, outcome.resolve, left, right);
+    PushRecord(type, outcome.resolve, left, right);
     return outcome.operation;
 }
 
@@ -143,7 +139,7 @@ const Operation* RecordingConflictResolver::OnSameValueRemoved(const RemoveOpera
 }
 
 bool RecordingConflictResolver::MayMergeInside(const Operation* left, const Operation* right) const {
-    return left->m_Mergeable && right->m_Mergeable && MergeRules::IsMergeablePath(m_Path);
+    return left->m_Mergeable && right->m_Mergeable && MergeRules::IsMergeablePath(m_Path.Elements());
 }
 
 template <class Change, class MergeInside>
@@ -171,7 +167,7 @@ const Operation* RecordingConflictResolver::OnSameValueAdded(const AddOperation*
                                                              const AddOperation* right) {
     const YAMLNode* leftValue = left->m_Value;
     const YAMLNode* rightValue = right->m_Value;
-    const MergeResolve found = FindResolve(m_Path).value_or(ResolveMerged);
+    const MergeResolve found = FindResolve(m_Path.Elements()).value_or(ResolveMerged);
     if (found == ResolveMerged && MayMergeInside(left, right)) {
         const auto kind = leftValue->GetKind();
         const bool sameKind = kind == rightValue->GetKind();
@@ -184,7 +180,7 @@ const Operation* RecordingConflictResolver::OnSameValueAdded(const AddOperation*
             return MergeAddedSequences(left, right);
         const bool equal = sameKind && (kind != YAMLNode::Kind::Scalar || leftValue->Equals(rightValue));
         const Outcome outcome = equal ? Outcome{left, ResolveMerged} : ConflictFallback(left, right, left);
-        PushRecord(m_Path, ConflictBothAdds, outcome.resolve, left, right);
+        PushRecord(ConflictBothAdds, outcome.resolve, left, right);
         return outcome.operation;
     }
     return ResolvePair(ConflictBothAdds, left, right, [&](bool asConflict) {
@@ -239,8 +235,8 @@ const Operation* RecordingConflictResolver::MergeAddedSequences(const AddOperati
 
 RecordingConflictResolver::Record* RecordingConflictResolver::FindObjectRecord(const YAMLScalar* fileID) {
     for (; m_IndexedRecords < m_Records.size(); ++m_IndexedRecords) {
-        const auto path = m_Records[m_IndexedRecords].path;
-        if (path.size() == 1) m_ObjectRecords.try_emplace(path[0], m_IndexedRecords);
+        if (const YAMLScalar* id = m_Records[m_IndexedRecords].path.OnlyElement())
+            m_ObjectRecords.try_emplace(id, m_IndexedRecords);
     }
     const auto found = m_ObjectRecords.find(fileID);
     return found == m_ObjectRecords.end() ? nullptr : &m_Records[found->second];
@@ -271,15 +267,8 @@ void RecordingConflictResolver::OnTransformCycleDetected(const YAMLScalar* fileI
         if (father && father->HasKey(YAMLScalar::fileID))
             father->Change(YAMLScalar::fileID, blank ? YAMLScalar::empty : YAMLScalar::zero)->Free();
     }
-    PushRecord(path, ConflictTransformCycle, breaks && !blank ? ResolveBreakCycle : ResolveConflict, nullptr,
-               nullptr);
-}
-
-bool RecordingConflictResolverRecordComparer::operator()(const RecordingConflictResolver::Record& a,
-                                                         const RecordingConflictResolver::Record& b) const {
-    return std::lexicographical_compare(
-        a.path.begin(), a.path.end(), b.path.begin(), b.path.end(),
-        [](const YAMLScalar* x, const YAMLScalar* y) { return x != y && x->Value() < y->Value(); });
+    m_Records.push_back({WalkedPath(path).Keep(), ConflictTransformCycle,
+                         breaks && !blank ? ResolveBreakCycle : ResolveConflict, nullptr, nullptr});
 }
 
 } // namespace ovrin_yaml

@@ -5,7 +5,6 @@
 #include "Merge/YAMLConflict.h"
 
 #include <optional>
-#include <span>
 #include <unordered_map>
 #include <vector>
 
@@ -17,8 +16,7 @@ namespace ovrin_yaml {
 class RecordingConflictResolver final : public ConflictResolver {
 public:
     struct Record {
-        /// Stays as long as the process.
-        std::span<const YAMLScalar* const> path;
+        KeptPath path;
         ConflictType type;
         /// How it was settled; ResolveConflict marks a pending conflict.
         MergeResolve resolve;
@@ -67,8 +65,8 @@ private:
     };
 
     std::optional<MergeResolve> FindResolve(const Path& path) const { return m_Resolves.Find(path); }
-    void PushRecord(const Path& path, ConflictType type, MergeResolve resolve, const Operation* left,
-                    const Operation* right);
+    /// Records what becomes of the property at the current path.
+    void PushRecord(ConflictType type, MergeResolve resolve, const Operation* left, const Operation* right);
     /// The first record whose path is this id alone, or null.
     Record* FindObjectRecord(const YAMLScalar* fileID);
     const Operation* SingleSideResolve(const Operation* operation, ConflictType type);
@@ -93,13 +91,6 @@ private:
     ResolveTable m_Resolves;
     DifferenceCheck m_DifferenceCheck; // of values that both sides added
     const MergeResolve m_DefaultResolve;
-};
-
-/// Orders records by path, element by element, as byte strings: "10" goes before "9", and a path before the
-/// longer ones that begin with it.
-struct RecordingConflictResolverRecordComparer {
-    bool operator()(const RecordingConflictResolver::Record& a,
-                    const RecordingConflictResolver::Record& b) const;
 };
 
 } // namespace ovrin_yaml

@@ -178,7 +178,7 @@ const ChangeSequenceOperation* ChangeSequenceOperation::Merge(const ChangeSequen
     Side leftSide{left->m_Remapper, left->m_Diff}, rightSide{right->m_Remapper, right->m_Diff};
     const YAMLSequenceRemapper* baseMap = nullptr;
     if (leftSide.remapper && rightSide.remapper) {
-        const std::vector<Path>& keyPaths = MergeRules::SelectKeyPaths(resolver.m_Path);
+        const std::vector<Path>& keyPaths = MergeRules::SelectKeyPaths(resolver.m_Path.Elements());
         if (!left->m_Diff->Entries().empty() && !right->m_Diff->Entries().empty() &&
             keyPaths == MergeRules::defaultPath && OperationEquals(left, right))
             return left;

@@ -4,26 +4,18 @@
 
 namespace ovrin_yaml {
 
-std::string PathToString(std::span<const YAMLScalar* const> path) {
-    std::string text;
-    for (std::size_t i = 0; i < path.size(); ++i) {
-        if (i > 0) text += '.';
-        text += path[i]->Value();
-    }
-    return text;
-}
-
 void ConflictResolver::PushPath(const YAMLScalar* key) {
-    if (key == YAMLScalar::mFather && !m_Path.empty() &&
-        (m_Path.back() == YAMLScalar::transform || m_Path.back() == YAMLScalar::rectTransform)) {
-        if (m_IsChangedTransform.insert(m_Path.front()).second) m_ChangedTransforms.push_back(m_Path.front());
+    const Path& path = m_Path.Elements();
+    if (key == YAMLScalar::mFather && !path.empty() &&
+        (path.back() == YAMLScalar::transform || path.back() == YAMLScalar::rectTransform)) {
+        if (m_IsChangedTransform.insert(path.front()).second) m_ChangedTransforms.push_back(path.front());
     }
-    m_Path.push_back(key);
+    m_Path.Push(key);
 }
 
 void ConflictResolver::PopPath() {
-    if (m_Path.empty()) throw YAMLError("Tried to pop on empty ConflictResolver path");
-    m_Path.pop_back();
+    if (m_Path.Elements().empty()) throw YAMLError("Tried to pop on empty ConflictResolver path");
+    m_Path.Pop();
 }
 
 SidePickingConflictResolver::SidePickingConflictResolver(MergeResolve side) : m_Side(side) {
@@ -70,33 +62,34 @@ void SidePickingConflictResolver::OnComponentDependencyConflict(const ComponentD
 }
 
 const Operation* ExceptionConflictResolver::OnSameValueAdded(const AddOperation* left, const AddOperation*) {
-    throw YAMLError("Conflict for same value added " + PathToString(m_Path) + " at line " +
+    throw YAMLError("Conflict for same value added " + PathToString(m_Path.Elements()) + " at line " +
                     std::to_string(left->m_Value->m_Line));
 }
 
 const Operation* ExceptionConflictResolver::OnSameValueChanged(const ChangeOperation*,
                                                                const ChangeOperation*) {
-    throw YAMLError("Conflict for same value changed " + PathToString(m_Path));
+    throw YAMLError("Conflict for same value changed " + PathToString(m_Path.Elements()));
 }
 
 const Operation* ExceptionConflictResolver::OnSameValueChanged(const RemoveOperation*,
                                                                const ChangeOperation*) {
-    throw YAMLError("Conflict for removed value changed " + PathToString(m_Path));
+    throw YAMLError("Conflict for removed value changed " + PathToString(m_Path.Elements()));
 }
 
 const Operation* ExceptionConflictResolver::OnSameValueChanged(const RemoveOperation*,
                                                                const ChangeMappingOperation*) {
-    throw YAMLError("Conflict for removed value changed " + PathToString(m_Path) + " in right file");
+    throw YAMLError("Conflict for removed value changed " + PathToString(m_Path.Elements()) +
+                    " in right file");
 }
 
 const Operation* ExceptionConflictResolver::OnSameMappingChanged(const ChangeMappingOperation*,
                                                                  const ChangeMappingOperation*) {
-    throw YAMLError("Conflict for same mapping changed " + PathToString(m_Path));
+    throw YAMLError("Conflict for same mapping changed " + PathToString(m_Path.Elements()));
 }
 
 const Operation* ExceptionConflictResolver::OnSameSequenceChanged(const ChangeSequenceOperation*,
                                                                   const ChangeSequenceOperation*) {
-    throw YAMLError("Conflict for same sequence changed " + PathToString(m_Path));
+    throw YAMLError("Conflict for same sequence changed " + PathToString(m_Path.Elements()));
 }
 
 void ExceptionConflictResolver::OnComponentDependencyConflict(const ComponentDependencyConflict&) {

@@ -4,16 +4,12 @@
 #include "Document/YAMLScalar.h"
 #include "Merge/ConflictType.h"
 #include "Merge/MergeResolve.h"
+#include "Merge/PropertyPath.h"
 
-#include <span>
-#include <string>
 #include <unordered_set>
 #include <vector>
 
 namespace ovrin_yaml {
-
-/// The elements' texts joined by ".".
-std::string PathToString(std::span<const YAMLScalar* const> path);
 
 /// A removal that broke what a component needs. The component's file id stands on the side that still has it.
 struct ComponentDependencyConflict {
@@ -31,7 +27,7 @@ public:
     /// The path of the property being merged: the object's file id, then mapping keys and, for elements of
     /// sequences, the merged index (for elements added on both sides of a list with keys, the left index).
     /// The key list of any mapping has the path "_". The merge of key lists replaces the path as a whole.
-    Path m_Path;
+    WalkedPath m_Path;
 
     virtual const Operation* OnValueAdded(const AddOperation* operation, ConflictType) { return operation; }
     virtual const Operation* OnValueChanged(const ChangeOperation* operation, ConflictType) {
