@@ -1,6 +1,8 @@
 #include "Support/Merges.h"
 
+#include <cctype>
 #include <sstream>
+#include <sys/resource.h>
 
 namespace {
 
@@ -129,6 +131,34 @@ TEST_F(Resolver, AddedContainersAreMergedInside) {
         const MergeOutput output = Merge({"{}", left, right});
         EXPECT_EQ(output.body, body) << left << " | " << right;
         EXPECT_EQ(output.records, keyList + records) << left << " | " << right;
+    }
+}
+
+TEST_F(Resolver, AdditionsNestedDeeplyTakeNoMoreMemoryThanFlatOnes) {
+    const auto peak = [] {
+        rusage usage{};
+        getrusage(RUSAGE_SELF, &usage);
+        return usage.ru_maxrss; // KB
+    };
+    for (const bool isList : {false, true}) {
+        const auto nested = [&](const std::string& last) {
+            constexpr int kDepth = 900;
+            std::string text = "n: ", end = "\n";
+            for (int level = 0; level < kDepth; ++level) {
+                text += isList ? "[" : "{";
+                for (char key = 'A'; key <= 'z'; ++key)
+                    if (std::isalpha(key)) text += key + std::string(isList ? ", " : ": 1, ");
+                text += isList ? "" : "deeper: ";
+                end.insert(0, 1, isList ? ']' : '}');
+            }
+            return text + last + end;
+        };
+        const YAMLMappingDiff *left = DiffOf("", nested("1")), *right = DiffOf("", nested("2"));
+        RecordingConflictResolver resolver(ResolveLeft);
+        const auto before = peak();
+        YAMLMappingDiff::Merge(left, right, resolver);
+        EXPECT_TRUE(resolver.HasPendingConflicts());
+        EXPECT_LT(peak() - before, 400 << 10) << "with shared paths and no diffs some tens of MB";
     }
 }
 

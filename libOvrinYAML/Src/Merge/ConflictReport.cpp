@@ -63,19 +63,21 @@ std::vector<RankedRecord> RecordsByPath(const std::vector<Record>& records, bool
     return RecordsByPath(records, true);
 }
 
-void OutputSide(YAMLDiffOutput& output, const char* side, const Record& record, const Operation* operation) {
-    output << side << PathToString(record.path) << " ";
+void OutputSide(YAMLDiffOutput& output, const char* side, const std::string& path,
+                const Operation* operation) {
+    output << side << path << " ";
     if (operation) operation->Output(output);
     output.EndLineIfOpen();
 }
 
 void OutputConflict(YAMLDiffOutput& output, const Record& record) {
+    const std::string path = PathToString(record.path);
     if (record.type == ConflictTransformCycle) {
-        OutputSide(output, "BreakCycle  ", record, nullptr);
+        OutputSide(output, "BreakCycle  ", path, nullptr);
         return;
     }
-    OutputSide(output, "Left  ", record, record.left);
-    OutputSide(output, "Right ", record, record.right);
+    OutputSide(output, "Left  ", path, record.left);
+    OutputSide(output, "Right ", path, record.right);
 }
 
 void OutputResolve(YAMLDiffOutput& output, const RecordResolve& decision) {
