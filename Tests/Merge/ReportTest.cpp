@@ -1,6 +1,8 @@
 #include "Merge/ConflictReport.h"
+#include "Merge/PathRanks.h"
 #include "Support/Merges.h"
 
+#include <random>
 #include <sstream>
 #include <stdexcept>
 
@@ -110,6 +112,29 @@ TEST_F(Report, ALineThatSaysNothingFailsAsLineOne) {
                                                          {"KEEP", noWord}};
     for (const auto& [line, error] : cases)
         EXPECT_EQ(Decisions("Conflict handling:\n" + line), error) << line;
+}
+
+TEST_F(Report, PathsAreRankedElementByElementAsBytes) {
+    static const char* const kElements[] = {"", "1", "10", "9", "a", "a-b", "\xC3\xA9"};
+    std::mt19937 random(1);
+    PathRanks ranks;
+    std::vector<std::pair<std::vector<std::string>, KeptPath>> paths;
+    WalkedPath walked;
+    for (int step = 0; step < 5000; ++step) {
+        if (random() % 2 && !walked.Elements().empty()) walked.Pop();
+        if (walked.Elements().size() < 6) walked.Push(YAMLScalar::Lookup(kElements[random() % 7]));
+        if (random() % 50 == 0) walked = random() % 2 ? WalkedPath() : WalkedPath(walked.Elements());
+        std::vector<std::string> texts;
+        for (const YAMLScalar* element : walked.Elements()) texts.emplace_back(element->Value());
+        paths.emplace_back(texts, walked.Keep());
+        ASSERT_EQ(paths.back().second.Elements(), walked.Elements());
+        ranks.Add(paths.back().second);
+    }
+    ranks.Number();
+    for (int i = 0; i < 100000; ++i) {
+        const auto &a = paths[random() % paths.size()], &b = paths[random() % paths.size()];
+        ASSERT_EQ(ranks.Of(a.second) < ranks.Of(b.second), a.first < b.first);
+    }
 }
 
 TEST_F(Report, PathsAreCutAtEveryDot) {

@@ -25,28 +25,39 @@ bool IsOdd(const YAMLNode* node) {
 EqualityMatcher::EqualityMatcher(const NodeList& items, std::size_t begin, std::size_t end)
     : m_Items(items), m_Begin(begin), m_Taken(end - begin, false), m_All(end - begin) {
     std::iota(m_All.begin(), m_All.end(), static_cast<std::uint32_t>(begin));
-    m_Buckets.reserve(end - begin);
-    for (const std::uint32_t position : m_All) {
+    for (const std::uint32_t position : m_All)
         if (IsOdd(items[position])) m_Odd.push_back(position);
-        m_Buckets[items[position]->m_Hash].positions.push_back(position);
-    }
 }
 
 int EqualityMatcher::TakeFirstEqual(const YAMLNode* element) {
     std::size_t found = kNone;
-    if (IsOdd(element)) {
+    if (AsScalar(element)) {
+        FillOnce(m_ScalarBuckets, [](const YAMLNode* item) { return item; });
+        found = FirstIn(m_ScalarBuckets, element, element);
+    } else if (IsOdd(element)) {
         found = FirstAmong(m_All, element);
     } else {
-        const auto bucket = m_Buckets.find(element->m_Hash);
-        if (bucket != m_Buckets.end()) found = FirstIn(bucket->second, element);
-        found = std::min(found, FirstAmong(m_Odd, element));
+        FillOnce(m_HashBuckets, [](const YAMLNode* item) { return item->m_Hash; });
+        found = std::min(FirstIn(m_HashBuckets, element->m_Hash, element), FirstAmong(m_Odd, element));
     }
     if (found == kNone) return -1;
     m_Taken[found - m_Begin] = true;
     return static_cast<int>(found);
 }
 
-std::size_t EqualityMatcher::FirstIn(Bucket& bucket, const YAMLNode* element) const {
+template <class Buckets, class KeyOf>
+void EqualityMatcher::FillOnce(Buckets& buckets, const KeyOf& keyOf) const {
+    if (!buckets.empty()) return;
+    buckets.reserve(m_All.size());
+    for (const std::uint32_t position : m_All)
+        buckets[keyOf(m_Items[position])].positions.push_back(position);
+}
+
+template <class Buckets, class Key>
+std::size_t EqualityMatcher::FirstIn(Buckets& buckets, const Key& key, const YAMLNode* element) const {
+    const auto found = buckets.find(key);
+    if (found == buckets.end()) return kNone;
+    Bucket& bucket = found->second;
     const auto& positions = bucket.positions;
     while (bucket.firstFree < positions.size() && m_Taken[positions[bucket.firstFree] - m_Begin])
         ++bucket.firstFree;

@@ -80,30 +80,34 @@ bool Equal(const YAMLSequenceRemapper* first, const YAMLSequenceRemapper* second
            first->m_Mapping == second->m_Mapping;
 }
 
-bool Equal(const ChangeSequenceOperation* first, const ChangeSequenceOperation* second) {
+} // namespace
+
+bool OperationComparison::ListChangesAreEqual(const ChangeSequenceOperation* first,
+                                              const ChangeSequenceOperation* second) {
     if (!first || !second) return first == second;
+    if (m_Unequal.contains({first, second})) return false;
     const auto& a = first->m_Diff->Entries();
     const auto& b = second->m_Diff->Entries();
-    return std::equal(a.begin(), a.end(), b.begin(), b.end(),
-                      [](const auto& x, const auto& y) {
-                          return x.index == y.index && OperationEquals(x.operation, y.operation);
-                      }) &&
-           Equal(first->m_Remapper, second->m_Remapper);
+    const bool areEqual = std::equal(a.begin(), a.end(), b.begin(), b.end(),
+                                     [this](const auto& x, const auto& y) {
+                                         return x.index == y.index && AreEqual(x.operation, y.operation);
+                                     }) &&
+                          Equal(first->m_Remapper, second->m_Remapper);
+    if (!areEqual) m_Unequal.insert({first, second});
+    return areEqual;
 }
 
-bool Equal(const YAMLMappingDiff* first, const YAMLMappingDiff* second) {
+bool OperationComparison::DiffsAreEqual(const YAMLMappingDiff* first, const YAMLMappingDiff* second) {
     const auto& a = first->Entries();
     const auto& b = second->Entries();
     return std::equal(a.begin(), a.end(), b.begin(), b.end(),
-                      [](const auto& x, const auto& y) {
-                          return x.key == y.key && OperationEquals(x.operation, y.operation);
+                      [this](const auto& x, const auto& y) {
+                          return x.key == y.key && AreEqual(x.operation, y.operation);
                       }) &&
-           Equal(first->m_KeyOrder, second->m_KeyOrder);
+           ListChangesAreEqual(first->m_KeyOrder, second->m_KeyOrder);
 }
 
-} // namespace
-
-bool OperationEquals(const Operation* first, const Operation* second) {
+bool OperationComparison::AreEqual(const Operation* first, const Operation* second) {
     if (first == second) return true;
     if (first->GetKind() != second->GetKind()) return false;
     switch (first->GetKind()) {
@@ -114,11 +118,16 @@ bool OperationEquals(const Operation* first, const Operation* second) {
         return static_cast<const ValuedOperation*>(second)->m_Value->Equals(
             static_cast<const ValuedOperation*>(first)->m_Value);
     case Operation::Kind::ChangeMapping:
-        return Equal(As<ChangeMappingOperation>(first)->m_Diff, As<ChangeMappingOperation>(second)->m_Diff);
+        return DiffsAreEqual(As<ChangeMappingOperation>(first)->m_Diff,
+                             As<ChangeMappingOperation>(second)->m_Diff);
     case Operation::Kind::ChangeSequence:
-        return Equal(As<ChangeSequenceOperation>(first), As<ChangeSequenceOperation>(second));
+        return ListChangesAreEqual(As<ChangeSequenceOperation>(first), As<ChangeSequenceOperation>(second));
     }
     return false;
+}
+
+bool OperationEquals(const Operation* first, const Operation* second) {
+    return OperationComparison().AreEqual(first, second);
 }
 
 } // namespace ovrin_yaml

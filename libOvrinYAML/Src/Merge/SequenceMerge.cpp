@@ -15,7 +15,6 @@
 //  5. Indexes at which nothing was taken leave the numbering again.
 
 #include "Diff/MergeRules.h"
-#include "Diff/MergeTreeVisitors.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
 #include "Merge/YAMLConflict.h"
@@ -180,7 +179,7 @@ const ChangeSequenceOperation* ChangeSequenceOperation::Merge(const ChangeSequen
     if (leftSide.remapper && rightSide.remapper) {
         const std::vector<Path>& keyPaths = MergeRules::SelectKeyPaths(resolver.m_Path.Elements());
         if (!left->m_Diff->Entries().empty() && !right->m_Diff->Entries().empty() &&
-            keyPaths == MergeRules::defaultPath && OperationEquals(left, right))
+            keyPaths == MergeRules::defaultPath && resolver.m_Comparison.AreEqual(left, right))
             return left;
         if (leftSide.remapper->m_IsSet) MergeCommonAdditions(leftSide, rightSide, keyPaths, resolver);
         baseMap = MergeNumberings(leftSide, rightSide, removeUnmatched);

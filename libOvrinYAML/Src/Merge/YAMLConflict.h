@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Diff/MergeTreeVisitors.h"
 #include "Diff/Operation.h"
 #include "Document/YAMLScalar.h"
 #include "Merge/ConflictType.h"
@@ -28,6 +29,8 @@ public:
     /// sequences, the merged index (for elements added on both sides of a list with keys, the left index).
     /// The key list of any mapping has the path "_". The merge of key lists replaces the path as a whole.
     WalkedPath m_Path;
+    /// Compares the sides' changes of lists.
+    OperationComparison m_Comparison;
 
     virtual const Operation* OnValueAdded(const AddOperation* operation, ConflictType) { return operation; }
     virtual const Operation* OnValueChanged(const ChangeOperation* operation, ConflictType) {
