@@ -175,8 +175,10 @@ YAMLMapping* WrittenFormReader::ReadObject(std::uint32_t firstLine) {
     const std::size_t headerPairs = AddHeaderData(header);
     CloseMapping(0, false, firstLine, headerPairs);
     YAMLMapping* object = AsMapping(m_Builder.TakeRoot());
-    // A body's own entry would be taken for the header's.
-    if (!header.isStripped && object->HasKey(YAMLScalar::strippedPrefabPlaceHolderName)) throw NotSure();
+    // A body's own entry would be taken for the header's. Its value may still be missing, so only the key can
+    // be asked for.
+    const bool hasMark = object->FindKey(YAMLScalar::strippedPrefabPlaceHolderName) != object->end();
+    if (hasMark && !header.isStripped) throw NotSure();
     return object;
 }
 
