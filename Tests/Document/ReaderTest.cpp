@@ -152,6 +152,11 @@ TEST(Reader, BehindAnEndMarkerOnlyBlanksAndCommentsMayFollow) {
         EXPECT_EQ(Objects(text + end), read) << end;
     for (const char* end : {"x", "# done\nx\n", "--- !o!1 &3\na: b\n"})
         EXPECT_NE(ReadError(ObjectText(text + end)), "none") << end;
+    for (const char* mark : {"", "\xef\xbb\xbf"}) {
+        const std::string other = mark + ObjectText("--- !o!1 &2\na: \u00E9\u65E5\u672C\n...\n# \u00E9\n");
+        EXPECT_EQ(ReadError(other), "none");
+        EXPECT_NE(ReadError(other + "x"), "none");
+    }
 }
 
 TEST(Reader, OneFileIDIsOneObject) {

@@ -42,6 +42,15 @@ void AddDocument(YAMLMapping& root, const LoadedDocument& document, std::string_
     root.Append(id, object);
 }
 
+/// Bytes in the first `characters` characters that the parser counts in its input. A byte order mark is none.
+std::size_t BytesOf(std::string_view input, std::size_t characters) {
+    std::size_t bytes = input.starts_with("\xef\xbb\xbf") ? 3 : 0;
+    const auto continues = [](char c) { return (c & 0xc0) == 0x80; };
+    for (; characters && bytes < input.size(); --characters)
+        for (++bytes; bytes < input.size() && continues(input[bytes]);) ++bytes;
+    return bytes;
+}
+
 bool OnlyBlanksAndComments(std::string_view text) {
     while (!text.empty()) {
         text.remove_prefix(std::min(text.size(), text.find_first_not_of(" \t\r\n")));
@@ -70,7 +79,7 @@ bool ChunkWalker::ReadDocument() {
     AddDocument(m_Root, document, input, isStripped);
     if (document.next == LoadedDocument::Next::End) return false;
     if (document.next == LoadedDocument::Next::Unknown) {
-        const std::size_t behind = std::min(m_Text.size(), m_Chunk + document.stoppedAt);
+        const std::size_t behind = m_Chunk + BytesOf(input, document.stoppedAt);
         if (OnlyBlanksAndComments(std::string_view(m_Text).substr(behind))) return false;
     }
     MoveToNext(document.stoppedAt);
