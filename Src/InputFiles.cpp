@@ -19,7 +19,7 @@ void TakeFile(const std::string& path, ObjectFile& file) {
 }
 
 void FinishFile(ObjectFile& file) {
-    if (!file.Finish()) throw YAMLError("Cannot read file");
+    file.Finish();
 }
 
 void ReadYAMLPath(const std::string& path, OvrinObjects& objects) {

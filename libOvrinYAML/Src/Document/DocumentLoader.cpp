@@ -41,8 +41,13 @@ public:
     yaml_parser_t& operator*() { return m_Parser; }
     yaml_parser_t* operator->() { return &m_Parser; }
 
+    /// Called behind each failure. Throws std::bad_alloc if it was a lack of memory.
+    void RequireMemory() const {
+        if (m_Parser.error == YAML_MEMORY_ERROR) throw std::bad_alloc();
+    }
     /// The problem as the system words it: those of the decoding stage begin with a capital.
     std::string Problem() const {
+        RequireMemory();
         std::string problem = m_Parser.problem ? m_Parser.problem : "unknown problem";
         if (m_Parser.error == YAML_READER_ERROR && problem[0] >= 'a' && problem[0] <= 'z')
             problem[0] = static_cast<char>(problem[0] - 'a' + 'A');
@@ -75,7 +80,10 @@ bool HasIncompatibleVersion(std::string_view text) {
     bool incompatible = false;
     for (bool looking = true; looking;) {
         yaml_token_t token;
-        if (!yaml_parser_scan(&*parser, &token)) return false;
+        if (!yaml_parser_scan(&*parser, &token)) {
+            parser.RequireMemory();
+            return false;
+        }
         if (token.type == YAML_VERSION_DIRECTIVE_TOKEN) {
             const auto& version = token.data.version_directive;
             incompatible = version.major != 1 || version.minor != 1;
@@ -219,12 +227,16 @@ private:
     std::vector<OpenContainer> m_Open;
 };
 
+std::string ProblemOfHeader(const Parser& parser, std::string_view text) {
+    const std::string problem = parser.Problem();
+    return HasIncompatibleVersion(text) ? kVersionProblem : problem;
+}
+
 /// Parses up to the start of the document. False if there is none.
 bool StartDocument(Parser& parser, std::string_view text, LoadedDocument& result) {
     for (;;) {
         Event event;
-        if (!yaml_parser_parse(&*parser, event.Get()))
-            throw YAMLError(HasIncompatibleVersion(text) ? kVersionProblem : parser.Problem());
+        if (!yaml_parser_parse(&*parser, event.Get())) throw YAMLError(ProblemOfHeader(parser, text));
         if (event->type == YAML_STREAM_END_EVENT) return false;
         if (event->type != YAML_DOCUMENT_START_EVENT) continue;
         const auto& start = event->data.document_start;

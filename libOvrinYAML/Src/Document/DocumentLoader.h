@@ -32,7 +32,7 @@ struct LoadedDocument {
 ///
 /// Aliases are expanded: each gets a copy of its own. Pairs whose key is no scalar are dropped.
 /// Throws YAMLError with the problem's text for what libyaml refuses, for a %YAML version other than 1.1, for
-/// text in UTF-16, and for nesting beyond 1,000 levels; std::bad_alloc if no parser can be set up.
+/// text in UTF-16, and for nesting beyond 1,000 levels; std::bad_alloc if there is no memory.
 LoadedDocument LoadDocument(std::string_view text);
 
 } // namespace ovrin_yaml

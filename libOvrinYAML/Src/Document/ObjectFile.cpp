@@ -9,7 +9,6 @@
 #include <algorithm>
 #include <atomic>
 #include <cstring>
-#include <new>
 
 namespace ovrin_yaml {
 
@@ -218,22 +217,16 @@ void ObjectFile::Complete(Document& document) const {
     if (!m_Base && document.isAsWritten) object.SetSource({document.begin, document.length});
 }
 
-bool ObjectFile::Finish() {
-    YAMLMapping& root = m_Objects.GetMapping();
+void ObjectFile::Finish() {
     // What comes before a failure points into it as well.
     if (!m_Base && !m_Documents.empty()) m_Objects.KeepText(m_Text);
     // A text that ends behind the first marker holds no document.
-    if (m_Text->size() <= m_Header.size() + 5) return true;
-    try {
-        if (m_Documents.empty())
-            ReadRestByLibrary(m_Header.size());
-        else
-            FinishDocuments();
-    } catch (const std::bad_alloc&) {
-        return false;
-    }
-    root.RebuildHash(true);
-    return true;
+    if (m_Text->size() <= m_Header.size() + 5) return;
+    if (m_Documents.empty())
+        ReadRestByLibrary(m_Header.size());
+    else
+        FinishDocuments();
+    m_Objects.GetMapping().RebuildHash(true);
 }
 
 void ObjectFile::FinishDocuments() {

@@ -61,9 +61,8 @@ public:
     void Cut(ObjectFile* base);
     std::size_t PieceCount() const { return m_Pieces.size(); }
     void ReadPiece(std::size_t piece);
-    /// All pieces must have been read, those of the base too. Throws YAMLError. Returns false only if a
-    /// parser can't be set up.
-    bool Finish();
+    /// All pieces must have been read, those of the base too. Throws YAMLError.
+    void Finish();
 
 private:
     struct Document {

@@ -17,10 +17,10 @@ namespace ovrin_yaml {
 /// Positions count characters of the parser as bytes: text that is no ASCII in a document with a successor is
 /// a read failure. Hashes are built on the way.
 /// Throws YAMLError with the library's problem text or one of this reader's; `objects` then holds what came
-/// before. Returns false only if a parser can't be set up.
-bool ParseYAMLString(std::string text, OvrinObjects& objects, ReaderOptions options = {});
+/// before. Throws std::bad_alloc where there is no memory.
+void ParseYAMLString(std::string text, OvrinObjects& objects, ReaderOptions options = {});
 
 /// The same for the bytes of a whole file: tests the signature first, and takes the text up to the first NUL.
-bool ParseYAMLFile(std::string bytes, OvrinObjects& objects, ReaderOptions options = {});
+void ParseYAMLFile(std::string bytes, OvrinObjects& objects, ReaderOptions options = {});
 
 } // namespace ovrin_yaml
