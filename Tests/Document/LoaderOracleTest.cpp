@@ -98,7 +98,8 @@ std::string Expected(const std::string& text) {
 std::string Actual(const std::string& text) {
     std::string result;
     const std::string error = ErrorOf([&] {
-        const LoadedDocument document = LoadDocument(text);
+        AliasBudget budget;
+        const LoadedDocument document = LoadDocument(text, budget);
         if (!document.aliasFailure.empty()) throw YAMLError(document.aliasFailure);
         result = !document.root
                      ? "nothing"

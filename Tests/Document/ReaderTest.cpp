@@ -211,6 +211,11 @@ TEST(Reader, AliasesToAliasesEndAtTenMillionNodes) {
         text += "x" + std::to_string(i) + ": &x" + std::to_string(i) + " [" + before + ", " + before + "]\n";
     }
     EXPECT_EQ(ReadError(ObjectText(text)), "Too many aliased nodes");
+    // Up to x16 they stand for some 260,000 nodes.
+    text.resize(text.find("x17"));
+    EXPECT_EQ(ReadError(ObjectText(text)), "none");
+    for (int i = 0; i < 6; ++i) text += text;
+    EXPECT_EQ(ReadError(ObjectText(text)), "Too many aliased nodes") << "the whole file counts";
 }
 
 TEST(Reader, EveryPrefixOfAFileIsReadOrRefused) {

@@ -33,7 +33,8 @@ std::string Join(const YAMLNode* node, const char* brackets, std::string (*show)
 } // namespace
 
 YAMLNode* Node(const std::string& text) {
-    return LoadDocument(text).root;
+    AliasBudget budget;
+    return LoadDocument(text, budget).root;
 }
 
 YAMLMapping* Doc(const std::string& text) {

@@ -1,6 +1,5 @@
 #include "Document/ChunkWalker.h"
 
-#include "Document/DocumentLoader.h"
 #include "Document/YAMLScalar.h"
 
 #include <algorithm>
@@ -69,13 +68,13 @@ void AddHeaderData(YAMLMapping& object, YAMLScalar* fileID, std::string_view cla
     if (isStripped) object.Append(YAMLScalar::strippedPrefabPlaceHolderName, YAMLScalar::one);
 }
 
-ChunkWalker::ChunkWalker(std::string text, std::string header, YAMLMapping& root)
-    : m_Text(std::move(text)), m_Header(std::move(header)), m_Root(root) {}
+ChunkWalker::ChunkWalker(std::string text, std::string header, YAMLMapping& root, AliasBudget& budget)
+    : m_Text(std::move(text)), m_Header(std::move(header)), m_Root(root), m_Budget(budget) {}
 
 bool ChunkWalker::ReadDocument() {
     const bool isStripped = BlankStrippedWord();
     const std::string_view input = ParserInput();
-    const LoadedDocument document = LoadDocument(input);
+    const LoadedDocument document = LoadDocument(input, m_Budget);
     AddDocument(m_Root, document, input, isStripped);
     if (document.next == LoadedDocument::Next::End) return false;
     if (document.next == LoadedDocument::Next::Unknown) {

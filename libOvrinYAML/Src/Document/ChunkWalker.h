@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Document/DocumentLoader.h"
 #include "Document/YAMLMapping.h"
 
 #include <cstdint>
@@ -23,8 +24,8 @@ void AddHeaderData(YAMLMapping& object, YAMLScalar* fileID, std::string_view cla
 ///     HEADER--- !o!4 &12 body oHEADER--- !o!4 &14 body two            second chunk
 class ChunkWalker {
 public:
-    /// `text` begins with `header`; objects are added to `root`.
-    ChunkWalker(std::string text, std::string header, YAMLMapping& root);
+    /// `text` begins with `header`; objects are added to `root`. `budget` is the file's.
+    ChunkWalker(std::string text, std::string header, YAMLMapping& root, AliasBudget& budget);
 
     /// Reads one document and moves on to the next; false if it was the last. Throws YAMLError.
     bool ReadDocument();
@@ -39,6 +40,7 @@ private:
     std::string m_Text;
     const std::string m_Header;
     YAMLMapping& m_Root;
+    AliasBudget& m_Budget;
     std::size_t m_Chunk = 0;
 };
 

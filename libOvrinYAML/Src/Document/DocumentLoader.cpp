@@ -18,8 +18,6 @@ namespace {
 
 /// libyaml's time is quadratic in unclosed brackets, and trees are walked by recursion.
 constexpr std::size_t kMaximumDepth = 1000;
-/// A few lines of aliases to aliases can stand for more nodes than any machine holds.
-constexpr std::uint64_t kMaximumAliasedNodes = 10'000'000;
 
 const char* const kUTF16Problem =
     "YAML file is not UTF-8 encoded, all files must be UTF-8 encoded for performance reasons";
@@ -103,7 +101,7 @@ std::string_view Text(const yaml_char_t* text) {
 /// Turns the events between the start and the end of a document into a tree.
 class EventComposer {
 public:
-    explicit EventComposer(LoadedDocument& result) : m_Result(result) {}
+    EventComposer(LoadedDocument& result, AliasBudget& budget) : m_Result(result), m_Budget(budget) {}
 
     /// Throws YAMLError for what the library's own composing stage refuses.
     void Take(yaml_event_t& event) {
@@ -204,11 +202,10 @@ private:
         if (position == m_Anchors.end()) throw YAMLError("found undefined alias");
         const Anchor& anchor = position->second;
         if (!anchor.node) return FailAlias("Recursive alias");
-        if (m_AliasedNodes + anchor.nodeCount > kMaximumAliasedNodes)
-            return FailAlias("Too many aliased nodes");
+        if (anchor.nodeCount > m_Budget.nodes) return FailAlias("Too many aliased nodes");
         if (m_Builder.Depth() + anchor.levels > kMaximumDepth) return FailAlias(kDepthProblem);
         NoteLevels(anchor.levels);
-        m_AliasedNodes += anchor.nodeCount;
+        m_Budget.nodes -= anchor.nodeCount;
         m_NodeCount += anchor.nodeCount - 1;
         AddNode(CopyExactly(anchor.node));
     }
@@ -219,10 +216,10 @@ private:
     }
 
     LoadedDocument& m_Result;
+    AliasBudget& m_Budget;
     TreeBuilder m_Builder;
     YAMLNode* m_Last = nullptr;
     std::uint64_t m_NodeCount = 0; // aliases expanded
-    std::uint64_t m_AliasedNodes = 0;
     std::unordered_map<std::string, Anchor> m_Anchors;
     std::vector<OpenContainer> m_Open;
 };
@@ -263,7 +260,7 @@ void NoteWhereItStopped(Parser& parser, LoadedDocument& result) {
 
 } // namespace
 
-LoadedDocument LoadDocument(std::string_view text) {
+LoadedDocument LoadDocument(std::string_view text, AliasBudget& budget) {
     // libyaml would decode UTF-16.
     if (text.starts_with("\xff\xfe") || text.starts_with("\xfe\xff")) throw YAMLError(kUTF16Problem);
 
@@ -273,7 +270,7 @@ LoadedDocument LoadDocument(std::string_view text) {
         result.next = LoadedDocument::Next::End;
         return result;
     }
-    EventComposer composer(result);
+    EventComposer composer(result, budget);
     for (bool open = true; open;) {
         Event event;
         if (!yaml_parser_parse(&*parser, event.Get())) throw YAMLError(parser.Problem());

@@ -3,6 +3,7 @@
 #include "Document/YAMLNode.h"
 
 #include <cstddef>
+#include <cstdint>
 #include <string>
 #include <string_view>
 
@@ -28,11 +29,18 @@ struct LoadedDocument {
     std::size_t stoppedAt = 0;
 };
 
+/// What the aliases of one file may still stand for, all its documents together: a few lines of aliases to
+/// aliases can stand for more nodes than any machine holds.
+struct AliasBudget {
+    std::uint64_t nodes = 10'000'000;
+};
+
 /// Parses the first document of `text` with libyaml and builds its tree, with content hashes and lines.
 ///
-/// Aliases are expanded: each gets a copy of its own. Pairs whose key is no scalar are dropped.
-/// Throws YAMLError with the problem's text for what libyaml refuses, for a %YAML version other than 1.1, for
-/// text in UTF-16, and for nesting beyond 1,000 levels; std::bad_alloc if there is no memory.
-LoadedDocument LoadDocument(std::string_view text);
+/// Aliases are expanded: each gets a copy of its own, at the expense of `budget`. Pairs whose key is no
+/// scalar are dropped. Throws YAMLError with the problem's text for what libyaml refuses, for a %YAML version
+/// other than 1.1, for text in UTF-16, and for nesting beyond 1,000 levels; std::bad_alloc if there is no
+/// memory.
+LoadedDocument LoadDocument(std::string_view text, AliasBudget& budget);
 
 } // namespace ovrin_yaml

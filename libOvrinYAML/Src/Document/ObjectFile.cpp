@@ -258,7 +258,7 @@ bool ObjectFile::ReadByLibrary(const Document& document, bool isLast) {
     std::string chunk(m_Header);
     chunk.append(document.begin, document.length);
     if (!isLast) chunk += kMarker;
-    ChunkWalker walker(std::move(chunk), std::string(m_Header), m_Objects.GetMapping());
+    ChunkWalker walker(std::move(chunk), std::string(m_Header), m_Objects.GetMapping(), m_AliasBudget);
     if (!walker.ReadDocument()) return false;
     if (!isLast && walker.Position() == document.length) return true;
     ReadRestByLibrary(static_cast<std::size_t>(document.begin - m_Text->data()) + walker.Position());
@@ -269,7 +269,7 @@ bool ObjectFile::ReadByLibrary(const Document& document, bool isLast) {
 void ObjectFile::ReadRestByLibrary(std::size_t offset) {
     std::string text(m_Header);
     text.append(*m_Text, offset);
-    ChunkWalker walker(std::move(text), std::string(m_Header), m_Objects.GetMapping());
+    ChunkWalker walker(std::move(text), std::string(m_Header), m_Objects.GetMapping(), m_AliasBudget);
     while (walker.ReadDocument()) {
     }
 }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Document/DocumentLoader.h"
 #include "Document/OvrinObjects.h"
 
 #include <cstddef>
@@ -107,6 +108,7 @@ private:
     std::string_view m_Header;
     std::vector<Document> m_Documents; // empty: libyaml reads all of the text
     std::vector<Piece> m_Pieces;
+    AliasBudget m_AliasBudget;
 
     // File id to document, for the files that are cut along this one; made by the first that asks.
     mutable std::once_flag m_IndexOnce;
