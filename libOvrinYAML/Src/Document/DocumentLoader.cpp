@@ -1,5 +1,6 @@
 #include "Document/DocumentLoader.h"
 
+#include "Document/SeededHash.h"
 #include "Document/TreeBuilder.h"
 #include "Document/YAMLError.h"
 #include "Document/YAMLScalar.h"
@@ -220,7 +221,7 @@ private:
     TreeBuilder m_Builder;
     YAMLNode* m_Last = nullptr;
     std::uint64_t m_NodeCount = 0; // aliases expanded
-    std::unordered_map<std::string, Anchor> m_Anchors;
+    std::unordered_map<std::string, Anchor, SeededHash> m_Anchors;
     std::vector<OpenContainer> m_Open;
 };
 

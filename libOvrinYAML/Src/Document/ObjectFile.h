@@ -2,6 +2,7 @@
 
 #include "Document/DocumentLoader.h"
 #include "Document/OvrinObjects.h"
+#include "Document/SeededHash.h"
 
 #include <cstddef>
 #include <cstdint>
@@ -112,7 +113,7 @@ private:
 
     // File id to document, for the files that are cut along this one; made by the first that asks.
     mutable std::once_flag m_IndexOnce;
-    mutable std::unordered_map<std::string_view, std::size_t> m_Index;
+    mutable std::unordered_map<std::string_view, std::size_t, SeededHash> m_Index;
 };
 
 } // namespace ovrin_yaml

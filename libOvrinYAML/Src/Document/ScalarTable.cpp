@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <memory>
 #include <new>
 
 namespace ovrin_yaml {
@@ -33,7 +34,7 @@ constinit ScalarTable ScalarTable::s_Instance;
 
 const ScalarTable::Slot* ScalarTable::SlotOf(std::uint32_t hash) const {
     const Slots* slots = m_Shards[hash >> (32 - kShardBits)].slots.load(std::memory_order_acquire);
-    return slots ? &slots->entries[slots->PlaceOf(hash)] : nullptr;
+    return slots ? slots->SlotOf(hash) : nullptr;
 }
 
 void ScalarTable::PrefetchSlot(std::uint32_t hash) const {
@@ -49,26 +50,36 @@ void ScalarTable::PrefetchScalar(std::uint32_t hash) const {
 void ScalarTable::Reserve(std::size_t count) {
     const std::size_t capacity = count * 3 / 2 / m_Shards.size() + 1;
     if (capacity <= kFirstCapacity) return;
-    // One piece for all shards is big enough for huge pages.
-    char* memory = static_cast<char*>(AllocateZeroed(m_Shards.size() * capacity * sizeof(Slot)));
-    for (Shard& shard : m_Shards) {
+    const auto isSmaller = [capacity](const Shard& shard) {
         const Slots* slots = shard.slots.load(std::memory_order_relaxed);
-        if (!slots || slots->capacity < capacity) Grow(shard, capacity, memory);
-        memory += capacity * sizeof(Slot);
+        return !slots || slots->capacity < capacity;
+    };
+    // Several files may be on their way into the table at once: one piece of memory is enough for them.
+    const std::lock_guard reserveLock(m_ReserveLock);
+    if (std::none_of(m_Shards.begin(), m_Shards.end(), isSmaller)) return;
+    // One piece for all shards is big enough for huge pages.
+    char* memory = static_cast<char*>(AllocateZeroed(m_Shards.size() * Slots::BytesFor(capacity)));
+    for (Shard& shard : m_Shards) {
+        const std::lock_guard lock(shard.lock);
+        if (isSmaller(shard)) Grow(shard, capacity, memory);
+        memory += Slots::BytesFor(capacity);
     }
 }
 
 // Part of the way of every text.
 [[gnu::always_inline]] inline ScalarTable::Place ScalarTable::Find(const Slots& slots, std::string_view text,
                                                                    std::uint32_t hash) {
-    for (std::size_t place = slots.PlaceOf(hash);; place = slots.Behind(place)) {
-        Slot& position = slots.entries[place];
-        const std::uint64_t slot = position.load(std::memory_order_acquire);
-        if (!slot) return {nullptr, &position};
+    Slot* position = slots.SlotOf(hash);
+    std::size_t alike = 0;
+    for (const Slot* end = position + kMostProbes; position != end; ++position) {
+        const std::uint64_t slot = position->load(std::memory_order_acquire);
+        if (!slot) return {nullptr, position};
         if (slot >> kTagShift != Tag(hash)) continue;
         YAMLScalar* scalar = Unpack(slot);
         if (scalar->m_Hash == hash && scalar->Value() == text) return {scalar, nullptr};
+        if (++alike == kMostAlike) break;
     }
+    return {nullptr, nullptr};
 }
 
 YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t hash, std::uint32_t line) {
@@ -85,25 +96,25 @@ YAMLScalar* ScalarTable::InternNew(Shard& shard, const NewScalar& wanted, const 
     const std::size_t capacity = slots ? slots->capacity : 0;
     if (3 * (shard.count + 1) > 2 * capacity) {
         const std::size_t grown = std::max(2 * capacity, kFirstCapacity);
-        Grow(shard, grown, AllocateZeroed(grown * sizeof(Slot)));
+        Grow(shard, grown, AllocateZeroed(Slots::BytesFor(grown)));
         slots = shard.slots.load(std::memory_order_relaxed);
     }
-    if (slots != seen || empty->load(std::memory_order_relaxed)) {
+    if (slots != seen || (empty && empty->load(std::memory_order_relaxed))) {
         // Another thread may have made the scalar meanwhile.
         const Place place = Find(*slots, wanted.text, wanted.hash);
         if (place.scalar) return place.scalar;
         empty = place.slot;
     }
+    if (!empty) return InternInOverflow(shard, wanted);
     YAMLScalar* scalar = Make(wanted);
     empty->store(Pack(scalar), std::memory_order_release);
     ++shard.count;
     return scalar;
 }
 
-void ScalarTable::Fill(const Slots& slots, YAMLScalar* scalar) {
-    std::size_t place = slots.PlaceOf(scalar->m_Hash);
-    while (slots.entries[place].load(std::memory_order_relaxed)) place = slots.Behind(place);
-    slots.entries[place].store(Pack(scalar), std::memory_order_release);
+YAMLScalar* ScalarTable::InternInOverflow(Shard& shard, const NewScalar& wanted) {
+    const auto found = shard.overflow->find(wanted.text);
+    return found != shard.overflow->end() ? *found : *shard.overflow->insert(Make(wanted)).first;
 }
 
 static_assert(sizeof(YAMLScalar) == 16, "there are millions of them");
@@ -116,12 +127,26 @@ YAMLScalar* ScalarTable::Make(const NewScalar& wanted) {
 }
 
 void ScalarTable::Grow(Shard& shard, std::size_t capacity, void* memory) {
-    const Slots* old = shard.slots.load(std::memory_order_relaxed);
     const auto* grown = new (ArenaAllocate(sizeof(Slots))) Slots{capacity, static_cast<Slot*>(memory)};
-    if (old)
-        for (std::size_t i = 0; i < old->capacity; ++i)
+    auto overflow = std::make_unique<Overflow>();
+    std::size_t count = 0;
+    const auto place = [&](YAMLScalar* scalar) {
+        if (Slot* slot = Find(*grown, scalar->Value(), scalar->m_Hash).slot) {
+            slot->store(Pack(scalar), std::memory_order_relaxed);
+            ++count;
+        } else {
+            overflow->insert(scalar);
+        }
+    };
+    if (const Slots* old = shard.slots.load(std::memory_order_relaxed))
+        for (std::size_t i = 0; i < old->capacity + kMostProbes; ++i)
             if (const std::uint64_t slot = old->entries[i].load(std::memory_order_relaxed))
-                Fill(*grown, Unpack(slot));
+                place(Unpack(slot));
+    if (shard.overflow) std::for_each(shard.overflow->begin(), shard.overflow->end(), place);
+    // The old set was asked under the lock only.
+    delete shard.overflow;
+    shard.overflow = overflow.release();
+    shard.count = count;
     shard.slots.store(grown, std::memory_order_release);
 }
 
