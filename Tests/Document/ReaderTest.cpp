@@ -132,6 +132,27 @@ TEST(Reader, AHeaderThatIsNoASCIIEndsTheWalkInsteadOfTurningItBack) {
     }
 }
 
+/// The last of many small objects behind a header, with its line.
+std::string LastOf(std::size_t count, const std::string& header, const std::string& handle) {
+    std::string text = header;
+    for (std::size_t i = 1; i <= count; ++i)
+        text += "--- " + handle + "4 &" + std::to_string(i) + "\nT: {a: b}\n";
+    OvrinObjects objects;
+    ParseYAMLString(text, objects);
+    const YAMLMapping::Entry last = objects.GetMapping().RawEntries()[count - 1];
+    return std::string(last.key->Value()) + " at " + std::to_string(last.value->m_Line);
+}
+
+TEST(Reader, ManyDocumentsOfAnyHandleBehindAnyHeaderAreReadInLinearTime) {
+    const std::string directives = "%YAML 1.1\n%TAG !x! tag:x,1:\n";
+    std::string comments = directives;
+    for (int i = 0; i < 60'000; ++i) comments += i % 2 ? "# c\n" : "\r\n";
+    EXPECT_EQ(LastOf(30'000, directives, "!x!"), "30000 at 2");
+    EXPECT_EQ(LastOf(10'000, comments, "!x!"), "10000 at 60002");
+    EXPECT_EQ(LastOf(10'000, Replaced(comments, "!x!", "!o!"), "!o!"), "10000 at 60002");
+    EXPECT_EQ(LastOf(1, "# &5\n" + directives + "# &6\n", "!x!"), "5 at 4");
+}
+
 TEST(Reader, TheWordStrippedCountsDirectlyBeforeTheLineEnd) {
     EXPECT_NE(Objects("--- !o!1 &2   stripped\na: b\n").find("MERGE_StrippedPrefab: 1"), std::string::npos);
     EXPECT_EQ(Objects("--- !o!1 &2\nstripped: stripped\n"),

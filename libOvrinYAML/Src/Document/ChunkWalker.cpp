@@ -3,7 +3,6 @@
 #include "Document/YAMLScalar.h"
 
 #include <algorithm>
-#include <cstring>
 
 namespace ovrin_yaml {
 
@@ -13,6 +12,8 @@ constexpr std::string_view kMarker = "---";
 constexpr std::string_view kNextHeader = "\n--- !o!";
 constexpr std::string_view kStripped = "stripped";
 constexpr std::string_view kIdCharacters = "0123456789-";
+/// More than the parser decodes ahead of what it scans.
+constexpr std::size_t kDecodedAhead = std::size_t{64} << 10;
 
 const char* const kLostPlace = "Error locating end of document sequence";
 
@@ -22,18 +23,32 @@ std::string_view IdAt(std::string_view text, std::size_t position) {
     return rest.substr(0, rest.find_first_not_of(kIdCharacters));
 }
 
-std::string_view FileIDIn(std::string_view input) {
-    const std::size_t anchor = input.find('&');
-    return anchor == std::string_view::npos ? std::string_view() : IdAt(input, anchor + 1);
+bool IsUnusual(char c) {
+    return (c < ' ' || c > '~') && c != '\t' && c != '\n' && c != '\r';
 }
 
-void AddDocument(YAMLMapping& root, const LoadedDocument& document, std::string_view input, bool isStripped) {
+/// Whether the parser takes what stands at the start of a line for a marker, wherever it meets it.
+bool IsMarker(std::string_view line) {
+    constexpr std::string_view kBehind = " \t\r\n";
+    return line.starts_with(kMarker) &&
+           (line.size() == kMarker.size() || kBehind.find(line[kMarker.size()]) != kBehind.npos);
+}
+
+/// The line end in front of the next marker, or npos.
+std::size_t FindMarker(std::string_view text, std::size_t from) {
+    constexpr std::string_view kMarkerLine = "\n---";
+    std::size_t found = text.find(kMarkerLine, from);
+    while (found != text.npos && !IsMarker(text.substr(found + 1))) found = text.find(kMarkerLine, found + 1);
+    return found;
+}
+
+void AddDocument(YAMLMapping& root, const LoadedDocument& document, std::string_view fileID,
+                 bool isStripped) {
     YAMLMapping* object = AsMapping(document.root);
     if (!object) throw YAMLError("Document root is not a mapping");
     const std::string_view classID =
         document.hasTagDirective ? IdAt(document.tag, document.tagPrefixLength) : std::string_view();
     if (classID.empty()) throw YAMLError("Document has no class id");
-    const std::string_view fileID = FileIDIn(input);
     if (fileID.empty()) throw YAMLError("Document has no file id");
     if (!document.aliasFailure.empty()) throw YAMLError(document.aliasFailure);
     YAMLScalar* id = YAMLScalar::Lookup(fileID);
@@ -69,19 +84,51 @@ void AddHeaderData(YAMLMapping& object, YAMLScalar* fileID, std::string_view cla
 }
 
 ChunkWalker::ChunkWalker(std::string text, std::string header, YAMLMapping& root, AliasBudget& budget)
-    : m_Text(std::move(text)), m_Header(std::move(header)), m_Root(root), m_Budget(budget) {}
+    : m_Text(std::move(text)), m_Header(std::move(header)), m_Short(Shorten(m_Header)),
+      m_HeaderAnchor(m_Header.find('&')), m_Root(root), m_Budget(budget) {}
+
+/// The directives of a header that consists of complete ASCII lines; the whole of any other. Whether a
+/// directive stands in the last line decides what the parser makes of blanks behind the header, so that a
+/// line that is no directive becomes an empty one there.
+ChunkWalker::ShortHeader ChunkWalker::Shorten(const std::string& header) {
+    const ShortHeader whole{header, 0};
+    ShortHeader result;
+    if (std::any_of(header.begin(), header.end(), IsUnusual)) return whole;
+    bool isDirective = true;
+    for (std::string_view rest = header; !rest.empty();) {
+        const std::size_t end = rest.find_first_of("\r\n");
+        if (end == rest.npos) return whole;
+        const std::string_view line = rest.substr(0, end);
+        const std::string_view lineEnd = rest.substr(end, rest.substr(end).starts_with("\r\n") ? 2 : 1);
+        rest.remove_prefix(end + lineEnd.size());
+        isDirective = line.starts_with('%');
+        if (isDirective) {
+            result.text.append(line.substr(0, line.find('#'))).append(lineEnd);
+        } else {
+            const std::size_t first = line.find_first_not_of(" \t");
+            if (first != line.npos && line[first] != '#') return whole;
+            ++result.linesLeftOut;
+        }
+    }
+    if (isDirective) return result;
+    result.text += '\n';
+    --result.linesLeftOut;
+    return result;
+}
 
 bool ChunkWalker::ReadDocument() {
     const bool isStripped = BlankStrippedWord();
-    const std::string_view input = ParserInput();
-    const LoadedDocument document = LoadDocument(input, m_Budget);
-    AddDocument(m_Root, document, input, isStripped);
+    const std::size_t nextHeader = FindNextHeader();
+    const std::size_t begin = InputBegin();
+    const std::string_view input = std::string_view(m_Text).substr(begin, InputEnd(nextHeader) - begin);
+    const LoadedDocument document = LoadDocument(input, m_Budget, m_Chunk ? m_Short.linesLeftOut : 0);
+    AddDocument(m_Root, document, FileID(nextHeader), isStripped);
     if (document.next == LoadedDocument::Next::End) return false;
     if (document.next == LoadedDocument::Next::Unknown) {
-        const std::size_t behind = m_Chunk + BytesOf(input, document.stoppedAt);
+        const std::size_t behind = begin + BytesOf(input, document.stoppedAt);
         if (OnlyBlanksAndComments(std::string_view(m_Text).substr(behind))) return false;
     }
-    MoveToNext(document.stoppedAt);
+    MoveToNext(begin - m_Chunk + document.stoppedAt);
     return true;
 }
 
@@ -96,12 +143,42 @@ bool ChunkWalker::BlankStrippedWord() {
     return true;
 }
 
-std::string_view ChunkWalker::ParserInput() const {
+/// The line end in front of the next document's header line, or npos.
+std::size_t ChunkWalker::FindNextHeader() {
+    return m_NextHeader.From(m_Chunk + m_Header.size() + kMarker.size(),
+                             [this](std::size_t from) { return m_Text.find(kNextHeader, from); });
+}
+
+/// Behind the "---" of the next header line or at the end of the text, so that the parser finds there what
+/// ends the document. Behind an earlier marker of any kind, where it stops by itself, if what it would decode
+/// ahead holds nothing that it could refuse: decoding that again for each document takes most of the time.
+std::size_t ChunkWalker::InputEnd(std::size_t nextHeader) {
     const std::string_view text = m_Text;
-    const std::size_t from = m_Chunk + m_Header.size() + kMarker.size();
-    const std::size_t next = from < text.size() ? text.find(kNextHeader, from) : std::string_view::npos;
-    if (next == std::string_view::npos) return text.substr(m_Chunk);
-    return text.substr(m_Chunk, next + 1 + kMarker.size() - m_Chunk);
+    const std::size_t end = nextHeader == text.npos ? text.size() : nextHeader + 1 + kMarker.size();
+    const std::size_t line = m_Chunk + m_Header.size();
+    // A chunk that lies wrong, or whose header swallows the marker, may find its own one later.
+    if (!m_Header.ends_with('\n') || !IsMarker(text.substr(line))) return end;
+    const std::size_t marker =
+        m_NextMarker.From(line + kMarker.size(), [text](std::size_t from) { return FindMarker(text, from); });
+    if (marker == text.npos) return end;
+    const std::size_t unusual = m_NextUnusual.From(line, [text](std::size_t from) -> std::size_t {
+        return std::find_if(text.begin() + from, text.end(), IsUnusual) - text.begin();
+    });
+    return unusual == text.size() || unusual > marker + kDecodedAhead ? marker + 1 + kMarker.size() : end;
+}
+
+/// Behind the first "&" in front of the next header line; that may be one in the file's header.
+std::string_view ChunkWalker::FileID(std::size_t nextHeader) {
+    const std::string_view text = m_Text;
+    if (m_HeaderAnchor != text.npos) {
+        // A header that isn't whole in front of the document consists of whole lines, and so the id ends
+        // there.
+        const bool isWhole = InputBegin() == m_Chunk;
+        return isWhole ? IdAt(text, m_Chunk + m_HeaderAnchor + 1) : IdAt(m_Header, m_HeaderAnchor + 1);
+    }
+    const std::size_t anchor = m_NextAnchor.From(m_Chunk + m_Header.size(),
+                                                 [text](std::size_t from) { return text.find('&', from); });
+    return anchor < nextHeader ? IdAt(text, anchor + 1) : std::string_view();
 }
 
 /// The parser counts characters and the text is counted in bytes: a document that is not ASCII puts the next
@@ -112,7 +189,7 @@ void ChunkWalker::MoveToNext(std::size_t stoppedAt) {
     const std::size_t next = behindHeader - kMarker.size() - m_Header.size();
     if (next <= m_Chunk || next + m_Header.size() > m_Text.size()) throw YAMLError(kLostPlace);
     m_Chunk = next;
-    std::memcpy(m_Text.data() + m_Chunk, m_Header.data(), m_Header.size());
+    m_Short.text.copy(m_Text.data() + InputBegin(), m_Short.text.size());
 }
 
 } // namespace ovrin_yaml

@@ -4,6 +4,7 @@
 #include "Document/YAMLMapping.h"
 
 #include <cstdint>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -22,6 +23,10 @@ void AddHeaderData(YAMLMapping& object, YAMLScalar* fileID, std::string_view cla
 ///
 ///     HEADER--- !o!4 &12 body one body one\n--- !o!4 &14 body two     first chunk: from the start
 ///     HEADER--- !o!4 &12 body oHEADER--- !o!4 &14 body two            second chunk
+///
+/// The time is linear in the text. The first document shows that the header can be read; in front of the
+/// later ones stands only what they need of it. And what is looked for in front of the walker is looked for
+/// once.
 class ChunkWalker {
 public:
     /// `text` begins with `header`; objects are added to `root`. `budget` is the file's.
@@ -33,15 +38,40 @@ public:
     std::size_t Position() const { return m_Chunk; }
 
 private:
+    /// What later documents need of the header.
+    struct ShortHeader {
+        std::string text;
+        std::uint32_t linesLeftOut = 0;
+    };
+    /// Where something stands next. Asked for places that rise, it has each byte looked at once.
+    class NextPlace {
+    public:
+        template <class Find> std::size_t From(std::size_t from, const Find& find) {
+            if (!m_Place || *m_Place < from) m_Place = find(from);
+            return *m_Place;
+        }
+
+    private:
+        std::optional<std::size_t> m_Place;
+    };
+
+    static ShortHeader Shorten(const std::string& header);
     bool BlankStrippedWord();
-    std::string_view ParserInput() const;
+    /// Where the parser's input begins and ends.
+    std::size_t InputBegin() const { return m_Chunk ? m_Chunk + m_Header.size() - m_Short.text.size() : 0; }
+    std::size_t InputEnd(std::size_t nextHeader);
+    std::size_t FindNextHeader();
+    std::string_view FileID(std::size_t nextHeader);
     void MoveToNext(std::size_t stoppedAt);
 
     std::string m_Text;
     const std::string m_Header;
+    const ShortHeader m_Short;
+    const std::size_t m_HeaderAnchor; // the first "&" in the header, or npos
     YAMLMapping& m_Root;
     AliasBudget& m_Budget;
     std::size_t m_Chunk = 0;
+    NextPlace m_NextHeader, m_NextMarker, m_NextAnchor, m_NextUnusual;
 };
 
 } // namespace ovrin_yaml

@@ -102,11 +102,12 @@ std::string_view Text(const yaml_char_t* text) {
 /// Turns the events between the start and the end of a document into a tree.
 class EventComposer {
 public:
-    EventComposer(LoadedDocument& result, AliasBudget& budget) : m_Result(result), m_Budget(budget) {}
+    EventComposer(LoadedDocument& result, AliasBudget& budget, std::uint32_t firstLine)
+        : m_Result(result), m_Budget(budget), m_FirstLine(firstLine) {}
 
     /// Throws YAMLError for what the library's own composing stage refuses.
     void Take(yaml_event_t& event) {
-        const auto line = static_cast<std::uint32_t>(event.start_mark.line);
+        const auto line = m_FirstLine + static_cast<std::uint32_t>(event.start_mark.line);
         switch (event.type) {
         case YAML_SCALAR_EVENT: {
             const auto& scalar = event.data.scalar;
@@ -218,6 +219,7 @@ private:
 
     LoadedDocument& m_Result;
     AliasBudget& m_Budget;
+    const std::uint32_t m_FirstLine;
     TreeBuilder m_Builder;
     YAMLNode* m_Last = nullptr;
     std::uint64_t m_NodeCount = 0; // aliases expanded
@@ -261,7 +263,7 @@ void NoteWhereItStopped(Parser& parser, LoadedDocument& result) {
 
 } // namespace
 
-LoadedDocument LoadDocument(std::string_view text, AliasBudget& budget) {
+LoadedDocument LoadDocument(std::string_view text, AliasBudget& budget, std::uint32_t firstLine) {
     // libyaml would decode UTF-16.
     if (text.starts_with("\xff\xfe") || text.starts_with("\xfe\xff")) throw YAMLError(kUTF16Problem);
 
@@ -271,7 +273,7 @@ LoadedDocument LoadDocument(std::string_view text, AliasBudget& budget) {
         result.next = LoadedDocument::Next::End;
         return result;
     }
-    EventComposer composer(result, budget);
+    EventComposer composer(result, budget, firstLine);
     for (bool open = true; open;) {
         Event event;
         if (!yaml_parser_parse(&*parser, event.Get())) throw YAMLError(parser.Problem());

@@ -35,12 +35,13 @@ struct AliasBudget {
     std::uint64_t nodes = 10'000'000;
 };
 
-/// Parses the first document of `text` with libyaml and builds its tree, with content hashes and lines.
+/// Parses the first document of `text` with libyaml and builds its tree, with content hashes and lines, which
+/// are counted from `firstLine` on.
 ///
 /// Aliases are expanded: each gets a copy of its own, at the expense of `budget`. Pairs whose key is no
 /// scalar are dropped. Throws YAMLError with the problem's text for what libyaml refuses, for a %YAML version
 /// other than 1.1, for text in UTF-16, and for nesting beyond 1,000 levels; std::bad_alloc if there is no
 /// memory.
-LoadedDocument LoadDocument(std::string_view text, AliasBudget& budget);
+LoadedDocument LoadDocument(std::string_view text, AliasBudget& budget, std::uint32_t firstLine = 0);
 
 } // namespace ovrin_yaml
