@@ -324,6 +324,12 @@ TEST(Lists, IndexesAreChecked) {
     EXPECT_EQ(Show(list), "[b]");
 }
 
+TEST(Values, WhatOutgrowsItsFieldIsRefused) {
+    EXPECT_EQ(ErrorOf([] { YAMLScalar::Lookup({"", std::size_t{1} << 32}); }), "Scalar is too long");
+    EXPECT_EQ(ErrorOf([] { Doc("a: b")->Reserve(std::size_t{1} << 30); }), "Mapping is too long");
+    EXPECT_EQ(ErrorOf([] { List("[a]")->GrowTo(std::size_t{1} << 31); }), "Sequence is too long");
+}
+
 TEST(Clones, ACopySharesScalarsOnlyAndKeepsWhatTheReaderMade) {
     YAMLMapping* source = Doc("a: {x: [1, {}]}\nb:\n  c: 2");
     YAMLMapping* copy = AsMapping(source->Clone());

@@ -107,6 +107,7 @@ public:
 
     /// Throws YAMLError for what the library's own composing stage refuses.
     void Take(yaml_event_t& event) {
+        if (event.start_mark.line > UINT32_MAX - m_FirstLine) throw YAMLError("Document has too many lines");
         const auto line = m_FirstLine + static_cast<std::uint32_t>(event.start_mark.line);
         switch (event.type) {
         case YAML_SCALAR_EVENT: {

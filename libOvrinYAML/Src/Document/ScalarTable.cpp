@@ -1,6 +1,7 @@
 #include "Document/ScalarTable.h"
 
 #include "Document/Arena.h"
+#include "Document/YAMLError.h"
 
 #include <algorithm>
 #include <cstring>
@@ -80,6 +81,11 @@ void ScalarTable::Reserve(std::size_t count) {
         if (++alike == kMostAlike) break;
     }
     return {nullptr, nullptr};
+}
+
+YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t line) {
+    if (text.size() > UINT32_MAX) throw YAMLError("Scalar is too long");
+    return Intern(text, HashOf(text), line);
 }
 
 YAMLScalar* ScalarTable::Intern(std::string_view text, std::uint32_t hash, std::uint32_t line) {

@@ -40,8 +40,9 @@ public:
     constexpr ScalarTable() = default;
     static ScalarTable& Instance() { return s_Instance; }
 
-    /// The one scalar of `text`; a new one gets `line`.
-    YAMLScalar* Intern(std::string_view text, std::uint32_t line) { return Intern(text, HashOf(text), line); }
+    /// The one scalar of `text`; a new one gets `line`. Throws YAMLError "Scalar is too long" for a text of 4
+    /// GiB or more.
+    YAMLScalar* Intern(std::string_view text, std::uint32_t line);
 
     // Looking up one text after the other means waiting for memory twice each time, for the slot and for the
     // scalar that it holds. Who has many texts asks for all slots, then for all scalars, and then for the
@@ -55,6 +56,7 @@ public:
     void PrefetchSlot(std::uint32_t hash) const;
     /// Starts to load the scalar that the slot of a text with this hash holds.
     void PrefetchScalar(std::uint32_t hash) const;
+    /// Only for texts that are shorter than 4 GiB.
     YAMLScalar* Intern(std::string_view text, std::uint32_t hash, std::uint32_t line);
 
     /// Makes room for that many scalars in all.

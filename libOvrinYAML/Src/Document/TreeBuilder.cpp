@@ -23,6 +23,7 @@ YAMLNode* TreeBuilder::Close() {
 
 YAMLNode* TreeBuilder::MakeMapping(const OpenContainer& open) {
     const std::span<YAMLNode* const> nodes(m_Nodes.data() + open.firstNode, m_Nodes.size() - open.firstNode);
+    if (nodes.size() / 2 > YAMLMapping::kMostPairs) throw YAMLError("Mapping is too long");
     // An object gets its header data behind the keys of its body.
     YAMLMapping* mapping = m_Open.empty() ? nullptr : MakeUsualMapping(open, nodes);
     if (!mapping) {
@@ -52,6 +53,7 @@ YAMLMapping* TreeBuilder::MakeUsualMapping(const OpenContainer& open, std::span<
 }
 
 YAMLNode* TreeBuilder::MakeSequence(const OpenContainer& open) const {
+    if (m_Nodes.size() - open.firstNode > YAMLSequence::kMostItems) throw YAMLError("Sequence is too long");
     YAMLSequence* sequence = YAMLAlloc<YAMLSequence>::create(open.flow);
     sequence->m_Items.assign(m_Nodes.begin() + static_cast<std::ptrdiff_t>(open.firstNode), m_Nodes.end());
     std::uint32_t hash = 0;

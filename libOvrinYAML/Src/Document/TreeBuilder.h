@@ -22,7 +22,8 @@ public:
     /// Opens a container; `line` is where it starts.
     void Open(YAMLNode::Kind kind, bool flow, std::uint32_t line);
     /// Makes the container opened last, adds it to the one around it and returns it. A pair whose key is no
-    /// scalar is dropped and folds nothing into the hash, but its index counts.
+    /// scalar is dropped and folds nothing into the hash, but its index counts. Throws YAMLError "Mapping is
+    /// too long" or "Sequence is too long" for more than such a container can hold.
     YAMLNode* Close();
 
     /// Containers that are open.

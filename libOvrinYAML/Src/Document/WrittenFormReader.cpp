@@ -12,8 +12,10 @@ namespace ovrin_yaml {
 
 namespace {
 
-/// Deeper documents are left to the library: it has the limit.
+/// Deeper and longer documents are left to the library: it has the limits. What a document of this size holds
+/// can be counted in any type that is in use here.
 constexpr int kMaximumDepth = 100;
+constexpr std::size_t kLongestDocument = INT32_MAX;
 /// The parser looks for the colon behind a key within 1024 characters.
 constexpr std::ptrdiff_t kLongestKey = 1000;
 /// The writer gives longer keys another form, and breaks lines behind this column.
@@ -137,7 +139,7 @@ private:
 
 WrittenFormReader::Document WrittenFormReader::Read(std::string_view text, std::uint32_t firstLine) {
     Document document;
-    if (text.empty() || text.back() != '\n') return document;
+    if (text.empty() || text.size() > kLongestDocument || text.back() != '\n') return document;
     Begin(text, firstLine);
     try {
         document.object = ReadObject(firstLine);

@@ -24,6 +24,7 @@ void YAMLMapping::RequireNormalState() const {
 }
 
 void YAMLMapping::MoveTo(std::size_t room) {
+    if (room > kMostPairs) throw YAMLError("Mapping is too long");
     void* memory = ArenaAllocate(room * (sizeof(YAMLNode*) + sizeof(YAMLScalar*)));
     auto** values = static_cast<YAMLNode**>(memory);
     auto** keys = static_cast<const YAMLScalar**>(static_cast<void*>(values + room));
@@ -69,7 +70,10 @@ std::uint32_t YAMLMapping::Find(const YAMLScalar* key) const {
 }
 
 void YAMLMapping::PushRaw(const YAMLScalar* key, YAMLNode* value) {
-    if (m_Size == Room() || !m_OwnsKeys) MoveTo(std::max<std::size_t>(2 * std::size_t{m_Size}, 4));
+    if (m_Size == Room() || !m_OwnsKeys) {
+        const std::size_t doubled = std::min(2 * std::size_t{m_Size}, kMostPairs);
+        MoveTo(std::max({doubled, std::size_t{m_Size} + 1, std::size_t{4}}));
+    }
     OwnKeys()[m_Size] = key;
     m_Extra->values[m_Size] = value;
     ++m_Size;

@@ -30,10 +30,11 @@ class YAMLSequence;
 ///     {x: 5, y: 7}    [ mapping | 5 | 7 ]  ------^
 ///
 /// A change of the keys gives the mapping a list of its own, and new pairs give it new arrays for both. At
-/// most 2^30 - 1 pairs.
+/// most kMostPairs: what would bring more throws YAMLError "Mapping is too long".
 class YAMLMapping final : public YAMLNode {
 public:
     static constexpr Kind kKind = Kind::Mapping;
+    static constexpr std::size_t kMostPairs = (std::size_t{1} << 30) - 1;
 
     struct Entry {
         const YAMLScalar* key; // null: a pair that was removed, passed over by iteration
@@ -113,9 +114,9 @@ public:
     /// The mapping is an object that several trees hold: it is never freed, and copied before it is changed.
     bool m_IsShared = false;
 
-    /// A new mapping of keys that are all different, with the values, which stand right behind it in memory,
-    /// to be filled in by the caller. The array of keys may be that of many mappings; it must stay as it is
-    /// until the process ends.
+    /// A new mapping of keys that are all different, at most kMostPairs, with the values, which stand right
+    /// behind it in memory, to be filled in by the caller. The array of keys may be that of many mappings; it
+    /// must stay as it is until the process ends.
     static YAMLMapping* Create(bool flow, const YAMLScalar* const* keys, std::size_t count) {
         void* memory = ArenaAllocate(sizeof(YAMLMapping) + count * sizeof(YAMLNode*));
         YAMLMapping* mapping = new (memory) YAMLMapping(flow);
@@ -141,7 +142,7 @@ public:
     /// Makes room for `count` pairs in all.
     void Reserve(std::size_t count);
     /// Adds a pair at the end. A key that is there already keeps its value if the new one is equal (which is
-    /// dropped), and brings on the duplicate state if not. Never throws a YAMLError.
+    /// dropped), and brings on the duplicate state if not.
     void Append(const YAMLScalar* key, YAMLNode* value);
     /// Appends keys and values that stand by turns, `count` of both; pairs whose key is no scalar are left
     /// out.

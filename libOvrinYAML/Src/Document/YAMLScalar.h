@@ -16,6 +16,7 @@ public:
 
     /// The one scalar of `text`, made if new; never null. May be called from any thread at any time; a text
     /// that is known already is found without a lock. `line` is kept if the scalar is made by this call.
+    /// Throws YAMLError "Scalar is too long" for a text of 4 GiB or more.
     static YAMLScalar* Lookup(std::string_view text, std::uint32_t line = 0);
 
     /// Interns the well-known scalars below. Called once, by `initialize`, before anything else is used.

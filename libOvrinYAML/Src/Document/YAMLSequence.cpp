@@ -25,6 +25,7 @@ YAMLNode* YAMLSequence::Set(int index, YAMLNode* item) {
 }
 
 void YAMLSequence::GrowTo(std::size_t count) {
+    if (count > kMostItems) throw YAMLError("Sequence is too long");
     if (m_Items.size() < count) m_Items.resize(count, nullptr);
 }
 

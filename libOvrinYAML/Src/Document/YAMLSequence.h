@@ -5,6 +5,7 @@
 #include "Document/YAMLError.h"
 #include "Document/YAMLNode.h"
 
+#include <climits>
 #include <vector>
 
 namespace ovrin_yaml {
@@ -18,6 +19,7 @@ using NodeList = std::vector<YAMLNode*, ArenaAllocator<YAMLNode*>>;
 class YAMLSequence final : public YAMLNode {
 public:
     static constexpr Kind kKind = Kind::Sequence;
+    static constexpr std::size_t kMostItems = INT_MAX; // indexes are ints
 
     explicit YAMLSequence(bool flow = false) : YAMLNode(Kind::Sequence), m_Flow(flow) {}
     YAMLSequence(const YAMLSequence&) = delete;
@@ -32,7 +34,7 @@ public:
     YAMLNode* Get(int index) const;
     /// Replaces the item and returns the old one. Throws "Cannot change non existing index in YAMLSequence".
     YAMLNode* Set(int index, YAMLNode* item);
-    /// Appends holes until `count` items are there.
+    /// Appends holes until `count` items are there. Throws "Sequence is too long" beyond kMostItems.
     void GrowTo(std::size_t count);
     /// Closes all holes; what stands behind one moves forward.
     void DropHoles();
