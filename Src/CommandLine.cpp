@@ -1,5 +1,6 @@
 #include "CommandLine.h"
 
+#include "Descriptor.h"
 #include "DiffCommand.h"
 #include "Document/YAMLScalar.h"
 #include "ErrMsg.h"
@@ -140,15 +141,13 @@ bool ParseTwoFileArgs(CommandLineArguments& arguments, int first, std::string_vi
 int RunDiff(CommandLineArguments& arguments) {
     DiffConfig config;
     if (!ParseDiffArgs(arguments, 2, config)) return 1;
-    HandleDiffCommand(config);
-    return 0;
+    return HandleDiffCommand(config);
 }
 
 int RunStrip(CommandLineArguments& arguments) {
     StripConfig config;
     if (!ParseStripArgs(arguments, 2, config)) return 1;
-    HandleStripCommand(config);
-    return 0;
+    return HandleStripCommand(config);
 }
 
 int RunMerge(CommandLineArguments& arguments) {
@@ -202,6 +201,7 @@ bool ParseStripArgs(CommandLineArguments& arguments, int first, StripConfig& con
 
 int InnerMain(CommandLineArguments& arguments) {
     initialize();
+    OutliveFileSizeLimit();
     std::vector<std::string>& args = arguments.args;
     if (args.size() < 2) {
         Refuse("Error: need 'merge' command specified");

@@ -1,7 +1,8 @@
 #include "DiffCommand.h"
 
 #include "CommandSettings.h"
-#include "OutputFile.h"
+#include "Destination.h"
+#include "DriverErrors.h"
 #include "TimerStat.h"
 #include "TwoFiles.h"
 
@@ -23,6 +24,7 @@ int HandleDiffCommand(DiffConfig& config) {
     ovrin_yaml::YAMLDiffOutput output(text, kIndentWidth);
     files.diff->Output(output);
     output.Finish();
-    WriteOutput(config.destFile, [&](std::ostream& stream) { stream << text.view(); });
-    return 0;
+    const int error =
+        Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});
+    return error ? FailToWrite(config.destFile, error) : 0;
 }

@@ -9,7 +9,6 @@
 #include <climits>
 #include <cstdlib>
 #include <fcntl.h>
-#include <fstream>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -93,10 +92,13 @@ bool FileExists(const char* path) {
     return access(path, R_OK) == 0;
 }
 
+bool IsMissing(const std::string& path) {
+    return access(path.c_str(), F_OK) != 0 && errno == ENOENT;
+}
+
 bool IsFileEmpty(const std::string& path) {
-    std::ifstream stream(path, std::ios::binary);
-    stream.seekg(0, std::ios::end);
-    return stream.tellg() == std::streampos(0);
+    struct stat status;
+    return stat(path.c_str(), &status) == 0 && status.st_size == 0;
 }
 
 std::string GetFileExtension(const std::string& path) {

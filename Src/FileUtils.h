@@ -15,7 +15,10 @@ std::string CreateTempFile();
 /// Whether the file is there and this user may read it.
 bool FileExists(const char* path);
 
-/// False also for a file that can't be opened.
+/// False for a file of which that can't be told.
+bool IsMissing(const std::string& path);
+
+/// False for a file of which that can't be told.
 bool IsFileEmpty(const std::string& path);
 
 /// What stands behind the last dot of the whole path; directories count as part of the name.

@@ -1,30 +1,20 @@
 #include "MergeCommand.h"
 
 #include "CommandSettings.h"
+#include "Destination.h"
 #include "DriverErrors.h"
-#include "ErrMsg.h"
 #include "Fallback.h"
 #include "FileUtils.h"
 #include "MergePipeline.h"
-#include "OutputFile.h"
 
 #include "Document/YAMLError.h"
 
 #include <algorithm>
 #include <exception>
-#include <iostream>
 #include <iterator>
 #include <new>
 
-std::stringstream g_DriverErrors;
-
 namespace {
-
-int Fail(const std::string& message) {
-    g_DriverErrors << message << '\n';
-    ErrMsg(g_DriverErrors);
-    return 1;
-}
 
 bool IsSmartExtension(const std::string& extension) {
     static const char* const kSmartExtensions[] = {"ovrin", "prefab", "meta", "OVR", "PRE", "MET"};
@@ -43,11 +33,16 @@ int SetupPremergePaths(MergeConfig& config) {
     return SetupPremergePath(config.premergeRightDest);
 }
 
+/// Returns `status` once the destination holds the file `source`.
+int DeliverResult(const std::string& source, const MergeConfig& config, int status) {
+    const int error = OutputResultToDestination(source, config.destFile);
+    return error ? FailToWrite(config.destFile, error) : status;
+}
+
 int MergeByTool(const MergeConfig& config, const std::string& output) {
     const int result = FallbackMergeTool(config.baseFile, config.leftFile, config.rightFile, output,
                                          config.fallbackSpecFile);
-    if (result == 0) OutputResultToDestination(output, config.destFile);
-    return result;
+    return result == 0 && !IsMissing(output) ? DeliverResult(output, config, 0) : result;
 }
 
 /// The tool takes up where the smart merge stopped: its left input is what that merged.
@@ -57,8 +52,8 @@ int HandConflictsToTool(const MergeConfig& config, const std::string& smartResul
     const std::string& base = config.premerge ? config.premergeBaseDest : config.baseFile;
     const std::string& right = config.premerge ? config.premergeRightDest : config.rightFile;
     const int result = FallbackMergeTool(base, smartResult, right, output2, config.fallbackSpecFile);
-    if (result == 0 && !IsFileEmpty(output2)) OutputResultToDestination(output2, config.destFile);
-    return result;
+    if (result != 0 || IsFileEmpty(output2) || IsMissing(output2)) return result;
+    return DeliverResult(output2, config, 0);
 }
 
 int MergeSmartly(MergeConfig& config, const std::string& output, bool useFallback) {
@@ -74,8 +69,7 @@ int MergeSmartly(MergeConfig& config, const std::string& output, bool useFallbac
     }
     if (result == 1) return 1;
     if (result != 0 && useFallback) return HandConflictsToTool(config, output);
-    OutputResultToDestination(output, config.destFile);
-    return result;
+    return DeliverResult(output, config, result);
 }
 
 } // namespace

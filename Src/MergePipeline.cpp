@@ -131,6 +131,31 @@ bool ApplyMergedChanges(TimerStat& root, const YAMLMappingDiff& merged, MergeFil
     return hasComponentDependencyConflicts;
 }
 
+/// A report that can't be written is lost without a word, but for one that shares standard output with the
+/// result. Returns errno or 0.
+int OutputConflicts(TimerStat& root, const MergeConfig& config, const RecordingConflictResolver& resolver) {
+    TimerStat timer(root, "Output conflicts");
+    const int error = WriteOutput(config.conflictFile, [&](std::ostream& stream) {
+        OutputConflictRecords(stream, resolver, config.describe);
+    });
+    return config.conflictFile.empty() && config.destFile.empty() ? error : 0;
+}
+
+int OutputResult(TimerStat& root, const std::string& path, const OvrinObjects& result) {
+    TimerStat timer(root, "Output result");
+    return WriteOutput(path, [&](std::ostream& stream) { result.Output(stream); });
+}
+
+/// Premerged files that can't be written are lost without a word where nobody is to work on them. Returns 0;
+/// 1, after a message, if a tool would.
+int PremergeForTool(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs) {
+    const PremergeErrors errors = PremergeBoth(root, config, inputs);
+    if (!config.premerge || config.fallbackSpecFile == kNoSpecFile) return 0;
+    if (errors.base) return FailToWrite(config.premergeBaseDest, errors.base);
+    if (errors.right) return FailToWrite(config.premergeRightDest, errors.right);
+    return 0;
+}
+
 } // namespace
 
 int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath) {
@@ -149,19 +174,12 @@ int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath)
     }
     const std::unique_ptr<OvrinObjects> baseClone = CloneBase(root, config, files.base);
     const bool hasComponentDependencyConflicts = ApplyMergedChanges(root, *merged, files, resolver);
-    {
-        TimerStat timer(root, "Output conflicts");
-        WriteOutput(config.conflictFile,
-                    [&](std::ostream& stream) { OutputConflictRecords(stream, resolver, config.describe); });
-    }
-    {
-        TimerStat timer(root, "Output result");
-        WriteOutput(outputPath, [&](std::ostream& stream) { files.base.Output(stream); });
-    }
+    if (const int error = OutputConflicts(root, config, resolver)) return FailToWrite({}, error);
+    if (const int error = OutputResult(root, outputPath, files.base)) return FailToWrite(outputPath, error);
     if (!resolver.HasPendingConflicts()) return 0;
-    if (baseClone)
-        PremergeBoth(
-            root, config,
-            {*baseClone, files.left.GetMapping(), files.right.GetMapping(), diffs.left, diffs.right});
+    if (baseClone && PremergeForTool(root, config,
+                                     {*baseClone, files.left.GetMapping(), files.right.GetMapping(),
+                                      diffs.left, diffs.right}) != 0)
+        return 1;
     return hasComponentDependencyConflicts ? 3 : 2;
 }

@@ -1,31 +1,33 @@
 #include "OutputFile.h"
 
+#include "Descriptor.h"
 #include "FileUtils.h"
 
-#include <fstream>
+#include <cerrno>
+#include <fcntl.h>
 #include <iostream>
-#include <vector>
+#include <unistd.h>
+#include <utility>
 
-void WriteOutput(const std::string& path, const std::function<void(std::ostream&)>& write) {
-    if (path.empty()) {
-        write(std::cout);
-        std::cout.flush();
-        return;
-    }
-    std::ofstream file(OvrinToNativePath(path), std::ios::binary | std::ios::trunc);
-    write(file);
+namespace {
+
+Descriptor OpenOutput(const std::string& path) {
+    if (!path.empty()) return OpenFile(OvrinToNativePath(path).c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0666);
+    std::cout.flush(); // what was printed so far stands before
+    return Duplicate(STDOUT_FILENO);
 }
 
-void OutputResultToDestination(const std::string& source, const std::string& dest) {
-    std::filebuf input;
-    if (!input.open(OvrinToNativePath(source), std::ios::in | std::ios::binary)) return;
-    WriteOutput(dest, [&](std::ostream& stream) {
-        std::vector<char> piece(std::size_t{1} << 20);
-        for (;;) {
-            const std::streamsize count =
-                input.sgetn(piece.data(), static_cast<std::streamsize>(piece.size()));
-            if (count <= 0) break;
-            stream.write(piece.data(), count);
-        }
-    });
+} // namespace
+
+int WriteOutput(const std::string& path, const OutputWriter& write) {
+    Descriptor file = OpenOutput(path);
+    return file.IsOpen() ? WriteAndClose(std::move(file), write) : errno;
+}
+
+int WriteAndClose(Descriptor file, const OutputWriter& write) {
+    OutputStream stream(file.Get());
+    write(stream);
+    const int error = stream.Finish();
+    const int closeError = file.Close();
+    return error ? error : closeError;
 }

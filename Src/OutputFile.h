@@ -1,12 +1,18 @@
 #pragma once
 
+#include "OutputStream.h"
+
 #include <functional>
-#include <iosfwd>
 #include <string>
 
-/// Lets `write` fill the file at `path`, which is truncated, or standard output where the path is empty. The
-/// state of the stream is not looked at: what can't be written is lost.
-void WriteOutput(const std::string& path, const std::function<void(std::ostream&)>& write);
+class Descriptor;
 
-/// Copies the file `source` to `dest`, or to standard output where that is empty. Failures are not looked at.
-void OutputResultToDestination(const std::string& source, const std::string& dest);
+/// Fills a file.
+using OutputWriter = std::function<void(OutputStream&)>;
+
+/// Lets `write` fill the file at `path`, which is truncated, or standard output where the path is empty.
+/// Returns 0 when all is written to the last byte, the errno of the first failure otherwise.
+int WriteOutput(const std::string& path, const OutputWriter& write);
+
+/// The same for an open file, which is closed.
+int WriteAndClose(Descriptor file, const OutputWriter& write);

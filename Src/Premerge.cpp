@@ -16,8 +16,9 @@ using namespace ovrin_yaml;
 
 namespace {
 
-void Premerge(MergeResolve resolve, TimerStat& parent, const std::string& path, OvrinObjects& objects,
-              const PremergeInputs& inputs) {
+/// Returns the errno of what can't be written, or 0.
+int Premerge(MergeResolve resolve, TimerStat& parent, const std::string& path, OvrinObjects& objects,
+             const PremergeInputs& inputs) {
     TimerStat timer(parent, "Premerge " + path);
     RecordingConflictResolver resolver(resolve);
     const YAMLMappingDiff* merged = nullptr;
@@ -31,29 +32,33 @@ void Premerge(MergeResolve resolve, TimerStat& parent, const std::string& path, 
         PostProcessMergeOnly(objects.GetMapping(), inputs.left, inputs.right, resolver);
     }
     TimerStat outputTimer(timer, "Output premerge result");
-    WriteOutput(path, [&](std::ostream& stream) { objects.Output(stream); });
+    return WriteOutput(path, [&](std::ostream& stream) { objects.Output(stream); });
 }
 
 Thread SpawnPremergeThread(MergeResolve resolve, const std::string& path, OvrinObjects& objects,
-                           const PremergeInputs& inputs) {
-    return Thread([=, &path, &objects, &inputs] {
+                           const PremergeInputs& inputs, int& error) {
+    return Thread([=, &path, &objects, &inputs, &error] {
         // Standard output may be the main thread's: the timers of a pass hang under a silent root.
         TimerStat root("Premerge", nullptr);
-        Premerge(resolve, root, path, objects, inputs);
+        error = Premerge(resolve, root, path, objects, inputs);
     });
 }
 
 } // namespace
 
-void PremergeBoth(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs) {
+PremergeErrors PremergeBoth(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs) {
     const std::unique_ptr<OvrinObjects> secondClone(inputs.base.Clone());
     // The name announces the clone, but the line stands for nothing: it is part of the listing.
     { TimerStat timer(root, "Clone base roots"); }
     const MergeResolve baseResolve = MergeRules::CheckBlankPremergeBaseEnabled() ? ResolveBlank : ResolveBase;
-    Thread baseThread = SpawnPremergeThread(baseResolve, config.premergeBaseDest, *secondClone, inputs);
-    Thread rightThread = SpawnPremergeThread(ResolveRight, config.premergeRightDest, inputs.base, inputs);
+    PremergeErrors errors;
+    Thread baseThread =
+        SpawnPremergeThread(baseResolve, config.premergeBaseDest, *secondClone, inputs, errors.base);
+    Thread rightThread =
+        SpawnPremergeThread(ResolveRight, config.premergeRightDest, inputs.base, inputs, errors.right);
     baseThread.Join();
     rightThread.Join();
     baseThread.CheckForExceptions();
     rightThread.CheckForExceptions();
+    return errors;
 }

@@ -1,7 +1,8 @@
 #include "StripCommand.h"
 
 #include "CommandSettings.h"
-#include "OutputFile.h"
+#include "Destination.h"
+#include "DriverErrors.h"
 #include "TimerStat.h"
 #include "TwoFiles.h"
 
@@ -45,6 +46,7 @@ int HandleStripCommand(StripConfig& config) {
     // command.
     std::ostringstream text;
     files.right.Output(text);
-    WriteOutput(config.destFile, [&](std::ostream& stream) { stream << text.view(); });
-    return 0;
+    const int error =
+        Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});
+    return error ? FailToWrite(config.destFile, error) : 0;
 }

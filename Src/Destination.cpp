@@ -1,0 +1,161 @@
+#include "Destination.h"
+
+#include "Descriptor.h"
+#include "FileUtils.h"
+#include "NewFile.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <fcntl.h>
+#include <filesystem>
+#include <sys/stat.h>
+#include <system_error>
+#include <unistd.h>
+#include <utility>
+#include <vector>
+
+namespace fs = std::filesystem;
+
+namespace {
+
+bool IsSameFile(const struct stat& left, const struct stat& right) {
+    return left.st_dev == right.st_dev && left.st_ino == right.st_ino;
+}
+
+/// Who holds the other end of a standard stream knows the file and not its name.
+bool IsStandardStream(const struct stat& file) {
+    struct stat stream;
+    return std::ranges::any_of(std::initializer_list<int>{STDOUT_FILENO, STDERR_FILENO}, [&](int number) {
+        return fstat(number, &stream) == 0 && IsSameFile(file, stream);
+    });
+}
+
+/// Replaces `path` by what its links lead to, which need not exist. Returns errno or 0.
+int FollowLinks(fs::path& path) {
+    constexpr int kMostLinks = 40; // as the system has it
+    for (int i = 0; i < kMostLinks; ++i) {
+        std::error_code error;
+        const fs::path target = fs::read_symlink(path, error);
+        if (error) return error.value() == EINVAL || error.value() == ENOENT ? 0 : error.value();
+        path = path.parent_path() / target;
+    }
+    return ELOOP;
+}
+
+/// Whether the failure says that a file may not be replaced, which isn't to say that it may not be written.
+bool IsRefusal(int error) {
+    return error == EACCES || error == EPERM || error == EROFS || error == EBUSY || error == EXDEV;
+}
+
+/// Makes the file, resembling `old` unless that is null.
+int Make(NewFile& file, const struct stat* old, const Content& content) {
+    const int error = old ? file.Resemble(*old) : 0;
+    return error ? error : file.Fill(content.write);
+}
+
+/// Puts a whole new file at `place`. `old` is what stands there, null for nothing. Without a name in the
+/// folder while it is being written, if that can be had.
+int PutNewFile(const fs::path& place, const struct stat* old, const Content& content) {
+    const mode_t mode = old ? 0600 : 0666;
+    NewFile unnamed(place);
+    if (unnamed.OpenUnnamed(mode) == 0) {
+        if (const int error = Make(unnamed, old, content)) return error;
+        if (unnamed.TakeName() == 0) return unnamed.TakePlace();
+    }
+    NewFile named(place);
+    if (const int error = named.OpenNamed(mode)) return error;
+    if (const int error = Make(named, old, content)) return error;
+    return named.TakePlace();
+}
+
+int Create(const std::string& path, const Content& content) {
+    fs::path place = path;
+    const int error = FollowLinks(place);
+    return error ? error : PutNewFile(place, nullptr, content);
+}
+
+/// EPERM for a file that must keep its identity.
+int Replace(const std::string& path, const struct stat& old, const Content& content) {
+    if (old.st_nlink != 1 || IsStandardStream(old)) return EPERM;
+    fs::path place = path;
+    if (const int error = FollowLinks(place)) return error;
+    struct stat found;
+    if (lstat(place.c_str(), &found) != 0) return errno;
+    return IsSameFile(old, found) ? PutNewFile(place, &old, content) : EPERM;
+}
+
+/// Asks for the space where the file system can tell beforehand. Returns errno or 0.
+int Reserve(const Descriptor& file, std::uint64_t size) {
+    if (size == 0) return 0;
+    const auto reserve = [&] {
+        return fallocate(file.Get(), FALLOC_FL_KEEP_SIZE, 0, static_cast<off_t>(size));
+    };
+    return Uninterrupted(reserve) == 0 || errno == EOPNOTSUPP || errno == ENOSYS ? 0 : errno;
+}
+
+int WriteFromStart(const Descriptor& file, const OutputWriter& write) {
+    OutputStream stream(file.Get());
+    write(stream);
+    if (const int error = stream.Finish()) return error;
+    const off_t end = lseek(file.Get(), 0, SEEK_CUR);
+    if (end < 0) return errno;
+    const int error = SetSize(file.Get(), end);
+    return error ? error : Sync(file.Get());
+}
+
+/// As far as the system lets it.
+void PutBack(const Descriptor& file, const std::string& bytes) {
+    if (lseek(file.Get(), 0, SEEK_SET) == 0) WriteFully(file.Get(), bytes.data(), bytes.size());
+    SetSize(file.Get(), static_cast<off_t>(bytes.size()));
+}
+
+/// Writes through a second descriptor, whose end tells what closing tells while there is still one to put the
+/// old bytes back.
+int Overwrite(const Descriptor& file, const std::string& path, const Content& content) {
+    std::string old;
+    errno = 0;
+    if (ReadWholeFile(path, old) != ReadResult::Complete) return errno ? errno : EIO;
+    Descriptor second = Duplicate(file.Get());
+    if (!second.IsOpen()) return errno;
+    int error = Reserve(file, content.size);
+    if (error == 0) error = WriteFromStart(second, content.write);
+    const int closeError = second.Close();
+    if (error == 0) error = closeError;
+    if (error != 0) PutBack(file, old);
+    return error;
+}
+
+void Copy(const Descriptor& source, OutputStream& stream) {
+    std::vector<char> piece(std::size_t{1} << 20);
+    off_t position = 0;
+    while (stream) {
+        const ssize_t count =
+            Uninterrupted([&] { return pread(source.Get(), piece.data(), piece.size(), position); });
+        if (count < 0) stream.Fail(errno);
+        if (count <= 0) return;
+        stream.write(piece.data(), count);
+        position += count;
+    }
+}
+
+} // namespace
+
+int Deliver(const std::string& path, const Content& content) {
+    if (path.empty()) return WriteOutput(path, content.write);
+    const std::string nativePath = OvrinToNativePath(path);
+    Descriptor file = OpenFile(nativePath.c_str(), O_WRONLY);
+    if (!file.IsOpen()) return errno == ENOENT ? Create(nativePath, content) : errno;
+    struct stat status;
+    if (fstat(file.Get(), &status) != 0) return errno;
+    if (!S_ISREG(status.st_mode)) return WriteAndClose(std::move(file), content.write);
+    const int error = Replace(nativePath, status, content);
+    return IsRefusal(error) ? Overwrite(file, nativePath, content) : error;
+}
+
+int OutputResultToDestination(const std::string& source, const std::string& dest) {
+    const Descriptor file = OpenFile(OvrinToNativePath(source).c_str(), O_RDONLY);
+    struct stat status;
+    if (!file.IsOpen() || fstat(file.Get(), &status) != 0) return errno;
+    return Deliver(dest, {static_cast<std::uint64_t>(status.st_size),
+                          [&](OutputStream& stream) { Copy(file, stream); }});
+}

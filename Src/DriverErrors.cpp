@@ -1,0 +1,17 @@
+#include "DriverErrors.h"
+
+#include "ErrMsg.h"
+
+#include <cstring>
+
+std::stringstream g_DriverErrors;
+
+int Fail(const std::string& message) {
+    g_DriverErrors << message << '\n';
+    ErrMsg(g_DriverErrors);
+    return 1;
+}
+
+int FailToWrite(const std::string& path, int error) {
+    return Fail("Cannot write '" + (path.empty() ? "-" : path) + "': " + std::strerror(error));
+}

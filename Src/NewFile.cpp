@@ -1,0 +1,82 @@
+#include "NewFile.h"
+
+#include <cerrno>
+#include <cstdio>
+#include <fcntl.h>
+#include <unistd.h>
+
+namespace {
+
+std::string FolderOf(const std::filesystem::path& place) {
+    const std::filesystem::path folder = place.parent_path();
+    return folder.empty() ? "." : folder.string();
+}
+
+/// The way to a file without a name.
+std::string LinkOf(const Descriptor& file) {
+    return "/proc/self/fd/" + std::to_string(file.Get());
+}
+
+} // namespace
+
+NewFile::~NewFile() {
+    if (!m_Name.empty()) unlink(m_Name.c_str());
+}
+
+/// Tries hidden names until `take` succeeds. Another process of this number, on another machine or in the
+/// past, may have left some behind.
+template <class Take> int NewFile::FindName(const Take& take) {
+    constexpr int kAttempts = 100;
+    const std::string start = FolderOf(m_Place) + "/.ovrinmerge-" + std::to_string(getpid()) + '-';
+    for (int attempt = 0; attempt < kAttempts; ++attempt) {
+        const std::string name = start + std::to_string(attempt);
+        if (take(name.c_str())) {
+            m_Name = name;
+            return 0;
+        }
+        if (errno != EEXIST) return errno;
+    }
+    return EEXIST;
+}
+
+/// The link serves TakeName later: it is missing where /proc is.
+int NewFile::OpenUnnamed(mode_t mode) {
+    m_File = OpenFile(FolderOf(m_Place).c_str(), O_TMPFILE | O_WRONLY, mode);
+    return m_File.IsOpen() && access(LinkOf(m_File).c_str(), F_OK) == 0 ? 0 : errno;
+}
+
+int NewFile::OpenNamed(mode_t mode) {
+    return FindName([&](const char* name) {
+        m_File = OpenFile(name, O_WRONLY | O_CREAT | O_EXCL, mode);
+        return m_File.IsOpen();
+    });
+}
+
+/// The owner comes first: who may read is opened last.
+int NewFile::Resemble(const struct stat& other) {
+    if (fchown(m_File.Get(), other.st_uid, other.st_gid) != 0 &&
+        fchown(m_File.Get(), -1, other.st_gid) != 0 && errno != EPERM && errno != EINVAL)
+        return errno;
+    return fchmod(m_File.Get(), other.st_mode & 0777) == 0 ? 0 : errno;
+}
+
+int NewFile::Fill(const OutputWriter& write) {
+    OutputStream stream(m_File.Get());
+    write(stream);
+    const int error = stream.Finish();
+    return error ? error : Sync(m_File.Get());
+}
+
+int NewFile::TakeName() {
+    const std::string link = LinkOf(m_File);
+    return FindName([&](const char* name) {
+        return linkat(AT_FDCWD, link.c_str(), AT_FDCWD, name, AT_SYMLINK_FOLLOW) == 0;
+    });
+}
+
+int NewFile::TakePlace() {
+    if (const int error = m_File.Close()) return error;
+    if (rename(m_Name.c_str(), m_Place.c_str()) != 0) return errno;
+    m_Name.clear();
+    return 0;
+}
