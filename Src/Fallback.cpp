@@ -12,6 +12,7 @@
 #include <iostream>
 #include <iterator>
 #include <optional>
+#include <sys/wait.h>
 #include <utility>
 
 namespace {
@@ -129,13 +130,20 @@ const FallbackCommandEntry* FindExistingTool(const FallbackCommandMap& fallbacks
     return nullptr;
 }
 
+/// Where no process is to be had, some C libraries give the status of a missing shell instead of -1.
+bool IsWithoutProcess(int status, int error) {
+    constexpr int kNoShell = 127;
+    return WIFEXITED(status) && WEXITSTATUS(status) == kNoShell && (error == EAGAIN || error == ENOMEM);
+}
+
 /// Runs the tool and gives the shell call's status as it is.
 int RunTool(const std::string& path, const std::string& arguments) {
     const std::string command = '"' + path + "\" " + arguments;
     std::cout.flush(); // what was printed so far stands before what the tool prints
     errno = 0;
-    const int status = std::system(command.c_str());
+    int status = std::system(command.c_str());
     const int error = errno;
+    if (IsWithoutProcess(status, error)) status = -1;
     if (status == -1 || (status == 0 && error == ENOENT)) {
         errs << "Could not start fallback merge command '" << path << "' code " << status << ' '
              << std::strerror(error) << '\n';
