@@ -6,15 +6,13 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <climits>
 #include <fcntl.h>
-#include <filesystem>
+#include <initializer_list>
+#include <memory>
 #include <sys/stat.h>
-#include <system_error>
 #include <unistd.h>
 #include <utility>
-#include <vector>
-
-namespace fs = std::filesystem;
 
 namespace {
 
@@ -22,22 +20,24 @@ bool IsSameFile(const struct stat& left, const struct stat& right) {
     return left.st_dev == right.st_dev && left.st_ino == right.st_ino;
 }
 
-/// Who holds the other end of a standard stream knows the file and not its name.
-bool IsStandardStream(const struct stat& file) {
+/// Who holds the other end of a standard stream knows the file and not its name. Where a stream was closed,
+/// its number may be that of `file`, which says nothing.
+bool IsStandardStream(const Descriptor& file, const struct stat& status) {
     struct stat stream;
     return std::ranges::any_of(std::initializer_list<int>{STDOUT_FILENO, STDERR_FILENO}, [&](int number) {
-        return fstat(number, &stream) == 0 && IsSameFile(file, stream);
+        return number != file.Get() && fstat(number, &stream) == 0 && IsSameFile(status, stream);
     });
 }
 
 /// Replaces `path` by what its links lead to, which need not exist. Returns errno or 0.
-int FollowLinks(fs::path& path) {
+int FollowLinks(std::string& path) {
     constexpr int kMostLinks = 40; // as the system has it
+    char target[PATH_MAX];
     for (int i = 0; i < kMostLinks; ++i) {
-        std::error_code error;
-        const fs::path target = fs::read_symlink(path, error);
-        if (error) return error.value() == EINVAL || error.value() == ENOENT ? 0 : error.value();
-        path = path.parent_path() / target;
+        const ssize_t length = readlink(path.c_str(), target, sizeof(target));
+        if (length < 0) return errno == EINVAL || errno == ENOENT ? 0 : errno;
+        const std::string link(target, static_cast<std::size_t>(length));
+        path = link.starts_with('/') ? link : GetFolder(path) + link;
     }
     return ELOOP;
 }
@@ -53,31 +53,30 @@ int Make(NewFile& file, const struct stat* old, const Content& content) {
     return error ? error : file.Fill(content.write);
 }
 
-/// Puts a whole new file at `place`. `old` is what stands there, null for nothing. Without a name in the
-/// folder while it is being written, if that can be had.
-int PutNewFile(const fs::path& place, const struct stat* old, const Content& content) {
+/// Puts a whole new file at `place`. `old` is what stands there, null for nothing. The file has no name in
+/// the folder while it is being written, if that can be had.
+int PutNewFile(const std::string& place, const struct stat* old, const Content& content) {
     const mode_t mode = old ? 0600 : 0666;
-    NewFile unnamed(place);
-    if (unnamed.OpenUnnamed(mode) == 0) {
-        if (const int error = Make(unnamed, old, content)) return error;
-        if (unnamed.TakeName() == 0) return unnamed.TakePlace();
+    if (NewFile file(place); file.OpenUnnamed(mode) == 0) {
+        if (const int error = Make(file, old, content)) return error;
+        if (file.TakeName() == 0) return file.TakePlace();
     }
-    NewFile named(place);
-    if (const int error = named.OpenNamed(mode)) return error;
-    if (const int error = Make(named, old, content)) return error;
-    return named.TakePlace();
+    NewFile file(place);
+    if (const int error = file.OpenNamed(mode)) return error;
+    if (const int error = Make(file, old, content)) return error;
+    return file.TakePlace();
 }
 
 int Create(const std::string& path, const Content& content) {
-    fs::path place = path;
+    std::string place = path;
     const int error = FollowLinks(place);
     return error ? error : PutNewFile(place, nullptr, content);
 }
 
-/// EPERM for a file that must keep its identity.
-int Replace(const std::string& path, const struct stat& old, const Content& content) {
-    if (old.st_nlink != 1 || IsStandardStream(old)) return EPERM;
-    fs::path place = path;
+/// Replaces `file`, which stands at `path`. EPERM where it must keep its identity.
+int Replace(const Descriptor& file, const std::string& path, const struct stat& old, const Content& content) {
+    if (old.st_nlink != 1 || IsStandardStream(file, old)) return EPERM;
+    std::string place = path;
     if (const int error = FollowLinks(place)) return error;
     struct stat found;
     if (lstat(place.c_str(), &found) != 0) return errno;
@@ -126,14 +125,15 @@ int Overwrite(const Descriptor& file, const std::string& path, const Content& co
 }
 
 void Copy(const Descriptor& source, OutputStream& stream) {
-    std::vector<char> piece(std::size_t{1} << 20);
+    constexpr std::size_t kPieceSize = std::size_t{1} << 20;
+    const auto piece = std::make_unique_for_overwrite<char[]>(kPieceSize);
     off_t position = 0;
     while (stream) {
         const ssize_t count =
-            Uninterrupted([&] { return pread(source.Get(), piece.data(), piece.size(), position); });
+            Uninterrupted([&] { return pread(source.Get(), piece.get(), kPieceSize, position); });
         if (count < 0) stream.Fail(errno);
         if (count <= 0) return;
-        stream.write(piece.data(), count);
+        stream.write(piece.get(), count);
         position += count;
     }
 }
@@ -148,7 +148,7 @@ int Deliver(const std::string& path, const Content& content) {
     struct stat status;
     if (fstat(file.Get(), &status) != 0) return errno;
     if (!S_ISREG(status.st_mode)) return WriteAndClose(std::move(file), content.write);
-    const int error = Replace(nativePath, status, content);
+    const int error = Replace(file, nativePath, status, content);
     return IsRefusal(error) ? Overwrite(file, nativePath, content) : error;
 }
 

@@ -106,6 +106,11 @@ std::string GetFileExtension(const std::string& path) {
     return dot == std::string::npos ? std::string() : path.substr(dot + 1);
 }
 
+std::string GetFolder(const std::string& path) {
+    const std::size_t separator = path.rfind('/');
+    return separator == std::string::npos ? "./" : path.substr(0, separator + 1);
+}
+
 std::string GetDataFilesDir() {
     char buffer[PATH_MAX];
     const std::string path = realpath("/proc/self/exe", buffer) ? buffer : "";

@@ -24,6 +24,9 @@ bool IsFileEmpty(const std::string& path);
 /// What stands behind the last dot of the whole path; directories count as part of the name.
 std::string GetFileExtension(const std::string& path);
 
+/// The folder of a path, with its separator at the end.
+std::string GetFolder(const std::string& path);
+
 /// The directory of the executable, which holds the data files, with its separator at the end. Empty, and
 /// reported, where it can't be found.
 std::string GetDataFilesDir();

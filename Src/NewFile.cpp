@@ -1,16 +1,13 @@
 #include "NewFile.h"
 
+#include "FileUtils.h"
+
 #include <cerrno>
-#include <cstdio>
+#include <cstdio> // rename
 #include <fcntl.h>
 #include <unistd.h>
 
 namespace {
-
-std::string FolderOf(const std::filesystem::path& place) {
-    const std::filesystem::path folder = place.parent_path();
-    return folder.empty() ? "." : folder.string();
-}
 
 /// The way to a file without a name.
 std::string LinkOf(const Descriptor& file) {
@@ -27,7 +24,7 @@ NewFile::~NewFile() {
 /// past, may have left some behind.
 template <class Take> int NewFile::FindName(const Take& take) {
     constexpr int kAttempts = 100;
-    const std::string start = FolderOf(m_Place) + "/.ovrinmerge-" + std::to_string(getpid()) + '-';
+    const std::string start = GetFolder(m_Place) + ".ovrinmerge-" + std::to_string(getpid()) + '-';
     for (int attempt = 0; attempt < kAttempts; ++attempt) {
         const std::string name = start + std::to_string(attempt);
         if (take(name.c_str())) {
@@ -41,7 +38,7 @@ template <class Take> int NewFile::FindName(const Take& take) {
 
 /// The link serves TakeName later: it is missing where /proc is.
 int NewFile::OpenUnnamed(mode_t mode) {
-    m_File = OpenFile(FolderOf(m_Place).c_str(), O_TMPFILE | O_WRONLY, mode);
+    m_File = OpenFile(GetFolder(m_Place).c_str(), O_TMPFILE | O_WRONLY, mode);
     return m_File.IsOpen() && access(LinkOf(m_File).c_str(), F_OK) == 0 ? 0 : errno;
 }
 

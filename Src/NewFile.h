@@ -3,7 +3,6 @@
 #include "Descriptor.h"
 #include "OutputFile.h"
 
-#include <filesystem>
 #include <string>
 #include <sys/stat.h>
 
@@ -12,7 +11,7 @@
 /// All functions return errno or 0; the first failure ends the use of the object.
 class NewFile {
 public:
-    explicit NewFile(const std::filesystem::path& place) : m_Place(place) {}
+    explicit NewFile(const std::string& place) : m_Place(place) {}
     NewFile(const NewFile&) = delete;
     NewFile& operator=(const NewFile&) = delete;
     ~NewFile();
@@ -31,7 +30,7 @@ public:
 private:
     template <class Take> int FindName(const Take& take);
 
-    const std::filesystem::path m_Place;
+    const std::string m_Place;
     Descriptor m_File;
     std::string m_Name; // empty if there is none
 };

@@ -2,6 +2,12 @@
 
 #include "Descriptor.h"
 
+namespace {
+
+constexpr std::size_t kBufferSize = std::size_t{64} * 1024;
+
+} // namespace
+
 OutputStream::OutputStream(int descriptor) : std::ostream(nullptr), m_Buffer(descriptor) {
     rdbuf(&m_Buffer);
 }
@@ -16,8 +22,9 @@ int OutputStream::Finish() {
     return m_Buffer.error;
 }
 
-OutputStream::Buffer::Buffer(int descriptor) : m_Descriptor(descriptor), m_Pending(std::size_t{64} * 1024) {
-    setp(m_Pending.data(), m_Pending.data() + m_Pending.size());
+OutputStream::Buffer::Buffer(int descriptor)
+    : m_Descriptor(descriptor), m_Pending(std::make_unique_for_overwrite<char[]>(kBufferSize)) {
+    setp(m_Pending.get(), m_Pending.get() + kBufferSize);
 }
 
 OutputStream::Buffer::int_type OutputStream::Buffer::overflow(int_type character) {
@@ -36,7 +43,7 @@ std::streamsize OutputStream::Buffer::xsputn(const char* text, std::streamsize l
 
 bool OutputStream::Buffer::WritePending() {
     const bool isWritten = Write(pbase(), static_cast<std::size_t>(pptr() - pbase()));
-    setp(m_Pending.data(), m_Pending.data() + m_Pending.size());
+    setp(m_Pending.get(), m_Pending.get() + kBufferSize);
     return isWritten;
 }
 

@@ -1,9 +1,9 @@
 #pragma once
 
 #include <cstddef>
+#include <memory>
 #include <ostream>
 #include <streambuf>
-#include <vector>
 
 /// A stream into a descriptor that can tell why it failed. Only `Finish` promises that what was inserted is
 /// written: a flush does nothing, so that a text of many lines takes few system calls.
@@ -33,7 +33,7 @@ private:
         bool Write(const char* text, std::size_t length);
 
         const int m_Descriptor;
-        std::vector<char> m_Pending;
+        const std::unique_ptr<char[]> m_Pending;
     };
 
     Buffer m_Buffer;
