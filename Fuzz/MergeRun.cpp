@@ -3,6 +3,7 @@
 #include "TreeComparison.h"
 
 #include "Diff/YAMLMappingDiff.h"
+#include "Document/CheckTree.h"
 #include "Merge/ConflictReport.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Repair/FileIDCollisions.h"
@@ -25,6 +26,27 @@ template <class Write> std::string Written(const Write& write) {
     return stream.str();
 }
 
+/// What a broken invariant is told by.
+class BrokenTree final : public std::exception {
+public:
+    explicit BrokenTree(std::string fault) : m_Fault(std::move(fault)) {}
+    const char* what() const noexcept override { return m_Fault.c_str(); }
+
+private:
+    std::string m_Fault;
+};
+
+void Check(const char* when, const OvrinObjects& objects, TreeStage stage) {
+    const std::string fault = CheckTree(objects.GetMapping(), stage);
+    if (!fault.empty()) throw BrokenTree(std::string(when) + ": " + fault);
+}
+
+void CheckAll(const char* when, const MergeFiles& files, TreeStage baseStage) {
+    Check(when, files.base, baseStage);
+    Check(when, files.left, TreeStage::Hashed);
+    Check(when, files.right, TreeStage::Hashed);
+}
+
 struct MergeDiffs {
     const YAMLMappingDiff* left;
     const YAMLMappingDiff* right;
@@ -34,17 +56,23 @@ struct MergeDiffs {
 MergeDiffs Prepare(MergeFiles& files) {
     YAMLMapping &base = files.base.GetMapping(), &left = files.left.GetMapping(),
                 &right = files.right.GetMapping();
+    CheckAll("read", files, TreeStage::Hashed);
     for (YAMLMapping* root : {&base, &left, &right}) PreProcess(*root);
     RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
+    CheckAll("prepared", files, TreeStage::Hashed);
     return {YAMLMappingDiff::Diff(&base, &left), YAMLMappingDiff::Diff(&base, &right)};
 }
 
 void Merge(MergeFiles& files, const MergeDiffs& diffs, MergeOutcome& outcome) {
     RecordingConflictResolver resolver(ResolveBase);
-    YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver)->Apply(files.base.GetMapping());
+    const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver);
+    CheckAll("merged", files, TreeStage::Hashed);
+    merged->Apply(files.base.GetMapping());
+    CheckAll("applied", files, TreeStage::Changed);
     bool hasBrokenDependencies = false;
     PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), resolver,
                 hasBrokenDependencies);
+    CheckAll("repaired", files, TreeStage::Changed);
     outcome.report = Written([&](std::ostream& stream) { OutputConflictRecords(stream, resolver, true); }) +
                      (hasBrokenDependencies ? "broken dependencies" : "");
     outcome.result = Written([&](std::ostream& stream) { files.base.Output(stream); });
@@ -54,7 +82,9 @@ std::string Premerge(MergeResolve resolve, OvrinObjects& base, const MergeFiles&
                      const MergeDiffs& diffs) {
     RecordingConflictResolver resolver(resolve);
     YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver)->Apply(base.GetMapping());
+    Check("premerge applied", base, TreeStage::Changed);
     PostProcessMergeOnly(base.GetMapping(), sides.left.GetMapping(), sides.right.GetMapping(), resolver);
+    Check("premerge repaired", base, TreeStage::Changed);
     return Written([&](std::ostream& stream) { base.Output(stream); });
 }
 
@@ -92,6 +122,8 @@ MergeOutcome RunMerge(const std::function<void(MergeFiles&)>& read, PremergeFrom
         outcome.failure = error.what();
     } catch (const YAMLError* error) { // of a cycle that can't be broken
         outcome.failure = "cycle: " + error->what();
+    } catch (const BrokenTree& fault) {
+        outcome.brokenTree = fault.what();
     } catch (const std::exception& error) {
         outcome.failure = std::string("exception: ") + error.what();
     }
@@ -99,6 +131,8 @@ MergeOutcome RunMerge(const std::function<void(MergeFiles&)>& read, PremergeFrom
 }
 
 std::string CompareOutcomes(const MergeOutcome& expected, const MergeOutcome& actual) {
+    if (!actual.brokenTree.empty()) return actual.brokenTree;
+    if (!expected.brokenTree.empty()) return expected.brokenTree;
     const auto compare = [](const char* what, const std::string& left, const std::string& right) {
         return left == right ? "" : std::string(what) + ":\n" + left + "\nand\n" + right + "\n";
     };

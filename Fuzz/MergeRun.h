@@ -16,8 +16,9 @@ struct MergeFiles {
 
 /// All that a merge gives.
 struct MergeOutcome {
-    std::string failure; // "none", or what was thrown
-    std::string report;  // with the decisions that were no conflicts
+    std::string failure;    // "none", or what was thrown
+    std::string brokenTree; // the first fault of CheckTree, and after which stage; empty if there was none
+    std::string report;     // with the decisions that were no conflicts
     std::string result;
     std::array<std::string, 2> premerged; // with blanks and with the right side's values at conflicts
     std::shared_ptr<MergeFiles> files;    // as they are at the end

@@ -2,6 +2,7 @@
 
 #include "TreeComparison.h"
 
+#include "Document/CheckTree.h"
 #include "Document/ObjectFileReader.h"
 #include "Document/YAMLScalar.h"
 #include "Document/YAMLSequence.h"
@@ -82,21 +83,12 @@ std::uint8_t PlainTraits(const YAMLMapping& object) {
     return static_cast<std::uint8_t>(traits);
 }
 
-/// The source bytes and the traits of the objects.
-std::string CheckNotes(const YAMLMapping& root) {
+std::string CheckTraits(const YAMLMapping& root) {
     for (const YAMLMapping::Entry entry : root.RawEntries()) {
         const YAMLMapping& object = *AsMapping(entry.value);
         const std::string id(entry.key->Value());
-        if (object.m_Traits && object.m_Traits != PlainTraits(object))
-            return "traits of " + id + ": " + std::to_string(object.m_Traits);
-        if (object.Source().empty()) continue;
-        OvrinObjects alone;
-        alone.GetMapping().Append(entry.key, object.Clone());
-        std::ostringstream stream;
-        alone.Output(stream);
-        const std::string written = stream.str();
-        if (written.substr(written.find("---")) != object.Source())
-            return "source of " + id + ":\n" + std::string(object.Source()) + "written:\n" + written;
+        if (object.TraitsAsRead() && object.TraitsAsRead() != PlainTraits(object))
+            return "traits of " + id + ": " + std::to_string(object.TraitsAsRead());
     }
     return "";
 }
@@ -113,8 +105,11 @@ std::string CheckReader(std::string_view file) {
     if (fast.failure != plain.failure) return "failures: '" + fast.failure + "' and '" + plain.failure + "'";
     const std::string difference = FirstDifference(fast.objects.GetMapping(), plain.objects.GetMapping());
     if (!difference.empty()) return "trees:" + difference;
-    const std::string notes = CheckNotes(fast.objects.GetMapping());
-    if (!notes.empty()) return notes;
+    for (const ReadFile* file : {&fast, &plain}) {
+        const YAMLMapping& root = file->objects.GetMapping();
+        const std::string fault = CheckTree(root, TreeStage::Hashed) + CheckTraits(root);
+        if (!fault.empty()) return fault;
+    }
     return fast.Written() == plain.Written() ? "" : "written:\n" + fast.Written() + "and\n" + plain.Written();
 }
 

@@ -1,7 +1,10 @@
 #include "Support/Documents.h"
 
+#include "Document/CheckTree.h"
 #include "Document/DocumentLoader.h"
 #include "Document/ObjectFileReader.h"
+
+#include <gtest/gtest.h>
 
 #include <sstream>
 
@@ -76,6 +79,7 @@ std::string ObjectText(const std::string& documents) {
 }
 
 std::string Written(const OvrinObjects& objects) {
+    EXPECT_EQ(CheckTree(objects.GetMapping(), TreeStage::Changed), "");
     std::ostringstream stream;
     objects.Output(stream);
     return stream.str();
@@ -89,6 +93,7 @@ std::string ReadError(const std::string& text) {
 std::string ReadAndWrite(const std::string& text) {
     OvrinObjects objects;
     ParseYAMLFile(text, objects);
+    EXPECT_EQ(CheckTree(objects.GetMapping(), TreeStage::Hashed), "");
     return Written(objects);
 }
 

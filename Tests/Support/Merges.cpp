@@ -1,5 +1,6 @@
 #include "Support/Merges.h"
 
+#include "Document/CheckTree.h"
 #include "Merge/ConflictReport.h"
 
 #include <sstream>
@@ -27,6 +28,7 @@ MergeOutput Merge(const MergeInput& input) {
     const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(left, right, resolver);
     YAMLMapping* body = Doc(input.base);
     merged->Apply(*body);
+    EXPECT_EQ(CheckTree(*body, TreeStage::Changed), "");
     std::ostringstream report;
     OutputConflictRecords(report, resolver, true);
     return {Show(body), Records(resolver), report.str(), resolver.HasPendingConflicts()};

@@ -1,8 +1,11 @@
 #pragma once
 
+#include "Document/CheckTree.h"
 #include "Document/ObjectFileReader.h"
 #include "Document/OvrinObjects.h"
 #include "Document/YAMLScalar.h"
+
+#include <gtest/gtest.h>
 
 #include <sstream>
 #include <stdexcept>
@@ -34,6 +37,7 @@ public:
             text += "--- !o!" + classID + " " + rest.substr(0, body) + "\n" + rest.substr(body + 1) + "\n";
         }
         ParseYAMLString(text, m_Objects);
+        EXPECT_EQ(CheckTree(Root(), TreeStage::Hashed), "");
     }
 
     OvrinObjects& Objects() { return m_Objects; }
@@ -42,6 +46,7 @@ public:
 
     /// The lines of the file as it is now, each with its line break. Folded bodies are unfolded.
     std::string Text() const {
+        EXPECT_EQ(CheckTree(m_Objects.GetMapping(), TreeStage::Changed), "");
         std::ostringstream stream;
         m_Objects.Output(stream);
         std::istringstream written(stream.str());

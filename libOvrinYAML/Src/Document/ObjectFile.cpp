@@ -210,10 +210,10 @@ void ObjectFile::Read(WrittenFormReader& reader, Document& document) const {
 void ObjectFile::Complete(Document& document) const {
     YAMLMapping& object = *document.object;
     document.fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
-    if (m_Options.inspect) object.m_Traits = m_Options.inspect(object);
-    document.isLendable = !(object.m_Traits & m_Options.unshared);
+    if (m_Options.inspect) object.SetTraitsAsRead(m_Options.inspect(object));
+    document.isLendable = !(object.TraitsAsRead() & m_Options.unshared);
     document.isMarked = document.isLendable && document.isWanted;
-    object.m_IsShared = document.isMarked;
+    if (document.isMarked) object.MarkAsShared();
     if (!m_Base && document.isAsWritten) object.SetSource({document.begin, document.length});
 }
 
@@ -237,7 +237,7 @@ void ObjectFile::FinishDocuments() {
         const Document* lender = document.lender == kNone ? nullptr : &m_Base->m_Documents[document.lender];
         if (lender && lender->isLendable) {
             // Nearly always done by now, while the object was at hand.
-            if (!lender->isMarked) lender->object->m_IsShared = true;
+            if (!lender->isMarked) lender->object->MarkAsShared();
             root.Append(lender->fileID, lender->object);
             continue;
         }

@@ -23,7 +23,7 @@ struct ReaderOptions {
     bool fast = true;  ///< read documents in written form without libyaml
     bool share = true; ///< share the objects of documents that are the same in two files, to the letter
     /// Looks at each object right after the fast reader has read it, while it is at hand; what it returns is
-    /// kept as YAMLMapping::m_Traits. Called from any thread, only for objects without repeated keys.
+    /// kept as YAMLMapping::TraitsAsRead. Called from any thread, only for objects without repeated keys.
     std::uint8_t (*inspect)(const YAMLMapping& object) = nullptr;
     /// Objects with one of these traits are never shared.
     std::uint8_t unshared = 0;

@@ -114,6 +114,8 @@ void YAMLMapping::DropRemoved() {
 }
 
 void YAMLMapping::Append(const YAMLScalar* key, YAMLNode* value) {
+    AssertMayChange();
+    assert(key && value);
     if (m_HasDuplicates) {
         PushRaw(key, value);
         return;
@@ -123,7 +125,10 @@ void YAMLMapping::Append(const YAMLScalar* key, YAMLNode* value) {
         PushBack(key, value);
         return;
     }
-    if (Values()[position]->Equals(value)) return;
+    if (Values()[position]->Equals(value)) {
+        NeedExtra().leftOut = true;
+        return;
+    }
     DropRemoved();
     DropIndex();
     PushRaw(key, value);
@@ -131,12 +136,18 @@ void YAMLMapping::Append(const YAMLScalar* key, YAMLNode* value) {
 }
 
 void YAMLMapping::AppendPairs(YAMLNode* const* keysAndValues, std::size_t count) {
-    for (std::size_t i = 0; i + 1 < count; i += 2)
-        if (const YAMLScalar* key = AsScalar(keysAndValues[i])) Append(key, keysAndValues[i + 1]);
+    for (std::size_t i = 0; i + 1 < count; i += 2) {
+        if (const YAMLScalar* key = AsScalar(keysAndValues[i]))
+            Append(key, keysAndValues[i + 1]);
+        else
+            NeedExtra().leftOut = true;
+    }
 }
 
 void YAMLMapping::Insert(const YAMLScalar* key, YAMLNode* value) {
     RequireNormalState();
+    AssertMayChange();
+    assert(key && value);
     if (Find(key) != KeyIndex::kMissing) throw YAMLError("Cannot add existing key in YAMLMapping");
     PushBack(key, value);
 }
@@ -145,6 +156,8 @@ YAMLNode* YAMLMapping::Change(const YAMLScalar* key, YAMLNode* value) {
     RequireNormalState();
     const std::uint32_t position = Find(key);
     if (position == KeyIndex::kMissing) throw YAMLError("Cannot change non existing key in YAMLMapping");
+    AssertMayChange();
+    assert(value);
     return std::exchange(Values()[position], value);
 }
 
@@ -197,6 +210,7 @@ YAMLNode* YAMLMapping::Steal(const YAMLScalar* key) {
     RequireNormalState();
     const std::uint32_t position = Find(key);
     if (position == KeyIndex::kMissing) return nullptr;
+    AssertMayChange();
     const YAMLScalar** keys = OwnKeys();
     YAMLNode** values = Values();
     YAMLNode* value = values[position];
@@ -221,12 +235,15 @@ void YAMLMapping::ChangeKey(const YAMLScalar* from, const YAMLScalar* to) {
     const std::uint32_t position = Find(from);
     if (position == KeyIndex::kMissing)
         throw YAMLError("Cannot change key of non existing key in YAMLMapping");
+    AssertMayChange();
+    assert(to && (to == from || Find(to) == KeyIndex::kMissing));
     OwnKeys()[position] = to;
     if (KeyIndex* index = Index()) index->Set(to, position);
 }
 
 void YAMLMapping::Reorder(const std::vector<const YAMLScalar*>& order) {
     RequireNormalState();
+    AssertMayChange();
     std::vector<Entry> ordered;
     ordered.reserve(Size());
     for (const YAMLScalar* key : order) {
@@ -266,6 +283,7 @@ YAMLMapping* YAMLMapping::CopyWith(YAMLNode* (*copyValue)(const YAMLNode*)) cons
     if (m_HasDuplicates) copy->DropIndex();
     copy->m_Hash = m_Hash;
     copy->m_Line = m_Line;
+    if (m_Extra && m_Extra->leftOut) copy->NeedExtra().leftOut = true;
     YAMLNode** values = copy->Values();
     for (const Entry entry : RawEntries())
         if (entry.key) *values++ = copyValue(entry.value);
@@ -279,7 +297,7 @@ void YAMLMapping::ShareInto(YAMLMapping& target) {
     target.Reserve(Size());
     for (const Entry entry : *this) {
         target.PushBack(entry.key, entry.value);
-        if (YAMLMapping* object = AsMapping(entry.value)) object->m_IsShared = true;
+        if (YAMLMapping* object = AsMapping(entry.value)) object->MarkAsShared();
     }
 }
 
@@ -289,6 +307,7 @@ YAMLNode* YAMLMapping::Clone() const {
 }
 
 void YAMLMapping::Clear() {
+    assert(!m_IsShared);
     for (const Entry entry : RawEntries())
         if (entry.value) entry.value->Free();
     m_Size = 0;
@@ -318,6 +337,7 @@ bool YAMLMapping::EqualsExpensive(const YAMLNode* node) const {
 }
 
 void YAMLMapping::RebuildHash(bool shallow) {
+    AssertMayChange();
     std::uint32_t hash = 0;
     std::uint32_t index = 0;
     if (!m_HasDuplicates) {
@@ -327,6 +347,7 @@ void YAMLMapping::RebuildHash(bool shallow) {
         }
     }
     m_Hash = hash;
+    if (m_Extra) m_Extra->leftOut = false;
 }
 
 } // namespace ovrin_yaml

@@ -5,6 +5,7 @@
 #include "Document/YAMLError.h"
 #include "Document/YAMLNode.h"
 
+#include <cassert>
 #include <cstddef>
 #include <string_view>
 #include <vector>
@@ -108,11 +109,6 @@ public:
 
     /// The mapping was written in flow style, {...}.
     bool m_Flow;
-    /// What an inspector found in this object when it was read (ReaderOptions::inspect); 0: nobody looked, or
-    /// the object was changed since.
-    std::uint8_t m_Traits = 0;
-    /// The mapping is an object that several trees hold: it is never freed, and copied before it is changed.
-    bool m_IsShared = false;
 
     /// A new mapping of keys that are all different, at most kMostPairs, with the values, which stand right
     /// behind it in memory, to be filled in by the caller. The array of keys may be that of many mappings; it
@@ -132,6 +128,20 @@ public:
     /// the object is changed; they belong to whoever read the file.
     std::string_view Source() const { return m_Extra ? m_Extra->source : std::string_view(); }
     void SetSource(std::string_view source) { NeedExtra().source = source; }
+
+    /// What an inspector found in this object when it was read (ReaderOptions::inspect); 0: nobody looked, or
+    /// the object was changed since.
+    std::uint8_t TraitsAsRead() const { return m_Traits; }
+    void SetTraitsAsRead(std::uint8_t traits) { m_Traits = traits; }
+
+    /// Whether several trees hold this mapping, an object: it is never freed, and copied before it is
+    /// changed.
+    bool IsShared() const { return m_IsShared; }
+    void MarkAsShared() { m_IsShared = true; }
+
+    /// Whether the object is known to be as it was when its hashes were built. What changes one first gets it
+    /// from GetForChange, which ends this state.
+    bool IsKnownUnchanged() const { return m_IsShared || m_Traits || !Source().empty(); }
 
     bool HasDuplicates() const { return m_HasDuplicates; }
     /// Throws the duplicate-keys YAMLError in the duplicate state.
@@ -205,7 +215,10 @@ private:
         YAMLNode** values = nullptr; // where they went when there was no more room behind the mapping
         std::uint32_t room = 0;      // for values there, and for keys that are the mapping's own
         std::uint32_t removed = 0;   // pairs whose key is null; only where there is an index
+        bool leftOut = false;        // the hash covers pairs that were not kept: it can't be checked
     };
+    friend class TreeCheck;
+
     Extra& NeedExtra();
     KeyIndex* Index() const { return m_Extra ? m_Extra->index : nullptr; }
     std::uint32_t RemovedCount() const { return m_Extra ? m_Extra->removed : 0; }
@@ -224,6 +237,11 @@ private:
     void BuildIndex();
     void DropIndex();
 
+    /// Ahead of every change.
+    void AssertMayChange() const { assert(!IsKnownUnchanged() && "an object that GetForChange didn't give"); }
+
+    std::uint8_t m_Traits = 0;
+    bool m_IsShared = false;
     std::uint32_t m_HasDuplicates : 1 = 0;
     std::uint32_t m_OwnsKeys : 1 = 0;
     std::uint32_t m_Size : 30 = 0; // pairs, those removed included

@@ -4,6 +4,7 @@
 #include "Document/YAMLScalar.h"
 
 #include <algorithm>
+#include <cassert>
 #include <utility>
 
 namespace ovrin_yaml {
@@ -59,6 +60,7 @@ void YAMLSequence::RebuildHash(bool shallow) {
     std::uint32_t hash = 0;
     std::uint32_t index = 0;
     for (YAMLNode* item : m_Items) {
+        assert(item);
         if (!shallow) item->RebuildHash(false);
         hash = FoldItem(hash, item->m_Hash, index++);
     }

@@ -40,7 +40,7 @@ void ForEachObject(const YAMLMapping& root, const IsOfInterest& isOfInterest, co
         const auto& [id, value] = entries[i];
         if (!id) continue;
         const YAMLMapping* object = AsMapping(value);
-        if (object && object->m_Traits && !isOfInterest(object->m_Traits)) continue;
+        if (object && object->TraitsAsRead() && !isOfInterest(object->TraitsAsRead())) continue;
         visit(id, value);
     }
 }
