@@ -2,7 +2,7 @@
 
 #include "TreeComparison.h"
 
-#include "Diff/YAMLMappingDiff.h"
+#include "Diff/CheckDiff.h"
 #include "Document/CheckTree.h"
 #include "Merge/ConflictReport.h"
 #include "Merge/RecordingConflictResolver.h"
@@ -41,6 +41,13 @@ void Check(const char* when, const OvrinObjects& objects, TreeStage stage) {
     if (!fault.empty()) throw BrokenTree(std::string(when) + ": " + fault);
 }
 
+/// The diff, checked.
+const YAMLMappingDiff* Checked(const char* which, const YAMLMappingDiff* diff, DiffOrigin origin) {
+    const std::string fault = CheckDiff(*diff, origin);
+    if (!fault.empty()) throw BrokenTree(std::string(which) + " diff: " + fault);
+    return diff;
+}
+
 void CheckAll(const char* when, const MergeFiles& files, TreeStage baseStage) {
     Check(when, files.base, baseStage);
     Check(when, files.left, TreeStage::Hashed);
@@ -60,12 +67,14 @@ MergeDiffs Prepare(MergeFiles& files) {
     for (YAMLMapping* root : {&base, &left, &right}) PreProcess(*root);
     RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
     CheckAll("prepared", files, TreeStage::Hashed);
-    return {YAMLMappingDiff::Diff(&base, &left), YAMLMappingDiff::Diff(&base, &right)};
+    return {Checked("left", YAMLMappingDiff::Diff(&base, &left), DiffOrigin::Trees),
+            Checked("right", YAMLMappingDiff::Diff(&base, &right), DiffOrigin::Trees)};
 }
 
 void Merge(MergeFiles& files, const MergeDiffs& diffs, MergeOutcome& outcome) {
     RecordingConflictResolver resolver(ResolveBase);
-    const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver);
+    const YAMLMappingDiff* merged =
+        Checked("merged", YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver), DiffOrigin::Sides);
     CheckAll("merged", files, TreeStage::Hashed);
     merged->Apply(files.base.GetMapping());
     CheckAll("applied", files, TreeStage::Changed);

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Diff/CheckDiff.h"
 #include "Diff/MergeRules.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
@@ -27,7 +28,9 @@ std::string Describe(const YAMLSequenceDiff* diff);
 std::string Describe(const YAMLMappingDiff* diff, bool withKeyOrder = false);
 
 inline const YAMLMappingDiff* DiffOf(const std::string& base, const std::string& dest) {
-    return YAMLMappingDiff::Diff(Doc(base), Doc(dest));
+    const YAMLMappingDiff* diff = YAMLMappingDiff::Diff(Doc(base), Doc(dest));
+    EXPECT_EQ(CheckDiff(*diff, DiffOrigin::Trees), "");
+    return diff;
 }
 /// One operation, from one text to another at a path.
 const Operation* OperationOf(const std::string& path, const std::string& base, const std::string& dest);

@@ -1,5 +1,6 @@
 #include "Support/Merges.h"
 
+#include "Diff/CheckDiff.h"
 #include "Document/CheckTree.h"
 #include "Merge/ConflictReport.h"
 
@@ -26,6 +27,7 @@ MergeOutput Merge(const MergeInput& input) {
     const YAMLMappingDiff* left = DiffOf(input.base, input.left);
     const YAMLMappingDiff* right = DiffOf(input.base, input.right);
     const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(left, right, resolver);
+    EXPECT_EQ(CheckDiff(*merged, DiffOrigin::Sides), "");
     YAMLMapping* body = Doc(input.base);
     merged->Apply(*body);
     EXPECT_EQ(CheckTree(*body, TreeStage::Changed), "");
