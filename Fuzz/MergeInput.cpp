@@ -21,6 +21,10 @@ std::vector<std::string_view> PartsOf(std::string_view input) {
     return parts;
 }
 
+std::string WithoutHeader(const std::string& text) {
+    return text.starts_with(kFileHeader) ? text.substr(std::string_view(kFileHeader).size()) : text;
+}
+
 std::string WithHeader(std::string_view text) {
     return (text.starts_with("%YAML") ? "" : kFileHeader) + std::string(text);
 }
@@ -77,6 +81,16 @@ MergeTexts TextsOfInput(std::string_view input) {
     std::vector<std::string> left = LinesOf(parts[0]), right = left;
     if (parts.size() == 2) Edit(parts[1], left, right);
     return {WithHeader(parts[0]), WithHeader(Joined(left)), WithHeader(Joined(right))};
+}
+
+std::string InputOfTexts(const MergeTexts& texts) {
+    std::string input;
+    for (const std::string* text : {&texts.base, &texts.left, &texts.right}) {
+        if (text != &texts.base) input += kDivider;
+        input += WithoutHeader(*text);
+        if (!input.ends_with('\n')) input += '\n';
+    }
+    return input;
 }
 
 } // namespace ovrin_fuzz

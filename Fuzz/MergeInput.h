@@ -16,5 +16,7 @@ struct MergeTexts {
 ///  - with one part all three are the same.
 /// A part that doesn't begin with "%YAML" gets the header lines of an object file in front.
 MergeTexts TextsOfInput(std::string_view input);
+/// An input of three parts; the usual header lines are left out.
+std::string InputOfTexts(const MergeTexts& texts);
 
 } // namespace ovrin_fuzz
