@@ -1,5 +1,6 @@
 #include "MergeCheck.h"
 #include "ReaderCheck.h"
+#include "SmallChecks.h"
 #include "Support/Documents.h"
 #include "Support/Program.h"
 
@@ -29,6 +30,16 @@ TEST(Replay, AllWaysToReadGiveTheSame) {
 TEST(Replay, AllWaysToReadGiveTheSameMerge) {
     EXPECT_EQ(FindingsIn("merge", [](const std::string& input) { return CheckMerge(TextsOfInput(input)); }),
               "");
+}
+
+TEST(Replay, SmallFilesAndCommandLinesObeyTheirLaws) {
+    const std::pair<const char*, std::string (*)(std::string_view)> checks[] = {
+        {"rules", CheckRules},
+        {"resolve", CheckResolve},
+        {"typeinfo", CheckTypeInfo},
+        {"mergespec", CheckMergeSpec},
+        {"commandline", CheckCommandLine}};
+    for (const auto& [corpus, check] : checks) EXPECT_EQ(FindingsIn(corpus, check), "") << corpus;
 }
 
 } // namespace
