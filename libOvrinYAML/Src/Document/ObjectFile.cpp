@@ -161,12 +161,13 @@ std::size_t ObjectFile::FindLender(const char* begin, const char* end, std::size
 }
 
 std::size_t ObjectFile::IndexOf(std::string_view fileID) const {
-    std::call_once(m_IndexOnce, [this] {
+    // Not std::call_once: a lack of memory can't get through the frames of the C library.
+    const std::lock_guard lock(m_IndexLock);
+    if (m_Index.empty()) {
         m_Index.reserve(m_Documents.size());
-        for (std::size_t i = 0; i < m_Documents.size(); ++i) {
+        for (std::size_t i = 0; i < m_Documents.size(); ++i)
             m_Index.try_emplace(FileIDOf(m_Documents[i]), i);
-        }
-    });
+    }
     const auto found = m_Index.find(fileID);
     return found == m_Index.end() ? kNone : found->second;
 }

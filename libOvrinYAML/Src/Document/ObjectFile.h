@@ -112,7 +112,7 @@ private:
     AliasBudget m_AliasBudget;
 
     // File id to document, for the files that are cut along this one; made by the first that asks.
-    mutable std::once_flag m_IndexOnce;
+    mutable std::mutex m_IndexLock;
     mutable std::unordered_map<std::string_view, std::size_t, SeededHash> m_Index;
 };
 
