@@ -160,7 +160,7 @@ std::size_t ChunkWalker::InputEnd(std::size_t nextHeader) {
     if (!m_Header.ends_with('\n') || !IsMarker(text.substr(line))) return end;
     const std::size_t marker =
         m_NextMarker.From(line + kMarker.size(), [text](std::size_t from) { return FindMarker(text, from); });
-    if (marker == text.npos) return end;
+    if (marker == nextHeader) return end;
     const std::size_t unusual = m_NextUnusual.From(line, [text](std::size_t from) -> std::size_t {
         return std::find_if(text.begin() + from, text.end(), IsUnusual) - text.begin();
     });
