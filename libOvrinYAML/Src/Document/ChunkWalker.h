@@ -24,9 +24,9 @@ void AddHeaderData(YAMLMapping& object, YAMLScalar* fileID, std::string_view cla
 ///     HEADER--- !o!4 &12 body one body one\n--- !o!4 &14 body two     first chunk: from the start
 ///     HEADER--- !o!4 &12 body oHEADER--- !o!4 &14 body two            second chunk
 ///
-/// The time is linear in the text. The first document shows that the header can be read; in front of the
-/// later ones stands only what they need of it. And what is looked for in front of the walker is looked for
-/// once.
+/// The time is linear in the text, but for directives, which the parser reads for each document. The first
+/// document shows that the header can be read; in front of the later ones stands only what they need of it.
+/// And what is looked for in front of the walker is looked for once.
 class ChunkWalker {
 public:
     /// `text` begins with `header`; objects are added to `root`. `budget` is the file's.
