@@ -3,6 +3,12 @@
 
 #include <gtest/gtest.h>
 
+#include <fstream>
+#include <new>
+
+#include <sys/resource.h>
+#include <unistd.h>
+
 namespace {
 
 using namespace documents;
@@ -237,6 +243,35 @@ TEST(Reader, AliasesToAliasesEndAtTenMillionNodes) {
     EXPECT_EQ(ReadError(ObjectText(text)), "none");
     for (int i = 0; i < 6; ++i) text += text;
     EXPECT_EQ(ReadError(ObjectText(text)), "Too many aliased nodes") << "the whole file counts";
+}
+
+/// Reads the text with so much memory more than there is now, and ends the process.
+[[noreturn]] void ReadWithin(rlim_t megabytes, std::string text) {
+    std::size_t pages = 0;
+    std::ifstream("/proc/self/statm") >> pages;
+    const rlim_t bytes = pages * sysconf(_SC_PAGESIZE) + (megabytes << 20);
+    const rlimit limit{bytes, bytes};
+    setrlimit(RLIMIT_AS, &limit);
+    try {
+        OvrinObjects objects;
+        ParseYAMLString(std::move(text), objects);
+    } catch (const std::bad_alloc&) {
+        _exit(1);
+    } catch (const YAMLError&) {
+        _exit(2);
+    }
+    _exit(0);
+}
+
+TEST(ReaderDeathTest, ALackOfMemoryIsToldAsWhatItIs) {
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+    GTEST_SKIP() << "sanitizers need address space without end";
+#endif
+    const std::string text =
+        Replaced(ObjectText("--- !o!1 &2\na: "), "!o!", "!x!") + std::string(8 << 20, 'x');
+    EXPECT_EXIT(ReadWithin(100, text), testing::ExitedWithCode(0), "");
+    for (const rlim_t megabytes : {4, 10, 14, 18, 22, 26})
+        EXPECT_EXIT(ReadWithin(megabytes, text), testing::ExitedWithCode(1), "") << megabytes;
 }
 
 TEST(Reader, EveryPrefixOfAFileIsReadOrRefused) {
