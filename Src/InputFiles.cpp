@@ -18,17 +18,13 @@ void TakeFile(const std::string& path, ObjectFile& file) {
     file.Take(std::move(bytes));
 }
 
-void FinishFile(ObjectFile& file) {
-    file.Finish();
-}
-
 void ReadYAMLPath(const std::string& path, OvrinObjects& objects) {
     WithFileName(path, [&] {
         ObjectFile file(objects, {});
         TakeFile(path, file);
         file.Cut(nullptr);
         for (std::size_t piece = 0; piece < file.PieceCount(); ++piece) file.ReadPiece(piece);
-        FinishFile(file);
+        file.Finish();
     });
 }
 

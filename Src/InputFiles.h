@@ -22,9 +22,8 @@ template <class Step> void WithFileName(const std::string& path, const Step& ste
     }
 }
 
-/// The first and the last step of reading an object file. They throw YAMLError for a file that can't be read.
+/// The first step of reading an object file. Throws YAMLError for a file that can't be read.
 void TakeFile(const std::string& path, ovrin_yaml::ObjectFile& file);
-void FinishFile(ovrin_yaml::ObjectFile& file);
 
 /// Reads an object file into `objects`, which must be empty. Throws YAMLError with the path and the fault.
 void ReadYAMLPath(const std::string& path, ovrin_yaml::OvrinObjects& objects);

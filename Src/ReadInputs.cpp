@@ -112,7 +112,7 @@ void ReadOnThreads(TimerStat& parent, const std::vector<InputFile>& inputs, Read
             pieces.emplace_back([&work, piece] { work.file.ReadPiece(piece); });
     RunTasks(pieces, isLittle);
 
-    for (FileInWork& work : files) work.Try([&] { FinishFile(work.file); });
+    for (FileInWork& work : files) work.Try([&] { work.file.Finish(); });
     for (const FileInWork& work : files)
         if (work.failure) std::rethrow_exception(work.failure);
 }
@@ -127,7 +127,7 @@ void ReadInOrder(TimerStat& parent, const std::vector<InputFile>& inputs, Reader
         work.Try([&] {
             work.file.Cut(i == 0 ? nullptr : &files.front().file);
             ReadPieces(work);
-            FinishFile(work.file);
+            work.file.Finish();
         });
         if (work.failure) std::rethrow_exception(work.failure);
     }
