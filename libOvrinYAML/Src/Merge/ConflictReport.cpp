@@ -34,7 +34,7 @@ constexpr HandlingWord kHandlingWords[] = {
     {ResolveBreakCycle, "BreakCycle", "breakCycle"},
 };
 
-/// A record and the place of its path among those of all that are sorted.
+/// A record and the rank of its path among those of all that are sorted; at first the path's index.
 struct RankedRecord {
     std::uint32_t rank;
     const Record* record;
@@ -43,19 +43,16 @@ struct RankedRecord {
 /// The records that are to be written, pending ones or all, in the order that std::sort gives all of them by
 /// path.
 ///
-/// Places are compared, for which std::sort takes the same decisions as for the paths of records, so that
+/// Ranks are compared, for which std::sort takes the same decisions as for the paths of records, so that
 /// those of one path, which it may bring into any order, come out in the same one. Where no path comes twice
 /// among the pending records, their order is settled without the others.
 std::vector<RankedRecord> RecordsByPath(const std::vector<Record>& records, bool all) {
     std::vector<RankedRecord> sorted;
-    PathRanks ranks;
-    for (const Record& record : records) {
-        if (!all && record.resolve != ResolveConflict) continue;
-        sorted.push_back({0, &record});
-        ranks.Add(record.path);
-    }
-    ranks.Number();
-    for (RankedRecord& ranked : sorted) ranked.rank = ranks.Of(ranked.record->path);
+    PathRanks paths;
+    for (const Record& record : records)
+        if (all || record.resolve == ResolveConflict) sorted.push_back({paths.Add(record.path), &record});
+    const std::vector<std::uint32_t> ranks = paths.Ranks();
+    for (RankedRecord& ranked : sorted) ranked.rank = ranks[ranked.rank];
     std::sort(sorted.begin(), sorted.end(),
               [](const RankedRecord& a, const RankedRecord& b) { return a.rank < b.rank; });
     const auto haveOnePath = [](const RankedRecord& a, const RankedRecord& b) { return a.rank == b.rank; };

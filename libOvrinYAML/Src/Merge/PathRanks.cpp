@@ -10,10 +10,10 @@ std::size_t PathRanks::StepHash::operator()(const Step& step) const {
     return std::hash<const YAMLScalar*>()(step.second) * 31 + step.first;
 }
 
-std::uint32_t PathRanks::IndexOf(const PathNode* last) {
+std::uint32_t PathRanks::Add(const KeptPath& path) {
     std::vector<const PathNode*> added;
     std::uint32_t index = 0;
-    for (const PathNode* node = last; node; node = node->parent) {
+    for (const PathNode* node = path.Last(); node; node = node->parent) {
         const auto known = m_Indexes.find(node);
         if (known != m_Indexes.end()) {
             index = known->second;
@@ -42,21 +42,18 @@ std::vector<std::uint32_t> PathRanks::SiblingsByText() const {
     return order;
 }
 
-void PathRanks::Number() {
+std::vector<std::uint32_t> PathRanks::Ranks() const {
     std::vector<std::uint32_t> sizes(m_Tree.size(), 1); // of the subtrees
     for (std::size_t i = m_Tree.size() - 1; i > 0; --i) sizes[m_Tree[i].parent] += sizes[i];
     std::vector<std::uint32_t> next(m_Tree.size(), 1); // the rank of a node's next child
-    m_Ranks.assign(m_Tree.size(), 0);
+    std::vector<std::uint32_t> ranks(m_Tree.size(), 0);
     for (const std::uint32_t node : SiblingsByText()) {
         std::uint32_t& rank = next[m_Tree[node].parent];
-        m_Ranks[node] = rank;
+        ranks[node] = rank;
         next[node] = rank + 1;
         rank += sizes[node];
     }
-}
-
-std::uint32_t PathRanks::Of(const KeptPath& path) const {
-    return path.Last() ? m_Ranks[m_Indexes.at(path.Last())] : 0;
+    return ranks;
 }
 
 } // namespace ovrin_yaml

@@ -17,11 +17,10 @@ namespace ovrin_yaml {
 /// children by their text. So the cost goes by the nodes of the paths and not by their lengths.
 class PathRanks {
 public:
-    void Add(const KeptPath& path) { IndexOf(path.Last()); }
-    /// To be called when all paths are added, and before Of.
-    void Number();
-    /// The number of a path that was added.
-    std::uint32_t Of(const KeptPath& path) const;
+    /// Returns the path's index, the same for equal paths.
+    std::uint32_t Add(const KeptPath& path);
+    /// The numbers of all paths that were added, by index.
+    std::vector<std::uint32_t> Ranks() const;
 
 private:
     struct TreeNode {
@@ -33,14 +32,11 @@ private:
         std::size_t operator()(const Step& step) const;
     };
 
-    /// The tree node of a path, made if it is new.
-    std::uint32_t IndexOf(const PathNode* last);
     std::vector<std::uint32_t> SiblingsByText() const;
 
     std::vector<TreeNode> m_Tree = {{0, nullptr}}; // parents go before their children; first the empty path
     std::unordered_map<Step, std::uint32_t, StepHash> m_Children;
     std::unordered_map<const PathNode*, std::uint32_t> m_Indexes;
-    std::vector<std::uint32_t> m_Ranks; // by index in m_Tree
 };
 
 } // namespace ovrin_yaml
