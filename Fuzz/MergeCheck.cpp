@@ -1,10 +1,14 @@
 #include "MergeCheck.h"
 
+#include "MergeLaws.h"
 #include "MergeRun.h"
 #include "ReadInputs.h"
+#include "Thread.h"
 
 #include "Document/ObjectFile.h"
 #include "Document/YAMLError.h"
+
+#include <vector>
 
 using namespace ovrin_yaml;
 
@@ -30,7 +34,7 @@ void ReadInTurn(const MergeTexts& texts, ReaderOptions options, MergeFiles& file
     read(right, texts.right);
 }
 
-/// All files take each step together.
+/// All files take each step together, and are read on threads.
 void ReadAtOnce(const MergeTexts& texts, ReaderOptions options, MergeFiles& files) {
     ObjectFile base(files.base, options), left(files.left, options), right(files.right, options);
     base.Take(std::string(texts.base));
@@ -38,26 +42,32 @@ void ReadAtOnce(const MergeTexts& texts, ReaderOptions options, MergeFiles& file
     left.Take(std::string(texts.left));
     right.Take(std::string(texts.right));
     for (ObjectFile* file : {&right, &left}) file->Cut(&base);
-    for (ObjectFile* file : {&right, &base, &left}) ReadPieces(*file);
+    std::vector<Thread> threads;
+    for (ObjectFile* file : {&right, &base, &left}) threads.emplace_back([file] { ReadPieces(*file); });
+    for (Thread& thread : threads) thread.Join();
+    for (const Thread& thread : threads) thread.CheckForExceptions();
     for (ObjectFile* file : {&base, &left, &right}) file->Finish();
 }
 
 } // namespace
 
 std::string CheckMerge(const MergeTexts& texts) {
-    const auto run = [&](auto read, bool fast, bool share, PremergeFrom from = PremergeFrom::Clone) {
+    const auto run = [&](auto read, bool fast, bool share, PremergeFrom from = PremergeFrom::Clone,
+                         bool onThreads = false) {
         ReaderOptions options = DefaultReaderOptions();
         options.fast = fast;
         options.share = share;
-        return RunMerge([&](MergeFiles& files) { read(texts, options, files); }, from);
+        return RunMerge({[&](MergeFiles& files) { read(texts, options, files); }, from, onThreads});
     };
     const MergeOutcome expected = run(ReadInTurn, false, false, PremergeFrom::Reading);
     const MergeOutcome unshared = run(ReadInTurn, true, false);
     const MergeOutcome inTurn = run(ReadInTurn, true, true);
-    const MergeOutcome atOnce = run(ReadAtOnce, true, true);
+    const MergeOutcome atOnce = run(ReadAtOnce, true, true, PremergeFrom::Clone, true);
     std::string finding = CompareOutcomes(expected, unshared);
     if (finding.empty()) finding = CompareOutcomes(expected, inTurn);
-    return finding.empty() ? CompareOutcomes(expected, atOnce) : finding;
+    if (finding.empty()) finding = CompareOutcomes(expected, atOnce);
+    if (finding.empty()) finding = CheckLaws(texts.base, texts.left);
+    return finding.empty() ? CheckLaws(texts.base, texts.right) : finding;
 }
 
 } // namespace ovrin_fuzz

@@ -1,5 +1,6 @@
 #include "MergeRun.h"
 
+#include "Thread.h"
 #include "TreeComparison.h"
 
 #include "Diff/CheckDiff.h"
@@ -59,16 +60,31 @@ struct MergeDiffs {
     const YAMLMappingDiff* right;
 };
 
+/// The diffs to both sides, each on a thread of its own if so wanted.
+MergeDiffs Diff(const MergeFiles& files, bool onThreads) {
+    const YAMLMappingDiff* diffs[2];
+    const OvrinObjects* const sides[2] = {&files.left, &files.right};
+    std::vector<Thread> threads;
+    for (int i = 0; i < 2; ++i)
+        threads.emplace_back(
+            [&files, &diffs, &sides, i] {
+                diffs[i] = YAMLMappingDiff::Diff(&files.base.GetMapping(), &sides[i]->GetMapping());
+            },
+            !onThreads);
+    for (Thread& thread : threads) thread.Join();
+    for (const Thread& thread : threads) thread.CheckForExceptions();
+    return {Checked("left", diffs[0], DiffOrigin::Trees), Checked("right", diffs[1], DiffOrigin::Trees)};
+}
+
 /// All that comes before the merge itself.
-MergeDiffs Prepare(MergeFiles& files) {
+MergeDiffs Prepare(MergeFiles& files, bool onThreads) {
     YAMLMapping &base = files.base.GetMapping(), &left = files.left.GetMapping(),
                 &right = files.right.GetMapping();
     CheckAll("read", files, TreeStage::Hashed);
     for (YAMLMapping* root : {&base, &left, &right}) PreProcess(*root);
     RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
     CheckAll("prepared", files, TreeStage::Hashed);
-    return {Checked("left", YAMLMappingDiff::Diff(&base, &left), DiffOrigin::Trees),
-            Checked("right", YAMLMappingDiff::Diff(&base, &right), DiffOrigin::Trees)};
+    return Diff(files, onThreads);
 }
 
 void Merge(MergeFiles& files, const MergeDiffs& diffs, MergeOutcome& outcome) {
@@ -99,10 +115,11 @@ std::string Premerge(MergeResolve resolve, OvrinObjects& base, const MergeFiles&
 
 constexpr MergeResolve kPremerges[] = {ResolveBlank, ResolveRight};
 
-void MergeAll(const std::function<void(MergeFiles&)>& read, PremergeFrom from, MergeOutcome& outcome) {
+void MergeAll(const MergeWay& way, MergeOutcome& outcome) {
+    const auto& [read, from, onThreads] = way;
     MergeFiles& files = *outcome.files;
     read(files);
-    const MergeDiffs diffs = Prepare(files);
+    const MergeDiffs diffs = Prepare(files, onThreads);
     std::vector<std::unique_ptr<OvrinObjects>> clones;
     if (from == PremergeFrom::Clone)
         for (std::size_t i = 0; i < std::size(kPremerges); ++i) clones.emplace_back(files.base.Clone());
@@ -113,7 +130,7 @@ void MergeAll(const std::function<void(MergeFiles&)>& read, PremergeFrom from, M
         } else {
             MergeFiles again;
             read(again);
-            const MergeDiffs ownDiffs = Prepare(again);
+            const MergeDiffs ownDiffs = Prepare(again, onThreads);
             outcome.premerged[i] = Premerge(kPremerges[i], again.base, again, ownDiffs);
         }
     }
@@ -121,12 +138,12 @@ void MergeAll(const std::function<void(MergeFiles&)>& read, PremergeFrom from, M
 
 } // namespace
 
-MergeOutcome RunMerge(const std::function<void(MergeFiles&)>& read, PremergeFrom from) {
+MergeOutcome RunMerge(const MergeWay& way) {
     MergeOutcome outcome;
     outcome.files = std::make_shared<MergeFiles>();
     outcome.failure = "none";
     try {
-        MergeAll(read, from, outcome);
+        MergeAll(way, outcome);
     } catch (const YAMLError& error) {
         outcome.failure = error.what();
     } catch (const YAMLError* error) { // of a cycle that can't be broken

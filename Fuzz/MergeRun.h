@@ -30,9 +30,15 @@ enum class PremergeFrom {
     Reading // files that are read once more for each
 };
 
-/// Reads three files with `read` and takes them all the way to the result and two premerged files, in this
-/// thread.
-MergeOutcome RunMerge(const std::function<void(MergeFiles&)>& read, PremergeFrom from = PremergeFrom::Clone);
+struct MergeWay {
+    std::function<void(MergeFiles&)> read; // reads the three files
+    PremergeFrom from = PremergeFrom::Clone;
+    bool onThreads = false; // the diffs are made on two threads
+};
+
+/// Takes a merge all the way to the result and two premerged files. All trees and diffs are checked after
+/// each stage.
+MergeOutcome RunMerge(const MergeWay& way);
 
 /// What the second of two outcomes of the same merge has different, or an empty text.
 std::string CompareOutcomes(const MergeOutcome& expected, const MergeOutcome& actual);

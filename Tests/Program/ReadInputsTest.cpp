@@ -26,12 +26,12 @@ protected:
     MergeOutcome Merge(bool useThreads, ReaderOptions options) const {
         const std::string base = m_Directory.Path() / "base", left = m_Directory.Path() / "left",
                           right = m_Directory.Path() / "right";
-        return RunMerge([&](MergeFiles& files) {
+        return RunMerge({[&](MergeFiles& files) {
             TimerStat timer("Read files", nullptr);
             ReadInputs(timer, useThreads,
                        {{"", &base, &files.base}, {"", &left, &files.left}, {"", &right, &files.right}},
                        options);
-        });
+        }});
     }
 
     /// Of all options and both orders; the first difference from the library's reading in turn.
