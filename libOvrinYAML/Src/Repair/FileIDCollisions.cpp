@@ -38,6 +38,15 @@ template <class IsTaken> const YAMLScalar* NextFreeID(const YAMLScalar& id, cons
     throw YAMLError("Cannot create new fileID for conflicting fileID: " + std::string(id.Value()));
 }
 
+/// Gives an object the hash that reading it would give, in which the data of its header has no part.
+void RebuildObjectHash(YAMLMapping& object) {
+    std::uint32_t hash = 0, index = 0;
+    for (const YAMLMapping::Entry entry : object)
+        if (!IsPlaceHolderKey(entry.key))
+            hash = FoldPair(hash, entry.key->m_Hash, entry.value->m_Hash, index++);
+    object.m_Hash = hash;
+}
+
 /// Brings references to their new ids. What holds one gets the hash that reading it with the new id would
 /// give: two additions that differ in nothing but the id must not count as one.
 class ReferenceRewriter {
@@ -54,11 +63,7 @@ public:
     /// Rewrites the references in an object.
     void RewriteObject(YAMLMapping& object) const {
         RewriteInside(object);
-        std::uint32_t hash = 0, index = 0;
-        for (const YAMLMapping::Entry entry : object)
-            if (!IsPlaceHolderKey(entry.key))
-                hash = FoldPair(hash, entry.key->m_Hash, entry.value->m_Hash, index++);
-        object.m_Hash = hash;
+        RebuildObjectHash(object);
     }
 
 private:
@@ -126,7 +131,9 @@ void RemapCollidingAddFileIDs(const std::vector<const YAMLScalar*>& conflicts, c
     }
     for (const NewID& newID : newIDs) {
         right.ChangeKey(newID.from, newID.to);
-        Editable(right, newID.to).Change(YAMLScalar::fileIDPlaceHolderName, newID.to->Clone());
+        YAMLMapping& object = Editable(right, newID.to);
+        object.Change(YAMLScalar::fileIDPlaceHolderName, newID.to->Clone());
+        RebuildObjectHash(object);
     }
     RewriteReferences(newIDs, right);
 }
