@@ -12,9 +12,9 @@ namespace ovrin_yaml {
 
 namespace {
 
-/// Deeper and longer documents are left to the library: it has the limits. What a document of this size holds
-/// can be counted in any type that is in use here.
-constexpr int kMaximumDepth = 100;
+/// Deeper and longer documents are left to the library, which has the limits; its own depth is a little more.
+/// What a document of this size holds can be counted in any type that is in use here.
+constexpr int kMaximumDepth = 990;
 constexpr std::size_t kLongestDocument = INT32_MAX;
 /// The parser looks for the colon behind a key within 1024 characters.
 constexpr std::ptrdiff_t kLongestKey = 1000;
