@@ -84,19 +84,24 @@ bool RepeatsKeys(const YAMLNode& node) {
     return false;
 }
 
-/// Reads a file; null if the laws don't hold for it.
+bool IsUsual(const YAMLMapping& root) {
+    if (RepeatsKeys(root)) return false;
+    for (const YAMLMapping::Entry object : root)
+        for (const YAMLMapping::Entry entry : *AsMapping(object.value))
+            if (IsOdd(*entry.value)) return false;
+    return true;
+}
+
+/// Reads and pre-processes a file; null if the laws don't hold for it.
 std::unique_ptr<OvrinObjects> Read(const std::string& file) {
     auto objects = std::make_unique<OvrinObjects>();
     try {
         ParseYAMLFile(std::string(file), *objects);
+        if (!IsUsual(objects->GetMapping())) return nullptr;
+        PreProcess(objects->GetMapping());
     } catch (const YAMLError&) {
         return nullptr;
     }
-    YAMLMapping& root = objects->GetMapping();
-    if (RepeatsKeys(root)) return nullptr;
-    for (const YAMLMapping::Entry object : root)
-        for (const YAMLMapping::Entry entry : *AsMapping(object.value))
-            if (IsOdd(*entry.value)) return nullptr;
     return objects;
 }
 
@@ -146,8 +151,6 @@ public:
     std::string Check() const {
         const std::unique_ptr<OvrinObjects> base = Read(m_Base);
         if (!base || !m_Changed) return "";
-        PreProcess(base->GetMapping());
-        PreProcess(m_Changed->GetMapping());
         const auto* none = YAMLMappingDiff::Diff(&base->GetMapping(), &base->GetMapping());
         const auto* change = YAMLMappingDiff::Diff(&base->GetMapping(), &m_Changed->GetMapping());
         std::string finding = CheckMerge("base, base, changed", *base, none, change);

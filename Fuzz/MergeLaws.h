@@ -11,12 +11,11 @@ namespace ovrin_fuzz {
 ///
 /// without a conflict, object by object; the order of the objects is the merge's own. Two objects are the
 /// same if hashes of all that stands in them are, since equal hashes count as equal content. The exceptions:
-///  - files that can't be read, that repeat keys, or of which the reader dropped a pair;
+///  - files that can't be read or pre-processed, that repeat keys, or of which the reader dropped a pair;
 ///  - what stands in the objects' headers, which their hashes leave out;
 ///  - the order of keys, where somewhere nothing but that differs, which is no difference;
 ///  - the third law, where an element of a list or a key of a mapping moved past another, or two equal
-///  elements
-///    became one: equal moves of both sides are lost.
+///    elements became one: equal moves of both sides are lost.
 /// Returns what was found to be wrong, or an empty text.
 std::string CheckLaws(const std::string& base, const std::string& changed);
 
