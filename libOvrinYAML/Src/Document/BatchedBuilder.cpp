@@ -6,11 +6,11 @@
 
 namespace ovrin_yaml {
 
-void BatchedBuilder::AddNewShort(std::string_view text, const ShortTextCache::Words& words,
+void BatchedBuilder::AddNewShort(std::string_view text, const ShortText& packed,
                                  ShortTextCache::Entry& entry) {
-    const std::uint32_t hash = ScalarTable::HashOf(words);
+    const std::uint32_t hash = ScalarTable::HashOf(packed);
     ScalarTable::Instance().PrefetchSlot(hash);
-    entry = {words.low, words.high, nullptr, hash, static_cast<std::uint16_t>(words.length), 0};
+    entry = {packed.low, packed.high, nullptr, hash, static_cast<std::uint16_t>(packed.length), 0};
     AddLate(text, hash, entry);
 }
 
@@ -30,12 +30,13 @@ void BatchedBuilder::AddLate(std::string_view text, std::uint32_t hash, ShortTex
 }
 
 YAMLScalar* BatchedBuilder::Intern(std::string_view text) {
-    if (text.size() > ShortTextCache::kLongest) return ScalarTable::Instance().Intern(text, 0);
-    const ShortTextCache::Words words = ShortTextCache::Pack(text);
-    ShortTextCache::Entry& entry = m_ShortTexts.At(words);
-    if (!entry.Holds(words) || !entry.scalar) {
+    if (text.size() > ShortText::kLongest) return ScalarTable::Instance().Intern(text, 0);
+    const ShortText packed = ShortText::Pack(text);
+    ShortTextCache::Entry& entry = m_ShortTexts.At(packed);
+    if (!entry.Holds(packed) || !entry.scalar) {
         YAMLScalar* scalar = ScalarTable::Instance().Intern(text, 0);
-        entry = {words.low, words.high, scalar, scalar->m_Hash, static_cast<std::uint16_t>(words.length), 0};
+        entry = {packed.low, packed.high, scalar, scalar->m_Hash, static_cast<std::uint16_t>(packed.length),
+                 0};
     }
     return entry.scalar;
 }

@@ -32,16 +32,16 @@ public:
     // Texts must stay where they are until they are interned, and kReadAhead bytes from their start on must
     // be readable.
 
-    static constexpr std::size_t kReadAhead = ShortTextCache::kLongest;
+    static constexpr std::size_t kReadAhead = ShortText::kLongest;
 
     void AddNode(YAMLNode* node, std::uint32_t hash) { m_Stack.push_back({node, hash, 0}); }
     void AddScalar(YAMLScalar* scalar) { AddNode(scalar, scalar->m_Hash); }
     void AddText(std::string_view text) {
-        if (text.size() <= ShortTextCache::kLongest) {
-            const ShortTextCache::Words words = ShortTextCache::Pack(text);
-            ShortTextCache::Entry& entry = m_ShortTexts.At(words);
-            if (!entry.Holds(words))
-                AddNewShort(text, words, entry);
+        if (text.size() <= ShortText::kLongest) {
+            const ShortText packed = ShortText::Pack(text);
+            ShortTextCache::Entry& entry = m_ShortTexts.At(packed);
+            if (!entry.Holds(packed))
+                AddNewShort(text, packed, entry);
             else if (entry.scalar)
                 AddNode(entry.scalar, entry.hash);
             else
@@ -83,7 +83,7 @@ private:
     };
     static constexpr std::size_t kMostLate = 256;
 
-    void AddNewShort(std::string_view text, const ShortTextCache::Words& words, ShortTextCache::Entry& entry);
+    void AddNewShort(std::string_view text, const ShortText& packed, ShortTextCache::Entry& entry);
     void AddLong(std::string_view text);
     void AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry& entry);
     void SetPlace(const Node& node, YAMLNode** place) { m_Late[node.late].place = place; }

@@ -2,7 +2,7 @@
 
 #include "Document/Hash.h"
 #include "Document/SeededHash.h"
-#include "Document/ShortTextCache.h"
+#include "Document/ShortText.h"
 #include "Document/SpinLock.h"
 #include "Document/YAMLScalar.h"
 
@@ -49,7 +49,7 @@ public:
     // results.
 
     static std::uint32_t HashOf(std::string_view text) { return MurmurHash3(text, kScalarSeed); }
-    static std::uint32_t HashOf(const ShortTextCache::Words& text) {
+    static std::uint32_t HashOf(const ShortText& text) {
         return MurmurHash3(text.low, text.high, text.length, kScalarSeed);
     }
     /// Starts to load the slot of a text with this hash.

@@ -1,11 +1,10 @@
 #pragma once
 
+#include "Document/ShortText.h"
 #include "Document/YAMLScalar.h"
 
 #include <array>
 #include <cstdint>
-#include <cstring>
-#include <string_view>
 
 namespace ovrin_yaml {
 
@@ -18,26 +17,6 @@ namespace ovrin_yaml {
 /// place the later one stays. Belongs to one thread.
 class ShortTextCache {
 public:
-    static constexpr std::size_t kLongest = 16;
-
-    /// A text of at most kLongest bytes as two words.
-    struct Words {
-        std::uint64_t low = 0;
-        std::uint64_t high = 0;
-        std::uint64_t length = 0;
-    };
-
-    /// kLongest bytes from the text's start on must be readable.
-    static Words Pack(std::string_view text) {
-        Words words;
-        words.length = text.size();
-        std::memcpy(&words.low, text.data(), 8);
-        std::memcpy(&words.high, text.data() + 8, 8);
-        words.low &= kMasks[text.size()].low;
-        words.high &= kMasks[text.size()].high;
-        return words;
-    }
-
     struct Entry {
         std::uint64_t low = 0;
         std::uint64_t high = 0;
@@ -46,31 +25,19 @@ public:
         std::uint16_t length = UINT16_MAX;
         std::uint16_t user = 0; // free for those who put in texts that aren't interned
 
-        bool Holds(const Words& words) const {
-            return low == words.low && high == words.high && length == words.length;
+        bool Holds(const ShortText& text) const {
+            return low == text.low && high == text.high && length == text.length;
         }
     };
 
     /// Where the text stands, or would stand in place of what is there.
-    Entry& At(const Words& words) { return m_Entries[PlaceOf(words)]; }
+    Entry& At(const ShortText& text) { return m_Entries[PlaceOf(text)]; }
 
 private:
     static constexpr unsigned kPlaceBits = 11;
 
-    struct Mask {
-        std::uint64_t low, high;
-    };
-    /// The lowest bytes of a pair of words, by their number.
-    static constexpr std::array<Mask, kLongest + 1> kMasks = [] {
-        const auto lowest = [](std::size_t bytes) {
-            return bytes >= 8 ? ~std::uint64_t{0} : (std::uint64_t{1} << 8 * bytes) - 1;
-        };
-        std::array<Mask, kLongest + 1> masks{};
-        for (std::size_t i = 0; i <= kLongest; ++i) masks[i] = {lowest(i), i > 8 ? lowest(i - 8) : 0};
-        return masks;
-    }();
-    static std::size_t PlaceOf(const Words& words) {
-        return (words.low ^ words.high * 0x9e3779b97f4a7c15u ^ words.length) * 0xd6e8feb86659fd93u >>
+    static std::size_t PlaceOf(const ShortText& text) {
+        return (text.low ^ text.high * 0x9e3779b97f4a7c15u ^ text.length) * 0xd6e8feb86659fd93u >>
                (64 - kPlaceBits);
     }
 
