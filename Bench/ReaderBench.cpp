@@ -1,8 +1,8 @@
 // Reads an object file on one thread, with nothing shared: as the program does, or with libyaml alone.
 
-#include "Document/ObjectFileReader.h"
-#include "Document/YAMLScalar.h"
 #include "FileUtils.h"
+#include "Reading/ObjectFileReader.h"
+#include "Values/YAMLScalar.h"
 
 #include <cstdio>
 #include <string>

@@ -1,7 +1,7 @@
 #include "FuzzTarget.h"
 
 #include "Diff/MergeRules.h"
-#include "Document/YAMLScalar.h"
+#include "Values/YAMLScalar.h"
 
 #include <cstddef>
 #include <cstdint>

@@ -5,8 +5,8 @@
 #include "ReadInputs.h"
 #include "Thread.h"
 
-#include "Document/ObjectFile.h"
-#include "Document/YAMLError.h"
+#include "Reading/ObjectFile.h"
+#include "Values/YAMLError.h"
 
 #include <vector>
 

@@ -5,10 +5,10 @@
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
-#include "Document/Hash.h"
-#include "Document/ObjectFileReader.h"
 #include "Merge/RecordingConflictResolver.h"
+#include "Reading/ObjectFileReader.h"
 #include "Repair/PreProcess.h"
+#include "Values/Hash.h"
 
 #include <map>
 #include <memory>

@@ -4,12 +4,13 @@
 #include "TreeComparison.h"
 
 #include "Diff/CheckDiff.h"
-#include "Document/CheckTree.h"
 #include "Merge/ConflictReport.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Repair/FileIDCollisions.h"
 #include "Repair/PostProcess.h"
 #include "Repair/PreProcess.h"
+#include "Writing/CheckTree.h"
+#include "Writing/ObjectFileWriter.h"
 
 #include <exception>
 #include <sstream>
@@ -100,7 +101,7 @@ void Merge(MergeFiles& files, const MergeDiffs& diffs, MergeOutcome& outcome) {
     CheckAll("repaired", files, TreeStage::Changed);
     outcome.report = Written([&](std::ostream& stream) { OutputConflictRecords(stream, resolver, true); }) +
                      (hasBrokenDependencies ? "broken dependencies" : "");
-    outcome.result = Written([&](std::ostream& stream) { files.base.Output(stream); });
+    outcome.result = Written([&](std::ostream& stream) { Output(files.base, stream); });
 }
 
 std::string Premerge(MergeResolve resolve, OvrinObjects& base, const MergeFiles& sides,
@@ -110,7 +111,7 @@ std::string Premerge(MergeResolve resolve, OvrinObjects& base, const MergeFiles&
     Check("premerge applied", base, TreeStage::Changed);
     PostProcessMergeOnly(base.GetMapping(), sides.left.GetMapping(), sides.right.GetMapping(), resolver);
     Check("premerge repaired", base, TreeStage::Changed);
-    return Written([&](std::ostream& stream) { base.Output(stream); });
+    return Written([&](std::ostream& stream) { Output(base, stream); });
 }
 
 constexpr MergeResolve kPremerges[] = {ResolveBlank, ResolveRight};

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/OvrinObjects.h"
+#include "Values/OvrinObjects.h"
 
 #include <array>
 #include <functional>

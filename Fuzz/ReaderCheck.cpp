@@ -2,11 +2,12 @@
 
 #include "TreeComparison.h"
 
-#include "Document/CheckTree.h"
-#include "Document/ObjectFileReader.h"
-#include "Document/YAMLScalar.h"
-#include "Document/YAMLSequence.h"
+#include "Reading/ObjectFileReader.h"
 #include "Repair/ObjectTraits.h"
+#include "Values/YAMLScalar.h"
+#include "Values/YAMLSequence.h"
+#include "Writing/CheckTree.h"
+#include "Writing/ObjectFileWriter.h"
 
 #include <sstream>
 
@@ -39,7 +40,7 @@ struct ReadFile {
 
     std::string Written() const {
         std::ostringstream stream;
-        const std::string writeFailure = FailureOf([&] { objects.Output(stream); });
+        const std::string writeFailure = FailureOf([&] { Output(objects, stream); });
         return stream.str() + "\nfailure: " + writeFailure;
     }
 

@@ -1,8 +1,8 @@
 #include "TreeComparison.h"
 
-#include "Document/YAMLMapping.h"
-#include "Document/YAMLScalar.h"
-#include "Document/YAMLSequence.h"
+#include "Values/YAMLMapping.h"
+#include "Values/YAMLScalar.h"
+#include "Values/YAMLSequence.h"
 
 #include <algorithm>
 #include <vector>

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/YAMLNode.h"
+#include "Values/YAMLNode.h"
 
 #include <string>
 

@@ -2,10 +2,11 @@
 
 #include "ReaderCheck.h"
 
-#include "Document/ObjectFileReader.h"
-#include "Document/YAMLScalar.h"
-#include "Document/YAMLSequence.h"
+#include "Reading/ObjectFileReader.h"
 #include "Repair/YAMLTypeInfo.h"
+#include "Values/YAMLScalar.h"
+#include "Values/YAMLSequence.h"
+#include "Writing/ObjectFileWriter.h"
 
 #include <algorithm>
 #include <sstream>
@@ -78,7 +79,7 @@ bool Parse(const std::string& file, bool fast, OvrinObjects& objects) {
 bool Write(const OvrinObjects& objects, std::string& text) {
     std::ostringstream stream;
     try {
-        objects.Output(stream);
+        Output(objects, stream);
     } catch (const YAMLError&) { // of repeated keys in some other object
         return false;
     }

@@ -2,12 +2,12 @@
 
 #include "Descriptor.h"
 #include "DiffCommand.h"
-#include "Document/YAMLScalar.h"
 #include "ErrMsg.h"
 #include "MergeCommand.h"
 #include "SelfCheck.h"
 #include "StripCommand.h"
 #include "Usage.h"
+#include "Values/YAMLScalar.h"
 
 #include <functional>
 #include <sstream>

@@ -2,7 +2,7 @@
 
 #include "ErrMsg.h"
 
-#include "Document/Arena.h"
+#include "Values/Arena.h"
 
 #include <algorithm>
 #include <cerrno>

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "Document/ObjectFile.h"
-#include "Document/YAMLError.h"
+#include "Reading/ObjectFile.h"
+#include "Values/YAMLError.h"
 
 #include <exception>
 #include <new>

@@ -7,7 +7,7 @@
 #include "FileUtils.h"
 #include "MergePipeline.h"
 
-#include "Document/YAMLError.h"
+#include "Values/YAMLError.h"
 
 #include <algorithm>
 #include <exception>

@@ -13,13 +13,14 @@
 #include "TimerStat.h"
 
 #include "Diff/YAMLMappingDiff.h"
-#include "Document/OvrinObjects.h"
-#include "Document/YAMLError.h"
 #include "Merge/ConflictReport.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Repair/FileIDCollisions.h"
 #include "Repair/PostProcess.h"
 #include "Repair/PreProcess.h"
+#include "Values/OvrinObjects.h"
+#include "Values/YAMLError.h"
+#include "Writing/ObjectFileWriter.h"
 
 #include <iostream>
 #include <memory>
@@ -143,7 +144,7 @@ int OutputConflicts(TimerStat& root, const MergeConfig& config, const RecordingC
 
 int OutputResult(TimerStat& root, const std::string& path, const OvrinObjects& result) {
     TimerStat timer(root, "Output result");
-    return WriteOutput(path, [&](std::ostream& stream) { result.Output(stream); });
+    return WriteOutput(path, [&](std::ostream& stream) { Output(result, stream); });
 }
 
 /// Premerged files that can't be written are lost without a word where nobody is to work on them. Returns 0;

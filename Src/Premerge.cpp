@@ -8,6 +8,7 @@
 #include "Diff/MergeRules.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Repair/PostProcess.h"
+#include "Writing/ObjectFileWriter.h"
 
 #include <memory>
 #include <ostream>
@@ -32,7 +33,7 @@ int Premerge(MergeResolve resolve, TimerStat& parent, const std::string& path, O
         PostProcessMergeOnly(objects.GetMapping(), inputs.left, inputs.right, resolver);
     }
     TimerStat outputTimer(timer, "Output premerge result");
-    return WriteOutput(path, [&](std::ostream& stream) { objects.Output(stream); });
+    return WriteOutput(path, [&](std::ostream& stream) { Output(objects, stream); });
 }
 
 Thread SpawnPremergeThread(MergeResolve resolve, const std::string& path, OvrinObjects& objects,

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "Diff/YAMLMappingDiff.h"
-#include "Document/OvrinObjects.h"
+#include "Values/OvrinObjects.h"
 
 struct MergeConfig;
 class TimerStat;

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/ObjectFile.h"
+#include "Reading/ObjectFile.h"
 
 #include <string>
 #include <vector>

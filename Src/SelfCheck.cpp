@@ -2,7 +2,7 @@
 
 #include "SelfCheckParts.h"
 
-#include "Document/YAMLError.h"
+#include "Values/YAMLError.h"
 
 #include <algorithm>
 #include <iostream>

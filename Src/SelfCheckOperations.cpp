@@ -6,7 +6,7 @@
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
-#include "Document/YAMLError.h"
+#include "Values/YAMLError.h"
 
 using namespace ovrin_yaml;
 

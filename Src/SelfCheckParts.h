@@ -1,10 +1,10 @@
 #pragma once
 
 #include "Diff/Operation.h"
-#include "Document/YAMLMapping.h"
-#include "Document/YAMLSequence.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "TestResults.h"
+#include "Values/YAMLMapping.h"
+#include "Values/YAMLSequence.h"
 
 #include <initializer_list>
 #include <string>

@@ -7,7 +7,8 @@
 #include "TwoFiles.h"
 
 #include "Diff/YAMLMappingDiff.h"
-#include "Document/YAMLMapping.h"
+#include "Values/YAMLMapping.h"
+#include "Writing/ObjectFileWriter.h"
 
 #include <iostream>
 #include <sstream>
@@ -45,7 +46,7 @@ int HandleStripCommand(StripConfig& config) {
     // The text is complete before the destination is touched: an object that can't be written ends the
     // command.
     std::ostringstream text;
-    files.right.Output(text);
+    Output(files.right, text);
     const int error =
         Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});
     return error ? FailToWrite(config.destFile, error) : 0;

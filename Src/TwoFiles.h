@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/OvrinObjects.h"
+#include "Values/OvrinObjects.h"
 
 struct TwoFileConfig;
 class TimerStat;

@@ -1,5 +1,5 @@
 #include "Diff/YAMLDiffOutput.h"
-#include "Document/ObjectFileReader.h"
+#include "Reading/ObjectFileReader.h"
 #include "Support/Diffs.h"
 
 #include <sstream>

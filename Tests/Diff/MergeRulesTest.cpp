@@ -1,5 +1,5 @@
 #include "Diff/MergeRules.h"
-#include "Document/YAMLMapping.h"
+#include "Values/YAMLMapping.h"
 
 #include <gtest/gtest.h>
 

@@ -3,7 +3,7 @@
 #include "Support/Documents.h"
 #include "Support/RandomDocuments.h"
 
-#include "Document/ObjectFileReader.h"
+#include "Reading/ObjectFileReader.h"
 #include "Repair/ObjectTraits.h"
 
 #include <gtest/gtest.h>

@@ -1,7 +1,7 @@
 #include "FileUtils.h"
 
-#include "Document/YAMLError.h"
 #include "InputFiles.h"
+#include "Values/YAMLError.h"
 
 #include <gtest/gtest.h>
 

@@ -1,6 +1,6 @@
-#include "Document/YAMLError.h"
 #include "Thread.h"
 #include "TimerStat.h"
+#include "Values/YAMLError.h"
 
 #include <gtest/gtest.h>
 

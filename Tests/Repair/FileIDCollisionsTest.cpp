@@ -1,7 +1,7 @@
 #include "Repair/FileIDCollisions.h"
 
-#include "Document/YAMLSequence.h"
 #include "Support/ObjectText.h"
+#include "Values/YAMLSequence.h"
 
 #include <gtest/gtest.h>
 

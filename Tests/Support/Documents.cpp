@@ -1,8 +1,9 @@
 #include "Support/Documents.h"
 
-#include "Document/CheckTree.h"
-#include "Document/DocumentLoader.h"
-#include "Document/ObjectFileReader.h"
+#include "Reading/DocumentLoader.h"
+#include "Reading/ObjectFileReader.h"
+#include "Writing/CheckTree.h"
+#include "Writing/ObjectFileWriter.h"
 
 #include <gtest/gtest.h>
 
@@ -81,7 +82,7 @@ std::string ObjectText(const std::string& documents) {
 std::string Written(const OvrinObjects& objects) {
     EXPECT_EQ(CheckTree(objects.GetMapping(), TreeStage::Changed), "");
     std::ostringstream stream;
-    objects.Output(stream);
+    Output(objects, stream);
     return stream.str();
 }
 

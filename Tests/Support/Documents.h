@@ -1,10 +1,10 @@
 #pragma once
 
-#include "Document/OvrinObjects.h"
-#include "Document/YAMLError.h"
-#include "Document/YAMLMapping.h"
-#include "Document/YAMLScalar.h"
-#include "Document/YAMLSequence.h"
+#include "Values/OvrinObjects.h"
+#include "Values/YAMLError.h"
+#include "Values/YAMLMapping.h"
+#include "Values/YAMLScalar.h"
+#include "Values/YAMLSequence.h"
 
 #include <string>
 

@@ -1,8 +1,8 @@
 #include "Support/Merges.h"
 
 #include "Diff/CheckDiff.h"
-#include "Document/CheckTree.h"
 #include "Merge/ConflictReport.h"
+#include "Writing/CheckTree.h"
 
 #include <sstream>
 

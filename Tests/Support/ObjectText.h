@@ -1,9 +1,10 @@
 #pragma once
 
-#include "Document/CheckTree.h"
-#include "Document/ObjectFileReader.h"
-#include "Document/OvrinObjects.h"
-#include "Document/YAMLScalar.h"
+#include "Reading/ObjectFileReader.h"
+#include "Values/OvrinObjects.h"
+#include "Values/YAMLScalar.h"
+#include "Writing/CheckTree.h"
+#include "Writing/ObjectFileWriter.h"
 
 #include <gtest/gtest.h>
 
@@ -48,7 +49,7 @@ public:
     std::string Text() const {
         EXPECT_EQ(CheckTree(m_Objects.GetMapping(), TreeStage::Changed), "");
         std::ostringstream stream;
-        m_Objects.Output(stream);
+        Output(m_Objects, stream);
         std::istringstream written(stream.str());
         std::string text;
         for (std::string line; std::getline(written, line);) {

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "Document/YAMLMapping.h"
-#include "Document/YAMLScalar.h"
-#include "Document/YAMLSequence.h"
+#include "Values/YAMLMapping.h"
+#include "Values/YAMLScalar.h"
+#include "Values/YAMLSequence.h"
 
 #include <initializer_list>
 #include <string_view>

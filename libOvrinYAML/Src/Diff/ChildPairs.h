@@ -1,9 +1,9 @@
 #pragma once
 
 #include "Diff/CreateDiffOperation.h"
-#include "Document/AlignedLookup.h"
-#include "Document/YAMLMapping.h"
-#include "Document/YAMLSequence.h"
+#include "Values/AlignedLookup.h"
+#include "Values/YAMLMapping.h"
+#include "Values/YAMLSequence.h"
 
 #include <algorithm>
 

@@ -5,8 +5,9 @@
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
-#include "Document/ObjectFileWriter.h"
-#include "Document/YAMLMapping.h"
+#include "Values/YAMLMapping.h"
+#include "Writing/ObjectFileWriter.h"
+#include "Writing/YAMLEmitter.h"
 
 namespace ovrin_yaml {
 
@@ -15,7 +16,7 @@ namespace {
 /// An object is shown without its header data.
 std::string TextOf(const YAMLNode* value) {
     const YAMLMapping* mapping = AsMapping(value);
-    if (!mapping || !mapping->HasKey(YAMLScalar::classIDPlaceHolderName)) return value->GetYAMLString();
+    if (!mapping || !mapping->HasKey(YAMLScalar::classIDPlaceHolderName)) return GetYAMLString(*value);
     std::string text;
     AppendObjectBody(*mapping, text);
     return text;
@@ -48,7 +49,7 @@ void RemoveOperation::Output(YAMLDiffOutput& output) const {
 }
 
 void ChangeOperation::Output(YAMLDiffOutput& output) const {
-    output << "change to " << m_Value->GetYAMLString() << endl;
+    output << "change to " << GetYAMLString(*m_Value) << endl;
 }
 
 void AddOperation::Output(YAMLDiffOutput& output) const {

@@ -1,7 +1,7 @@
 #include "Diff/EqualityMatcher.h"
 
-#include "Document/YAMLMapping.h"
-#include "Document/YAMLScalar.h"
+#include "Values/YAMLMapping.h"
+#include "Values/YAMLScalar.h"
 
 #include <algorithm>
 #include <cstdint>

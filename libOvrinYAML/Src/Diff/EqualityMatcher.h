@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/YAMLSequence.h"
+#include "Values/YAMLSequence.h"
 
 #include <cstddef>
 #include <cstdint>

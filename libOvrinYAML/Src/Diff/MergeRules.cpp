@@ -1,6 +1,6 @@
 #include "Diff/MergeRules.h"
 
-#include "Document/YAMLMapping.h"
+#include "Values/YAMLMapping.h"
 
 #include <algorithm>
 

@@ -3,8 +3,8 @@
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
-#include "Document/YAMLMapping.h"
-#include "Document/YAMLSequence.h"
+#include "Values/YAMLMapping.h"
+#include "Values/YAMLSequence.h"
 
 namespace ovrin_yaml {
 

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "Document/YAMLAlloc.h"
-#include "Document/YAMLNode.h"
-#include "Document/YAMLScalar.h"
+#include "Values/YAMLAlloc.h"
+#include "Values/YAMLNode.h"
+#include "Values/YAMLScalar.h"
 
 namespace ovrin_yaml {
 

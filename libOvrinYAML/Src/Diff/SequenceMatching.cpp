@@ -3,7 +3,7 @@
 #include "Diff/EqualityMatcher.h"
 #include "Diff/MergeRules.h"
 #include "Diff/YAMLSequenceRemapper.h"
-#include "Document/KeyIndex.h"
+#include "Values/KeyIndex.h"
 
 #include <algorithm>
 #include <memory>

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "Diff/Operation.h"
-#include "Document/KeyIndex.h"
+#include "Values/KeyIndex.h"
 
 #include <memory>
 #include <vector>

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "Diff/Operation.h"
-#include "Document/YAMLSequence.h"
+#include "Values/YAMLSequence.h"
 
 #include <set>
 #include <utility>

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "Document/YAMLAlloc.h"
-#include "Document/YAMLScalar.h"
-#include "Document/YAMLSequence.h"
+#include "Values/YAMLAlloc.h"
+#include "Values/YAMLScalar.h"
+#include "Values/YAMLSequence.h"
 
 #include <cstddef>
 #include <string>

@@ -1,6 +1,6 @@
 #include "Merge/PropertyPath.h"
 
-#include "Document/Arena.h"
+#include "Values/Arena.h"
 
 #include <algorithm>
 #include <new>

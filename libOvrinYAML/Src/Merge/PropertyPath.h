@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/YAMLScalar.h"
+#include "Values/YAMLScalar.h"
 
 #include <span>
 #include <string>

@@ -5,8 +5,8 @@
 #include "Diff/MergeTreeVisitors.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
-#include "Document/YAMLError.h"
-#include "Document/YAMLMapping.h"
+#include "Values/YAMLError.h"
+#include "Values/YAMLMapping.h"
 
 #include <algorithm>
 

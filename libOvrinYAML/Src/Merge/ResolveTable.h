@@ -1,7 +1,7 @@
 #pragma once
 
-#include "Document/YAMLScalar.h"
 #include "Merge/MergeResolve.h"
+#include "Values/YAMLScalar.h"
 
 #include <cstddef>
 #include <optional>

@@ -1,6 +1,6 @@
 #include "Merge/YAMLConflict.h"
 
-#include "Document/YAMLError.h"
+#include "Values/YAMLError.h"
 
 namespace ovrin_yaml {
 

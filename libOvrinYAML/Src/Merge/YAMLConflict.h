@@ -2,10 +2,10 @@
 
 #include "Diff/MergeTreeVisitors.h"
 #include "Diff/Operation.h"
-#include "Document/YAMLScalar.h"
 #include "Merge/ConflictType.h"
 #include "Merge/MergeResolve.h"
 #include "Merge/PropertyPath.h"
+#include "Values/YAMLScalar.h"
 
 #include <unordered_set>
 #include <vector>

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "Document/YAMLMapping.h"
 #include "Merge/YAMLConflict.h"
 #include "Repair/YAMLTypeInfo.h"
+#include "Values/YAMLMapping.h"
 
 #include <vector>
 

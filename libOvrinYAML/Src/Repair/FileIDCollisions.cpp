@@ -1,9 +1,9 @@
 #include "Repair/FileIDCollisions.h"
 
-#include "Document/AlignedLookup.h"
-#include "Document/Hash.h"
-#include "Document/OvrinObjects.h"
 #include "Repair/ObjectAccess.h"
+#include "Values/AlignedLookup.h"
+#include "Values/Hash.h"
+#include "Values/OvrinObjects.h"
 
 #include <algorithm>
 #include <climits>

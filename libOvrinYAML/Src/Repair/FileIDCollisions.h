@@ -1,7 +1,7 @@
 #pragma once
 
-#include "Document/YAMLMapping.h"
-#include "Document/YAMLScalar.h"
+#include "Values/YAMLMapping.h"
+#include "Values/YAMLScalar.h"
 
 #include <vector>
 

@@ -1,6 +1,6 @@
 #include "Repair/ObjectAccess.h"
 
-#include "Document/AlignedLookup.h"
+#include "Values/AlignedLookup.h"
 
 namespace ovrin_yaml {
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Document/YAMLMapping.h"
+#include "Values/YAMLMapping.h"
 
 #include <cstdint>
 

@@ -1,7 +1,7 @@
 #include "Repair/YAMLTypeInfo.h"
 
-#include "Document/YAMLMapping.h"
-#include "Document/YAMLSequence.h"
+#include "Values/YAMLMapping.h"
+#include "Values/YAMLSequence.h"
 
 #include <stdexcept>
 #include <string>

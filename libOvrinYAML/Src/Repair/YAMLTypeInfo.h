@@ -1,7 +1,7 @@
 #pragma once
 
-#include "Document/OvrinObjects.h"
-#include "Document/YAMLScalar.h"
+#include "Values/OvrinObjects.h"
+#include "Values/YAMLScalar.h"
 
 #include <set>
 #include <string_view>

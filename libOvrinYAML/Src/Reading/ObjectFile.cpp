@@ -1,0 +1,277 @@
+#include "Reading/ObjectFile.h"
+
+#include "Reading/ChunkWalker.h"
+#include "Reading/Fast/WrittenFormReader.h"
+#include "Values/Arena.h"
+#include "Values/ScalarTable.h"
+#include "Values/YAMLScalar.h"
+
+#include <algorithm>
+#include <atomic>
+#include <cstring>
+
+namespace ovrin_yaml {
+
+namespace {
+
+constexpr std::string_view kSignature = "%YAML";
+constexpr std::string_view kMarker = "---";
+constexpr std::string_view kDocumentStart = "--- !o!";
+constexpr std::string_view kNextHeader = "\n--- !o!";
+/// Lines in a header of the usual form; the parser counts them in every document.
+constexpr std::uint32_t kHeaderLines = 2;
+/// Text that is read at one go: enough for a reader to get to know the common texts, little enough to share
+/// out.
+constexpr std::size_t kPieceBytes = std::size_t{1} << 20;
+
+/// The file id in a document's header line, where that has the usual form.
+std::string_view FileIDOf(const char* begin, const char* end) {
+    const std::string_view line(begin, static_cast<std::size_t>(std::find(begin, end, '\n') - begin));
+    const std::size_t anchor = line.find('&');
+    if (anchor == std::string_view::npos) return {};
+    return line.substr(anchor + 1, line.find(' ', anchor) - anchor - 1);
+}
+
+} // namespace
+
+std::string_view ObjectFile::FileIDOf(const Document& document) {
+    return ovrin_yaml::FileIDOf(document.begin, document.begin + document.length);
+}
+
+void ObjectFile::Take(std::string bytes) {
+    if (std::string_view(bytes).substr(0, kSignature.size() + 4).find(kSignature) == std::string_view::npos)
+        throw YAMLError(
+            "File is not a valid text serialized YAML file. Make sure that Asset Serialization is "
+            "set to 'Force text' in Editor Settings.");
+    if (const void* nul = std::memchr(bytes.data(), '\0', bytes.size()))
+        bytes.resize(static_cast<std::size_t>(static_cast<const char*>(nul) - bytes.data()));
+    TakeText(std::move(bytes));
+}
+
+void ObjectFile::TakeText(std::string text) {
+    m_Text = std::make_shared<const std::string>(std::move(text));
+    m_Header = std::string_view(*m_Text).substr(0, m_Text->find(kMarker));
+}
+
+/// "%YAML 1.1" and the %TAG line of the handle "!o!", with nothing in its prefix that isn't plain in every
+/// sense.
+bool ObjectFile::HasWrittenHeader() const {
+    constexpr std::string_view kBegin = "%YAML 1.1\n%TAG !o! tag:";
+    if (!m_Header.starts_with(kBegin) || !m_Header.ends_with('\n')) return false;
+    const std::string_view prefix = m_Header.substr(kBegin.size(), m_Header.size() - kBegin.size() - 1);
+    const auto isPlain = [](char c) {
+        return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') ||
+               std::string_view(".,:-").find(c) != std::string_view::npos;
+    };
+    return std::all_of(prefix.begin(), prefix.end(), isPlain) &&
+           std::string_view(*m_Text).substr(m_Header.size()).starts_with(kDocumentStart);
+}
+
+void ObjectFile::Cut(ObjectFile* base) {
+    if (!m_Options.fast || !HasWrittenHeader()) return;
+    if (base && m_Options.share && !base->m_Documents.empty() && m_Header == base->m_Header) {
+        m_Base = base;
+        CutAlong();
+    } else {
+        CutAlone();
+    }
+    MakePieces();
+}
+
+/// Looks for the first "!" of "\n--- !o!": a sign that stands in headers and seldom elsewhere is found many
+/// times faster than one that stands in every line.
+const char* ObjectFile::FindDocumentEnd(const char* begin) const {
+    constexpr std::size_t kSignAt = kNextHeader.find('!');
+    const char* position = begin + kDocumentStart.size();
+    while (position < End()) {
+        const auto* sign =
+            static_cast<const char*>(std::memchr(position, '!', static_cast<std::size_t>(End() - position)));
+        if (!sign) break;
+        const char* header = sign - kSignAt;
+        if (std::string_view(header, static_cast<std::size_t>(End() - header)).starts_with(kNextHeader))
+            return header + 1;
+        position = sign + 1;
+    }
+    return End();
+}
+
+void ObjectFile::CutAlone() {
+    // A guess that spares the table most of its growing.
+    constexpr std::size_t kBytesPerScalar = 56;
+    ScalarTable::Instance().Reserve(m_Text->size() / kBytesPerScalar);
+    constexpr std::size_t kBytesPerDocument = 400;
+    ReserveDocuments(m_Text->size() / kBytesPerDocument);
+    for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
+        const char* end = FindDocumentEnd(begin);
+        AddDocument(begin, static_cast<std::size_t>(end - begin), kNone);
+        begin = end;
+    }
+}
+
+void ObjectFile::ReserveDocuments(std::size_t count) {
+    m_Documents.reserve(count);
+    AdviseHugePages(m_Documents.data(), count * sizeof(Document));
+}
+
+void ObjectFile::AddDocument(const char* begin, std::size_t length, std::size_t lender) {
+    m_Documents.push_back({begin, length, lender});
+    if (lender == kNone) return;
+    // Left and right may want one object at the same time, and say the same.
+    std::atomic_ref(m_Base->m_Documents[lender].isWanted).store(true, std::memory_order_relaxed);
+}
+
+/// Whether the base's document stands at `position` in the same words and ends there, too.
+bool ObjectFile::StandsAt(const Document& document, const char* position, const char* end) const {
+    const std::size_t left = static_cast<std::size_t>(end - position);
+    if (left < document.length || std::memcmp(position, document.begin, document.length) != 0) return false;
+    if (left == document.length) return true;
+    return position[document.length - 1] == '\n' &&
+           std::string_view(position + document.length, left - document.length).starts_with(kDocumentStart);
+}
+
+/// Most documents follow each other as they do in the base, so the base's next one is tried before any
+/// search.
+void ObjectFile::CutAlong() {
+    const std::vector<Document>& known = m_Base->m_Documents;
+    ReserveDocuments(known.size());
+    std::size_t expected = 0;
+    for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
+        if (expected < known.size() && StandsAt(known[expected], begin, End())) {
+            AddDocument(begin, known[expected].length, expected);
+            ++expected;
+        } else {
+            const char* end = FindDocumentEnd(begin);
+            AddDocument(begin, static_cast<std::size_t>(end - begin), FindLender(begin, end, expected));
+        }
+        begin += m_Documents.back().length;
+    }
+}
+
+/// For a document that isn't the expected one; `expected` becomes the one behind the base's of the same id.
+std::size_t ObjectFile::FindLender(const char* begin, const char* end, std::size_t& expected) const {
+    const std::vector<Document>& known = m_Base->m_Documents;
+    const std::string_view fileID = ovrin_yaml::FileIDOf(begin, end);
+    const bool isChanged = expected < known.size() && FileIDOf(known[expected]) == fileID;
+    const std::size_t index = isChanged ? expected : m_Base->IndexOf(fileID);
+    if (index == kNone) return kNone;
+    expected = index + 1;
+    const bool isSame =
+        known[index].length == static_cast<std::size_t>(end - begin) && StandsAt(known[index], begin, end);
+    return isSame ? index : kNone;
+}
+
+std::size_t ObjectFile::IndexOf(std::string_view fileID) const {
+    // Not std::call_once: a lack of memory can't get through the frames of the C library.
+    const std::lock_guard lock(m_IndexLock);
+    if (m_Index.empty()) {
+        m_Index.reserve(m_Documents.size());
+        for (std::size_t i = 0; i < m_Documents.size(); ++i) m_Index.try_emplace(FileIDOf(m_Documents[i]), i);
+    }
+    const auto found = m_Index.find(fileID);
+    return found == m_Index.end() ? kNone : found->second;
+}
+
+void ObjectFile::MakePieces() {
+    std::size_t bytes = 0;
+    Piece piece{0, 0};
+    for (std::size_t i = 0; i < m_Documents.size(); ++i) {
+        if (m_Documents[i].lender == kNone) bytes += m_Documents[i].length;
+        piece.end = i + 1;
+        if (bytes < kPieceBytes && piece.end != m_Documents.size()) continue;
+        m_Pieces.push_back(piece);
+        piece = {piece.end, piece.end};
+        bytes = 0;
+    }
+}
+
+void ObjectFile::ReadPiece(std::size_t piece) {
+    constexpr std::size_t kAtOnce = 32;
+    WrittenFormReader reader(End());
+    for (std::size_t i = m_Pieces[piece].first; i < m_Pieces[piece].end; i += kAtOnce)
+        ReadDocuments(reader, {&m_Documents[i], std::min(kAtOnce, m_Pieces[piece].end - i)});
+}
+
+/// Reads those that no other file lends.
+void ObjectFile::ReadDocuments(WrittenFormReader& reader, std::span<Document> documents) const {
+    for (Document& document : documents)
+        if (document.lender == kNone) Read(reader, document);
+    reader.InternTexts();
+    for (Document& document : documents)
+        if (document.object) Complete(document);
+}
+
+void ObjectFile::Read(WrittenFormReader& reader, Document& document) const {
+    const auto read = reader.Read({document.begin, document.length}, kHeaderLines);
+    document.object = read.object;
+    document.isAsWritten = read.isAsWritten;
+}
+
+/// What there is to do with an object that the fast reader has read, as long as it is at hand.
+void ObjectFile::Complete(Document& document) const {
+    YAMLMapping& object = *document.object;
+    document.fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
+    if (m_Options.inspect) object.SetTraitsAsRead(m_Options.inspect(object));
+    document.isLendable = !(object.TraitsAsRead() & m_Options.unshared);
+    document.isMarked = document.isLendable && document.isWanted;
+    if (document.isMarked) object.MarkAsShared();
+    if (!m_Base && document.isAsWritten) object.SetSource({document.begin, document.length});
+}
+
+void ObjectFile::Finish() {
+    // What comes before a failure points into it as well.
+    if (!m_Base && !m_Documents.empty()) m_Objects.KeepText(m_Text);
+    // A text that ends behind the first marker holds no document.
+    if (m_Text->size() <= m_Header.size() + 5) return;
+    if (m_Documents.empty())
+        ReadRestByLibrary(m_Header.size());
+    else
+        FinishDocuments();
+    m_Objects.GetMapping().RebuildHash(true);
+}
+
+void ObjectFile::FinishDocuments() {
+    YAMLMapping& root = m_Objects.GetMapping();
+    root.Reserve(m_Documents.size());
+    WrittenFormReader reader(End());
+    for (Document& document : m_Documents) {
+        const Document* lender = document.lender == kNone ? nullptr : &m_Base->m_Documents[document.lender];
+        if (lender && lender->isLendable) {
+            // Nearly always done by now, while the object was at hand.
+            if (!lender->isMarked) lender->object->MarkAsShared();
+            root.Append(lender->fileID, lender->object);
+            continue;
+        }
+        if (lender) {
+            document.lender = kNone;
+            ReadDocuments(reader, {&document, 1});
+        }
+        if (document.object)
+            root.Append(document.fileID, document.object);
+        else if (!ReadByLibrary(document, &document == &m_Documents.back()))
+            return;
+    }
+}
+
+/// Reads a single document with libyaml. If it doesn't end where the next one begins, all that follows goes
+/// the same way, and false is returned.
+bool ObjectFile::ReadByLibrary(const Document& document, bool isLast) {
+    std::string chunk(m_Header);
+    chunk.append(document.begin, document.length);
+    if (!isLast) chunk += kMarker;
+    ChunkWalker walker(std::move(chunk), std::string(m_Header), m_Objects.GetMapping(), m_AliasBudget);
+    if (!walker.ReadDocument()) return false;
+    if (!isLast && walker.Position() == document.length) return true;
+    ReadRestByLibrary(static_cast<std::size_t>(document.begin - m_Text->data()) + walker.Position());
+    return false;
+}
+
+/// Reads everything from the document at `offset` on with libyaml.
+void ObjectFile::ReadRestByLibrary(std::size_t offset) {
+    std::string text(m_Header);
+    text.append(*m_Text, offset);
+    ChunkWalker walker(std::move(text), std::string(m_Header), m_Objects.GetMapping(), m_AliasBudget);
+    while (walker.ReadDocument()) {
+    }
+}
+
+} // namespace ovrin_yaml

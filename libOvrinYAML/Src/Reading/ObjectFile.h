@@ -1,0 +1,119 @@
+#pragma once
+
+#include "Reading/DocumentLoader.h"
+#include "Values/OvrinObjects.h"
+#include "Values/SeededHash.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <mutex>
+#include <span>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+namespace ovrin_yaml {
+
+class WrittenFormReader;
+
+/// How object files are read. What they mean doesn't depend on it: tests and benchmarks switch parts off.
+struct ReaderOptions {
+    bool fast = true;  ///< read documents in written form without libyaml
+    bool share = true; ///< share the objects of documents that are the same in two files, to the letter
+    /// Looks at each object right after the fast reader has read it, while it is at hand; what it returns is
+    /// kept as YAMLMapping::TraitsAsRead. Called from any thread, only for objects without repeated keys.
+    std::uint8_t (*inspect)(const YAMLMapping& object) = nullptr;
+    /// Objects with one of these traits are never shared.
+    std::uint8_t unshared = 0;
+};
+
+/// An object file on its way from text to objects.
+///
+///  1. `Take` tests the signature, and `Cut` cuts the text at the document headers. A file that is cut along
+///     another finds that one's documents in it: what stands there in the same words needs no reading.
+///     Several files may be cut along one at the same time.
+///  2. `ReadPiece` reads some documents that are in written form. Pieces are independent of each other:
+///     any thread may read any piece, each once.
+///  3. `Finish` adds the objects to the root in file order. A document that the fast reader wasn't sure of
+///     goes to libyaml here, so that the first failure in file order is the one that is thrown.
+///
+/// A text whose header hasn't the usual form goes to libyaml as a whole (ChunkWalker), and so does the rest
+/// of a text behind a document that doesn't end where the next header stands.
+///
+/// Sharing: an object that a second file takes is marked, and whoever changes it copies it first
+/// (YAMLMapping::GetForChange). Objects with repeated keys are left to libyaml and are not shared. Only the
+/// file that others are cut along keeps its text, with the objects that are in written form pointing into it:
+/// what nobody changes is written as the bytes that came in.
+class ObjectFile {
+public:
+    /// Fills `objects`, which must be empty and outlive the file.
+    ObjectFile(OvrinObjects& objects, ReaderOptions options) : m_Objects(objects), m_Options(options) {}
+    ObjectFile(const ObjectFile&) = delete;
+    ObjectFile& operator=(const ObjectFile&) = delete;
+
+    /// Takes the bytes of a whole file, up to the first NUL. Throws YAMLError for a file without the
+    /// signature.
+    void Take(std::string bytes);
+    /// The same for a text that needs no signature.
+    void TakeText(std::string text);
+    /// Cuts the text, along `base` if it is not null; that must be cut already and stay where it is. Objects
+    /// that are wanted before they are read are marked as shared while they are at hand.
+    void Cut(ObjectFile* base);
+    std::size_t PieceCount() const { return m_Pieces.size(); }
+    void ReadPiece(std::size_t piece);
+    /// All pieces must have been read, those of the base too. Throws YAMLError.
+    void Finish();
+
+private:
+    struct Document {
+        const char* begin;
+        std::size_t length;
+        std::size_t lender;            // the base's document in the same words, or kNone
+        YAMLMapping* object = nullptr; // null: not read, or left to libyaml
+        YAMLScalar* fileID = nullptr;  // of the object
+        std::uint8_t isWanted = false; // another file would take the object; set by several threads
+        bool isLendable = false; // the object may be copied before a change, so another file may take it
+        bool isMarked = false;   // the object is marked as shared
+        bool isAsWritten = false;
+    };
+    struct Piece {
+        std::size_t first, end; // documents
+    };
+    static constexpr std::size_t kNone = SIZE_MAX;
+
+    static std::string_view FileIDOf(const Document& document);
+    bool HasWrittenHeader() const;
+    const char* End() const { return m_Text->data() + m_Text->size(); }
+    const char* FindDocumentEnd(const char* begin) const;
+    bool StandsAt(const Document& document, const char* position, const char* end) const;
+    std::size_t FindLender(const char* begin, const char* end, std::size_t& expected) const;
+    std::size_t IndexOf(std::string_view fileID) const;
+    void CutAlong();
+    void ReserveDocuments(std::size_t count);
+    void AddDocument(const char* begin, std::size_t length, std::size_t lender);
+    void CutAlone();
+    void MakePieces();
+    void ReadDocuments(WrittenFormReader& reader, std::span<Document> documents) const;
+    void Read(WrittenFormReader& reader, Document& document) const;
+    void Complete(Document& document) const;
+    void FinishDocuments();
+    bool ReadByLibrary(const Document& document, bool isLast);
+    void ReadRestByLibrary(std::size_t offset);
+
+    OvrinObjects& m_Objects;
+    const ReaderOptions m_Options;
+    ObjectFile* m_Base = nullptr;
+    std::shared_ptr<const std::string> m_Text;
+    std::string_view m_Header;
+    std::vector<Document> m_Documents; // empty: libyaml reads all of the text
+    std::vector<Piece> m_Pieces;
+    AliasBudget m_AliasBudget;
+
+    // File id to document, for the files that are cut along this one; made by the first that asks.
+    mutable std::mutex m_IndexLock;
+    mutable std::unordered_map<std::string_view, std::size_t, SeededHash> m_Index;
+};
+
+} // namespace ovrin_yaml

@@ -1,0 +1,45 @@
+#include "Values/KeyIndex.h"
+
+#include "Values/Arena.h"
+
+#include <bit>
+
+namespace ovrin_yaml {
+
+void KeyIndex::Reserve(std::size_t count) {
+    const std::size_t capacity = std::bit_ceil(2 * count + 2);
+    if (capacity > m_Slots.size()) Rehash(capacity);
+}
+
+void KeyIndex::Set(const YAMLScalar* key, std::uint32_t position) {
+    if (2 * (m_Count + 1) > m_Slots.size()) Reserve(m_Count + 1);
+    Slot& slot = m_Slots[PlaceOf(key)];
+    if (!slot.key) ++m_Count;
+    slot = {key, position};
+}
+
+std::uint32_t KeyIndex::Find(const YAMLScalar* key) const {
+    if (m_Slots.empty()) return kMissing;
+    const Slot& slot = m_Slots[PlaceOf(key)];
+    return slot.key ? slot.position : kMissing;
+}
+
+std::size_t KeyIndex::PlaceOf(const YAMLScalar* key) const {
+    const std::size_t mask = m_Slots.size() - 1;
+    // Addresses are multiples of eight and close to each other: spread them (Fibonacci hashing).
+    std::size_t place = (reinterpret_cast<std::uintptr_t>(key) >> 3) * 0x9e3779b97f4a7c15u >> 20;
+    while (m_Slots[place & mask].key && m_Slots[place & mask].key != key) ++place;
+    return place & mask;
+}
+
+void KeyIndex::Rehash(std::size_t capacity) {
+    std::vector<Slot> old;
+    old.reserve(capacity);
+    AdviseHugePages(old.data(), capacity * sizeof(Slot));
+    old.resize(capacity);
+    old.swap(m_Slots);
+    for (const Slot& slot : old)
+        if (slot.key) m_Slots[PlaceOf(slot.key)] = slot;
+}
+
+} // namespace ovrin_yaml

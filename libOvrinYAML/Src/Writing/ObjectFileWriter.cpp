@@ -1,0 +1,61 @@
+#include "Writing/ObjectFileWriter.h"
+
+#include "Values/YAMLScalar.h"
+#include "Writing/YAMLEmitter.h"
+
+#include <ostream>
+#include <vector>
+
+namespace ovrin_yaml {
+
+namespace {
+
+/// Text is handed to the stream in pieces of about this size: big enough to make calls cheap, small enough
+/// to stay in the cache.
+constexpr std::size_t kPieceSize = std::size_t{1} << 20;
+
+constexpr const char* kFileHeader = "%YAML 1.1\n%TAG !o! tag:" OVRIN_TAG_AUTHORITY ",2011:\n";
+
+void AppendHeaderLine(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text) {
+    const YAMLScalar* fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
+    const YAMLScalar* classID = AsScalar(object.Get(YAMLScalar::classIDPlaceHolderName));
+    if (!fileID) fileID = &rootKey;
+    if (!classID) throw YAMLError("Object has no class id: " + std::string(fileID->Value()));
+    text.append("--- !o!").append(classID->Value()).append(" &").append(fileID->Value());
+    if (object.HasKey(YAMLScalar::strippedPrefabPlaceHolderName)) text.append(" stripped");
+    text.push_back('\n');
+}
+
+} // namespace
+
+void AppendObjectBody(const YAMLMapping& object, std::string& text) {
+    std::vector<const YAMLScalar*> keys;
+    std::vector<YAMLNode*> values;
+    for (const YAMLMapping::Entry entry : object) {
+        if (IsPlaceHolderKey(entry.key)) continue;
+        keys.push_back(entry.key);
+        values.push_back(entry.value);
+    }
+    YAMLEmitter(text).EmitDocument({keys.data(), values.data(), keys.size()}, object.m_Flow);
+}
+
+void Output(const OvrinObjects& objects, std::ostream& stream) {
+    std::string text = kFileHeader;
+    for (const YAMLMapping::Entry entry : objects.GetMapping()) {
+        const YAMLMapping& object = ToMapping(entry.value);
+        if (!object.Source().empty()) {
+            text += object.Source();
+        } else {
+            AppendHeaderLine(*entry.key, object, text);
+            AppendObjectBody(object, text);
+            text.push_back('\n');
+        }
+        if (text.size() < kPieceSize) continue;
+        stream.write(text.data(), static_cast<std::streamsize>(text.size()));
+        text.clear();
+    }
+    stream.write(text.data(), static_cast<std::streamsize>(text.size()));
+    stream.flush();
+}
+
+} // namespace ovrin_yaml

@@ -1,0 +1,208 @@
+#include "Writing/YAMLEmitter.h"
+
+#include "Values/YAMLScalar.h"
+#include "Values/YAMLSequence.h"
+#include "Writing/ScalarWriter.h"
+
+#include <algorithm>
+
+namespace ovrin_yaml {
+
+namespace {
+
+constexpr int kStep = 2;
+constexpr std::size_t kLongestSimpleKey = 128; // in bytes
+
+/// Around the root, so that a block collection there comes to stand at column 0.
+constexpr int kOutsideRoot = -kStep;
+
+bool IsSimpleKey(std::string_view key, ScalarForms forms) {
+    return !forms.lineBreaks && key.size() <= kLongestSimpleKey;
+}
+
+bool IsEmpty(const YAMLMapping::Pairs& pairs) {
+    for (const YAMLMapping::Entry pair : pairs)
+        if (pair.key) return false;
+    return true;
+}
+
+/// Indentation of a flow collection, and of the lines that a scalar folds into. Even at the root that is a
+/// step.
+int ContinuationIndent(int outer) {
+    return std::max(outer + kStep, kStep);
+}
+
+std::string_view TextOf(const YAMLNode& node) {
+    return static_cast<const YAMLScalar&>(node).Value();
+}
+
+} // namespace
+
+void YAMLEmitter::EmitDocument(const YAMLNode& root) {
+    EmitBlockNode(root, kOutsideRoot, Behind::Nothing);
+    if (root.GetKind() == YAMLNode::Kind::Scalar && ClassifyScalar(TextOf(root)).plainInBlock) {
+        m_Output.Break(0);
+        m_Output.Put("...");
+    }
+}
+
+void YAMLEmitter::EmitDocument(const Pairs& pairs, bool flow) {
+    if (flow || IsEmpty(pairs))
+        EmitFlowMapping(pairs, kOutsideRoot, Behind::Nothing);
+    else
+        EmitBlockMapping(pairs, kOutsideRoot, Behind::Nothing);
+}
+
+void YAMLEmitter::EmitBlockNode(const YAMLNode& node, int outer, Behind behind) {
+    if (const YAMLMapping* mapping = AsMapping(&node)) {
+        const Pairs pairs = mapping->RawEntries();
+        if (!mapping->m_Flow && !IsEmpty(pairs)) return EmitBlockMapping(pairs, outer, behind);
+    } else if (const YAMLSequence* sequence = AsSequence(&node)) {
+        if (!sequence->m_Flow && !sequence->m_Items.empty())
+            return EmitBlockSequence(*sequence, outer, behind);
+    } else {
+        Separate(behind);
+        const ScalarForms forms = ClassifyScalar(TextOf(node));
+        return EmitScalar(TextOf(node), forms, forms.plainInBlock, outer);
+    }
+    EmitFlowNode(node, outer, behind);
+}
+
+void YAMLEmitter::EmitBlockMapping(const Pairs& pairs, int outer, Behind behind) {
+    const int indent = outer + kStep;
+    for (const YAMLMapping::Entry pair : pairs) {
+        if (!pair.key) continue;
+        BeginBlockEntry(indent, behind);
+        EmitBlockPair(pair, indent);
+        behind = Behind::Text;
+    }
+}
+
+void YAMLEmitter::EmitBlockPair(const YAMLMapping::Entry& pair, int indent) {
+    const std::string_view key = pair.key->Value();
+    const ScalarForms forms = ClassifyScalar(key);
+    if (IsSimpleKey(key, forms)) {
+        EmitSimpleKey(key, forms, forms.plainInBlock);
+        m_Output.Put(':');
+        EmitBlockNode(*pair.value, indent, Behind::Text);
+    } else {
+        m_Output.Put("? ");
+        EmitScalar(key, forms, forms.plainInBlock, indent);
+        m_Output.Break(indent);
+        m_Output.Put(':');
+        EmitBlockNode(*pair.value, indent, Behind::Indicator);
+    }
+}
+
+void YAMLEmitter::EmitBlockSequence(const YAMLSequence& sequence, int outer, Behind behind) {
+    const int indent = behind == Behind::Text ? outer : outer + kStep;
+    for (const YAMLNode* item : sequence.m_Items) {
+        BeginBlockEntry(indent, behind);
+        m_Output.Put('-');
+        EmitBlockNode(*item, indent, Behind::Indicator);
+        behind = Behind::Text;
+    }
+}
+
+void YAMLEmitter::BeginBlockEntry(int indent, Behind behind) {
+    if (behind == Behind::Text)
+        m_Output.Break(indent);
+    else
+        Separate(behind);
+}
+
+void YAMLEmitter::EmitFlowNode(const YAMLNode& node, int outer, Behind behind) {
+    if (const YAMLMapping* mapping = AsMapping(&node)) {
+        EmitFlowMapping(mapping->RawEntries(), outer, behind);
+    } else if (const YAMLSequence* sequence = AsSequence(&node)) {
+        EmitFlowSequence(*sequence, outer, behind);
+    } else {
+        Separate(behind);
+        const ScalarForms forms = ClassifyScalar(TextOf(node));
+        EmitScalar(TextOf(node), forms, forms.plainInFlow, outer);
+    }
+}
+
+void YAMLEmitter::EmitFlowMapping(const Pairs& pairs, int outer, Behind behind) {
+    Separate(behind);
+    m_Output.Put('{');
+    const int indent = ContinuationIndent(outer);
+    bool first = true;
+    for (const YAMLMapping::Entry pair : pairs) {
+        if (!pair.key) continue;
+        EmitFlowPair(pair, indent, BeginFlowEntry(indent, first));
+        first = false;
+    }
+    m_Output.Put('}');
+}
+
+void YAMLEmitter::EmitFlowPair(const YAMLMapping::Entry& pair, int indent, Behind behind) {
+    const std::string_view key = pair.key->Value();
+    const ScalarForms forms = ClassifyScalar(key);
+    Separate(behind);
+    if (IsSimpleKey(key, forms)) {
+        EmitSimpleKey(key, forms, forms.plainInFlow);
+    } else {
+        m_Output.Put("? ");
+        EmitScalar(key, forms, forms.plainInFlow, indent);
+        if (m_Output.IsBeyondWidth())
+            m_Output.Break(indent);
+        else
+            m_Output.Put(' ');
+    }
+    m_Output.Put(':');
+    EmitFlowNode(*pair.value, indent, Behind::Text);
+}
+
+void YAMLEmitter::EmitFlowSequence(const YAMLSequence& sequence, int outer, Behind behind) {
+    Separate(behind);
+    m_Output.Put('[');
+    const int indent = ContinuationIndent(outer);
+    bool first = true;
+    for (const YAMLNode* item : sequence.m_Items) {
+        EmitFlowNode(*item, indent, BeginFlowEntry(indent, first));
+        first = false;
+    }
+    m_Output.Put(']');
+}
+
+YAMLEmitter::Behind YAMLEmitter::BeginFlowEntry(int indent, bool first) {
+    if (!first) m_Output.Put(',');
+    if (m_Output.IsBeyondWidth()) {
+        m_Output.Break(indent);
+        return Behind::Nothing;
+    }
+    return first ? Behind::Nothing : Behind::Text;
+}
+
+void YAMLEmitter::EmitSimpleKey(std::string_view key, ScalarForms forms, bool plainAllowed) {
+    constexpr Folding kNoFolding{false, 0};
+    if (plainAllowed && !key.empty())
+        WritePlain(m_Output, key, kNoFolding);
+    else if (forms.singleQuoted)
+        WriteSingleQuoted(m_Output, key, kNoFolding);
+    else
+        WriteDoubleQuoted(m_Output, key, kNoFolding);
+}
+
+void YAMLEmitter::EmitScalar(std::string_view text, ScalarForms forms, bool plainAllowed, int outer) {
+    const Folding folding{true, ContinuationIndent(outer)};
+    if (plainAllowed)
+        WritePlain(m_Output, text, folding);
+    else if (forms.singleQuoted)
+        WriteSingleQuoted(m_Output, text, folding);
+    else
+        WriteDoubleQuoted(m_Output, text, folding);
+}
+
+void YAMLEmitter::Separate(Behind behind) {
+    if (behind != Behind::Nothing) m_Output.Put(' ');
+}
+
+std::string GetYAMLString(const YAMLNode& node) {
+    std::string text;
+    YAMLEmitter(text).EmitDocument(node);
+    return text;
+}
+
+} // namespace ovrin_yaml
