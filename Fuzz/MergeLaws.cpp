@@ -105,11 +105,22 @@ std::unique_ptr<OvrinObjects> Read(const std::string& file) {
     return objects;
 }
 
-using Contents = std::map<std::string, std::uint32_t>;
+/// An object by the two hashes that tell whether it is the same.
+struct Content {
+    explicit Content(const YAMLNode& object)
+        : hash(ContentHash(object)), unordered(ContentHash(object, KeyOrder::CountsNot)) {}
 
-Contents ContentsOf(const YAMLMapping& root, KeyOrder order) {
+    bool IsSame(const Content& other, KeyOrder order) const {
+        return hash == other.hash || (order == KeyOrder::CountsNot && unordered == other.unordered);
+    }
+
+    std::uint32_t hash, unordered;
+};
+using Contents = std::map<std::string, Content>;
+
+Contents ContentsOf(const YAMLMapping& root) {
     Contents contents;
-    for (const auto& [id, object] : root) contents.emplace(id->Value(), ContentHash(*object, order));
+    for (const auto& [id, object] : root) contents.emplace(id->Value(), Content(*object));
     return contents;
 }
 
@@ -173,11 +184,11 @@ private:
         const YAMLMapping& changed = m_Changed->GetMapping();
         const KeyOrder order =
             OnlyKeysMove(base.GetMapping(), changed) ? KeyOrder::CountsNot : KeyOrder::Counts;
-        const Contents expected = ContentsOf(changed, order);
-        const Contents actual = ContentsOf(merged->GetMapping(), order);
+        const Contents expected = ContentsOf(changed), actual = ContentsOf(merged->GetMapping());
         if (actual.size() != expected.size()) return which + " has other objects";
-        for (const auto& [id, hash] : expected)
-            if (!actual.contains(id) || actual.at(id) != hash) return which + " has another object " + id;
+        for (const auto& [id, content] : expected)
+            if (!actual.contains(id) || !actual.at(id).IsSame(content, order))
+                return which + " has another object " + id;
         return "";
     }
 
