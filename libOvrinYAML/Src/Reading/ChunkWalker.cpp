@@ -15,12 +15,22 @@ constexpr std::string_view kIdCharacters = "0123456789-";
 /// More than the parser decodes ahead of what it scans.
 constexpr std::size_t kDecodedAhead = std::size_t{64} << 10;
 
+/// The parser compares the directives of a header with each other, for every document.
+constexpr int kMostDirectives = 100;
+
 const char* const kLostPlace = "Error locating end of document sequence";
 
 std::string_view IdAt(std::string_view text, std::size_t position) {
     if (position >= text.size()) return {};
     const std::string_view rest = text.substr(position);
     return rest.substr(0, rest.find_first_not_of(kIdCharacters));
+}
+
+void RequireFewDirectives(std::string_view header) {
+    int directives = 0;
+    for (std::size_t at = 0; (at = header.find('%', at)) != header.npos; ++at)
+        if (at == 0 || header[at - 1] == '\n' || header[at - 1] == '\r') ++directives;
+    if (directives > kMostDirectives) throw YAMLError("Too many directives");
 }
 
 bool IsUnusual(char c) {
@@ -85,7 +95,9 @@ void AddHeaderData(YAMLMapping& object, YAMLScalar* fileID, std::string_view cla
 
 ChunkWalker::ChunkWalker(std::string text, std::string header, YAMLMapping& root, AliasBudget& budget)
     : m_Text(std::move(text)), m_Header(std::move(header)), m_Short(Shorten(m_Header)),
-      m_HeaderAnchor(m_Header.find('&')), m_Root(root), m_Budget(budget) {}
+      m_HeaderAnchor(m_Header.find('&')), m_Root(root), m_Budget(budget) {
+    RequireFewDirectives(m_Header);
+}
 
 /// The directives of a header that consists of complete ASCII lines; the whole of any other. Whether a
 /// directive stands in the last line decides what the parser makes of blanks behind the header, so that a
