@@ -201,7 +201,7 @@ bool ParseStripArgs(CommandLineArguments& arguments, int first, StripConfig& con
 
 int InnerMain(CommandLineArguments& arguments) {
     initialize();
-    OutliveFileSizeLimit();
+    OutliveFailedWrites();
     std::vector<std::string>& args = arguments.args;
     if (args.size() < 2) {
         Refuse("Error: need 'merge' command specified");

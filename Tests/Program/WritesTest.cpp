@@ -71,6 +71,15 @@ TEST_F(Writes, AReportIsLostInSilenceUnlessItSharesStandardOutputWithTheResult) 
     ExpectMessage("-", "No space left on device");
 }
 
+TEST_F(Writes, APipeThatNobodyReadsEndsNothing) {
+    const std::string merge = "mkfifo pipe; exec 3<>pipe 4>pipe 3<&-; rm pipe; "
+                              "\"$OVRIN\" merge --fallback none base.ovrin left.ovrin right.ovrin";
+    EXPECT_EQ(directory.Run(merge + " dest >&4"), 2) << "its report is lost in silence";
+    ExpectMerged("dest");
+    EXPECT_EQ(directory.Run(merge + " >&4"), 1);
+    ExpectMessage("-", "Broken pipe");
+}
+
 TEST_F(Writes, NoToolWorksOnPremergedFilesThatAreNotWhole) {
     directory.Write(
         "tools", "ovrin use \"/bin/cp\" %l %d && touch started\n* use \"/bin/cp\" %l %d && touch started\n");
