@@ -48,14 +48,14 @@ bool IsRefusal(int error) {
 }
 
 /// Makes the file, resembling `old` unless that is null.
-int Make(NewFile& file, const struct stat* old, const Content& content) {
+int Make(NewFile& file, const Descriptor* old, const Content& content) {
     const int error = old ? file.Resemble(*old) : 0;
     return error ? error : file.Fill(content.write);
 }
 
 /// Puts a whole new file at `place`. `old` is what stands there, null for nothing. The file has no name in
 /// the folder while it is being written, if that can be had.
-int PutNewFile(const std::string& place, const struct stat* old, const Content& content) {
+int PutNewFile(const std::string& place, const Descriptor* old, const Content& content) {
     const mode_t mode = old ? 0600 : 0666;
     if (NewFile file(place); file.OpenUnnamed(mode) == 0) {
         if (const int error = Make(file, old, content)) return error;
@@ -80,7 +80,7 @@ int Replace(const Descriptor& file, const std::string& path, const struct stat& 
     if (const int error = FollowLinks(place)) return error;
     struct stat found;
     if (lstat(place.c_str(), &found) != 0) return errno;
-    return IsSameFile(old, found) ? PutNewFile(place, &old, content) : EPERM;
+    return IsSameFile(old, found) ? PutNewFile(place, &file, content) : EPERM;
 }
 
 /// Asks for the space where the file system can tell beforehand. Returns errno or 0.

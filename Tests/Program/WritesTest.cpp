@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <sys/stat.h>
+#include <sys/xattr.h>
 #include <unistd.h>
 
 namespace {
@@ -113,6 +114,24 @@ TEST_F(Writes, TheDestinationIsReplacedAndKeepsModeAndOwner) {
     EXPECT_EQ(after.st_uid, owned.st_uid);
     EXPECT_EQ(after.st_gid, owned.st_gid);
     EXPECT_TRUE(fs::is_symlink(directory.Path() / "link"));
+}
+
+TEST_F(Writes, TheDestinationKeepsItsAccessListAndGetsNoOtherFromTheFolder) {
+    // Version 2: the user rw, user 4242 r, the group nothing, the mask r, others nothing.
+    const std::string list("\2\0\0\0\1\0\6\0\377\377\377\377\2\0\4\0\222\20\0\0"
+                           "\4\0\0\0\377\377\377\377\20\0\4\0\377\377\377\377\40\0\0\0\377\377\377\377",
+                           44);
+    const std::string folder = directory.Path().string();
+    if (setxattr(folder.c_str(), "system.posix_acl_default", list.data(), list.size(), 0) != 0)
+        GTEST_SKIP() << "no access lists here";
+    const std::string file = folder + "/old";
+    EXPECT_EQ(Merge("old"), 2);
+    EXPECT_EQ(getxattr(file.c_str(), "system.posix_acl_access", nullptr, 0), -1);
+    EXPECT_EQ(setxattr(file.c_str(), "system.posix_acl_access", list.data(), list.size(), 0), 0);
+    EXPECT_EQ(Merge("old"), 2);
+    char kept[44] = {};
+    EXPECT_EQ(getxattr(file.c_str(), "system.posix_acl_access", kept, sizeof(kept)), 44);
+    EXPECT_EQ(std::string(kept, sizeof(kept)), list);
 }
 
 TEST_F(Writes, ANewDestinationGetsTheModeOfTheUserAndStandsWhereLinksEnd) {
