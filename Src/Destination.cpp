@@ -9,8 +9,10 @@
 #include <climits>
 #include <fcntl.h>
 #include <initializer_list>
+#include <linux/magic.h> // PROC_SUPER_MAGIC
 #include <memory>
 #include <sys/stat.h>
+#include <sys/vfs.h>
 #include <unistd.h>
 #include <utility>
 
@@ -29,13 +31,21 @@ bool IsStandardStream(const Descriptor& file, const struct stat& status) {
     });
 }
 
-/// Replaces `path` by what its links lead to, which need not exist. Returns errno or 0.
+/// Whether a link in this folder leads to an open file itself: it reads as a name that the file may have had.
+bool IsFolderOfOpenFiles(const std::string& folder) {
+    struct statfs system;
+    return statfs(folder.c_str(), &system) == 0 && system.f_type == PROC_SUPER_MAGIC;
+}
+
+/// Replaces `path` by what its links lead to, which need not exist. Returns errno or 0; EPERM for what was
+/// named by its number as an open file, and must keep its identity.
 int FollowLinks(std::string& path) {
     constexpr int kMostLinks = 40; // as the system has it
     char target[PATH_MAX];
     for (int i = 0; i < kMostLinks; ++i) {
         const ssize_t length = readlink(path.c_str(), target, sizeof(target));
         if (length < 0) return errno == EINVAL || errno == ENOENT ? 0 : errno;
+        if (IsFolderOfOpenFiles(GetFolder(path))) return EPERM;
         const std::string link(target, static_cast<std::size_t>(length));
         path = link.starts_with('/') ? link : GetFolder(path) + link;
     }

@@ -150,6 +150,10 @@ TEST_F(Writes, WhatMustKeepItsIdentityIsWrittenInPlace) {
     ExpectMerged("second");
     EXPECT_EQ(Merge("/dev/stdout"), 2);
     ExpectMerged("stdout");
+    directory.Run(
+        "seq 9 >open; exec 3<open; \"$OVRIN\" merge --fallback none -o report base.ovrin left.ovrin "
+        "right.ovrin /dev/fd/3; cat <&3 >seen");
+    ExpectMerged("seen");
     EXPECT_EQ(
         directory.Run("mkfifo pipe; cat pipe >piped & \"$OVRIN\" merge --fallback none -o report base.ovrin "
                       "left.ovrin right.ovrin pipe; status=$?; wait; exit $status"),
