@@ -52,9 +52,11 @@ int FollowLinks(std::string& path) {
     return ELOOP;
 }
 
-/// Whether the failure says that a file may not be replaced, which isn't to say that it may not be written.
+/// Whether the failure says that a file can't be replaced, which isn't to say that it can't be written. The
+/// hidden name may be too long where the path isn't.
 bool IsRefusal(int error) {
-    return error == EACCES || error == EPERM || error == EROFS || error == EBUSY || error == EXDEV;
+    return error == EACCES || error == EPERM || error == EROFS || error == EBUSY || error == EXDEV ||
+           error == ENAMETOOLONG;
 }
 
 /// Makes the file, resembling `old` unless that is null.

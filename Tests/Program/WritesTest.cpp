@@ -161,6 +161,12 @@ TEST_F(Writes, WhatMustKeepItsIdentityIsWrittenInPlace) {
     ExpectMerged("piped");
 }
 
+TEST_F(Writes, ThePathOfADestinationMayBeAsLongAsTheSystemHasIt) {
+    const std::string folder = "$(yes ./ | head -n 2046 | tr -d '\\n')"; // PATH_MAX, 4096, is 4 more
+    EXPECT_EQ(Merge(folder + "old"), 2);
+    ExpectMerged("old");
+}
+
 TEST_F(Writes, AFileWrittenInPlaceGetsItsOldBytesBack) {
     directory.Run("ln old second");
     EXPECT_EQ(directory.Run("prlimit --fsize=100 \"$OVRIN\" strip base.ovrin left.ovrin old"), 1);
