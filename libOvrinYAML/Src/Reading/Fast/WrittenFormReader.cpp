@@ -2,9 +2,9 @@
 
 #include "Values/YAMLScalar.h"
 #include "Writing/ScalarStyle.h"
+#include "Writing/WrittenForm.h"
 
 #include <algorithm>
-#include <array>
 #include <bit>
 #include <cstring>
 
@@ -14,44 +14,11 @@ namespace {
 
 /// Deeper and longer documents are left to the library, which has the limits; its own depth is a little more.
 /// What a document of this size holds can be counted in any type that is in use here.
-constexpr int kMaximumDepth = 990;
+constexpr int kSafeDepth = 990;
 constexpr std::size_t kLongestDocument = INT32_MAX;
 /// The parser looks for the colon behind a key within 1024 characters.
 constexpr std::ptrdiff_t kLongestKey = 1000;
-/// The writer gives longer keys another form, and breaks lines behind this column.
-constexpr std::size_t kLongestSimpleKey = 128;
 static_assert(kLongestSimpleKey <= KnownKey::kLongest);
-constexpr std::ptrdiff_t kLineWidth = 80;
-
-enum CharClass : std::uint8_t {
-    kId = 1,         // in class and file ids
-    kPlain = 2,      // inside a plain text in block style, whatever stands beside it
-    kPlainStart = 4, // first in a plain text, whatever follows
-    kFlow = 8,       // inside a plain text in flow style, whatever stands beside it
-    kQuoted = 16,    // stands for itself in quotes
-};
-
-constexpr bool Contains(std::string_view set, int c) {
-    return set.find(static_cast<char>(c)) != set.npos;
-}
-
-constexpr std::array<std::uint8_t, 256> MakeClasses() {
-    std::array<std::uint8_t, 256> classes{};
-    for (int c = 0x21; c < 0x7f; ++c) {
-        if (Contains("0123456789-", c)) classes[c] |= kId;
-        if (!Contains(":#", c)) classes[c] |= kPlain;
-        if (!Contains("-?:,[]{}#&*!|>'\"%@`", c)) classes[c] |= kPlainStart;
-        if (!Contains(",[]{}?:#", c)) classes[c] |= kFlow;
-        if (!Contains("'\"\\", c)) classes[c] |= kQuoted;
-    }
-    return classes;
-}
-
-constexpr std::array<std::uint8_t, 256> kClasses = MakeClasses();
-
-bool Is(char c, CharClass wanted) {
-    return kClasses[static_cast<unsigned char>(c)] & wanted;
-}
 
 /// Bytes behind a document that must be readable: what is compared or tested at one go.
 constexpr std::ptrdiff_t kReadAhead = 160;
@@ -94,14 +61,9 @@ const char* SkipBlanks(const char* p) {
             return p + std::countr_zero(others) / 8;
 }
 
-/// Whether a text could be taken for the marker at the start or the end of a document.
-bool IsLikeMarker(std::string_view text) {
-    return text.starts_with("---") || text.starts_with("...");
-}
-
 /// Whether the writer gives a plain or quoted key this form.
 bool IsKeyAsWritten(std::string_view text) {
-    return !IsLikeMarker(text) && !text.ends_with(':') && text.size() <= kLongestSimpleKey;
+    return !IsLikeMark(text) && !text.ends_with(':') && text.size() <= kLongestSimpleKey;
 }
 
 void AppendUTF8(std::string& text, std::uint32_t c) {
@@ -129,7 +91,7 @@ void AppendUTF8(std::string& text, std::uint32_t c) {
 class WrittenFormReader::Nesting {
 public:
     explicit Nesting(WrittenFormReader& reader) : m_Reader(reader) {
-        if (++m_Reader.m_Depth > kMaximumDepth) throw NotSure();
+        if (++m_Reader.m_Depth > kSafeDepth) throw NotSure();
     }
     ~Nesting() { --m_Reader.m_Depth; }
 
@@ -185,14 +147,13 @@ YAMLMapping* WrittenFormReader::ReadObject(std::uint32_t firstLine) {
 }
 
 WrittenFormReader::Header WrittenFormReader::ReadHeaderLine() {
-    constexpr std::string_view kMarker = "--- !o!", kAnchor = " &", kStripped = " stripped";
     const auto skip = [this](std::string_view text) {
         if (!std::string_view(m_Position, m_End - m_Position).starts_with(text)) return false;
         m_Position += text.size();
         return true;
     };
     Header header;
-    if (!skip(kMarker)) throw NotSure();
+    if (!skip(kDocumentStart)) throw NotSure();
     header.classID = ReadId();
     if (!skip(kAnchor)) throw NotSure();
     header.fileID = ReadId();
@@ -220,10 +181,10 @@ void WrittenFormReader::CloseMapping(std::size_t mark, bool flow, std::uint32_t 
 }
 
 std::string_view WrittenFormReader::ReadId() {
-    const char* begin = m_Position;
-    while (Is(*m_Position, kId)) ++m_Position;
-    if (m_Position == begin) throw NotSure();
-    return {begin, static_cast<std::size_t>(m_Position - begin)};
+    const std::string_view id = IdAt({m_Position, m_End}, 0);
+    if (id.empty()) throw NotSure();
+    m_Position += id.size();
+    return id;
 }
 
 /// From the end of a line to the first character of the next that is no blank.
@@ -281,7 +242,7 @@ KnownKey& WrittenFormReader::ReadBlockKey(const KnownKey& parent, KeyGuess& gues
         m_Position += known->length + 1;
         return *known;
     }
-    if (!Is(*m_Position, kPlainStart)) throw NotSure();
+    if (!IsPlainStart(*m_Position)) throw NotSure();
     const char* end = ScanPlain(m_Position);
     if (*end != ':' || end - m_Position > kLongestKey) throw NotSure();
     return AddKey(end, parent, guess);
@@ -297,8 +258,8 @@ KnownKey& WrittenFormReader::AddKey(const char* end, const KnownKey& parent, Key
     m_Position = end + 1;
     const bool isWritten = IsKeyAsWritten(text);
     NoteIf(!isWritten);
-    const bool isSame = Is(text[0], kPlainStart) &&
-                        std::all_of(text.begin(), text.end(), [](char c) { return Is(c, kFlow); });
+    const bool isSame = IsPlainStart(text[0]) &&
+                        std::all_of(text.begin(), text.end(), [](char c) { return IsPlainInFlow(c); });
     return isWritten && isSame ? m_KnownKeys.Learn(parent, scalar, guess) : m_KnownKeys.Unknown();
 }
 
@@ -313,7 +274,7 @@ void WrittenFormReader::ReadBlockValue(int indent, KnownKey& parent) {
         ReadBlockSequence(indent, parent);
     else if (isEmpty)
         m_Builder.AddScalar(YAMLScalar::empty);
-    else if (m_Indent == indent + 2 && !AtListItem())
+    else if (m_Indent == indent + kIndentStep && !AtListItem())
         ReadBlockMapping(m_Indent, parent);
     else
         throw NotSure();
@@ -332,10 +293,10 @@ void WrittenFormReader::ReadBlockSequence(int indent, KnownKey& parent) {
 void WrittenFormReader::ReadItem(int indent, KnownKey& parent) {
     const bool hasBlank = *++m_Position == ' ';
     if (hasBlank && *++m_Position != '\n') {
-        m_Indent = indent + 2;
+        m_Indent = indent + kIndentStep;
         if (AtListItem()) return ReadBlockSequence(m_Indent, parent);
         const bool isGuessed = GuessBlockKey(parent.inside);
-        if (isGuessed || (Is(*m_Position, kPlainStart) && *ScanPlain(m_Position) == ':'))
+        if (isGuessed || (IsPlainStart(*m_Position) && *ScanPlain(m_Position) == ':'))
             return ReadBlockMapping(m_Indent, parent);
         return ReadInline(indent, parent);
     }
@@ -378,25 +339,25 @@ const char* WrittenFormReader::ScanPlain(const char* from) const {
         case '#':
             break;
         default:
-            if (!Is(*p, kPlain)) throw NotSure();
+            if (!IsPlain(*p)) throw NotSure();
         }
     }
 }
 
 void WrittenFormReader::ReadPlainLines(int indent) {
-    const bool isNegative = *m_Position == '-' && Is(m_Position[1], kPlain);
-    if (!Is(*m_Position, kPlainStart) && !isNegative) throw NotSure();
+    const bool isNegative = *m_Position == '-' && IsPlain(m_Position[1]);
+    if (!IsPlainStart(*m_Position) && !isNegative) throw NotSure();
     const char* begin = m_Position;
     const char* end = ScanPlain(begin);
     if (*end != '\n') throw NotSure();
     NoteText(begin, end);
-    std::ptrdiff_t width = Column(end);
+    std::size_t width = Column(end);
     m_Position = end;
     NextLine();
     if (m_Indent <= indent) return m_Builder.AddText({begin, end});
     m_Text.assign(begin, end);
     while (m_Indent > indent) {
-        NoteIf(width <= kLineWidth || m_Indent != indent + 2);
+        NoteIf(width <= kLineWidth || m_Indent != indent + kIndentStep);
         if (*m_Position == '#') throw NotSure();
         end = ScanPlain(m_Position);
         if (*end != '\n') throw NotSure();
@@ -412,7 +373,7 @@ void WrittenFormReader::ReadPlainLines(int indent) {
 /// A text that stands plain on this line: the writer breaks lines at blanks behind the width, and quotes what
 /// could be taken for a document marker.
 void WrittenFormReader::NoteText(const char* begin, const char* end) {
-    if (begin[0] == begin[1] && (*begin == '-' || *begin == '.')) NoteIf(IsLikeMarker({begin, end}));
+    if (begin[0] == begin[1] && (*begin == '-' || *begin == '.')) NoteIf(IsLikeMark({begin, end}));
     if (Column(end) > kLineWidth) NoteLongText(begin, end);
 }
 
@@ -425,12 +386,12 @@ void WrittenFormReader::NoteLongText(const char* begin, const char* end) {
 
 void WrittenFormReader::ReadFlow(KnownKey& parent) {
     const Nesting nesting(*this);
-    m_FlowIndent += 2;
+    m_FlowIndent += kIndentStep;
     if (*m_Position == '{')
         ReadFlowMapping(parent);
     else
         ReadFlowSequence(parent);
-    m_FlowIndent -= 2;
+    m_FlowIndent -= kIndentStep;
 }
 
 void WrittenFormReader::ReadFlowMapping(KnownKey& parent) {
@@ -533,9 +494,9 @@ bool WrittenFormReader::ReadFlowSeparator(char close) {
 /// caller, who wants none of them.
 const char* WrittenFormReader::ScanFlowPlain() {
     const char* p = m_Position;
-    if (!Is(*p, kPlainStart) && !(*p == '-' && Is(p[1], kFlow))) throw NotSure();
+    if (!IsPlainStart(*p) && !(*p == '-' && IsPlainInFlow(p[1]))) throw NotSure();
     p = SkipWord(p);
-    while (Is(*p, kFlow) || (*p == ' ' && Is(p[1], kFlow))) p = SkipWord(p + 1);
+    while (IsPlainInFlow(*p) || (*p == ' ' && IsPlainInFlow(p[1]))) p = SkipWord(p + 1);
     NoteText(m_Position, p);
     return p;
 }
@@ -555,7 +516,7 @@ std::string_view WrittenFormReader::ReadQuoted(bool inFlow) {
     const char quote = *m_Position++;
     const char* p = m_Position;
     const char other = quote == '"' ? '\'' : '"';
-    while (Is(*p, kQuoted) || *p == ' ' || *p == other) ++p;
+    while (IsPlainInQuotes(*p) || *p == other) ++p;
     if (*p != quote || (quote == '\'' && p[1] == '\'')) return ReadQuotedWithFolds(p);
     const std::string_view text(m_Position, static_cast<std::size_t>(p - m_Position));
     NoteText(m_Position, p);
@@ -617,29 +578,17 @@ void WrittenFormReader::FoldLines() {
 }
 
 void WrittenFormReader::Unescape() {
-    struct Escape {
-        char letter;
-        std::uint32_t character;
-    };
-    static constexpr Escape kEscapes[] = {
-        {'0', 0},    {'a', 7},    {'b', 8},      {'t', 9},      {'n', 10},  {'v', 11},
-        {'f', 12},   {'r', 13},   {'e', 0x1b},   {' ', 0x20},   {'"', '"'}, {'\\', '\\'},
-        {'N', 0x85}, {'_', 0xa0}, {'L', 0x2028}, {'P', 0x2029},
-    };
     const char letter = m_Position[1];
     m_Position += 2;
-    for (const Escape& escape : kEscapes)
-        if (escape.letter == letter) return AppendUTF8(m_Text, escape.character);
-    switch (letter) {
-    case 'x':
-        return AppendUTF8(m_Text, ReadHex(2));
-    case 'u':
-        return AppendUTF8(m_Text, ReadHex(4));
-    case 'U':
-        return AppendUTF8(m_Text, ReadHex(8));
-    default:
-        throw NotSure();
+    if (letter == ' ') {
+        m_Text += ' ';
+        return;
     }
+    for (const LetterEscape& escape : kLetterEscapes)
+        if (escape.letter == letter) return AppendUTF8(m_Text, escape.character);
+    for (const NumberEscape& escape : kNumberEscapes)
+        if (escape.letter == letter) return AppendUTF8(m_Text, ReadHex(escape.digits));
+    throw NotSure();
 }
 
 std::uint32_t WrittenFormReader::ReadHex(int digits) {

@@ -64,7 +64,9 @@ private:
     void CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed = 0);
     void NextLine();
     bool AtListItem() const;
-    std::ptrdiff_t Column(const char* position) const { return position - m_LineStart; }
+    std::size_t Column(const char* position) const {
+        return static_cast<std::size_t>(position - m_LineStart);
+    }
     void NoteIf(bool differs) { m_IsAsWritten = m_IsAsWritten && !differs; }
     void NoteText(const char* begin, const char* end);
     void NoteLongText(const char* begin, const char* end);
