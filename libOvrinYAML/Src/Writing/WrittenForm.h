@@ -7,8 +7,8 @@
 
 namespace ovrin_yaml {
 
-// The written form: what the writer of object files must agree on with those who know its files without
-// asking a YAML parser. A change here is a change of both.
+// The written form: what the writer of object files and the readers that know it without a YAML parser must
+// agree on. A change here changes both sides.
 //
 //     %YAML 1.1
 //     %TAG !o! tag:ovrin.dev,2011:     the file's header
@@ -55,12 +55,16 @@ inline constexpr std::size_t kLongestSimpleKey = 128;
 
 /// What a character can mean, as bits. One without any stands for itself wherever it stands.
 ///
-///     a z A Z / _ ...     none
-///     0 9                 Id
-///     -                   Id, LeadingSpaced
-///     :                   Colon, LeadingSpaced
-///     , [ ] { }           FlowIndicator, Leading
-///     ' "                 Leading, Quoting
+///     a-z A-Z _ . / ...     none
+///     0-9                   Id
+///     -                     Id, LeadingSpaced
+///     :                     Colon, LeadingSpaced
+///     ?                     FlowIndicator, LeadingSpaced
+///     , [ ] { }             FlowIndicator, Leading
+///     #                     Hash, Leading
+///     & * ! | > % @ `       Leading
+///     ' "                   Leading, Quoting
+///     \                     Quoting
 struct Meaning {
     enum Bits : std::uint16_t {
         kBlank = 1,
@@ -77,6 +81,7 @@ struct Meaning {
     };
 };
 
+/// In ASCII; nothing else is written as it is.
 constexpr bool IsPrintable(char c) {
     return c >= ' ' && c <= '~';
 }
