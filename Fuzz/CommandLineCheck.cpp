@@ -88,7 +88,8 @@ Words Accepted(bool (&parse)(CommandLineArguments&, int, Config&), const Words& 
 std::string CheckRefusal(const Words& words, const CapturedStreams& streams) {
     CommandLineArguments arguments = Arguments(words);
     const std::size_t before = streams.ErrorSize();
-    if (InnerMain(arguments) != 1) return "refused with another status than 1: " + Shown(words);
+    if (InnerMain(arguments) != ExitStatus::Failed)
+        return "refused with another status than that of a failure: " + Shown(words);
     return streams.ErrorSize() > before ? "" : "refused without a word: " + Shown(words);
 }
 

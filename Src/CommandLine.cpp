@@ -138,27 +138,27 @@ bool ParseTwoFileArgs(CommandLineArguments& arguments, int first, std::string_vi
     return Parse(arguments.args, first, grammar);
 }
 
-int RunDiff(CommandLineArguments& arguments) {
+ExitStatus RunDiff(CommandLineArguments& arguments) {
     DiffConfig config;
-    if (!ParseDiffArgs(arguments, 2, config)) return 1;
+    if (!ParseDiffArgs(arguments, 2, config)) return ExitStatus::Failed;
     return HandleDiffCommand(config);
 }
 
-int RunStrip(CommandLineArguments& arguments) {
+ExitStatus RunStrip(CommandLineArguments& arguments) {
     StripConfig config;
-    if (!ParseStripArgs(arguments, 2, config)) return 1;
+    if (!ParseStripArgs(arguments, 2, config)) return ExitStatus::Failed;
     return HandleStripCommand(config);
 }
 
-int RunMerge(CommandLineArguments& arguments) {
+ExitStatus RunMerge(CommandLineArguments& arguments) {
     MergeConfig config;
-    if (!ParseMergeArgs(arguments, 2, config)) return 1;
+    if (!ParseMergeArgs(arguments, 2, config)) return ExitStatus::Failed;
     return ProcessMergeCommand(config);
 }
 
 /// The form of version control systems that have their parameters built in: base, left, right, destination
 /// and a fifth argument that means nothing here.
-int RunVersionControlForm(std::vector<std::string>& args) {
+ExitStatus RunVersionControlForm(std::vector<std::string>& args) {
     MergeConfig config;
     config.baseFile = std::move(args[1]);
     config.leftFile = std::move(args[2]);
@@ -199,13 +199,13 @@ bool ParseStripArgs(CommandLineArguments& arguments, int first, StripConfig& con
     return ParseTwoFileArgs(arguments, first, kCmdStrip, config);
 }
 
-int InnerMain(CommandLineArguments& arguments) {
+ExitStatus InnerMain(CommandLineArguments& arguments) {
     initialize();
     OutliveFailedWrites();
     std::vector<std::string>& args = arguments.args;
     if (args.size() < 2) {
         Refuse("Error: need 'merge' command specified");
-        return 1;
+        return ExitStatus::Failed;
     }
     const std::string& command = args[1];
     if (command == kCmdStrip) return RunStrip(arguments);
@@ -214,11 +214,11 @@ int InnerMain(CommandLineArguments& arguments) {
     if (command == kCmdUnittest) return RunUnitttests();
     if (command.starts_with('-')) {
         Report("Missing command (e.g. 'merge') before option " + command);
-        return 1;
+        return ExitStatus::Failed;
     }
     if (args.size() != 6) {
         Refuse("Error: unknown command " + command);
-        return 1;
+        return ExitStatus::Failed;
     }
     return RunVersionControlForm(args);
 }

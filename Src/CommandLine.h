@@ -1,6 +1,7 @@
 #pragma once
 
 #include "CommandSettings.h"
+#include "ExitStatus.h"
 
 #include <string>
 #include <vector>
@@ -20,6 +21,6 @@ bool ParseMergeArgs(CommandLineArguments& arguments, int first, MergeConfig& con
 bool ParseDiffArgs(CommandLineArguments& arguments, int first, DiffConfig& config);
 bool ParseStripArgs(CommandLineArguments& arguments, int first, StripConfig& config);
 
-/// Runs the command the arguments name. Returns the exit status of the process. What a command throws passes
+/// Runs the command the arguments name. What a command throws passes
 /// through, but for a merge, which reports its failures.
-int InnerMain(CommandLineArguments& arguments);
+ExitStatus InnerMain(CommandLineArguments& arguments);

@@ -12,7 +12,7 @@
 #include <iostream>
 #include <sstream>
 
-int HandleDiffCommand(DiffConfig& config) {
+ExitStatus HandleDiffCommand(DiffConfig& config) {
     constexpr std::size_t kIndentWidth = 2;
     TimerStat root("Diff Command", config.timing ? &std::cout : nullptr);
     TwoFiles files;
@@ -26,5 +26,5 @@ int HandleDiffCommand(DiffConfig& config) {
     output.Finish();
     const int error =
         Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});
-    return error ? FailToWrite(config.destFile, error) : 0;
+    return error ? FailToWrite(config.destFile, error) : ExitStatus::Done;
 }

@@ -150,19 +150,19 @@ int OutputResult(TimerStat& root, const std::string& path, const OvrinObjects& r
     return WriteOutput(path, [&](std::ostream& stream) { Output(result, stream); });
 }
 
-/// Premerged files that can't be written are lost without a word where nobody is to work on them. Returns 0;
-/// 1, after a message, if a tool would.
-int PremergeForTool(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs) {
+/// Premerged files that can't be written are lost without a word where nobody is to work on them. Returns
+/// Done; Failed, after a message, if a tool would.
+ExitStatus PremergeForTool(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs) {
     const PremergeErrors errors = PremergeBoth(root, config, inputs);
-    if (!config.premerge || config.fallbackSpecFile == kNoSpecFile) return 0;
+    if (!config.premerge || config.fallbackSpecFile == kNoSpecFile) return ExitStatus::Done;
     if (errors.base) return FailToWrite(config.premergeBaseDest, errors.base);
     if (errors.right) return FailToWrite(config.premergeRightDest, errors.right);
-    return 0;
+    return ExitStatus::Done;
 }
 
 } // namespace
 
-int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath) {
+ExitStatus HandleMergeCommand(const MergeConfig& config, const std::string& outputPath) {
     TimerStat root("Merging", config.timing ? &std::cout : nullptr);
     MergeFiles files;
     const RulesAndTypes known = ReadFiles(root, config, files);
@@ -170,7 +170,7 @@ int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath)
     { TimerStat timer(root, "Creating mappings"); }
     PreProcessMappings(root, config, files);
     const MergeDiffs diffs = CreateDiffs(root, config, known.rules, files);
-    if (!ReadResolveFile(root, config, resolver)) return 1;
+    if (!ReadResolveFile(root, config, resolver)) return ExitStatus::Failed;
     const YAMLMappingDiff* merged = nullptr;
     {
         TimerStat timer(root, "Merging");
@@ -181,10 +181,10 @@ int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath)
         ApplyMergedChanges(root, *merged, files, known.types, resolver);
     if (const int error = OutputConflicts(root, config, resolver)) return FailToWrite({}, error);
     if (const int error = OutputResult(root, outputPath, files.base)) return FailToWrite(outputPath, error);
-    if (!resolver.HasPendingConflicts()) return 0;
+    if (!resolver.HasPendingConflicts()) return ExitStatus::Done;
     if (baseClone && PremergeForTool(root, config,
                                      {known.rules, *baseClone, files.left.GetMapping(),
-                                      files.right.GetMapping(), diffs.left, diffs.right}) != 0)
-        return 1;
-    return hasComponentDependencyConflicts ? 3 : 2;
+                                      files.right.GetMapping(), diffs.left, diffs.right}) != ExitStatus::Done)
+        return ExitStatus::Failed;
+    return hasComponentDependencyConflicts ? ExitStatus::BrokenDependencies : ExitStatus::Conflicts;
 }

@@ -20,7 +20,7 @@ CommandLineArguments Arguments(const std::string& line) {
 }
 
 struct Outcome {
-    int status;
+    ExitStatus status;
     std::string errors; // ends in the last message; messages before it may be repeated in front
     std::string output;
 };
@@ -29,7 +29,7 @@ Outcome RunMain(const std::string& line) {
     CommandLineArguments arguments = Arguments(line);
     testing::internal::CaptureStderr();
     testing::internal::CaptureStdout();
-    const int status = InnerMain(arguments);
+    const ExitStatus status = InnerMain(arguments);
     return {status, testing::internal::GetCapturedStderr(), testing::internal::GetCapturedStdout()};
 }
 
@@ -83,7 +83,7 @@ TEST(CommandLine, WrongArgumentsAreExplained) {
     };
     for (const auto& [line, message, usage] : cases) {
         const Outcome outcome = RunMain(line);
-        EXPECT_EQ(outcome.status, 1) << line;
+        EXPECT_EQ(outcome.status, ExitStatus::Failed) << line;
         EXPECT_TRUE(outcome.errors.ends_with(message + "\n")) << line << "\n" << outcome.errors;
         EXPECT_EQ(!outcome.output.empty(), usage) << line;
     }
