@@ -3,6 +3,9 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <ranges>
+#include <regex>
+#include <set>
 #include <sstream>
 
 using namespace ovrin_yaml;
@@ -33,18 +36,19 @@ Outcome RunMain(const std::string& line) {
     return {status, testing::internal::GetCapturedStderr(), testing::internal::GetCapturedStdout()};
 }
 
-MergeConfig Merge(const std::string& line) {
-    CommandLineArguments arguments = Arguments("merge " + line);
+MergeConfig Settings(const std::string& command, const std::string& line) {
+    CommandLineArguments arguments = Arguments(command + " " + line);
     MergeConfig config;
-    EXPECT_TRUE(ParseMergeArgs(arguments, 2, config)) << line;
+    EXPECT_TRUE(ParseArguments(*FindCommand(command), arguments, config)) << line;
     return config;
 }
 
-DiffConfig Diff(const std::string& line) {
-    CommandLineArguments arguments = Arguments("diff " + line);
-    DiffConfig config;
-    EXPECT_TRUE(ParseDiffArgs(arguments, 2, config)) << line;
-    return config;
+MergeConfig Merge(const std::string& line) {
+    return Settings("merge", line);
+}
+
+TwoFileConfig Diff(const std::string& line) {
+    return Settings("diff", line);
 }
 
 std::string Paths(const MergeConfig& config) {
@@ -52,7 +56,7 @@ std::string Paths(const MergeConfig& config) {
            config.premergeBaseDest + "," + config.premergeRightDest;
 }
 
-std::string Paths(const DiffConfig& config) {
+std::string Paths(const TwoFileConfig& config) {
     return config.leftFile + "," + config.rightFile + "," + config.destFile;
 }
 
@@ -104,6 +108,27 @@ TEST(CommandLine, UsageKeepsItsBlanksAndEmptyLines) {
     EXPECT_EQ(std::count(text.begin(), text.end(), '\n'), 47);
 }
 
+/// The words of the text that the pattern finds.
+std::set<std::string> Found(const std::string& text, const char* pattern) {
+    const std::regex words(pattern);
+    std::set<std::string> found;
+    for (std::sregex_iterator i(text.begin(), text.end(), words); i != std::sregex_iterator(); ++i)
+        found.insert(i->str(1));
+    return found;
+}
+
+TEST(CommandLine, UsageNamesWhatTheTableSaysItNames) {
+    const std::string text = RunMain("").output;
+    std::set<std::string> commands, options;
+    for (const Command& command : kCommands) {
+        if (command.isInUsage) commands.emplace(command.word);
+        for (const Option& option : command.options | std::views::join)
+            if (option.isInUsage) options.emplace(option.word);
+    }
+    EXPECT_EQ(Found(text, "[ |\\[](--?[a-zA-Z]+)"), options);
+    EXPECT_EQ(Found(text, "(?:OvrinMerge |experimental ')([a-z]+)"), commands);
+}
+
 TEST(CommandLine, OptionsEndAtTheFirstPath) {
     EXPECT_EQ(Paths(Merge("a b c")), "a,b,c,,,");
     EXPECT_EQ(Paths(Merge("a b c --force")), "a,b,c,--force,,");
@@ -126,7 +151,7 @@ TEST(CommandLine, EachFlagSetsItsField) {
     const MergeConfig none = Merge("a b c");
     EXPECT_FALSE(none.force || none.describe || none.timing || none.premerge || !none.useThreads);
     const MergeConfig all = Merge("--force --describe --timing --nothreads -h a b c");
-    EXPECT_TRUE(all.force && all.describe && all.timing && !all.useThreads && gHeadlessEnabled);
+    EXPECT_TRUE(all.force && all.describe && all.timing && !all.useThreads && all.headless);
     EXPECT_EQ(Merge("-l a b c").resolve, ResolveLeft);
     EXPECT_EQ(Merge("-r a b c").resolve, ResolveRight);
     EXPECT_EQ(Merge("-p a b c").resolve, ResolveLeft);
