@@ -137,7 +137,7 @@ bool IsWithoutProcess(int status, int error) {
 }
 
 /// Runs the tool and gives the shell call's status as it is.
-int RunTool(const std::string& path, const std::string& arguments) {
+ExitStatus RunTool(const std::string& path, const std::string& arguments) {
     const std::string command = '"' + path + "\" " + arguments;
     std::cout.flush(); // what was printed so far stands before what the tool prints
     errno = 0;
@@ -149,7 +149,7 @@ int RunTool(const std::string& path, const std::string& arguments) {
              << std::strerror(error) << '\n';
         ErrMsg(errs);
     }
-    return status;
+    return static_cast<ExitStatus>(status);
 }
 
 } // namespace
@@ -189,15 +189,14 @@ std::string SubstituteMergePlaceholderFilePaths(const std::string& arguments, co
     return result;
 }
 
-int FallbackMergeTool(const std::string& base, const std::string& left, const std::string& right,
-                      const std::string& dest, const std::string& specFile) {
-    constexpr int kNoTool = 1;
-    if (specFile == kNoSpecFile) return kNoTool;
+ExitStatus FallbackMergeTool(const std::string& base, const std::string& left, const std::string& right,
+                             const std::string& dest, const std::string& specFile) {
+    if (specFile == kNoSpecFile) return ExitStatus::Failed;
     const std::string specPath = GetSpecFilename(specFile);
     const FallbackCommandMap fallbacks = PopulateFallbacks(specPath);
-    if (fallbacks.empty()) return kNoTool;
+    if (fallbacks.empty()) return ExitStatus::Failed;
     const FallbackCommandEntry entry = GetFallbackCommandEntry(fallbacks, left, specPath);
-    if (entry.path.empty()) return kNoTool;
+    if (entry.path.empty()) return ExitStatus::Failed;
     const std::string arguments =
         SubstituteMergePlaceholderFilePaths(entry.arguments, base, left, right, dest);
     if (!FileExists(dest.c_str())) std::ofstream{dest};

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "ExitStatus.h"
+
 #include <map>
 #include <string>
 #include <vector>
@@ -43,7 +45,7 @@ std::string SubstituteMergePlaceholderFilePaths(const std::string& arguments, co
                                                 const std::string& dest);
 
 /// Has a tool merge the files into `dest`, and waits for its end. The tool is chosen by the extension of
-/// `left` from the spec file of the name `specFile`, "none" being no file. Returns 0 on success, 1 if there
-/// is no tool, and the raw status of the shell call otherwise, which is -1 if there was none.
-int FallbackMergeTool(const std::string& base, const std::string& left, const std::string& right,
-                      const std::string& dest, const std::string& specFile);
+/// `left` from the spec file of the name `specFile`, "none" being no file. Returns Done on success, Failed
+/// if there is no tool, and the raw status of the shell call otherwise, which is -1 if there was none.
+ExitStatus FallbackMergeTool(const std::string& base, const std::string& left, const std::string& right,
+                             const std::string& dest, const std::string& specFile);

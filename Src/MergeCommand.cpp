@@ -40,14 +40,9 @@ ExitStatus DeliverResult(const std::string& source, const MergeConfig& config, E
     return error ? FailToWrite(config.destFile, error) : status;
 }
 
-/// A tool's status becomes that of the process, whatever it is.
-ExitStatus RunTool(const MergeConfig& config, const std::string& base, const std::string& left,
-                   const std::string& right, const std::string& output) {
-    return static_cast<ExitStatus>(FallbackMergeTool(base, left, right, output, config.fallbackSpecFile));
-}
-
 ExitStatus MergeByTool(const MergeConfig& config, const std::string& output) {
-    const ExitStatus result = RunTool(config, config.baseFile, config.leftFile, config.rightFile, output);
+    const ExitStatus result = FallbackMergeTool(config.baseFile, config.leftFile, config.rightFile, output,
+                                                config.fallbackSpecFile);
     return result == ExitStatus::Done && !IsMissing(output) ? DeliverResult(output, config, result) : result;
 }
 
@@ -57,7 +52,7 @@ ExitStatus HandConflictsToTool(const MergeConfig& config, const std::string& sma
     if (output2.empty()) return Fail("Couldn't create temporary output2 file for merge result");
     const std::string& base = config.premerge ? config.premergeBaseDest : config.baseFile;
     const std::string& right = config.premerge ? config.premergeRightDest : config.rightFile;
-    const ExitStatus result = RunTool(config, base, smartResult, right, output2);
+    const ExitStatus result = FallbackMergeTool(base, smartResult, right, output2, config.fallbackSpecFile);
     if (result != ExitStatus::Done || IsFileEmpty(output2) || IsMissing(output2)) return result;
     return DeliverResult(output2, config, result);
 }
