@@ -1,5 +1,6 @@
 #include "ReaderCheck.h"
 
+#include "ErrorOf.h"
 #include "TreeComparison.h"
 
 #include "Reading/ObjectFileReader.h"
@@ -12,6 +13,7 @@
 #include <sstream>
 
 using namespace ovrin_yaml;
+using failures::ErrorOf;
 
 namespace ovrin_fuzz {
 
@@ -19,28 +21,18 @@ const char* const kFileHeader = "%YAML 1.1\n%TAG !o! tag:ovrin.dev,2011:\n";
 
 namespace {
 
-/// What `act` throws as a YAMLError, or "none".
-template <class Act> std::string FailureOf(const Act& act) {
-    try {
-        act();
-    } catch (const YAMLError& error) {
-        return error.what();
-    }
-    return "none";
-}
-
 struct ReadFile {
     ReadFile(std::string_view file, bool fast) {
         ReaderOptions options;
         options.fast = fast;
         options.inspect = InspectObject;
         // A copy without spare room: reading behind its end is seen.
-        failure = FailureOf([&] { ParseYAMLFile(std::string(file), objects, options); });
+        failure = ErrorOf([&] { ParseYAMLFile(std::string(file), objects, options); });
     }
 
     std::string Written() const {
         std::ostringstream stream;
-        const std::string writeFailure = FailureOf([&] { Output(objects, stream); });
+        const std::string writeFailure = ErrorOf([&] { Output(objects, stream); });
         return stream.str() + "\nfailure: " + writeFailure;
     }
 

@@ -1,7 +1,7 @@
 #include "FileUtils.h"
 
+#include "ErrorOf.h"
 #include "InputFiles.h"
-#include "Values/YAMLError.h"
 
 #include <gtest/gtest.h>
 
@@ -13,6 +13,8 @@
 
 namespace {
 
+using failures::ErrorOf;
+
 /// A file of that content, removed at the end of the test.
 class TempFile {
 public:
@@ -22,18 +24,9 @@ public:
     const std::string path;
 };
 
-template <class Act> std::string ErrorOf(const Act& act, const std::string& path) {
-    try {
-        act(path);
-    } catch (const ovrin_yaml::YAMLError& error) {
-        return error.what();
-    }
-    return "none";
-}
-
-void ReadObjects(const std::string& path) {
+std::string ReadError(const std::string& path) {
     ovrin_yaml::OvrinObjects objects;
-    ReadYAMLPath(path, objects);
+    return ErrorOf([&] { ReadYAMLPath(path, objects); });
 }
 
 TEST(FileUtils, TheExtensionStandsBehindTheLastDotOfThePath) {
@@ -105,10 +98,11 @@ TEST(FileUtils, ADirectoryCanBeOpenedButNotRead) {
 }
 
 TEST(InputFiles, FaultsNameTheFile) {
-    EXPECT_EQ(ErrorOf(ReadObjects, "/nonexistent"), "Error parsing file '/nonexistent': Cannot open file");
-    EXPECT_EQ(ErrorOf(ReadObjects, "/tmp"), "Error parsing file '/tmp': Cannot read file");
+    EXPECT_EQ(ReadError("/nonexistent"), "Error parsing file '/nonexistent': Cannot open file");
+    EXPECT_EQ(ReadError("/tmp"), "Error parsing file '/tmp': Cannot read file");
     for (const char* path : {"/nonexistent", "/tmp"})
-        EXPECT_EQ(ErrorOf(SetupRules, path), std::string("Cannot open rules file for reading:") + path);
+        EXPECT_EQ(ErrorOf([&] { SetupRules(path); }),
+                  std::string("Cannot open rules file for reading:") + path);
 }
 
 } // namespace

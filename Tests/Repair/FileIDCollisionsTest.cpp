@@ -13,8 +13,8 @@ namespace {
 std::string Remapped(Scene&& base, Scene&& left, Scene&& right) {
     const auto conflicts = CreateConflictingFileIDsRemapper(base.Root(), left.Root(), right.Root());
     const std::string failure =
-        FailureOf([&] { RemapCollidingAddFileIDs(conflicts, base.Root(), left.Root(), right.Root()); });
-    return failure.empty() ? right.Text() : failure;
+        ErrorOf([&] { RemapCollidingAddFileIDs(conflicts, base.Root(), left.Root(), right.Root()); });
+    return failure == "none" ? right.Text() : failure;
 }
 
 /// The hashes of a tree, parents in front of their children.
@@ -94,7 +94,7 @@ TEST(FileIDCollisions, WithoutAFreeIdTheRightFileStaysAsItWas) {
         Scene right("2 &1 B: {}\n2 &" + std::string(id) + " B: {}\n");
         const std::string before = right.Text();
         EXPECT_EQ(Remapped("", "1 &1 A: {}\n1 &" + std::string(id) + " A: {}\n" + taken, std::move(right)),
-                  "YAMLError: Cannot create new fileID for conflicting fileID: " + std::string(id));
+                  "Cannot create new fileID for conflicting fileID: " + std::string(id));
         EXPECT_EQ(right.Text(), before);
     }
 }

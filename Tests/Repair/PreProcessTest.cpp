@@ -52,8 +52,8 @@ TEST(PreProcess, HashOfAConvertedObjectCoversItsHeader) {
 TEST(PreProcess, FailsWhereTransitionsHaveAnotherShape) {
     for (const char* shape : {"[]", "x"}) {
         Scene scene(Transitions(shape));
-        EXPECT_EQ(FailureOf([&] { PreProcess(scene.Root()); }),
-                  "YAMLError: Expected key to point to yaml mapping: m_StateMachineTransitions");
+        EXPECT_EQ(ErrorOf([&] { PreProcess(scene.Root()); }),
+                  "Expected key to point to yaml mapping: m_StateMachineTransitions");
     }
     const std::pair<const char*, const char*> kRestored[] = {
         {"{}", "Expected key to point to yaml sequence: m_StateMachineTransitions"},
@@ -62,15 +62,15 @@ TEST(PreProcess, FailsWhereTransitionsHaveAnotherShape) {
     };
     for (const auto& [shape, fault] : kRestored) {
         Scene scene(Transitions(shape));
-        EXPECT_EQ(FailureOf([&] { RestoreRepeatedKeys(scene.Root()); }), std::string("YAMLError: ") + fault);
+        EXPECT_EQ(ErrorOf([&] { RestoreRepeatedKeys(scene.Root()); }), fault);
     }
 }
 
 TEST(PreProcess, FailsWhereAStateMachineOrAnObjectRepeatsAKey) {
     for (const char* object : {"1107 &1 AnimatorStateMachine: {a: 1, a: 2}", "1 &1 {a: 1, a: 2}"}) {
         Scene scene(object);
-        EXPECT_EQ(FailureOf([&] { PreProcess(scene.Root()); }),
-                  "YAMLError: Cannot perform this operation on a YAML file with duplicate keys");
+        EXPECT_EQ(ErrorOf([&] { PreProcess(scene.Root()); }),
+                  "Cannot perform this operation on a YAML file with duplicate keys");
     }
 }
 

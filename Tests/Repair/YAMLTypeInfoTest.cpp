@@ -4,6 +4,8 @@
 
 #include <gtest/gtest.h>
 
+#include <stdexcept>
+
 using namespace object_text;
 
 namespace {
@@ -57,19 +59,18 @@ TEST(YAMLTypeInfo, ReadingAgainReplacesWhatWasThere) {
 }
 
 TEST(YAMLTypeInfo, BadFilesFail) {
-    const std::string noList = "error: Cannot findMergeTypeInfo object in YAMLMapping provided\n";
+    const std::string noList = "Cannot findMergeTypeInfo object in YAMLMapping provided\n";
     const std::pair<std::string, std::string> kCases[] = {
         {"1 &2 MergeTypeInfo: []", noList},
         {"1 &1 MergeTypeInfo: {}", noList},
-        {"1 &1 MergeTypeInfo: [x]", "error: Cannot read id in YAMLTypeInfo file\n"},
-        {"1 &1 MergeTypeInfo: [{id: 1, name: A, ismulti: 0}]",
-         "error: Cannot read baseid in YAMLTypeInfo file\n"},
+        {"1 &1 MergeTypeInfo: [x]", "Cannot read id in YAMLTypeInfo file\n"},
+        {"1 &1 MergeTypeInfo: [{id: 1, name: A, ismulti: 0}]", "Cannot read baseid in YAMLTypeInfo file\n"},
         {"1 &1 MergeTypeInfo: [" + Entry("1", "A", "0", "[]") + "]",
-         "error: Cannot read requires in YAMLTypeInfo file\n"},
+         "Cannot read requires in YAMLTypeInfo file\n"},
     };
     for (const auto& [file, failure] : kCases) {
         YAMLTypeInfoManager manager;
-        EXPECT_EQ(FailureOf([&] { manager.Read(Scene(file).Objects()); }), failure);
+        EXPECT_EQ(ErrorOf<std::runtime_error>([&] { manager.Read(Scene(file).Objects()); }), failure);
     }
 }
 

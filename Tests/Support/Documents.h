@@ -1,7 +1,7 @@
 #pragma once
 
+#include "ErrorOf.h"
 #include "Values/OvrinObjects.h"
-#include "Values/YAMLError.h"
 #include "Values/YAMLMapping.h"
 #include "Values/YAMLScalar.h"
 #include "Values/YAMLSequence.h"
@@ -12,6 +12,7 @@
 namespace documents {
 
 using namespace ovrin_yaml;
+using failures::ErrorOf;
 
 /// The tree of a YAML text, hashed as the reader does it: Doc("a: 1\nl: [1, 2]").
 YAMLNode* Node(const std::string& text);
@@ -29,16 +30,6 @@ std::string Dump(const YAMLNode* node);
 /// An object file of the given documents: Objects("--- !o!1 &2\na: 1\n").
 std::string ObjectText(const std::string& documents);
 std::string Written(const OvrinObjects& objects);
-
-/// What `act` throws as a YAMLError, or "none".
-template <class Act> std::string ErrorOf(const Act& act) {
-    try {
-        act();
-    } catch (const YAMLError& error) {
-        return error.what();
-    }
-    return "none";
-}
 
 /// The failure of reading a text, or "none".
 std::string ReadError(const std::string& text);

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "ErrorOf.h"
 #include "Reading/ObjectFileReader.h"
 #include "Values/OvrinObjects.h"
 #include "Values/YAMLScalar.h"
@@ -9,7 +10,6 @@
 #include <gtest/gtest.h>
 
 #include <sstream>
-#include <stdexcept>
 #include <string>
 #include <string_view>
 
@@ -20,6 +20,7 @@
 namespace object_text {
 
 using namespace ovrin_yaml;
+using failures::ErrorOf;
 
 inline const YAMLScalar* Id(std::string_view text) {
     return YAMLScalar::Lookup(text);
@@ -66,18 +67,5 @@ public:
 private:
     OvrinObjects m_Objects;
 };
-
-/// What the action throws, by kind: "YAMLError: ..." or, for a standard exception, "error: ...". Empty if
-/// nothing.
-template <class Action> std::string FailureOf(const Action& action) {
-    try {
-        action();
-    } catch (const YAMLError& error) {
-        return "YAMLError: " + error.what();
-    } catch (const std::exception& error) {
-        return std::string("error: ") + error.what();
-    }
-    return "";
-}
 
 } // namespace object_text
