@@ -11,10 +11,10 @@ namespace {
 constexpr std::size_t kLongestDocument = INT32_MAX;
 
 /// Bytes behind a document that must be readable: what is compared or tested at one go.
-constexpr std::size_t kReadAhead = 160;
-static_assert(kReadAhead >= KnownKey::kLongest + 2);
-static_assert(kReadAhead >= BatchedBuilder::kReadAhead);
-static_assert(kReadAhead >= kScanAhead);
+constexpr std::size_t kReadableBehind = 160;
+static_assert(kReadableBehind >= KnownKey::kLongest + 2);
+static_assert(kReadableBehind >= BatchedBuilder::kReadAhead);
+static_assert(kReadableBehind >= kScanAhead);
 
 } // namespace
 
@@ -33,9 +33,9 @@ WrittenFormReader::Document WrittenFormReader::Read(std::string_view text, std::
 
 /// The text where enough may be read behind it.
 std::string_view WrittenFormReader::Readable(std::string_view text) {
-    if (static_cast<std::size_t>(m_ReadableEnd - (text.data() + text.size())) >= kReadAhead) return text;
+    if (static_cast<std::size_t>(m_ReadableEnd - (text.data() + text.size())) >= kReadableBehind) return text;
     std::string& copy = m_Copies.emplace_back(text);
-    copy.append(kReadAhead, '\0');
+    copy.append(kReadableBehind, '\0');
     return std::string_view(copy).substr(0, text.size());
 }
 
