@@ -1,3 +1,5 @@
+#include "SelfCheckOperations.h"
+
 #include "SelfCheckParts.h"
 
 #include "Fallback.h"
