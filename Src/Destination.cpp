@@ -37,7 +37,8 @@ int FollowLinks(std::string& path) {
         const ssize_t length = readlink(path.c_str(), target, sizeof(target));
         if (length < 0) return errno == EINVAL || errno == ENOENT ? 0 : errno;
         const std::string link(target, static_cast<std::size_t>(length));
-        path = link.starts_with('/') ? link : GetFolder(path) + link;
+        path = link.starts_with('/') ? std::string() : GetFolder(path);
+        path += link;
     }
     return ELOOP;
 }

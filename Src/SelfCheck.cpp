@@ -1,5 +1,7 @@
 #include "SelfCheck.h"
 
+#include "SelfCheckDiffs.h"
+#include "SelfCheckOperations.h"
 #include "SelfCheckParts.h"
 
 #include "Values/YAMLError.h"

@@ -1,3 +1,5 @@
+#include "SelfCheckDiffs.h"
+
 #include "SelfCheckParts.h"
 
 #include "Diff/YAMLMappingDiff.h"

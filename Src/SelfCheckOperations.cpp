@@ -1,6 +1,7 @@
-#include "SelfCheckParts.h"
+#include "SelfCheckOperations.h"
 
 #include "Fallback.h"
+#include "SelfCheckParts.h"
 
 #include "CommandSettings.h"
 #include "Diff/YAMLMappingDiff.h"

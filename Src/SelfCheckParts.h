@@ -10,12 +10,9 @@
 #include <string>
 #include <utility>
 
-/// The parts of the built-in self check, and what they share. The trees, diffs and operations of a check live
-/// until the process ends.
+/// What the parts of the built-in self check share. The trees, diffs and operations of a check live until the
+/// process ends.
 namespace self_check {
-
-void TestOperations(TestResults& results);
-void TestDiffs(TestResults& results);
 
 ovrin_yaml::YAMLScalar* str(const char* text);
 /// Containers of scalars, hashed.
