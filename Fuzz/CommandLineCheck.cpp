@@ -33,41 +33,35 @@ void AddFlag(Words& words, bool isSet, const char* flag) {
     if (isSet) words.push_back(flag);
 }
 
-/// The settings as a command line.
-Words WordsOf(const MergeConfig& config) {
+void AddSharedOptions(Words& words, const TwoFileConfig& config) {
+    AddFlag(words, config.timing, "--timing");
+    AddFlag(words, !config.useThreads, "--nothreads");
+    AddFlag(words, config.headless, "-h");
+    words.insert(words.end(), {"--rules", config.rulesFile, "--typeInfo", config.typeInfoFile});
+}
+
+Words MergeWordsOf(const MergeConfig& config) {
     Words words{"OvrinMerge", "merge"};
     AddFlag(words, config.premerge, "-p");
     AddFlag(words, config.resolve == ResolveLeft && !config.premerge, "-l");
     AddFlag(words, config.resolve == ResolveRight, "-r");
     AddFlag(words, config.force, "--force");
     AddFlag(words, config.describe, "--describe");
-    AddFlag(words, config.timing, "--timing");
-    AddFlag(words, !config.useThreads, "--nothreads");
-    AddFlag(words, gHeadlessEnabled, "-h");
-    words.insert(words.end(),
-                 {"-i", config.resolveFile, "-o", config.conflictFile, "--rules", config.rulesFile,
-                  "--typeInfo", config.typeInfoFile, "--fallback", config.fallbackSpecFile});
+    AddSharedOptions(words, config);
+    words.insert(words.end(), {"-i", config.resolveFile, "-o", config.conflictFile, "--fallback",
+                               config.fallbackSpecFile});
     words.insert(words.end(), {config.baseFile, config.leftFile, config.rightFile, config.destFile,
                                config.premergeBaseDest, config.premergeRightDest});
     return words;
 }
 
-Words WordsOf(const TwoFileConfig& config, const char* command) {
-    Words words{"OvrinMerge", command};
-    AddFlag(words, config.timing, "--timing");
-    AddFlag(words, !config.useThreads, "--nothreads");
-    AddFlag(words, gHeadlessEnabled, "-h");
-    words.insert(words.end(), {"--rules", config.rulesFile, "--typeInfo", config.typeInfoFile});
+/// The settings as a command line.
+Words WordsOf(const Command& command, const MergeConfig& config) {
+    if (command.word == "merge") return MergeWordsOf(config);
+    Words words{"OvrinMerge", std::string(command.word)};
+    AddSharedOptions(words, config);
     words.insert(words.end(), {config.leftFile, config.rightFile, config.destFile});
     return words;
-}
-
-Words WordsOf(const DiffConfig& config) {
-    return WordsOf(config, "diff");
-}
-
-Words WordsOf(const StripConfig& config) {
-    return WordsOf(config, "strip");
 }
 
 std::string Shown(const Words& words) {
@@ -76,28 +70,25 @@ std::string Shown(const Words& words) {
     return text;
 }
 
-/// The words of what a parser accepts; none where it refuses.
-template <class Config>
-Words Accepted(bool (&parse)(CommandLineArguments&, int, Config&), const Words& words) {
-    gHeadlessEnabled = false;
-    Config config;
+/// The words of what the parser accepts; none where it refuses.
+Words Accepted(const Command& command, const Words& words) {
+    MergeConfig config;
     CommandLineArguments arguments = Arguments(words);
-    return parse(arguments, 2, config) ? WordsOf(config) : Words();
+    return ParseArguments(command, arguments, config) ? WordsOf(command, config) : Words();
 }
 
 std::string CheckRefusal(const Words& words, const CapturedStreams& streams) {
     CommandLineArguments arguments = Arguments(words);
     const std::size_t before = streams.ErrorSize();
-    if (InnerMain(arguments) != 1) return "refused with another status than 1: " + Shown(words);
+    if (InnerMain(arguments) != ExitStatus::Failed)
+        return "refused with another status than that of a failure: " + Shown(words);
     return streams.ErrorSize() > before ? "" : "refused without a word: " + Shown(words);
 }
 
-template <class Config>
-std::string Check(bool (&parse)(CommandLineArguments&, int, Config&), const Words& words,
-                  const CapturedStreams& streams) {
-    const Words accepted = Accepted(parse, words);
+std::string Check(const Command& command, const Words& words, const CapturedStreams& streams) {
+    const Words accepted = Accepted(command, words);
     if (accepted.empty()) return CheckRefusal(words, streams);
-    const Words again = Accepted(parse, accepted);
+    const Words again = Accepted(command, accepted);
     return again == accepted ? "" : Shown(accepted) + "is taken for " + Shown(again);
 }
 
@@ -106,11 +97,10 @@ std::string Check(bool (&parse)(CommandLineArguments&, int, Config&), const Word
 std::string CheckCommandLine(std::string_view input) {
     const CapturedStreams streams;
     const Words words = WordsOf(input);
-    const std::string command = words.size() > 1 ? words[1] : "";
-    if (command == "merge") return Check(ParseMergeArgs, words, streams);
-    if (command == "diff") return Check(ParseDiffArgs, words, streams);
-    if (command == "strip") return Check(ParseStripArgs, words, streams);
-    const bool mayRun = command == "unittest" || (words.size() == 6 && !command.starts_with('-'));
+    const std::string word = words.size() > 1 ? words[1] : "";
+    const Command* command = FindCommand(word);
+    if (command && !command->paths.empty()) return Check(*command, words, streams);
+    const bool mayRun = command || (words.size() == 6 && !word.starts_with('-'));
     return mayRun ? "" : CheckRefusal(words, streams);
 }
 

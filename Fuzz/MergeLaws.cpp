@@ -5,6 +5,7 @@
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
+#include "Merge/DiffMerge.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Reading/ObjectFileReader.h"
 #include "Repair/PreProcess.h"
@@ -54,7 +55,7 @@ bool OnlyKeysMove(const YAMLNode& base, const YAMLNode& changed) {
     const YAMLMapping *from = AsMapping(&base), *to = AsMapping(&changed);
     const YAMLSequence *fromList = AsSequence(&base), *toList = AsSequence(&changed);
     if (from && to) {
-        if (YAMLMappingDiff::Diff(from, to)->Entries().empty()) return true;
+        if (YAMLMappingDiff::Diff(MergeRules(), from, to)->Entries().empty()) return true;
         for (const auto& [key, value] : *from)
             if (to->HasKey(key) && OnlyKeysMove(*value, *to->Get(key))) return true;
     } else if (fromList && toList) {
@@ -105,11 +106,22 @@ std::unique_ptr<OvrinObjects> Read(const std::string& file) {
     return objects;
 }
 
-using Contents = std::map<std::string, std::uint32_t>;
+/// An object by the two hashes that tell whether it is the same.
+struct Content {
+    explicit Content(const YAMLNode& object)
+        : hash(ContentHash(object)), unordered(ContentHash(object, KeyOrder::CountsNot)) {}
 
-Contents ContentsOf(const YAMLMapping& root, KeyOrder order) {
+    bool IsSame(const Content& other, KeyOrder order) const {
+        return hash == other.hash || (order == KeyOrder::CountsNot && unordered == other.unordered);
+    }
+
+    std::uint32_t hash, unordered;
+};
+using Contents = std::map<std::string, Content>;
+
+Contents ContentsOf(const YAMLMapping& root) {
     Contents contents;
-    for (const auto& [id, object] : root) contents.emplace(id->Value(), ContentHash(*object, order));
+    for (const auto& [id, object] : root) contents.emplace(id->Value(), Content(*object));
     return contents;
 }
 
@@ -151,8 +163,8 @@ public:
     std::string Check() const {
         const std::unique_ptr<OvrinObjects> base = Read(m_Base);
         if (!base || !m_Changed) return "";
-        const auto* none = YAMLMappingDiff::Diff(&base->GetMapping(), &base->GetMapping());
-        const auto* change = YAMLMappingDiff::Diff(&base->GetMapping(), &m_Changed->GetMapping());
+        const auto* none = YAMLMappingDiff::Diff(m_Rules, &base->GetMapping(), &base->GetMapping());
+        const auto* change = YAMLMappingDiff::Diff(m_Rules, &base->GetMapping(), &m_Changed->GetMapping());
         std::string finding = CheckMerge("base, base, changed", *base, none, change);
         if (finding.empty()) finding = CheckMerge("base, changed, base", *base, change, none);
         if (!finding.empty() || MovesInObjects(*change)) return finding;
@@ -163,9 +175,9 @@ private:
     std::string CheckMerge(const std::string& which, OvrinObjects& base, const YAMLMappingDiff* left,
                            const YAMLMappingDiff* right) const {
         const std::unique_ptr<OvrinObjects> merged(base.Clone());
-        RecordingConflictResolver resolver(ResolveBase);
+        RecordingConflictResolver resolver(m_Rules, ResolveBase);
         try {
-            YAMLMappingDiff::Merge(left, right, resolver)->Apply(merged->GetMapping());
+            MergeMappingDiffs(left, right, resolver)->Apply(merged->GetMapping());
         } catch (const YAMLError& error) {
             return which + " fails: " + error.what();
         }
@@ -173,14 +185,15 @@ private:
         const YAMLMapping& changed = m_Changed->GetMapping();
         const KeyOrder order =
             OnlyKeysMove(base.GetMapping(), changed) ? KeyOrder::CountsNot : KeyOrder::Counts;
-        const Contents expected = ContentsOf(changed, order);
-        const Contents actual = ContentsOf(merged->GetMapping(), order);
+        const Contents expected = ContentsOf(changed), actual = ContentsOf(merged->GetMapping());
         if (actual.size() != expected.size()) return which + " has other objects";
-        for (const auto& [id, hash] : expected)
-            if (!actual.contains(id) || actual.at(id) != hash) return which + " has another object " + id;
+        for (const auto& [id, content] : expected)
+            if (!actual.contains(id) || !actual.at(id).IsSame(content, order))
+                return which + " has another object " + id;
         return "";
     }
 
+    const MergeRules m_Rules;
     const std::string& m_Base;
     const std::unique_ptr<OvrinObjects> m_Changed;
 };

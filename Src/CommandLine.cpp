@@ -1,72 +1,21 @@
 #include "CommandLine.h"
 
 #include "Descriptor.h"
-#include "DiffCommand.h"
 #include "ErrMsg.h"
 #include "MergeCommand.h"
-#include "SelfCheck.h"
-#include "StripCommand.h"
 #include "Usage.h"
 #include "Values/YAMLScalar.h"
 
-#include <functional>
 #include <sstream>
 #include <string_view>
 
 using namespace ovrin_yaml;
 
-bool gHeadlessEnabled = false;
-
 namespace {
 
+constexpr std::size_t kFirstArgument = 2; // behind the names of program and command
+
 std::stringstream errs;
-
-constexpr std::string_view kCmdStrip = "strip";
-constexpr std::string_view kCmdDiff = "diff";
-constexpr std::string_view kCmdMerge = "merge";
-constexpr std::string_view kCmdUnittest = "unittest";
-
-constexpr std::string_view kOptionUseLeft = "-l";
-constexpr std::string_view kOptionUseRight = "-r";
-constexpr std::string_view kOptionUsePremerge = "-p";
-constexpr std::string_view kOptionUseMergeFile = "-i";
-constexpr std::string_view kOptionUseConflictFile = "-o";
-constexpr std::string_view kOptionRules = "--rules";
-constexpr std::string_view kOptionTypeInfo = "--typeInfo";
-constexpr std::string_view kOptionFallback = "--fallback";
-constexpr std::string_view kOptionDescribe = "--describe";
-constexpr std::string_view kOptionForce = "--force";
-constexpr std::string_view kOptionTiming = "--timing";
-constexpr std::string_view kOptionNoThreads = "--nothreads";
-constexpr std::string_view kOptionHeadless = "-h";
-
-/// An option that stands alone. `take` returns false where it is refused, with the error reported.
-struct FlagOption {
-    std::string_view word;
-    std::function<bool()> take;
-};
-
-/// An option whose value is the next argument, whatever that looks like.
-struct ValueOption {
-    std::string_view word;
-    std::string* target;
-};
-
-/// What a command takes: options in any order, then paths, of which some must be there.
-struct Grammar {
-    std::string_view command;
-    std::vector<FlagOption> flags;
-    std::vector<ValueOption> values;
-    std::vector<std::string*> paths;
-    std::size_t requiredPaths;
-};
-
-FlagOption Sets(std::string_view word, bool& target, bool value = true) {
-    return {word, [&target, value] {
-                target = value;
-                return true;
-            }};
-}
 
 void Report(const std::string& message) {
     errs << message << '\n';
@@ -80,85 +29,27 @@ bool Refuse(const std::string& message) {
     return false;
 }
 
-bool RefusePathCount(const Grammar& grammar, std::size_t count) {
-    return Refuse("Error: " + std::string(grammar.command) + " command takes exactly " +
-                  std::to_string(grammar.requiredPaths) + " paths but " + std::to_string(count) +
+bool RefusePathCount(const Command& command, std::size_t count) {
+    return Refuse("Error: " + std::string(command.word) + " command takes exactly " +
+                  std::to_string(command.requiredPaths) + " paths but " + std::to_string(count) +
                   " was provided.");
 }
 
-template <class Option> const Option* Find(const std::vector<Option>& options, const std::string& word) {
-    for (const Option& option : options)
-        if (option.word == word) return &option;
-    return nullptr;
+void TakePaths(std::vector<std::string>& args, std::size_t first, const Command& command,
+               MergeConfig& settings) {
+    for (std::size_t i = 0; i < command.paths.size() && first + i < args.size(); ++i)
+        settings.*command.paths[i].target = std::move(args[first + i]);
 }
 
-void TakePaths(std::vector<std::string>& args, std::size_t first, const Grammar& grammar) {
-    for (std::size_t i = 0; i < grammar.paths.size() && first + i < args.size(); ++i)
-        *grammar.paths[i] = std::move(args[first + i]);
-}
-
-bool Parse(std::vector<std::string>& args, std::size_t position, const Grammar& grammar) {
-    for (; position < args.size(); ++position) {
-        if (const FlagOption* flag = Find(grammar.flags, args[position])) {
-            if (!flag->take()) return false;
-            continue;
-        }
-        const std::size_t remaining = args.size() - position;
-        if (remaining < 2) return RefusePathCount(grammar, 1);
-        if (const ValueOption* option = Find(grammar.values, args[position])) {
-            *option->target = std::move(args[++position]);
-            continue;
-        }
-        if (remaining < grammar.requiredPaths) return RefusePathCount(grammar, remaining);
-        TakePaths(args, position, grammar);
-        return true;
-    }
-    return RefusePathCount(grammar, 0);
-}
-
-FlagOption SetsResolve(std::string_view word, MergeConfig& config, MergeResolve resolve) {
-    return {word, [word, &config, resolve] {
-                if (config.resolve != ResolveBase)
-                    return Refuse("Error: Only one of then -l, -r and -p may be provided");
-                config.resolve = resolve;
-                config.premerge = word == kOptionUsePremerge;
-                return true;
-            }};
-}
-
-bool ParseTwoFileArgs(CommandLineArguments& arguments, int first, std::string_view command,
-                      TwoFileConfig& config) {
-    const Grammar grammar{command,
-                          {Sets(kOptionTiming, config.timing),
-                           Sets(kOptionNoThreads, config.useThreads, false),
-                           Sets(kOptionHeadless, gHeadlessEnabled)},
-                          {{kOptionRules, &config.rulesFile}, {kOptionTypeInfo, &config.typeInfoFile}},
-                          {&config.leftFile, &config.rightFile, &config.destFile},
-                          2};
-    return Parse(arguments.args, first, grammar);
-}
-
-int RunDiff(CommandLineArguments& arguments) {
-    DiffConfig config;
-    if (!ParseDiffArgs(arguments, 2, config)) return 1;
-    return HandleDiffCommand(config);
-}
-
-int RunStrip(CommandLineArguments& arguments) {
-    StripConfig config;
-    if (!ParseStripArgs(arguments, 2, config)) return 1;
-    return HandleStripCommand(config);
-}
-
-int RunMerge(CommandLineArguments& arguments) {
-    MergeConfig config;
-    if (!ParseMergeArgs(arguments, 2, config)) return 1;
-    return ProcessMergeCommand(config);
+/// How many arguments there must be from an option on, or from the first path on.
+std::size_t NeededFrom(const Option* option, const Command& command) {
+    if (!option) return command.requiredPaths;
+    return option->value.empty() ? 1 : 2;
 }
 
 /// The form of version control systems that have their parameters built in: base, left, right, destination
 /// and a fifth argument that means nothing here.
-int RunVersionControlForm(std::vector<std::string>& args) {
+ExitStatus RunVersionControlForm(std::vector<std::string>& args) {
     MergeConfig config;
     config.baseFile = std::move(args[1]);
     config.leftFile = std::move(args[2]);
@@ -169,56 +60,47 @@ int RunVersionControlForm(std::vector<std::string>& args) {
     return ProcessMergeCommand(config);
 }
 
+/// The first argument is none of the commands.
+ExitStatus RunWithoutCommand(std::vector<std::string>& args) {
+    if (args[1].starts_with('-'))
+        Report("Missing command (e.g. 'merge') before option " + args[1]);
+    else if (args.size() != 6)
+        Refuse("Error: unknown command " + args[1]);
+    else
+        return RunVersionControlForm(args);
+    return ExitStatus::Failed;
+}
+
 } // namespace
 
-bool ParseMergeArgs(CommandLineArguments& arguments, int first, MergeConfig& config) {
-    config.resolve = ResolveBase;
-    config.premerge = false;
-    const Grammar grammar{
-        kCmdMerge,
-        {SetsResolve(kOptionUseLeft, config, ResolveLeft), SetsResolve(kOptionUseRight, config, ResolveRight),
-         SetsResolve(kOptionUsePremerge, config, ResolveLeft), Sets(kOptionForce, config.force),
-         Sets(kOptionDescribe, config.describe), Sets(kOptionTiming, config.timing),
-         Sets(kOptionNoThreads, config.useThreads, false), Sets(kOptionHeadless, gHeadlessEnabled)},
-        {{kOptionUseMergeFile, &config.resolveFile},
-         {kOptionUseConflictFile, &config.conflictFile},
-         {kOptionRules, &config.rulesFile},
-         {kOptionTypeInfo, &config.typeInfoFile},
-         {kOptionFallback, &config.fallbackSpecFile}},
-        {&config.baseFile, &config.leftFile, &config.rightFile, &config.destFile, &config.premergeBaseDest,
-         &config.premergeRightDest},
-        3};
-    return Parse(arguments.args, first, grammar);
+bool ParseArguments(const Command& command, CommandLineArguments& arguments, MergeConfig& settings) {
+    if (command.paths.empty()) return true;
+    std::vector<std::string>& args = arguments.args;
+    for (std::size_t position = kFirstArgument; position < args.size(); ++position) {
+        const Option* option = FindOption(command, args[position]);
+        const std::size_t remaining = args.size() - position;
+        if (remaining < NeededFrom(option, command)) return RefusePathCount(command, remaining);
+        if (!option) {
+            TakePaths(args, position, command, settings);
+            return true;
+        }
+        if (!option->value.empty()) ++position;
+        const std::string_view refusal = option->take(settings, args[position]);
+        if (!refusal.empty()) return Refuse(std::string(refusal));
+    }
+    return RefusePathCount(command, 0);
 }
 
-bool ParseDiffArgs(CommandLineArguments& arguments, int first, DiffConfig& config) {
-    return ParseTwoFileArgs(arguments, first, kCmdDiff, config);
-}
-
-bool ParseStripArgs(CommandLineArguments& arguments, int first, StripConfig& config) {
-    return ParseTwoFileArgs(arguments, first, kCmdStrip, config);
-}
-
-int InnerMain(CommandLineArguments& arguments) {
+ExitStatus InnerMain(CommandLineArguments& arguments) {
     initialize();
-    OutliveFileSizeLimit();
+    OutliveFailedWrites();
     std::vector<std::string>& args = arguments.args;
     if (args.size() < 2) {
         Refuse("Error: need 'merge' command specified");
-        return 1;
+        return ExitStatus::Failed;
     }
-    const std::string& command = args[1];
-    if (command == kCmdStrip) return RunStrip(arguments);
-    if (command == kCmdDiff) return RunDiff(arguments);
-    if (command == kCmdMerge) return RunMerge(arguments);
-    if (command == kCmdUnittest) return RunUnitttests();
-    if (command.starts_with('-')) {
-        Report("Missing command (e.g. 'merge') before option " + command);
-        return 1;
-    }
-    if (args.size() != 6) {
-        Refuse("Error: unknown command " + command);
-        return 1;
-    }
-    return RunVersionControlForm(args);
+    const Command* command = FindCommand(args[1]);
+    if (!command) return RunWithoutCommand(args);
+    MergeConfig settings;
+    return ParseArguments(*command, arguments, settings) ? command->run(settings) : ExitStatus::Failed;
 }

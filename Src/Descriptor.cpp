@@ -52,7 +52,7 @@ int Sync(int file) {
     return errno == EINVAL || errno == ENOSYS || errno == EOPNOTSUPP ? 0 : errno;
 }
 
-/// A handler, since programs would inherit that a signal is ignored.
-void OutliveFileSizeLimit() {
-    std::signal(SIGXFSZ, [](int) {});
+/// Handlers, since programs would inherit that a signal is ignored.
+void OutliveFailedWrites() {
+    for (const int signal : {SIGXFSZ, SIGPIPE}) std::signal(signal, [](int) {});
 }

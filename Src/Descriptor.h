@@ -46,6 +46,6 @@ int SetSize(int file, off_t size);
 /// Brings the file to the disk. A file system that doesn't know this has not failed. Returns errno or 0.
 int Sync(int file);
 
-/// Makes a file that outgrows the limit of the process one that can't be written, instead of the end of the
-/// process. Programs that are started don't inherit this.
-void OutliveFileSizeLimit();
+/// Makes a file that outgrows the limit of the process, and a pipe that nobody reads any more, what can't be
+/// written, instead of the end of the process. Programs that are started don't inherit this.
+void OutliveFailedWrites();

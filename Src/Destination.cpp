@@ -9,8 +9,10 @@
 #include <climits>
 #include <fcntl.h>
 #include <initializer_list>
+#include <linux/magic.h> // PROC_SUPER_MAGIC
 #include <memory>
 #include <sys/stat.h>
+#include <sys/vfs.h>
 #include <unistd.h>
 #include <utility>
 
@@ -29,13 +31,21 @@ bool IsStandardStream(const Descriptor& file, const struct stat& status) {
     });
 }
 
-/// Replaces `path` by what its links lead to, which need not exist. Returns errno or 0.
+/// Whether a link in this folder leads to an open file itself: it reads as a name that the file may have had.
+bool IsFolderOfOpenFiles(const std::string& folder) {
+    struct statfs system;
+    return statfs(folder.c_str(), &system) == 0 && system.f_type == PROC_SUPER_MAGIC;
+}
+
+/// Replaces `path` by what its links lead to, which need not exist. Returns errno or 0; EPERM for what was
+/// named by its number as an open file, and must keep its identity.
 int FollowLinks(std::string& path) {
     constexpr int kMostLinks = 40; // as the system has it
     char target[PATH_MAX];
     for (int i = 0; i < kMostLinks; ++i) {
         const ssize_t length = readlink(path.c_str(), target, sizeof(target));
         if (length < 0) return errno == EINVAL || errno == ENOENT ? 0 : errno;
+        if (IsFolderOfOpenFiles(GetFolder(path))) return EPERM;
         const std::string link(target, static_cast<std::size_t>(length));
         path = link.starts_with('/') ? std::string() : GetFolder(path);
         path += link;
@@ -43,20 +53,22 @@ int FollowLinks(std::string& path) {
     return ELOOP;
 }
 
-/// Whether the failure says that a file may not be replaced, which isn't to say that it may not be written.
+/// Whether the failure says that a file can't be replaced, which isn't to say that it can't be written. The
+/// hidden name may be too long where the path isn't.
 bool IsRefusal(int error) {
-    return error == EACCES || error == EPERM || error == EROFS || error == EBUSY || error == EXDEV;
+    return error == EACCES || error == EPERM || error == EROFS || error == EBUSY || error == EXDEV ||
+           error == ENAMETOOLONG;
 }
 
 /// Makes the file, resembling `old` unless that is null.
-int Make(NewFile& file, const struct stat* old, const Content& content) {
+int Make(NewFile& file, const Descriptor* old, const Content& content) {
     const int error = old ? file.Resemble(*old) : 0;
     return error ? error : file.Fill(content.write);
 }
 
 /// Puts a whole new file at `place`. `old` is what stands there, null for nothing. The file has no name in
 /// the folder while it is being written, if that can be had.
-int PutNewFile(const std::string& place, const struct stat* old, const Content& content) {
+int PutNewFile(const std::string& place, const Descriptor* old, const Content& content) {
     const mode_t mode = old ? 0600 : 0666;
     if (NewFile file(place); file.OpenUnnamed(mode) == 0) {
         if (const int error = Make(file, old, content)) return error;
@@ -81,7 +93,7 @@ int Replace(const Descriptor& file, const std::string& path, const struct stat& 
     if (const int error = FollowLinks(place)) return error;
     struct stat found;
     if (lstat(place.c_str(), &found) != 0) return errno;
-    return IsSameFile(old, found) ? PutNewFile(place, &old, content) : EPERM;
+    return IsSameFile(old, found) ? PutNewFile(place, &file, content) : EPERM;
 }
 
 /// Asks for the space where the file system can tell beforehand. Returns errno or 0.

@@ -6,13 +6,13 @@
 #include "TimerStat.h"
 #include "TwoFiles.h"
 
+#include "Diff/DiffText.h"
 #include "Diff/YAMLDiffOutput.h"
-#include "Diff/YAMLMappingDiff.h"
 
 #include <iostream>
 #include <sstream>
 
-int HandleDiffCommand(DiffConfig& config) {
+ExitStatus HandleDiffCommand(DiffConfig& config) {
     constexpr std::size_t kIndentWidth = 2;
     TimerStat root("Diff Command", config.timing ? &std::cout : nullptr);
     TwoFiles files;
@@ -22,9 +22,9 @@ int HandleDiffCommand(DiffConfig& config) {
     std::ostringstream text;
     text << "Diff '" << config.leftFile << "' vs. '" << config.rightFile << "':\n";
     ovrin_yaml::YAMLDiffOutput output(text, kIndentWidth);
-    files.diff->Output(output);
+    ovrin_yaml::OutputDiff(*files.diff, output);
     output.Finish();
     const int error =
         Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});
-    return error ? FailToWrite(config.destFile, error) : 0;
+    return error ? FailToWrite(config.destFile, error) : ExitStatus::Done;
 }

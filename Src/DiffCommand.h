@@ -1,7 +1,9 @@
 #pragma once
 
+#include "ExitStatus.h"
+
 struct DiffConfig;
 
-/// Lists the changes between two object files. Returns 0; 1, after a message, if that can't be
-/// written. Throws YAMLError where a file can't be read.
-int HandleDiffCommand(DiffConfig& config);
+/// Lists the changes between two object files. Returns Done; Failed, after a message, if that
+/// can't be written. Throws YAMLError where a file can't be read.
+ExitStatus HandleDiffCommand(DiffConfig& config);

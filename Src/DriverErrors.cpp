@@ -6,12 +6,12 @@
 
 std::stringstream g_DriverErrors;
 
-int Fail(const std::string& message) {
+ExitStatus Fail(const std::string& message) {
     g_DriverErrors << message << '\n';
     ErrMsg(g_DriverErrors);
-    return 1;
+    return ExitStatus::Failed;
 }
 
-int FailToWrite(const std::string& path, int error) {
+ExitStatus FailToWrite(const std::string& path, int error) {
     return Fail("Cannot write '" + (path.empty() ? "-" : path) + "': " + std::strerror(error));
 }

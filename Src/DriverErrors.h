@@ -1,5 +1,7 @@
 #pragma once
 
+#include "ExitStatus.h"
+
 #include <sstream>
 #include <string>
 
@@ -7,8 +9,8 @@
 /// the earlier ones of both.
 extern std::stringstream g_DriverErrors;
 
-/// Shows the message. Always 1, the exit status of a failed command.
-int Fail(const std::string& message);
+/// Shows the message. Always ExitStatus::Failed.
+ExitStatus Fail(const std::string& message);
 
 /// The same for what can't be written to its last byte, by the errno. The empty path is standard output.
-int FailToWrite(const std::string& path, int error);
+ExitStatus FailToWrite(const std::string& path, int error);

@@ -1,4 +1,5 @@
 #include "CommandLine.h"
+#include "ExitStatus.h"
 
 #include <exception>
 #include <iostream>
@@ -7,12 +8,12 @@
 int main(int argc, char** argv) {
     try {
         CommandLineArguments arguments(argc, argv);
-        return InnerMain(arguments);
+        return static_cast<int>(InnerMain(arguments));
     } catch (const std::bad_alloc&) {
         std::cerr << "Out of memory\n";
-        return 1;
+        return static_cast<int>(ExitStatus::Failed);
     } catch (const std::exception& error) {
         std::cerr << "Uncaught exception: " << error.what() << '\n';
-        return 1;
+        return static_cast<int>(ExitStatus::Failed);
     }
 }

@@ -22,42 +22,48 @@ bool IsSmartExtension(const std::string& extension) {
            std::end(kSmartExtensions);
 }
 
-int SetupPremergePath(std::string& path) {
+/// False after a message.
+bool SetupPremergePath(std::string& path) {
     if (path.empty()) path = CreateTempFile();
-    return path.empty() ? Fail("Couldn't create temporary output premerge base file for merge result") : 0;
+    if (path.empty()) Fail("Couldn't create temporary output premerge base file for merge result");
+    return !path.empty();
 }
 
-int SetupPremergePaths(MergeConfig& config) {
-    if (!config.premerge) return 0;
-    if (const int failure = SetupPremergePath(config.premergeBaseDest)) return failure;
-    return SetupPremergePath(config.premergeRightDest);
+bool SetupPremergePaths(MergeConfig& config) {
+    return !config.premerge ||
+           (SetupPremergePath(config.premergeBaseDest) && SetupPremergePath(config.premergeRightDest));
 }
 
 /// Returns `status` once the destination holds the file `source`.
-int DeliverResult(const std::string& source, const MergeConfig& config, int status) {
+ExitStatus DeliverResult(const std::string& source, const MergeConfig& config, ExitStatus status) {
     const int error = OutputResultToDestination(source, config.destFile);
     return error ? FailToWrite(config.destFile, error) : status;
 }
 
-int MergeByTool(const MergeConfig& config, const std::string& output) {
-    const int result = FallbackMergeTool(config.baseFile, config.leftFile, config.rightFile, output,
-                                         config.fallbackSpecFile);
-    return result == 0 && !IsMissing(output) ? DeliverResult(output, config, 0) : result;
+/// A tool's status becomes that of the process, whatever it is.
+ExitStatus RunTool(const MergeConfig& config, const std::string& base, const std::string& left,
+                   const std::string& right, const std::string& output) {
+    return static_cast<ExitStatus>(FallbackMergeTool(base, left, right, output, config.fallbackSpecFile));
+}
+
+ExitStatus MergeByTool(const MergeConfig& config, const std::string& output) {
+    const ExitStatus result = RunTool(config, config.baseFile, config.leftFile, config.rightFile, output);
+    return result == ExitStatus::Done && !IsMissing(output) ? DeliverResult(output, config, result) : result;
 }
 
 /// The tool takes up where the smart merge stopped: its left input is what that merged.
-int HandConflictsToTool(const MergeConfig& config, const std::string& smartResult) {
+ExitStatus HandConflictsToTool(const MergeConfig& config, const std::string& smartResult) {
     const std::string output2 = CreateTempFile();
     if (output2.empty()) return Fail("Couldn't create temporary output2 file for merge result");
     const std::string& base = config.premerge ? config.premergeBaseDest : config.baseFile;
     const std::string& right = config.premerge ? config.premergeRightDest : config.rightFile;
-    const int result = FallbackMergeTool(base, smartResult, right, output2, config.fallbackSpecFile);
-    if (result != 0 || IsFileEmpty(output2) || IsMissing(output2)) return result;
-    return DeliverResult(output2, config, 0);
+    const ExitStatus result = RunTool(config, base, smartResult, right, output2);
+    if (result != ExitStatus::Done || IsFileEmpty(output2) || IsMissing(output2)) return result;
+    return DeliverResult(output2, config, result);
 }
 
-int MergeSmartly(MergeConfig& config, const std::string& output, bool useFallback) {
-    int result = 0;
+ExitStatus MergeSmartly(MergeConfig& config, const std::string& output, bool useFallback) {
+    ExitStatus result;
     try {
         result = HandleMergeCommand(config, output);
     } catch (const ovrin_yaml::YAMLError& error) {
@@ -67,20 +73,20 @@ int MergeSmartly(MergeConfig& config, const std::string& output, bool useFallbac
     } catch (const std::exception& error) {
         return Fail(error.what());
     }
-    if (result == 1) return 1;
-    if (result != 0 && useFallback) return HandConflictsToTool(config, output);
+    if (result == ExitStatus::Failed) return result;
+    if (result != ExitStatus::Done && useFallback) return HandConflictsToTool(config, output);
     return DeliverResult(output, config, result);
 }
 
 } // namespace
 
-int ProcessMergeCommand(MergeConfig& config) {
+ExitStatus ProcessMergeCommand(MergeConfig& config) {
     const std::string extension = GetFileExtension(config.leftFile);
     const bool smart = config.force || IsSmartExtension(extension);
     const bool useFallback = config.fallbackSpecFile != kNoSpecFile;
     const std::string output = CreateTempFile();
     if (output.empty()) return Fail("Couldn't create temporary output file for merge result");
-    if (const int failure = SetupPremergePaths(config)) return failure;
+    if (!SetupPremergePaths(config)) return ExitStatus::Failed;
     if (smart) return MergeSmartly(config, output, useFallback);
     if (useFallback) return MergeByTool(config, output);
     return Fail("Don't know how to merge " + extension + " files. Consider specifying a specFile argument");

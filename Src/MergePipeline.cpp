@@ -14,6 +14,7 @@
 
 #include "Diff/YAMLMappingDiff.h"
 #include "Merge/ConflictReport.h"
+#include "Merge/DiffMerge.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Repair/FileIDCollisions.h"
 #include "Repair/PostProcess.h"
@@ -40,13 +41,14 @@ struct MergeDiffs {
     const YAMLMappingDiff* right = nullptr;
 };
 
-void ReadFiles(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
+RulesAndTypes ReadFiles(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
     TimerStat timer(root, "Read files");
-    SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
+    RulesAndTypes rulesAndTypes = SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
     ReadInputs(timer, config.useThreads,
                {{"Read base", &config.baseFile, &files.base},
                 {"Read left", &config.leftFile, &files.left},
                 {"Read right", &config.rightFile, &files.right}});
+    return rulesAndTypes;
 }
 
 void PreProcessFile(const std::string& path, OvrinObjects& objects) {
@@ -68,13 +70,15 @@ void PreProcessMappings(TimerStat& root, const MergeConfig& config, MergeFiles& 
     RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
 }
 
-MergeDiffs DiffOnThreads(TimerStat& timer, const MergeFiles& files) {
+MergeDiffs DiffOnThreads(TimerStat& timer, const MergeRules& rules, const MergeFiles& files) {
     constexpr std::size_t kFewObjects = 1000;
     const YAMLMapping& base = files.base.GetMapping();
     const bool isLittle = base.Size() < kFewObjects;
     MergeDiffs diffs;
-    Thread left([&] { diffs.left = YAMLMappingDiff::Diff(&base, &files.left.GetMapping()); }, isLittle);
-    Thread right([&] { diffs.right = YAMLMappingDiff::Diff(&base, &files.right.GetMapping()); }, isLittle);
+    Thread left([&] { diffs.left = YAMLMappingDiff::Diff(rules, &base, &files.left.GetMapping()); },
+                isLittle);
+    Thread right([&] { diffs.right = YAMLMappingDiff::Diff(rules, &base, &files.right.GetMapping()); },
+                 isLittle);
     {
         TimerStat waitTimer(timer, "Waiting for left diff");
         left.Join();
@@ -85,16 +89,17 @@ MergeDiffs DiffOnThreads(TimerStat& timer, const MergeFiles& files) {
     return diffs;
 }
 
-MergeDiffs CreateDiffs(TimerStat& root, const MergeConfig& config, const MergeFiles& files) {
+MergeDiffs CreateDiffs(TimerStat& root, const MergeConfig& config, const MergeRules& rules,
+                       const MergeFiles& files) {
     TimerStat timer(root, "Creating diffs");
-    if (config.useThreads) return DiffOnThreads(timer, files);
+    if (config.useThreads) return DiffOnThreads(timer, rules, files);
     MergeDiffs diffs;
     {
         TimerStat leftTimer(timer, "Creating left diff");
-        diffs.left = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.left.GetMapping());
+        diffs.left = YAMLMappingDiff::Diff(rules, &files.base.GetMapping(), &files.left.GetMapping());
     }
     TimerStat rightTimer(timer, "Creating right diff");
-    diffs.right = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.right.GetMapping());
+    diffs.right = YAMLMappingDiff::Diff(rules, &files.base.GetMapping(), &files.right.GetMapping());
     return diffs;
 }
 
@@ -122,14 +127,12 @@ std::unique_ptr<OvrinObjects> CloneBase(TimerStat& root, const MergeConfig& conf
 
 /// Returns whether component dependencies were found broken.
 bool ApplyMergedChanges(TimerStat& root, const YAMLMappingDiff& merged, MergeFiles& files,
-                        RecordingConflictResolver& resolver) {
+                        const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver) {
     TimerStat timer(root, "Applying merged changes");
-    bool hasComponentDependencyConflicts = false;
     merged.Apply(files.base.GetMapping());
     TimerStat postTimer(timer, "Post process merged changes");
-    PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), resolver,
-                hasComponentDependencyConflicts);
-    return hasComponentDependencyConflicts;
+    return PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), types,
+                       resolver);
 }
 
 /// A report that can't be written is lost without a word, but for one that shares standard output with the
@@ -147,40 +150,41 @@ int OutputResult(TimerStat& root, const std::string& path, const OvrinObjects& r
     return WriteOutput(path, [&](std::ostream& stream) { Output(result, stream); });
 }
 
-/// Premerged files that can't be written are lost without a word where nobody is to work on them. Returns 0;
-/// 1, after a message, if a tool would.
-int PremergeForTool(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs) {
+/// Premerged files that can't be written are lost without a word where nobody is to work on them. Returns
+/// Done; Failed, after a message, if a tool would.
+ExitStatus PremergeForTool(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs) {
     const PremergeErrors errors = PremergeBoth(root, config, inputs);
-    if (!config.premerge || config.fallbackSpecFile == kNoSpecFile) return 0;
+    if (!config.premerge || config.fallbackSpecFile == kNoSpecFile) return ExitStatus::Done;
     if (errors.base) return FailToWrite(config.premergeBaseDest, errors.base);
     if (errors.right) return FailToWrite(config.premergeRightDest, errors.right);
-    return 0;
+    return ExitStatus::Done;
 }
 
 } // namespace
 
-int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath) {
+ExitStatus HandleMergeCommand(const MergeConfig& config, const std::string& outputPath) {
     TimerStat root("Merging", config.timing ? &std::cout : nullptr);
     MergeFiles files;
-    ReadFiles(root, config, files);
-    RecordingConflictResolver resolver(config.resolve);
+    const RulesAndTypes known = ReadFiles(root, config, files);
+    RecordingConflictResolver resolver(known.rules, config.resolve);
     { TimerStat timer(root, "Creating mappings"); }
     PreProcessMappings(root, config, files);
-    const MergeDiffs diffs = CreateDiffs(root, config, files);
-    if (!ReadResolveFile(root, config, resolver)) return 1;
+    const MergeDiffs diffs = CreateDiffs(root, config, known.rules, files);
+    if (!ReadResolveFile(root, config, resolver)) return ExitStatus::Failed;
     const YAMLMappingDiff* merged = nullptr;
     {
         TimerStat timer(root, "Merging");
-        merged = YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver);
+        merged = MergeMappingDiffs(diffs.left, diffs.right, resolver);
     }
     const std::unique_ptr<OvrinObjects> baseClone = CloneBase(root, config, files.base);
-    const bool hasComponentDependencyConflicts = ApplyMergedChanges(root, *merged, files, resolver);
+    const bool hasComponentDependencyConflicts =
+        ApplyMergedChanges(root, *merged, files, known.types, resolver);
     if (const int error = OutputConflicts(root, config, resolver)) return FailToWrite({}, error);
     if (const int error = OutputResult(root, outputPath, files.base)) return FailToWrite(outputPath, error);
-    if (!resolver.HasPendingConflicts()) return 0;
+    if (!resolver.HasPendingConflicts()) return ExitStatus::Done;
     if (baseClone && PremergeForTool(root, config,
-                                     {*baseClone, files.left.GetMapping(), files.right.GetMapping(),
-                                      diffs.left, diffs.right}) != 0)
-        return 1;
-    return hasComponentDependencyConflicts ? 3 : 2;
+                                     {known.rules, *baseClone, files.left.GetMapping(),
+                                      files.right.GetMapping(), diffs.left, diffs.right}) != ExitStatus::Done)
+        return ExitStatus::Failed;
+    return hasComponentDependencyConflicts ? ExitStatus::BrokenDependencies : ExitStatus::Conflicts;
 }

@@ -5,6 +5,9 @@
 #include <cerrno>
 #include <cstdio> // rename
 #include <fcntl.h>
+#include <linux/limits.h> // XATTR_SIZE_MAX
+#include <sys/stat.h>
+#include <sys/xattr.h>
 #include <unistd.h>
 
 namespace {
@@ -12,6 +15,22 @@ namespace {
 /// The way to a file without a name.
 std::string LinkOf(const Descriptor& file) {
     return "/proc/self/fd/" + std::to_string(file.Get());
+}
+
+bool HasNoAccessList() {
+    return errno == ENODATA || errno == EOPNOTSUPP || errno == ENOSYS;
+}
+
+/// Makes the access list of `to` that of `from`. None is one too: the folder may have given another to a new
+/// file. Beside a list the mode tells less than who may read. Returns errno or 0.
+int CopyAccessList(const Descriptor& from, const Descriptor& to) {
+    constexpr const char* kName = "system.posix_acl_access";
+    char list[XATTR_SIZE_MAX];
+    const ssize_t size = fgetxattr(from.Get(), kName, list, sizeof(list));
+    if (size < 0 && !HasNoAccessList()) return errno;
+    if (size >= 0)
+        return fsetxattr(to.Get(), kName, list, static_cast<std::size_t>(size), 0) == 0 ? 0 : errno;
+    return fremovexattr(to.Get(), kName) == 0 || HasNoAccessList() ? 0 : errno;
 }
 
 } // namespace
@@ -50,11 +69,14 @@ int NewFile::OpenNamed(mode_t mode) {
 }
 
 /// The owner comes first: who may read is opened last.
-int NewFile::Resemble(const struct stat& other) {
-    if (fchown(m_File.Get(), other.st_uid, other.st_gid) != 0 &&
-        fchown(m_File.Get(), -1, other.st_gid) != 0 && errno != EPERM && errno != EINVAL)
+int NewFile::Resemble(const Descriptor& other) {
+    struct stat status;
+    if (fstat(other.Get(), &status) != 0) return errno;
+    if (fchown(m_File.Get(), status.st_uid, status.st_gid) != 0 &&
+        fchown(m_File.Get(), -1, status.st_gid) != 0 && errno != EPERM && errno != EINVAL)
         return errno;
-    return fchmod(m_File.Get(), other.st_mode & 0777) == 0 ? 0 : errno;
+    if (const int error = CopyAccessList(other, m_File)) return error;
+    return fchmod(m_File.Get(), status.st_mode & 0777) == 0 ? 0 : errno;
 }
 
 int NewFile::Fill(const OutputWriter& write) {

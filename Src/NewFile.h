@@ -4,7 +4,6 @@
 #include "OutputFile.h"
 
 #include <string>
-#include <sys/stat.h>
 
 /// A file that takes its place when it is whole. Until then it has no name, so that it vanishes with the
 /// process, or, where the file system wants one, a hidden name in its folder, which the destructor removes.
@@ -18,8 +17,8 @@ public:
 
     int OpenUnnamed(mode_t mode);
     int OpenNamed(mode_t mode);
-    /// Gives the file the mode and, as far as that is permitted, the owner of another one.
-    int Resemble(const struct stat& other);
+    /// Gives the file the mode, the access list and, as far as that is permitted, the owner of another one.
+    int Resemble(const Descriptor& other);
     /// Fills the file and brings it to the disk.
     int Fill(const OutputWriter& write);
     /// Gives the hidden name to a file without name.

@@ -35,6 +35,11 @@ YAMLMapping* createTestMap() {
     return MapOf({{"key1", "value1"}, {"key2", "value2"}, {"key3", "value3"}});
 }
 
+const MergeRules& NoRules() {
+    static const MergeRules rules;
+    return rules;
+}
+
 const RemoveOperation* Removal() {
     return YAMLAlloc<RemoveOperation>::create(false);
 }
@@ -60,17 +65,17 @@ bool VerifyHasConflict(const RecordingConflictResolver& resolver, const std::str
 
 } // namespace self_check
 
-int RunUnitttests() {
+ExitStatus RunUnitttests() {
     try {
         TestResults results;
         self_check::TestOperations(results);
         self_check::TestDiffs(results);
         results.Output(std::cout);
-        return 0;
+        return ExitStatus::Done;
     } catch (const YAMLError& error) {
         std::cerr << "YAML error: " << error.what() << '\n';
     } catch (const std::exception& error) {
         std::cerr << "Exception: " << error.what() << '\n';
     }
-    return 1;
+    return ExitStatus::Failed;
 }

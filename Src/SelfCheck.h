@@ -1,5 +1,7 @@
 #pragma once
 
-/// Runs the built-in checks and prints a line for each. Returns the exit status of the process, which is 0
-/// also where checks fail.
-int RunUnitttests();
+#include "ExitStatus.h"
+
+/// Runs the built-in checks and prints a line for each. Returns Done also where checks fail; Failed only
+/// where one throws.
+ExitStatus RunUnitttests();

@@ -37,7 +37,7 @@ void StripUnchangedMapping(YAMLMapping& mapping, const YAMLMappingDiff& diff) {
 
 } // namespace
 
-int HandleStripCommand(StripConfig& config) {
+ExitStatus HandleStripCommand(StripConfig& config) {
     TimerStat root("Strip Command", config.timing ? &std::cout : nullptr);
     TwoFiles files;
     ReadAndDiff(root, config, files);
@@ -49,5 +49,5 @@ int HandleStripCommand(StripConfig& config) {
     Output(files.right, text);
     const int error =
         Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});
-    return error ? FailToWrite(config.destFile, error) : 0;
+    return error ? FailToWrite(config.destFile, error) : ExitStatus::Done;
 }

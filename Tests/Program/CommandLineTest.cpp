@@ -3,6 +3,9 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <ranges>
+#include <regex>
+#include <set>
 #include <sstream>
 
 using namespace ovrin_yaml;
@@ -20,7 +23,7 @@ CommandLineArguments Arguments(const std::string& line) {
 }
 
 struct Outcome {
-    int status;
+    ExitStatus status;
     std::string errors; // ends in the last message; messages before it may be repeated in front
     std::string output;
 };
@@ -29,22 +32,23 @@ Outcome RunMain(const std::string& line) {
     CommandLineArguments arguments = Arguments(line);
     testing::internal::CaptureStderr();
     testing::internal::CaptureStdout();
-    const int status = InnerMain(arguments);
+    const ExitStatus status = InnerMain(arguments);
     return {status, testing::internal::GetCapturedStderr(), testing::internal::GetCapturedStdout()};
 }
 
-MergeConfig Merge(const std::string& line) {
-    CommandLineArguments arguments = Arguments("merge " + line);
+MergeConfig Settings(const std::string& command, const std::string& line) {
+    CommandLineArguments arguments = Arguments(command + " " + line);
     MergeConfig config;
-    EXPECT_TRUE(ParseMergeArgs(arguments, 2, config)) << line;
+    EXPECT_TRUE(ParseArguments(*FindCommand(command), arguments, config)) << line;
     return config;
 }
 
-DiffConfig Diff(const std::string& line) {
-    CommandLineArguments arguments = Arguments("diff " + line);
-    DiffConfig config;
-    EXPECT_TRUE(ParseDiffArgs(arguments, 2, config)) << line;
-    return config;
+MergeConfig Merge(const std::string& line) {
+    return Settings("merge", line);
+}
+
+TwoFileConfig Diff(const std::string& line) {
+    return Settings("diff", line);
 }
 
 std::string Paths(const MergeConfig& config) {
@@ -52,7 +56,7 @@ std::string Paths(const MergeConfig& config) {
            config.premergeBaseDest + "," + config.premergeRightDest;
 }
 
-std::string Paths(const DiffConfig& config) {
+std::string Paths(const TwoFileConfig& config) {
     return config.leftFile + "," + config.rightFile + "," + config.destFile;
 }
 
@@ -83,7 +87,7 @@ TEST(CommandLine, WrongArgumentsAreExplained) {
     };
     for (const auto& [line, message, usage] : cases) {
         const Outcome outcome = RunMain(line);
-        EXPECT_EQ(outcome.status, 1) << line;
+        EXPECT_EQ(outcome.status, ExitStatus::Failed) << line;
         EXPECT_TRUE(outcome.errors.ends_with(message + "\n")) << line << "\n" << outcome.errors;
         EXPECT_EQ(!outcome.output.empty(), usage) << line;
     }
@@ -102,6 +106,27 @@ TEST(CommandLine, UsageKeepsItsBlanksAndEmptyLines) {
     EXPECT_NE(text.find("[--fallback fallbackspecfile] \n"), std::string::npos);
     EXPECT_TRUE(text.ends_with("  format to be stable as it will likely change.\n"));
     EXPECT_EQ(std::count(text.begin(), text.end(), '\n'), 47);
+}
+
+/// The words of the text that the pattern finds.
+std::set<std::string> Found(const std::string& text, const char* pattern) {
+    const std::regex words(pattern);
+    std::set<std::string> found;
+    for (std::sregex_iterator i(text.begin(), text.end(), words); i != std::sregex_iterator(); ++i)
+        found.insert(i->str(1));
+    return found;
+}
+
+TEST(CommandLine, UsageNamesWhatTheTableSaysItNames) {
+    const std::string text = RunMain("").output;
+    std::set<std::string> commands, options;
+    for (const Command& command : kCommands) {
+        if (command.isInUsage) commands.emplace(command.word);
+        for (const Option& option : command.options | std::views::join)
+            if (option.isInUsage) options.emplace(option.word);
+    }
+    EXPECT_EQ(Found(text, "[ |\\[](--?[a-zA-Z]+)"), options);
+    EXPECT_EQ(Found(text, "(?:OvrinMerge |experimental ')([a-z]+)"), commands);
 }
 
 TEST(CommandLine, OptionsEndAtTheFirstPath) {
@@ -126,7 +151,7 @@ TEST(CommandLine, EachFlagSetsItsField) {
     const MergeConfig none = Merge("a b c");
     EXPECT_FALSE(none.force || none.describe || none.timing || none.premerge || !none.useThreads);
     const MergeConfig all = Merge("--force --describe --timing --nothreads -h a b c");
-    EXPECT_TRUE(all.force && all.describe && all.timing && !all.useThreads && gHeadlessEnabled);
+    EXPECT_TRUE(all.force && all.describe && all.timing && !all.useThreads && all.headless);
     EXPECT_EQ(Merge("-l a b c").resolve, ResolveLeft);
     EXPECT_EQ(Merge("-r a b c").resolve, ResolveRight);
     EXPECT_EQ(Merge("-p a b c").resolve, ResolveLeft);

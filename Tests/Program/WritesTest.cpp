@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <sys/stat.h>
+#include <sys/xattr.h>
 #include <unistd.h>
 
 namespace {
@@ -71,6 +72,15 @@ TEST_F(Writes, AReportIsLostInSilenceUnlessItSharesStandardOutputWithTheResult) 
     ExpectMessage("-", "No space left on device");
 }
 
+TEST_F(Writes, APipeThatNobodyReadsEndsNothing) {
+    const std::string merge = "mkfifo pipe; exec 3<>pipe 4>pipe 3<&-; rm pipe; "
+                              "\"$OVRIN\" merge --fallback none base.ovrin left.ovrin right.ovrin";
+    EXPECT_EQ(directory.Run(merge + " dest >&4"), 2) << "its report is lost in silence";
+    ExpectMerged("dest");
+    EXPECT_EQ(directory.Run(merge + " >&4"), 1);
+    ExpectMessage("-", "Broken pipe");
+}
+
 TEST_F(Writes, NoToolWorksOnPremergedFilesThatAreNotWhole) {
     directory.Write(
         "tools", "ovrin use \"/bin/cp\" %l %d && touch started\n* use \"/bin/cp\" %l %d && touch started\n");
@@ -106,6 +116,24 @@ TEST_F(Writes, TheDestinationIsReplacedAndKeepsModeAndOwner) {
     EXPECT_TRUE(fs::is_symlink(directory.Path() / "link"));
 }
 
+TEST_F(Writes, TheDestinationKeepsItsAccessListAndGetsNoOtherFromTheFolder) {
+    // Version 2: the user rw, user 4242 r, the group nothing, the mask r, others nothing.
+    const std::string list("\2\0\0\0\1\0\6\0\377\377\377\377\2\0\4\0\222\20\0\0"
+                           "\4\0\0\0\377\377\377\377\20\0\4\0\377\377\377\377\40\0\0\0\377\377\377\377",
+                           44);
+    const std::string folder = directory.Path().string();
+    if (setxattr(folder.c_str(), "system.posix_acl_default", list.data(), list.size(), 0) != 0)
+        GTEST_SKIP() << "no access lists here";
+    const std::string file = folder + "/old";
+    EXPECT_EQ(Merge("old"), 2);
+    EXPECT_EQ(getxattr(file.c_str(), "system.posix_acl_access", nullptr, 0), -1);
+    EXPECT_EQ(setxattr(file.c_str(), "system.posix_acl_access", list.data(), list.size(), 0), 0);
+    EXPECT_EQ(Merge("old"), 2);
+    char kept[44] = {};
+    EXPECT_EQ(getxattr(file.c_str(), "system.posix_acl_access", kept, sizeof(kept)), 44);
+    EXPECT_EQ(std::string(kept, sizeof(kept)), list);
+}
+
 TEST_F(Writes, ANewDestinationGetsTheModeOfTheUserAndStandsWhereLinksEnd) {
     fs::create_directory(directory.Path() / "folder");
     directory.Run("ln -s ../new folder/second; ln -s folder/second first");
@@ -122,11 +150,21 @@ TEST_F(Writes, WhatMustKeepItsIdentityIsWrittenInPlace) {
     ExpectMerged("second");
     EXPECT_EQ(Merge("/dev/stdout"), 2);
     ExpectMerged("stdout");
+    directory.Run(
+        "seq 9 >open; exec 3<open; \"$OVRIN\" merge --fallback none -o report base.ovrin left.ovrin "
+        "right.ovrin /dev/fd/3; cat <&3 >seen");
+    ExpectMerged("seen");
     EXPECT_EQ(
         directory.Run("mkfifo pipe; cat pipe >piped & \"$OVRIN\" merge --fallback none -o report base.ovrin "
                       "left.ovrin right.ovrin pipe; status=$?; wait; exit $status"),
         2);
     ExpectMerged("piped");
+}
+
+TEST_F(Writes, ThePathOfADestinationMayBeAsLongAsTheSystemHasIt) {
+    const std::string folder = "$(yes ./ | head -n 2046 | tr -d '\\n')"; // PATH_MAX, 4096, is 4 more
+    EXPECT_EQ(Merge(folder + "old"), 2);
+    ExpectMerged("old");
 }
 
 TEST_F(Writes, AFileWrittenInPlaceGetsItsOldBytesBack) {

@@ -221,6 +221,14 @@ TEST(Reader, AThousandLevelsAreTheLimit) {
     EXPECT_EQ(ReadError(ObjectText("--- !o!1 &2\na: " + std::string(2000000, '{'))), tooDeep);
 }
 
+/// The parser's time is quadratic in them, for each document.
+TEST(Reader, AHundredDirectivesAreTheLimit) {
+    std::string header = "%YAML 1.1\n%TAG !o! tag:t,2011:\n";
+    for (int i = 2; i < 100; ++i) header += "%TAG !a" + std::to_string(i) + "! tag:t\n";
+    EXPECT_EQ(ReadError(header + "--- !o!1 &2\na: 1\n"), "none");
+    EXPECT_EQ(ReadError(header + "%TAG !b! tag:t\n--- !o!1 &2\na: 1\n"), "Too many directives");
+}
+
 TEST(Reader, LevelsBehindAliasesCount) {
     const auto text = [](int inner, int outer) {
         return ObjectText("--- !o!1 &2\na: &x " + std::string(inner, '[') + std::string(inner, ']') +

@@ -1,6 +1,7 @@
 #include "Reading/ChunkWalker.h"
 
 #include "Values/YAMLScalar.h"
+#include "Writing/WrittenForm.h"
 
 #include <algorithm>
 
@@ -8,35 +9,35 @@ namespace ovrin_yaml {
 
 namespace {
 
-constexpr std::string_view kMarker = "---";
-constexpr std::string_view kNextHeader = "\n--- !o!";
-constexpr std::string_view kStripped = "stripped";
-constexpr std::string_view kIdCharacters = "0123456789-";
 /// More than the parser decodes ahead of what it scans.
 constexpr std::size_t kDecodedAhead = std::size_t{64} << 10;
 
+/// The parser compares the directives of a header with each other, for every document.
+constexpr int kMostDirectives = 100;
+
 const char* const kLostPlace = "Error locating end of document sequence";
 
-std::string_view IdAt(std::string_view text, std::size_t position) {
-    if (position >= text.size()) return {};
-    const std::string_view rest = text.substr(position);
-    return rest.substr(0, rest.find_first_not_of(kIdCharacters));
+void RequireFewDirectives(std::string_view header) {
+    int directives = 0;
+    for (std::size_t at = 0; (at = header.find('%', at)) != header.npos; ++at)
+        if (at == 0 || header[at - 1] == '\n' || header[at - 1] == '\r') ++directives;
+    if (directives > kMostDirectives) throw YAMLError("Too many directives");
 }
 
 bool IsUnusual(char c) {
-    return (c < ' ' || c > '~') && c != '\t' && c != '\n' && c != '\r';
+    return !IsPrintable(c) && c != '\t' && c != '\n' && c != '\r';
 }
 
 /// Whether the parser takes what stands at the start of a line for a marker, wherever it meets it.
 bool IsMarker(std::string_view line) {
     constexpr std::string_view kBehind = " \t\r\n";
-    return line.starts_with(kMarker) &&
-           (line.size() == kMarker.size() || kBehind.find(line[kMarker.size()]) != kBehind.npos);
+    return line.starts_with(kDocumentMark) &&
+           (line.size() == kDocumentMark.size() || kBehind.find(line[kDocumentMark.size()]) != kBehind.npos);
 }
 
 /// The line end in front of the next marker, or npos.
 std::size_t FindMarker(std::string_view text, std::size_t from) {
-    constexpr std::string_view kMarkerLine = "\n---";
+    constexpr std::string_view kMarkerLine = kNextHeader.substr(0, 1 + kDocumentMark.size());
     std::size_t found = text.find(kMarkerLine, from);
     while (found != text.npos && !IsMarker(text.substr(found + 1))) found = text.find(kMarkerLine, found + 1);
     return found;
@@ -85,7 +86,9 @@ void AddHeaderData(YAMLMapping& object, YAMLScalar* fileID, std::string_view cla
 
 ChunkWalker::ChunkWalker(std::string text, std::string header, YAMLMapping& root, AliasBudget& budget)
     : m_Text(std::move(text)), m_Header(std::move(header)), m_Short(Shorten(m_Header)),
-      m_HeaderAnchor(m_Header.find('&')), m_Root(root), m_Budget(budget) {}
+      m_HeaderAnchor(m_Header.find(kAnchorSign)), m_Root(root), m_Budget(budget) {
+    RequireFewDirectives(m_Header);
+}
 
 /// The directives of a header that consists of complete ASCII lines; the whole of any other. Whether a
 /// directive stands in the last line decides what the parser makes of blanks behind the header, so that a
@@ -137,15 +140,16 @@ bool ChunkWalker::BlankStrippedWord() {
     const std::size_t line = m_Chunk + m_Header.size();
     const std::size_t end = line < m_Text.size() ? m_Text.find_first_of("\r\n", line) : std::string::npos;
     if (end == std::string::npos || end == line) throw YAMLError(kLostPlace);
-    if (end < kStripped.size() || m_Text.compare(end - kStripped.size(), kStripped.size(), kStripped) != 0)
+    if (end < kStrippedWord.size() ||
+        m_Text.compare(end - kStrippedWord.size(), kStrippedWord.size(), kStrippedWord) != 0)
         return false;
-    m_Text.replace(end - kStripped.size(), kStripped.size(), kStripped.size(), ' ');
+    m_Text.replace(end - kStrippedWord.size(), kStrippedWord.size(), kStrippedWord.size(), ' ');
     return true;
 }
 
 /// The line end in front of the next document's header line, or npos.
 std::size_t ChunkWalker::FindNextHeader() {
-    return m_NextHeader.From(m_Chunk + m_Header.size() + kMarker.size(),
+    return m_NextHeader.From(m_Chunk + m_Header.size() + kDocumentMark.size(),
                              [this](std::size_t from) { return m_Text.find(kNextHeader, from); });
 }
 
@@ -154,17 +158,18 @@ std::size_t ChunkWalker::FindNextHeader() {
 /// ahead holds nothing that it could refuse: decoding that again for each document takes most of the time.
 std::size_t ChunkWalker::InputEnd(std::size_t nextHeader) {
     const std::string_view text = m_Text;
-    const std::size_t end = nextHeader == text.npos ? text.size() : nextHeader + 1 + kMarker.size();
+    const std::size_t end = nextHeader == text.npos ? text.size() : nextHeader + 1 + kDocumentMark.size();
     const std::size_t line = m_Chunk + m_Header.size();
     // A chunk that lies wrong, or whose header swallows the marker, may find its own one later.
     if (!m_Header.ends_with('\n') || !IsMarker(text.substr(line))) return end;
-    const std::size_t marker =
-        m_NextMarker.From(line + kMarker.size(), [text](std::size_t from) { return FindMarker(text, from); });
+    const std::size_t marker = m_NextMarker.From(line + kDocumentMark.size(),
+                                                 [text](std::size_t from) { return FindMarker(text, from); });
     if (marker == nextHeader) return end;
     const std::size_t unusual = m_NextUnusual.From(line, [text](std::size_t from) -> std::size_t {
         return std::find_if(text.begin() + from, text.end(), IsUnusual) - text.begin();
     });
-    return unusual == text.size() || unusual > marker + kDecodedAhead ? marker + 1 + kMarker.size() : end;
+    return unusual == text.size() || unusual > marker + kDecodedAhead ? marker + 1 + kDocumentMark.size()
+                                                                      : end;
 }
 
 /// Behind the first "&" in front of the next header line; that may be one in the file's header.
@@ -176,8 +181,8 @@ std::string_view ChunkWalker::FileID(std::size_t nextHeader) {
         const bool isWhole = InputBegin() == m_Chunk;
         return isWhole ? IdAt(text, m_Chunk + m_HeaderAnchor + 1) : IdAt(m_Header, m_HeaderAnchor + 1);
     }
-    const std::size_t anchor = m_NextAnchor.From(m_Chunk + m_Header.size(),
-                                                 [text](std::size_t from) { return text.find('&', from); });
+    const std::size_t anchor = m_NextAnchor.From(
+        m_Chunk + m_Header.size(), [text](std::size_t from) { return text.find(kAnchorSign, from); });
     return anchor < nextHeader ? IdAt(text, anchor + 1) : std::string_view();
 }
 
@@ -185,8 +190,8 @@ std::string_view ChunkWalker::FileID(std::size_t nextHeader) {
 /// chunk too early, which is noticed at the latest when that is parsed.
 void ChunkWalker::MoveToNext(std::size_t stoppedAt) {
     const std::size_t behindHeader = m_Chunk + stoppedAt;
-    if (behindHeader < kMarker.size() + m_Header.size()) throw YAMLError(kLostPlace);
-    const std::size_t next = behindHeader - kMarker.size() - m_Header.size();
+    if (behindHeader < kDocumentMark.size() + m_Header.size()) throw YAMLError(kLostPlace);
+    const std::size_t next = behindHeader - kDocumentMark.size() - m_Header.size();
     if (next <= m_Chunk || next + m_Header.size() > m_Text.size()) throw YAMLError(kLostPlace);
     m_Chunk = next;
     m_Short.text.copy(m_Text.data() + InputBegin(), m_Short.text.size());

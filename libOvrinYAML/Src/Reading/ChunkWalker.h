@@ -24,12 +24,13 @@ void AddHeaderData(YAMLMapping& object, YAMLScalar* fileID, std::string_view cla
 ///     HEADER--- !o!4 &12 body one body one\n--- !o!4 &14 body two     first chunk: from the start
 ///     HEADER--- !o!4 &12 body oHEADER--- !o!4 &14 body two            second chunk
 ///
-/// The time is linear in the text, but for directives, which the parser reads for each document. The first
+/// The time is linear in the text: directives, which the parser reads for each document, are few. The first
 /// document shows that the header can be read; in front of the later ones stands only what they need of it.
 /// And what is looked for in front of the walker is looked for once.
 class ChunkWalker {
 public:
-    /// `text` begins with `header`; objects are added to `root`. `budget` is the file's.
+    /// `text` begins with `header`; objects are added to `root`. `budget` is the file's. Throws YAMLError for
+    /// a header of more than 100 directives.
     ChunkWalker(std::string text, std::string header, YAMLMapping& root, AliasBudget& budget);
 
     /// Reads one document and moves on to the next; false if it was the last. Throws YAMLError.

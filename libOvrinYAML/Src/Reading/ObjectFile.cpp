@@ -5,6 +5,7 @@
 #include "Values/Arena.h"
 #include "Values/ScalarTable.h"
 #include "Values/YAMLScalar.h"
+#include "Writing/WrittenForm.h"
 
 #include <algorithm>
 #include <atomic>
@@ -14,32 +15,19 @@ namespace ovrin_yaml {
 
 namespace {
 
-constexpr std::string_view kSignature = "%YAML";
-constexpr std::string_view kMarker = "---";
-constexpr std::string_view kDocumentStart = "--- !o!";
-constexpr std::string_view kNextHeader = "\n--- !o!";
-/// Lines in a header of the usual form; the parser counts them in every document.
-constexpr std::uint32_t kHeaderLines = 2;
 /// Text that is read at one go: enough for a reader to get to know the common texts, little enough to share
 /// out.
 constexpr std::size_t kPieceBytes = std::size_t{1} << 20;
 
-/// The file id in a document's header line, where that has the usual form.
-std::string_view FileIDOf(const char* begin, const char* end) {
-    const std::string_view line(begin, static_cast<std::size_t>(std::find(begin, end, '\n') - begin));
-    const std::size_t anchor = line.find('&');
-    if (anchor == std::string_view::npos) return {};
-    return line.substr(anchor + 1, line.find(' ', anchor) - anchor - 1);
-}
-
 } // namespace
 
 std::string_view ObjectFile::FileIDOf(const Document& document) {
-    return ovrin_yaml::FileIDOf(document.begin, document.begin + document.length);
+    return ovrin_yaml::FileIDOf({document.begin, document.length});
 }
 
 void ObjectFile::Take(std::string bytes) {
-    if (std::string_view(bytes).substr(0, kSignature.size() + 4).find(kSignature) == std::string_view::npos)
+    if (std::string_view(bytes).substr(0, kFileSignature.size() + 4).find(kFileSignature) ==
+        std::string_view::npos)
         throw YAMLError(
             "File is not a valid text serialized YAML file. Make sure that Asset Serialization is "
             "set to 'Force text' in Editor Settings.");
@@ -50,15 +38,15 @@ void ObjectFile::Take(std::string bytes) {
 
 void ObjectFile::TakeText(std::string text) {
     m_Text = std::make_shared<const std::string>(std::move(text));
-    m_Header = std::string_view(*m_Text).substr(0, m_Text->find(kMarker));
+    m_Header = std::string_view(*m_Text).substr(0, m_Text->find(kDocumentMark));
 }
 
 /// "%YAML 1.1" and the %TAG line of the handle "!o!", with nothing in its prefix that isn't plain in every
 /// sense.
 bool ObjectFile::HasWrittenHeader() const {
-    constexpr std::string_view kBegin = "%YAML 1.1\n%TAG !o! tag:";
-    if (!m_Header.starts_with(kBegin) || !m_Header.ends_with('\n')) return false;
-    const std::string_view prefix = m_Header.substr(kBegin.size(), m_Header.size() - kBegin.size() - 1);
+    if (!m_Header.starts_with(kFileHeaderStart) || !m_Header.ends_with('\n')) return false;
+    const std::string_view prefix =
+        m_Header.substr(kFileHeaderStart.size(), m_Header.size() - kFileHeaderStart.size() - 1);
     const auto isPlain = [](char c) {
         return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') ||
                std::string_view(".,:-").find(c) != std::string_view::npos;
@@ -150,7 +138,7 @@ void ObjectFile::CutAlong() {
 /// For a document that isn't the expected one; `expected` becomes the one behind the base's of the same id.
 std::size_t ObjectFile::FindLender(const char* begin, const char* end, std::size_t& expected) const {
     const std::vector<Document>& known = m_Base->m_Documents;
-    const std::string_view fileID = ovrin_yaml::FileIDOf(begin, end);
+    const std::string_view fileID = ovrin_yaml::FileIDOf({begin, end});
     const bool isChanged = expected < known.size() && FileIDOf(known[expected]) == fileID;
     const std::size_t index = isChanged ? expected : m_Base->IndexOf(fileID);
     if (index == kNone) return kNone;
@@ -201,7 +189,8 @@ void ObjectFile::ReadDocuments(WrittenFormReader& reader, std::span<Document> do
 }
 
 void ObjectFile::Read(WrittenFormReader& reader, Document& document) const {
-    const auto read = reader.Read({document.begin, document.length}, kHeaderLines);
+    // The parser counts the lines of the file's header in every document.
+    const auto read = reader.Read({document.begin, document.length}, kFileHeaderLines);
     document.object = read.object;
     document.isAsWritten = read.isAsWritten;
 }
@@ -257,7 +246,7 @@ void ObjectFile::FinishDocuments() {
 bool ObjectFile::ReadByLibrary(const Document& document, bool isLast) {
     std::string chunk(m_Header);
     chunk.append(document.begin, document.length);
-    if (!isLast) chunk += kMarker;
+    if (!isLast) chunk += kDocumentMark;
     ChunkWalker walker(std::move(chunk), std::string(m_Header), m_Objects.GetMapping(), m_AliasBudget);
     if (!walker.ReadDocument()) return false;
     if (!isLast && walker.Position() == document.length) return true;

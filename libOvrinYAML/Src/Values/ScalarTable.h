@@ -73,6 +73,14 @@ private:
 
     /// A scalar's address with 16 bits of its hash above it, so that most probes of other scalars need not
     /// look into memory elsewhere. User addresses have 47 bits on the platforms served.
+    ///
+    ///     hash 5b07e391    010110 11000001111110001110010001    shard 22, and where the walk begins in its
+    ///     slots
+    ///                                       1110001110010001    tag e391, above the address:
+    ///
+    ///         first slot     4c20 7f3a5c10f0c0    another tag: passed without a look at the scalar
+    ///         second slot    e391 7f3a5c102018    this tag: the scalar's hash and text decide
+    ///         third slot     0000 000000000000    empty: the text isn't known
     using Slot = std::atomic<std::uint64_t>;
 
     struct Slots {

@@ -5,6 +5,7 @@
 #include "Values/ScalarTable.h"
 #include "Values/YAMLSequence.h"
 #include "Writing/ObjectFileWriter.h"
+#include "Writing/WrittenForm.h"
 
 #include <sstream>
 
@@ -46,7 +47,7 @@ std::string WrittenAlone(const YAMLMapping& object) {
     std::ostringstream stream;
     Output(alone, stream);
     const std::string written = stream.str();
-    return written.substr(written.find("---"));
+    return written.substr(written.find(kDocumentMark));
 }
 
 } // namespace

@@ -1,6 +1,7 @@
 #include "Writing/ObjectFileWriter.h"
 
 #include "Values/YAMLScalar.h"
+#include "Writing/WrittenForm.h"
 #include "Writing/YAMLEmitter.h"
 
 #include <ostream>
@@ -14,15 +15,15 @@ namespace {
 /// to stay in the cache.
 constexpr std::size_t kPieceSize = std::size_t{1} << 20;
 
-constexpr const char* kFileHeader = "%YAML 1.1\n%TAG !o! tag:" OVRIN_TAG_AUTHORITY ",2011:\n";
+constexpr std::string_view kFileHeaderEnd = OVRIN_TAG_AUTHORITY ",2011:\n";
 
 void AppendHeaderLine(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text) {
     const YAMLScalar* fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
     const YAMLScalar* classID = AsScalar(object.Get(YAMLScalar::classIDPlaceHolderName));
     if (!fileID) fileID = &rootKey;
     if (!classID) throw YAMLError("Object has no class id: " + std::string(fileID->Value()));
-    text.append("--- !o!").append(classID->Value()).append(" &").append(fileID->Value());
-    if (object.HasKey(YAMLScalar::strippedPrefabPlaceHolderName)) text.append(" stripped");
+    text.append(kDocumentStart).append(classID->Value()).append(kAnchor).append(fileID->Value());
+    if (object.HasKey(YAMLScalar::strippedPrefabPlaceHolderName)) text.append(kStripped);
     text.push_back('\n');
 }
 
@@ -40,7 +41,8 @@ void AppendObjectBody(const YAMLMapping& object, std::string& text) {
 }
 
 void Output(const OvrinObjects& objects, std::ostream& stream) {
-    std::string text = kFileHeader;
+    std::string text(kFileHeaderStart);
+    text += kFileHeaderEnd;
     for (const YAMLMapping::Entry entry : objects.GetMapping()) {
         const YAMLMapping& object = ToMapping(entry.value);
         if (!object.Source().empty()) {

@@ -1,12 +1,13 @@
 #include "Writing/ScalarWriter.h"
 
+#include "Writing/WrittenForm.h"
+
 #include <algorithm>
+#include <iterator>
 
 namespace ovrin_yaml {
 
 namespace {
-
-constexpr std::size_t kWidth = TextOutput::kWidth;
 
 /// The blank at `at` has a neighbour on both sides, and the one before it is no blank.
 bool EndsWordInside(std::string_view text, std::size_t at) {
@@ -38,33 +39,28 @@ Character Decode(std::string_view text) {
     return {code, length};
 }
 
-/// Characters that are written as a letter behind a backslash, and those letters.
-constexpr std::u32string_view kLettered(U"\0\a\b\t\n\v\f\r\x1B\"\\\x85\xA0\u2028\u2029", 15);
-constexpr std::string_view kLetters("0abtnvfre\"\\N_LP");
-static_assert(kLettered.size() == kLetters.size());
-
 void WriteEscape(TextOutput& output, char32_t code) {
     output.Put('\\');
-    if (const std::size_t at = kLettered.find(code); at != std::u32string_view::npos) {
-        output.Put(kLetters[at]);
-        return;
-    }
-    const int digits = code <= 0xFF ? 2 : code <= 0xFFFF ? 4 : 8;
-    output.Put(digits == 2 ? 'x' : digits == 4 ? 'u' : 'U');
-    for (int shift = 4 * (digits - 1); shift >= 0; shift -= 4)
+    for (const LetterEscape& escape : kLetterEscapes)
+        if (escape.character == code) return output.Put(escape.letter);
+    const NumberEscape& escape =
+        *std::find_if(std::begin(kNumberEscapes), std::prev(std::end(kNumberEscapes)),
+                      [code](const NumberEscape& candidate) { return code >> 4 * candidate.digits == 0; });
+    output.Put(escape.letter);
+    for (int shift = 4 * (escape.digits - 1); shift >= 0; shift -= 4)
         output.Put("0123456789ABCDEF"[code >> shift & 15]);
 }
 
 bool IsEscaped(char c) {
-    return c < 0x20 || c > 0x7E || c == '"' || c == '\\';
+    return !IsPrintable(c) || c == '"' || c == '\\';
 }
 
 } // namespace
 
 void WritePlain(TextOutput& output, std::string_view text, Folding folding) {
-    while (folding.allowed && output.Column() + text.size() > kWidth) {
+    while (folding.allowed && output.Column() + text.size() > kLineWidth) {
         const std::size_t column = output.Column();
-        const std::size_t at = FindFold(text, column > kWidth ? 0 : kWidth + 1 - column);
+        const std::size_t at = FindFold(text, column > kLineWidth ? 0 : kLineWidth + 1 - column);
         if (at == std::string_view::npos) break;
         output.Put(text.substr(0, at));
         output.Break(folding.indent);

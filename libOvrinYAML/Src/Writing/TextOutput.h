@@ -1,5 +1,7 @@
 #pragma once
 
+#include "Writing/WrittenForm.h"
+
 #include <cstddef>
 #include <string>
 #include <string_view>
@@ -9,9 +11,6 @@ namespace ovrin_yaml {
 /// The end of a growing text: appends, and knows the column. Written text is ASCII, so columns are bytes.
 class TextOutput {
 public:
-    /// Lines that have passed this column are folded where that can be done.
-    static constexpr std::size_t kWidth = 80;
-
     /// Appends to `text`, at column 0 whatever it ends in.
     explicit TextOutput(std::string& text) : m_Text(text), m_LineStart(text.size()) {}
 
@@ -26,7 +25,7 @@ public:
     }
     /// Characters on the current line so far.
     std::size_t Column() const { return m_Text.size() - m_LineStart; }
-    bool IsBeyondWidth() const { return Column() > kWidth; }
+    bool IsBeyondWidth() const { return Column() > kLineWidth; }
 
 private:
     std::string& m_Text;

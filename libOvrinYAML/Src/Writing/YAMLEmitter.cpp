@@ -3,6 +3,7 @@
 #include "Values/YAMLScalar.h"
 #include "Values/YAMLSequence.h"
 #include "Writing/ScalarWriter.h"
+#include "Writing/WrittenForm.h"
 
 #include <algorithm>
 
@@ -10,11 +11,8 @@ namespace ovrin_yaml {
 
 namespace {
 
-constexpr int kStep = 2;
-constexpr std::size_t kLongestSimpleKey = 128; // in bytes
-
 /// Around the root, so that a block collection there comes to stand at column 0.
-constexpr int kOutsideRoot = -kStep;
+constexpr int kOutsideRoot = -kIndentStep;
 
 bool IsSimpleKey(std::string_view key, ScalarForms forms) {
     return !forms.lineBreaks && key.size() <= kLongestSimpleKey;
@@ -29,7 +27,7 @@ bool IsEmpty(const YAMLMapping::Pairs& pairs) {
 /// Indentation of a flow collection, and of the lines that a scalar folds into. Even at the root that is a
 /// step.
 int ContinuationIndent(int outer) {
-    return std::max(outer + kStep, kStep);
+    return std::max(outer + kIndentStep, kIndentStep);
 }
 
 std::string_view TextOf(const YAMLNode& node) {
@@ -42,7 +40,7 @@ void YAMLEmitter::EmitDocument(const YAMLNode& root) {
     EmitBlockNode(root, kOutsideRoot, Behind::Nothing);
     if (root.GetKind() == YAMLNode::Kind::Scalar && ClassifyScalar(TextOf(root)).plainInBlock) {
         m_Output.Break(0);
-        m_Output.Put("...");
+        m_Output.Put(kDocumentEnd);
     }
 }
 
@@ -69,7 +67,7 @@ void YAMLEmitter::EmitBlockNode(const YAMLNode& node, int outer, Behind behind) 
 }
 
 void YAMLEmitter::EmitBlockMapping(const Pairs& pairs, int outer, Behind behind) {
-    const int indent = outer + kStep;
+    const int indent = outer + kIndentStep;
     for (const YAMLMapping::Entry pair : pairs) {
         if (!pair.key) continue;
         BeginBlockEntry(indent, behind);
@@ -95,7 +93,7 @@ void YAMLEmitter::EmitBlockPair(const YAMLMapping::Entry& pair, int indent) {
 }
 
 void YAMLEmitter::EmitBlockSequence(const YAMLSequence& sequence, int outer, Behind behind) {
-    const int indent = behind == Behind::Text ? outer : outer + kStep;
+    const int indent = behind == Behind::Text ? outer : outer + kIndentStep;
     for (const YAMLNode* item : sequence.m_Items) {
         BeginBlockEntry(indent, behind);
         m_Output.Put('-');

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "Reading/Fast/BatchedBuilder.h"
-#include "Reading/Fast/KnownKeys.h"
+#include "Reading/Fast/FlowReader.h"
+#include "Reading/Fast/FormReading.h"
 #include "Values/YAMLMapping.h"
 
 #include <cstdint>
@@ -46,73 +46,38 @@ public:
     void InternTexts();
 
 private:
-    /// Thrown where the reader isn't sure, and caught by Read.
-    struct NotSure {};
-
     struct Header {
         std::string_view classID;
         std::string_view fileID;
         bool isStripped;
     };
 
-    void Begin(std::string_view text, std::uint32_t firstLine);
+    std::string_view Readable(std::string_view text);
     YAMLMapping* ReadObject(std::uint32_t firstLine);
     Header ReadHeaderLine();
     std::string_view ReadId();
-    void ReadPairs(int indent, KnownKey& parent);
     std::size_t AddHeaderData(const Header& header);
-    void CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed = 0);
-    void NextLine();
-    bool AtListItem() const;
-    std::ptrdiff_t Column(const char* position) const { return position - m_LineStart; }
-    void NoteIf(bool differs) { m_IsAsWritten = m_IsAsWritten && !differs; }
-    void NoteText(const char* begin, const char* end);
-    void NoteLongText(const char* begin, const char* end);
 
-    // `parent` is the key that a value stands under.
+    // Block style. Each function begins at the first character of its node and ends at that of the next line
+    // that is not its own. `parent` is the key that a value stands under.
 
-    void ReadBlockMapping(int indent, KnownKey& parent);
-    KnownKey* GuessBlockKey(KeyGuess& guess) const;
-    KnownKey& ReadBlockKey(const KnownKey& parent, KeyGuess& guess);
-    KnownKey& AddKey(const char* end, const KnownKey& parent, KeyGuess& guess);
-    void ReadBlockValue(int indent, KnownKey& parent);
-    void ReadBlockSequence(int indent, KnownKey& parent);
+    void ReadMapping(int indent, KnownKey& parent);
+    void ReadPairs(int indent, KnownKey& parent);
+    KnownKey* GuessKey(KeyGuess& guess) const;
+    KnownKey& ReadKey(const KnownKey& parent, KeyGuess& guess);
+    void ReadValue(int indent, KnownKey& parent);
+    void ReadSequence(int indent, KnownKey& parent);
     void ReadItem(int indent, KnownKey& parent);
     void ReadInline(int indent, KnownKey& parent);
-    void ReadPlainLines(int indent);
-    const char* ScanPlain(const char* from) const;
-
-    void ReadFlow(KnownKey& parent);
-    void ReadFlowMapping(KnownKey& parent);
-    KnownKey& ReadFlowKey(const KnownKey& parent, KeyGuess& guess);
-    void ReadFlowSequence(KnownKey& parent);
-    void ReadFlowValue(KnownKey& parent);
-    bool SkipUsualSeparator();
-    bool ReadFlowSeparator(char close);
-    const char* ScanFlowPlain();
-
-    void AddQuoted(std::string_view text);
-    std::string_view ReadQuoted(bool inFlow);
-    std::string_view ReadQuotedWithFolds(const char* from);
-    void FoldLines();
-    void Unescape();
-    std::uint32_t ReadHex(int digits);
-
-    class Nesting;
+    void ReadPlainText(int indent);
+    std::string_view ReadPlainLine();
+    void ReadFoldedText(int indent, std::string_view firstLine, std::size_t width);
 
     const char* const m_ReadableEnd;
-    BatchedBuilder m_Builder;
-    KnownKeys m_KnownKeys;
+    FormReading m_Form;
+    FlowReader m_Flow{m_Form};
     std::deque<std::string> m_Copies; // of documents at the end of what may be read
-    std::string m_Text;               // of a scalar that doesn't stand in the document as it is
-    const char* m_Position = nullptr;
-    const char* m_End = nullptr;
-    const char* m_LineStart = nullptr;
-    std::uint32_t m_Line = 0; // of m_Position
-    int m_Indent = 0;         // blanks in front of the line under way; -1 at the end of the document
-    int m_Depth = 0;
-    int m_FlowIndent = 0; // where a flow collection goes on in a new line
-    bool m_IsAsWritten = false;
+    std::string m_FoldedText;         // of a scalar that stands on several lines
 };
 
 } // namespace ovrin_yaml
