@@ -47,7 +47,8 @@ int FollowLinks(std::string& path) {
         if (length < 0) return errno == EINVAL || errno == ENOENT ? 0 : errno;
         if (IsFolderOfOpenFiles(GetFolder(path))) return EPERM;
         const std::string link(target, static_cast<std::size_t>(length));
-        path = link.starts_with('/') ? link : GetFolder(path) + link;
+        path = link.starts_with('/') ? std::string() : GetFolder(path);
+        path += link;
     }
     return ELOOP;
 }

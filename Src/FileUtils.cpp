@@ -17,7 +17,7 @@ namespace {
 std::stringstream errs;
 
 /// The read size where a file does not tell its own.
-constexpr std::size_t kChunkSize = 64 * 1024;
+constexpr std::size_t kChunkSize = std::size_t{64} * 1024;
 
 class FileDescriptor {
 public:

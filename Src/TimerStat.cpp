@@ -11,5 +11,6 @@ TimerStat::TimerStat(TimerStat& parent, std::string name)
 TimerStat::~TimerStat() {
     if (!m_Output) return;
     const auto elapsed = std::chrono::duration_cast<std::chrono::milliseconds>(Clock::now() - m_Start);
-    *m_Output << std::string(2 * m_Depth, ' ') << m_Name << ": " << elapsed.count() << std::endl;
+    *m_Output << std::string(static_cast<std::size_t>(2 * m_Depth), ' ') << m_Name << ": " << elapsed.count()
+              << std::endl;
 }

@@ -1,7 +1,9 @@
 // Merges two changes of a scene and prints the open conflicts by path.
 
 #include "Diff/MergeRules.h"
+#include "Diff/RulesReader.h"
 #include "Diff/YAMLMappingDiff.h"
+#include "Merge/DiffMerge.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Reading/ObjectFileReader.h"
 #include "Repair/FileIDCollisions.h"
@@ -25,16 +27,17 @@ YAMLMapping& Read(const char* path, OvrinObjects& objects) {
 }
 
 void PrintConflicts(char** paths) {
-    std::ifstream rules(paths[0]);
-    MergeRules::LoadSequenceUniqueKeys(rules);
+    MergeRules rules;
+    std::ifstream rulesFile(paths[0]);
+    LoadSequenceUniqueKeys(rulesFile, rules);
     OvrinObjects files[3];
     const YAMLMapping& base = Read(paths[1], files[0]);
     const YAMLMapping& left = Read(paths[2], files[1]);
     YAMLMapping& right = Read(paths[3], files[2]);
     RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
-    RecordingConflictResolver resolver(ResolveBase);
-    YAMLMappingDiff::Merge(YAMLMappingDiff::Diff(&base, &left), YAMLMappingDiff::Diff(&base, &right),
-                           resolver);
+    RecordingConflictResolver resolver(rules, ResolveBase);
+    MergeMappingDiffs(YAMLMappingDiff::Diff(rules, &base, &left), YAMLMappingDiff::Diff(rules, &base, &right),
+                      resolver);
     for (const auto& record : resolver.Records())
         if (record.resolve == ResolveConflict) std::cout << PathToString(record.path) << '\n';
 }

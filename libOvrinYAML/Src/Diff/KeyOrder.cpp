@@ -65,7 +65,7 @@ bool IsIdentityKeyOrder(const ChangeSequenceOperation* order) {
     return order->m_Diff->Entries().empty() && (!order->m_Remapper || order->m_Remapper->IsIdentity());
 }
 
-void ApplyKeyOrder(const ChangeSequenceOperation* order, std::vector<const YAMLScalar*> before,
+void ApplyKeyOrder(const ChangeSequenceOperation* order, const std::vector<const YAMLScalar*>& before,
                    YAMLMapping& target) {
     YAMLSequence keys;
     keys.m_Items.reserve(before.size());

@@ -15,7 +15,7 @@ bool IsIdentityKeyOrder(const ChangeSequenceOperation* order);
 
 /// Brings the keys of `target`, whose pairs have been changed already, into the merged order. `before` holds
 /// the keys of `target` as they were. Throws YAMLError "Unmapped key when trying to reorder mapping keys".
-void ApplyKeyOrder(const ChangeSequenceOperation* order, std::vector<const YAMLScalar*> before,
+void ApplyKeyOrder(const ChangeSequenceOperation* order, const std::vector<const YAMLScalar*>& before,
                    YAMLMapping& target);
 
 } // namespace ovrin_yaml

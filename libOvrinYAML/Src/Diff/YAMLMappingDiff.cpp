@@ -49,7 +49,7 @@ void YAMLMappingDiff::Apply(YAMLMapping& target) const {
     before.reserve(target.Size());
     for (const auto& entry : target) before.push_back(entry.key);
     for (const Entry& entry : m_Entries) entry.operation->Apply(target, entry.key);
-    if (m_KeyOrder) ApplyKeyOrder(m_KeyOrder, std::move(before), target);
+    if (m_KeyOrder) ApplyKeyOrder(m_KeyOrder, before, target);
 }
 
 } // namespace ovrin_yaml

@@ -94,7 +94,7 @@ ChunkWalker::ChunkWalker(std::string text, std::string header, YAMLMapping& root
 /// directive stands in the last line decides what the parser makes of blanks behind the header, so that a
 /// line that is no directive becomes an empty one there.
 ChunkWalker::ShortHeader ChunkWalker::Shorten(const std::string& header) {
-    const ShortHeader whole{header, 0};
+    ShortHeader whole{header, 0};
     ShortHeader result;
     if (std::any_of(header.begin(), header.end(), IsUnusual)) return whole;
     bool isDirective = true;

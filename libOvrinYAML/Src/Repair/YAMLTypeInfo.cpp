@@ -21,6 +21,7 @@ std::vector<const YAMLScalar*> ReadTypeIDs(const YAMLScalar& text) {
     std::set<int> numbers;
     ReadCompactSerializedSet(text.Value(), numbers);
     std::vector<const YAMLScalar*> ids;
+    ids.reserve(numbers.size());
     for (const int number : numbers) ids.push_back(YAMLScalar::Lookup(std::to_string(number)));
     return ids;
 }

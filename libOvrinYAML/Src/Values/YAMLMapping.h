@@ -203,7 +203,7 @@ public:
     }
     YAMLNode* Clone() const;
     bool Equals(const YAMLNode* other) const;
-    bool EqualsExpensive(const YAMLNode* other) const;
+    bool EqualsExpensive(const YAMLNode* node) const;
     void RebuildHash(bool shallow);
     void ResetForAlloc() { Clear(); }
 
