@@ -6,7 +6,6 @@
 #include "StripCommand.h"
 
 #include <algorithm>
-#include <ranges>
 
 using namespace ovrin_yaml;
 
@@ -73,12 +72,12 @@ constexpr PathArgument kTwoFilePaths[] = {
 };
 
 ExitStatus RunDiff(MergeConfig& settings) {
-    DiffConfig config{settings};
+    DiffConfig config{static_cast<const TwoFileConfig&>(settings)};
     return HandleDiffCommand(config);
 }
 
 ExitStatus RunStrip(MergeConfig& settings) {
-    StripConfig config{settings};
+    StripConfig config{static_cast<const TwoFileConfig&>(settings)};
     return HandleStripCommand(config);
 }
 
@@ -123,7 +122,8 @@ const Command* FindCommand(std::string_view word) {
 }
 
 const Option* FindOption(const Command& command, std::string_view word) {
-    for (const Option& option : command.options | std::views::join)
-        if (option.word == word) return &option;
+    for (const std::span<const Option> options : command.options)
+        for (const Option& option : options)
+            if (option.word == word) return &option;
     return nullptr;
 }
