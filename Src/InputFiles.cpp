@@ -1,31 +1,25 @@
 #include "InputFiles.h"
 
 #include "CommandSettings.h"
-#include "Diff/MergeRules.h"
 #include "FileUtils.h"
-#include "Repair/YAMLTypeInfo.h"
+#include "TimerStat.h"
 
-#include <exception>
+#include "Diff/MergeRules.h"
+#include "Repair/YAMLTypeInfo.h"
+#include "Session/ReadInputs.h"
+
 #include <sstream>
 
 using namespace ovrin_yaml;
 
-void TakeFile(const std::string& path, ObjectFile& file) {
-    std::string bytes;
-    const ReadResult result = ReadWholeFile(path, bytes);
-    if (result == ReadResult::CannotOpen) throw YAMLError("Cannot open file");
-    if (result == ReadResult::CannotRead) throw YAMLError("Cannot read file");
-    file.Take(std::move(bytes));
-}
-
-void ReadYAMLPath(const std::string& path, OvrinObjects& objects) {
-    WithFileName(path, [&] {
-        ObjectFile file(objects, {});
-        TakeFile(path, file);
-        file.Cut(nullptr);
-        for (std::size_t piece = 0; piece < file.PieceCount(); ++piece) file.ReadPiece(piece);
-        file.Finish();
-    });
+InputFile FileInput(const std::string& path) {
+    return {path, FileSize(path), [path] {
+                std::string bytes;
+                const ReadResult result = ReadWholeFile(path, bytes);
+                if (result == ReadResult::CannotOpen) throw YAMLError("Cannot open file");
+                if (result == ReadResult::CannotRead) throw YAMLError("Cannot read file");
+                return bytes;
+            }};
 }
 
 void SetupRules(const std::string& rulesFile) {
@@ -40,6 +34,18 @@ void SetupRules(const std::string& rulesFile) {
 
 void SetupTypeInfo(const std::string& typeInfoFile) {
     OvrinObjects objects;
-    ReadYAMLPath(typeInfoFile, objects);
+    const InputFile input = FileInput(typeInfoFile);
+    ReadInputs({{"Read type info", &input, &objects}}, Threads::None, nullptr, {});
     GetTypeInfoManager()->Read(objects);
+}
+
+void SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
+                        const std::string& typeInfoFile) {
+    {
+        TimerStat timer(reading, "Reading unique keys");
+        SetupRules(rulesFile);
+    }
+    if (typeInfoFile == kDefaultTypeInfoFile) return;
+    TimerStat timer(root, "Read type info");
+    SetupTypeInfo(typeInfoFile);
 }

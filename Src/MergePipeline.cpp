@@ -6,100 +6,38 @@
 #include "DriverErrors.h"
 #include "ErrMsg.h"
 #include "FileUtils.h"
+#include "InputFiles.h"
 #include "OutputFile.h"
 #include "Premerge.h"
-#include "ReadInputs.h"
-#include "Thread.h"
-#include "TimerStat.h"
+#include "StepTimers.h"
 
-#include "Diff/YAMLMappingDiff.h"
 #include "Merge/ConflictReport.h"
-#include "Merge/RecordingConflictResolver.h"
-#include "Repair/FileIDCollisions.h"
-#include "Repair/PostProcess.h"
-#include "Repair/PreProcess.h"
-#include "Values/OvrinObjects.h"
-#include "Values/YAMLError.h"
+#include "Session/MergeSession.h"
 #include "Writing/ObjectFileWriter.h"
 
 #include <iostream>
-#include <memory>
 #include <sstream>
 
 using namespace ovrin_yaml;
 
 namespace {
 
-/// The three files of a merge. The result is built in the base.
-struct MergeFiles {
-    OvrinObjects base, left, right;
-};
-
-struct MergeDiffs {
-    const YAMLMappingDiff* left = nullptr;
-    const YAMLMappingDiff* right = nullptr;
-};
-
-void ReadFiles(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
+void ReadFiles(TimerStat& root, const MergeConfig& config, MergeSession& session) {
     TimerStat timer(root, "Read files");
     SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
-    ReadInputs(timer, config.useThreads,
-               {{"Read base", &config.baseFile, &files.base},
-                {"Read left", &config.leftFile, &files.left},
-                {"Read right", &config.rightFile, &files.right}});
+    StepTimers steps(timer);
+    session.Read({FileInput(config.baseFile), FileInput(config.leftFile), FileInput(config.rightFile)},
+                 &steps);
 }
 
-void PreProcessFile(const std::string& path, OvrinObjects& objects) {
-    try {
-        PreProcess(objects.GetMapping());
-    } catch (const YAMLError& error) {
-        throw YAMLError("Cannot merge file '" + path + "': " + error.what());
-    }
-}
-
-void PreProcessMappings(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
-    TimerStat timer(root, "Preprocess mappings");
-    PreProcessFile(config.baseFile, files.base);
-    PreProcessFile(config.leftFile, files.left);
-    PreProcessFile(config.rightFile, files.right);
-    const YAMLMapping& base = files.base.GetMapping();
-    const YAMLMapping& left = files.left.GetMapping();
-    YAMLMapping& right = files.right.GetMapping();
-    RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
-}
-
-MergeDiffs DiffOnThreads(TimerStat& timer, const MergeFiles& files) {
-    constexpr std::size_t kFewObjects = 1000;
-    const YAMLMapping& base = files.base.GetMapping();
-    const bool isLittle = base.Size() < kFewObjects;
-    MergeDiffs diffs;
-    Thread left([&] { diffs.left = YAMLMappingDiff::Diff(&base, &files.left.GetMapping()); }, isLittle);
-    Thread right([&] { diffs.right = YAMLMappingDiff::Diff(&base, &files.right.GetMapping()); }, isLittle);
-    {
-        TimerStat waitTimer(timer, "Waiting for left diff");
-        left.Join();
-        right.Join();
-    }
-    left.CheckForExceptions();
-    right.CheckForExceptions();
-    return diffs;
-}
-
-MergeDiffs CreateDiffs(TimerStat& root, const MergeConfig& config, const MergeFiles& files) {
+void CreateDiffs(TimerStat& root, MergeSession& session) {
     TimerStat timer(root, "Creating diffs");
-    if (config.useThreads) return DiffOnThreads(timer, files);
-    MergeDiffs diffs;
-    {
-        TimerStat leftTimer(timer, "Creating left diff");
-        diffs.left = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.left.GetMapping());
-    }
-    TimerStat rightTimer(timer, "Creating right diff");
-    diffs.right = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.right.GetMapping());
-    return diffs;
+    StepTimers steps(timer);
+    session.Diff(&steps);
 }
 
 /// False, after a message, if the file can't be read.
-bool ReadResolveFile(TimerStat& root, const MergeConfig& config, RecordingConflictResolver& resolver) {
+bool ReadResolveFile(TimerStat& root, const MergeConfig& config, std::vector<RecordResolve>& decisions) {
     if (config.resolveFile.empty()) return true;
     TimerStat timer(root, "Reading resolve file");
     std::string text;
@@ -109,27 +47,21 @@ bool ReadResolveFile(TimerStat& root, const MergeConfig& config, RecordingConfli
         return false;
     }
     std::istringstream stream(std::move(text));
-    InputConflictRecords(stream, resolver);
+    decisions = ReadDecisions(stream);
     return true;
 }
 
-/// Null where no premerge can follow: nobody else reads the base once it is changed.
-std::unique_ptr<OvrinObjects> CloneBase(TimerStat& root, const MergeConfig& config, OvrinObjects& base) {
-    TimerStat timer(root, "Cloning base roots");
-    if (config.premergeBaseDest.empty() || config.premergeRightDest.empty()) return nullptr;
-    return std::unique_ptr<OvrinObjects>(base.Clone());
+/// The base is needed again where a premerge can follow.
+MergeSession::Base UseOfBase(const MergeConfig& config) {
+    const bool mayPremerge = !config.premergeBaseDest.empty() && !config.premergeRightDest.empty();
+    return mayPremerge ? MergeSession::Base::Kept : MergeSession::Base::UsedUp;
 }
 
-/// Returns whether component dependencies were found broken.
-bool ApplyMergedChanges(TimerStat& root, const YAMLMappingDiff& merged, MergeFiles& files,
-                        RecordingConflictResolver& resolver) {
+void ApplyMergedChanges(TimerStat& root, const MergeConfig& config, MergeSession& session) {
     TimerStat timer(root, "Applying merged changes");
-    bool hasComponentDependencyConflicts = false;
-    merged.Apply(files.base.GetMapping());
+    session.Apply(UseOfBase(config));
     TimerStat postTimer(timer, "Post process merged changes");
-    PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), resolver,
-                hasComponentDependencyConflicts);
-    return hasComponentDependencyConflicts;
+    session.Repair();
 }
 
 /// A report that can't be written is lost without a word, but for one that shares standard output with the
@@ -149,8 +81,8 @@ int OutputResult(TimerStat& root, const std::string& path, const OvrinObjects& r
 
 /// Premerged files that can't be written are lost without a word where nobody is to work on them. Returns 0;
 /// 1, after a message, if a tool would.
-int PremergeForTool(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs) {
-    const PremergeErrors errors = PremergeBoth(root, config, inputs);
+int PremergeForTool(TimerStat& root, const MergeConfig& config, MergeSession& session) {
+    const PremergeErrors errors = PremergeBoth(root, config, session);
     if (!config.premerge || config.fallbackSpecFile == kNoSpecFile) return 0;
     if (errors.base) return FailToWrite(config.premergeBaseDest, errors.base);
     if (errors.right) return FailToWrite(config.premergeRightDest, errors.right);
@@ -161,26 +93,28 @@ int PremergeForTool(TimerStat& root, const MergeConfig& config, const PremergeIn
 
 int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath) {
     TimerStat root("Merging", config.timing ? &std::cout : nullptr);
-    MergeFiles files;
-    ReadFiles(root, config, files);
-    RecordingConflictResolver resolver(config.resolve);
+    MergeSession session(ThreadsOf(config.useThreads));
+    ReadFiles(root, config, session);
     { TimerStat timer(root, "Creating mappings"); }
-    PreProcessMappings(root, config, files);
-    const MergeDiffs diffs = CreateDiffs(root, config, files);
-    if (!ReadResolveFile(root, config, resolver)) return 1;
-    const YAMLMappingDiff* merged = nullptr;
+    {
+        TimerStat timer(root, "Preprocess mappings");
+        session.Prepare();
+    }
+    CreateDiffs(root, session);
+    std::vector<RecordResolve> decisions;
+    if (!ReadResolveFile(root, config, decisions)) return 1;
+    session.Decide(std::move(decisions), config.resolve);
     {
         TimerStat timer(root, "Merging");
-        merged = YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver);
+        session.Merge();
     }
-    const std::unique_ptr<OvrinObjects> baseClone = CloneBase(root, config, files.base);
-    const bool hasComponentDependencyConflicts = ApplyMergedChanges(root, *merged, files, resolver);
-    if (const int error = OutputConflicts(root, config, resolver)) return FailToWrite({}, error);
-    if (const int error = OutputResult(root, outputPath, files.base)) return FailToWrite(outputPath, error);
-    if (!resolver.HasPendingConflicts()) return 0;
-    if (baseClone && PremergeForTool(root, config,
-                                     {*baseClone, files.left.GetMapping(), files.right.GetMapping(),
-                                      diffs.left, diffs.right}) != 0)
+    { TimerStat timer(root, "Cloning base roots"); }
+    ApplyMergedChanges(root, config, session);
+    if (const int error = OutputConflicts(root, config, session.Resolver())) return FailToWrite({}, error);
+    if (const int error = OutputResult(root, outputPath, session.Result()))
+        return FailToWrite(outputPath, error);
+    if (!session.Resolver().HasPendingConflicts()) return 0;
+    if (UseOfBase(config) == MergeSession::Base::Kept && PremergeForTool(root, config, session) != 0)
         return 1;
-    return hasComponentDependencyConflicts ? 3 : 2;
+    return session.HasBrokenDependencies() ? 3 : 2;
 }

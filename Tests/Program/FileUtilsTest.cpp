@@ -1,6 +1,7 @@
 #include "FileUtils.h"
 
 #include "InputFiles.h"
+#include "Session/MergeSession.h"
 #include "Values/YAMLError.h"
 
 #include <gtest/gtest.h>
@@ -32,8 +33,7 @@ std::string ErrorOf(void (*act)(const std::string&), const std::string& path) {
 }
 
 void ReadObjects(const std::string& path) {
-    ovrin_yaml::OvrinObjects objects;
-    ReadYAMLPath(path, objects);
+    ovrin_yaml::MergeSession().Read({FileInput(path), FileInput(path)});
 }
 
 TEST(FileUtils, TheExtensionStandsBehindTheLastDotOfThePath) {
