@@ -62,51 +62,49 @@ struct MergeDiffs {
 };
 
 /// The diffs to both sides, each on a thread of its own if so wanted.
-MergeDiffs Diff(const MergeFiles& files, bool onThreads) {
+MergeDiffs Diff(const MergeFiles& files, const MergeWay& way) {
     const YAMLMappingDiff* diffs[2];
     const OvrinObjects* const sides[2] = {&files.left, &files.right};
     std::vector<Thread> threads;
     for (int i = 0; i < 2; ++i)
         threads.emplace_back(
-            [&files, &diffs, &sides, i] {
-                diffs[i] = YAMLMappingDiff::Diff(&files.base.GetMapping(), &sides[i]->GetMapping());
+            [&files, &way, &diffs, &sides, i] {
+                diffs[i] =
+                    YAMLMappingDiff::Diff(way.rules, &files.base.GetMapping(), &sides[i]->GetMapping());
             },
-            !onThreads);
+            !way.onThreads);
     for (Thread& thread : threads) thread.Join();
     for (const Thread& thread : threads) thread.CheckForExceptions();
     return {Checked("left", diffs[0], DiffOrigin::Trees), Checked("right", diffs[1], DiffOrigin::Trees)};
 }
 
 /// All that comes before the merge itself.
-MergeDiffs Prepare(MergeFiles& files, bool onThreads) {
+MergeDiffs Prepare(MergeFiles& files, const MergeWay& way) {
     YAMLMapping &base = files.base.GetMapping(), &left = files.left.GetMapping(),
                 &right = files.right.GetMapping();
     CheckAll("read", files, TreeStage::Hashed);
     for (YAMLMapping* root : {&base, &left, &right}) PreProcess(*root);
     RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
     CheckAll("prepared", files, TreeStage::Hashed);
-    return Diff(files, onThreads);
+    return Diff(files, way);
 }
 
-void Merge(MergeFiles& files, const MergeDiffs& diffs, MergeOutcome& outcome) {
-    RecordingConflictResolver resolver(ResolveBase);
+void Merge(MergeFiles& files, const MergeRules& rules, const MergeDiffs& diffs, MergeOutcome& outcome) {
+    RecordingConflictResolver resolver(rules, ResolveBase);
     const YAMLMappingDiff* merged =
         Checked("merged", YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver), DiffOrigin::Sides);
     CheckAll("merged", files, TreeStage::Hashed);
     merged->Apply(files.base.GetMapping());
     CheckAll("applied", files, TreeStage::Changed);
-    bool hasBrokenDependencies = false;
-    PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), resolver,
-                hasBrokenDependencies);
+    PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), {}, resolver);
     CheckAll("repaired", files, TreeStage::Changed);
-    outcome.report = Written([&](std::ostream& stream) { OutputConflictRecords(stream, resolver, true); }) +
-                     (hasBrokenDependencies ? "broken dependencies" : "");
+    outcome.report = Written([&](std::ostream& stream) { OutputConflictRecords(stream, resolver, true); });
     outcome.result = Written([&](std::ostream& stream) { Output(files.base, stream); });
 }
 
-std::string Premerge(MergeResolve resolve, OvrinObjects& base, const MergeFiles& sides,
-                     const MergeDiffs& diffs) {
-    RecordingConflictResolver resolver(resolve);
+std::string Premerge(const MergeRules& rules, MergeResolve resolve, OvrinObjects& base,
+                     const MergeFiles& sides, const MergeDiffs& diffs) {
+    RecordingConflictResolver resolver(rules, resolve);
     YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver)->Apply(base.GetMapping());
     Check("premerge applied", base, TreeStage::Changed);
     PostProcessMergeOnly(base.GetMapping(), sides.left.GetMapping(), sides.right.GetMapping(), resolver);
@@ -117,22 +115,22 @@ std::string Premerge(MergeResolve resolve, OvrinObjects& base, const MergeFiles&
 constexpr MergeResolve kPremerges[] = {ResolveBlank, ResolveRight};
 
 void MergeAll(const MergeWay& way, MergeOutcome& outcome) {
-    const auto& [read, from, onThreads] = way;
+    const auto& [read, from, onThreads, rules] = way;
     MergeFiles& files = *outcome.files;
     read(files);
-    const MergeDiffs diffs = Prepare(files, onThreads);
+    const MergeDiffs diffs = Prepare(files, way);
     std::vector<std::unique_ptr<OvrinObjects>> clones;
     if (from == PremergeFrom::Clone)
         for (std::size_t i = 0; i < std::size(kPremerges); ++i) clones.emplace_back(files.base.Clone());
-    Merge(files, diffs, outcome);
+    Merge(files, rules, diffs, outcome);
     for (std::size_t i = 0; i < std::size(kPremerges); ++i) {
         if (from == PremergeFrom::Clone) {
-            outcome.premerged[i] = Premerge(kPremerges[i], *clones[i], files, diffs);
+            outcome.premerged[i] = Premerge(rules, kPremerges[i], *clones[i], files, diffs);
         } else {
             MergeFiles again;
             read(again);
-            const MergeDiffs ownDiffs = Prepare(again, onThreads);
-            outcome.premerged[i] = Premerge(kPremerges[i], again.base, again, ownDiffs);
+            const MergeDiffs ownDiffs = Prepare(again, way);
+            outcome.premerged[i] = Premerge(rules, kPremerges[i], again.base, again, ownDiffs);
         }
     }
 }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Diff/MergeRules.h"
 #include "Values/OvrinObjects.h"
 
 #include <array>
@@ -34,6 +35,7 @@ struct MergeWay {
     std::function<void(MergeFiles&)> read; // reads the three files
     PremergeFrom from = PremergeFrom::Clone;
     bool onThreads = false; // the diffs are made on two threads
+    ovrin_yaml::MergeRules rules = {};
 };
 
 /// Takes a merge all the way to the result and two premerged files. All trees and diffs are checked after

@@ -1,9 +1,8 @@
 #include "InputFiles.h"
 
 #include "CommandSettings.h"
-#include "Diff/MergeRules.h"
+#include "Diff/RulesReader.h"
 #include "FileUtils.h"
-#include "Repair/YAMLTypeInfo.h"
 
 #include <exception>
 #include <sstream>
@@ -28,18 +27,22 @@ void ReadYAMLPath(const std::string& path, OvrinObjects& objects) {
     });
 }
 
-void SetupRules(const std::string& rulesFile) {
+MergeRules SetupRules(const std::string& rulesFile) {
     const std::string path =
         rulesFile == kDefaultRulesFile ? GetDataFilesDir() + "mergerules.txt" : rulesFile;
     std::string text;
     if (ReadWholeFile(path, text) != ReadResult::Complete)
         throw YAMLError("Cannot open rules file for reading:" + path);
     std::istringstream stream(std::move(text));
-    MergeRules::LoadSequenceUniqueKeys(stream);
+    MergeRules rules;
+    LoadSequenceUniqueKeys(stream, rules);
+    return rules;
 }
 
-void SetupTypeInfo(const std::string& typeInfoFile) {
+YAMLTypeInfoManager SetupTypeInfo(const std::string& typeInfoFile) {
     OvrinObjects objects;
     ReadYAMLPath(typeInfoFile, objects);
-    GetTypeInfoManager()->Read(objects);
+    YAMLTypeInfoManager types;
+    types.Read(objects);
+    return types;
 }

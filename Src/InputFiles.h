@@ -1,6 +1,8 @@
 #pragma once
 
+#include "Diff/MergeRules.h"
 #include "Reading/ObjectFile.h"
+#include "Repair/YAMLTypeInfo.h"
 #include "Values/YAMLError.h"
 
 #include <exception>
@@ -28,10 +30,10 @@ void TakeFile(const std::string& path, ovrin_yaml::ObjectFile& file);
 /// Reads an object file into `objects`, which must be empty. Throws YAMLError with the path and the fault.
 void ReadYAMLPath(const std::string& path, ovrin_yaml::OvrinObjects& objects);
 
-/// Loads the rules file of that name, "auto" being the one beside the executable. Called once per command,
-/// before any file is read. Throws YAMLError if the file can't be read and std::runtime_error for a bad line.
-void SetupRules(const std::string& rulesFile);
+/// Reads the rules file of that name, "auto" being the one beside the executable. Throws YAMLError if the
+/// file can't be read and std::runtime_error for a bad line.
+ovrin_yaml::MergeRules SetupRules(const std::string& rulesFile);
 
-/// Loads the type information of that object file into the library. Called at most once per command, before
-/// threads are started. Throws YAMLError if the file can't be read and std::runtime_error for a bad entry.
-void SetupTypeInfo(const std::string& typeInfoFile);
+/// Reads the type information of that object file. Throws YAMLError if the file can't be read and
+/// std::runtime_error for a bad entry.
+ovrin_yaml::YAMLTypeInfoManager SetupTypeInfo(const std::string& typeInfoFile);

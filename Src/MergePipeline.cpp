@@ -40,13 +40,14 @@ struct MergeDiffs {
     const YAMLMappingDiff* right = nullptr;
 };
 
-void ReadFiles(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
+RulesAndTypes ReadFiles(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
     TimerStat timer(root, "Read files");
-    SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
+    RulesAndTypes rulesAndTypes = SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
     ReadInputs(timer, config.useThreads,
                {{"Read base", &config.baseFile, &files.base},
                 {"Read left", &config.leftFile, &files.left},
                 {"Read right", &config.rightFile, &files.right}});
+    return rulesAndTypes;
 }
 
 void PreProcessFile(const std::string& path, OvrinObjects& objects) {
@@ -68,13 +69,15 @@ void PreProcessMappings(TimerStat& root, const MergeConfig& config, MergeFiles& 
     RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
 }
 
-MergeDiffs DiffOnThreads(TimerStat& timer, const MergeFiles& files) {
+MergeDiffs DiffOnThreads(TimerStat& timer, const MergeRules& rules, const MergeFiles& files) {
     constexpr std::size_t kFewObjects = 1000;
     const YAMLMapping& base = files.base.GetMapping();
     const bool isLittle = base.Size() < kFewObjects;
     MergeDiffs diffs;
-    Thread left([&] { diffs.left = YAMLMappingDiff::Diff(&base, &files.left.GetMapping()); }, isLittle);
-    Thread right([&] { diffs.right = YAMLMappingDiff::Diff(&base, &files.right.GetMapping()); }, isLittle);
+    Thread left([&] { diffs.left = YAMLMappingDiff::Diff(rules, &base, &files.left.GetMapping()); },
+                isLittle);
+    Thread right([&] { diffs.right = YAMLMappingDiff::Diff(rules, &base, &files.right.GetMapping()); },
+                 isLittle);
     {
         TimerStat waitTimer(timer, "Waiting for left diff");
         left.Join();
@@ -85,16 +88,17 @@ MergeDiffs DiffOnThreads(TimerStat& timer, const MergeFiles& files) {
     return diffs;
 }
 
-MergeDiffs CreateDiffs(TimerStat& root, const MergeConfig& config, const MergeFiles& files) {
+MergeDiffs CreateDiffs(TimerStat& root, const MergeConfig& config, const MergeRules& rules,
+                       const MergeFiles& files) {
     TimerStat timer(root, "Creating diffs");
-    if (config.useThreads) return DiffOnThreads(timer, files);
+    if (config.useThreads) return DiffOnThreads(timer, rules, files);
     MergeDiffs diffs;
     {
         TimerStat leftTimer(timer, "Creating left diff");
-        diffs.left = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.left.GetMapping());
+        diffs.left = YAMLMappingDiff::Diff(rules, &files.base.GetMapping(), &files.left.GetMapping());
     }
     TimerStat rightTimer(timer, "Creating right diff");
-    diffs.right = YAMLMappingDiff::Diff(&files.base.GetMapping(), &files.right.GetMapping());
+    diffs.right = YAMLMappingDiff::Diff(rules, &files.base.GetMapping(), &files.right.GetMapping());
     return diffs;
 }
 
@@ -122,14 +126,12 @@ std::unique_ptr<OvrinObjects> CloneBase(TimerStat& root, const MergeConfig& conf
 
 /// Returns whether component dependencies were found broken.
 bool ApplyMergedChanges(TimerStat& root, const YAMLMappingDiff& merged, MergeFiles& files,
-                        RecordingConflictResolver& resolver) {
+                        const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver) {
     TimerStat timer(root, "Applying merged changes");
-    bool hasComponentDependencyConflicts = false;
     merged.Apply(files.base.GetMapping());
     TimerStat postTimer(timer, "Post process merged changes");
-    PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), resolver,
-                hasComponentDependencyConflicts);
-    return hasComponentDependencyConflicts;
+    return PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), types,
+                       resolver);
 }
 
 /// A report that can't be written is lost without a word, but for one that shares standard output with the
@@ -162,11 +164,11 @@ int PremergeForTool(TimerStat& root, const MergeConfig& config, const PremergeIn
 int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath) {
     TimerStat root("Merging", config.timing ? &std::cout : nullptr);
     MergeFiles files;
-    ReadFiles(root, config, files);
-    RecordingConflictResolver resolver(config.resolve);
+    const RulesAndTypes known = ReadFiles(root, config, files);
+    RecordingConflictResolver resolver(known.rules, config.resolve);
     { TimerStat timer(root, "Creating mappings"); }
     PreProcessMappings(root, config, files);
-    const MergeDiffs diffs = CreateDiffs(root, config, files);
+    const MergeDiffs diffs = CreateDiffs(root, config, known.rules, files);
     if (!ReadResolveFile(root, config, resolver)) return 1;
     const YAMLMappingDiff* merged = nullptr;
     {
@@ -174,13 +176,14 @@ int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath)
         merged = YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver);
     }
     const std::unique_ptr<OvrinObjects> baseClone = CloneBase(root, config, files.base);
-    const bool hasComponentDependencyConflicts = ApplyMergedChanges(root, *merged, files, resolver);
+    const bool hasComponentDependencyConflicts =
+        ApplyMergedChanges(root, *merged, files, known.types, resolver);
     if (const int error = OutputConflicts(root, config, resolver)) return FailToWrite({}, error);
     if (const int error = OutputResult(root, outputPath, files.base)) return FailToWrite(outputPath, error);
     if (!resolver.HasPendingConflicts()) return 0;
     if (baseClone && PremergeForTool(root, config,
-                                     {*baseClone, files.left.GetMapping(), files.right.GetMapping(),
-                                      diffs.left, diffs.right}) != 0)
+                                     {known.rules, *baseClone, files.left.GetMapping(),
+                                      files.right.GetMapping(), diffs.left, diffs.right}) != 0)
         return 1;
     return hasComponentDependencyConflicts ? 3 : 2;
 }

@@ -5,7 +5,6 @@
 #include "Thread.h"
 #include "TimerStat.h"
 
-#include "Diff/MergeRules.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Repair/PostProcess.h"
 #include "Writing/ObjectFileWriter.h"
@@ -21,7 +20,7 @@ namespace {
 int Premerge(MergeResolve resolve, TimerStat& parent, const std::string& path, OvrinObjects& objects,
              const PremergeInputs& inputs) {
     TimerStat timer(parent, "Premerge " + path);
-    RecordingConflictResolver resolver(resolve);
+    RecordingConflictResolver resolver(inputs.rules, resolve);
     const YAMLMappingDiff* merged = nullptr;
     {
         TimerStat mergeTimer(timer, "Merging premerge");
@@ -51,7 +50,8 @@ PremergeErrors PremergeBoth(TimerStat& root, const MergeConfig& config, const Pr
     const std::unique_ptr<OvrinObjects> secondClone(inputs.base.Clone());
     // The name announces the clone, but the line stands for nothing: it is part of the listing.
     { TimerStat timer(root, "Clone base roots"); }
-    const MergeResolve baseResolve = MergeRules::CheckBlankPremergeBaseEnabled() ? ResolveBlank : ResolveBase;
+    const MergeResolve baseResolve =
+        inputs.rules.CheckBlankPremergeBaseEnabled() ? ResolveBlank : ResolveBase;
     PremergeErrors errors;
     Thread baseThread =
         SpawnPremergeThread(baseResolve, config.premergeBaseDest, *secondClone, inputs, errors.base);

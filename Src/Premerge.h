@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Diff/MergeRules.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Values/OvrinObjects.h"
 
@@ -8,6 +9,7 @@ class TimerStat;
 
 /// What both premerge passes work on. They share all but the base read-only.
 struct PremergeInputs {
+    const ovrin_yaml::MergeRules& rules;
     ovrin_yaml::OvrinObjects& base; // as it was before the merge; used up
     const ovrin_yaml::YAMLMapping& left;
     const ovrin_yaml::YAMLMapping& right;

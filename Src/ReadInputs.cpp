@@ -135,15 +135,17 @@ void ReadInOrder(TimerStat& parent, const std::vector<InputFile>& inputs, Reader
 
 } // namespace
 
-void SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
-                        const std::string& typeInfoFile) {
+RulesAndTypes SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
+                                 const std::string& typeInfoFile) {
+    RulesAndTypes read;
     {
         TimerStat timer(reading, "Reading unique keys");
-        SetupRules(rulesFile);
+        read.rules = SetupRules(rulesFile);
     }
-    if (typeInfoFile == kDefaultTypeInfoFile) return;
+    if (typeInfoFile == kDefaultTypeInfoFile) return read;
     TimerStat timer(root, "Read type info");
-    SetupTypeInfo(typeInfoFile);
+    read.types = SetupTypeInfo(typeInfoFile);
+    return read;
 }
 
 ReaderOptions DefaultReaderOptions() {

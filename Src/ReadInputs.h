@@ -1,16 +1,24 @@
 #pragma once
 
+#include "Diff/MergeRules.h"
 #include "Reading/ObjectFile.h"
+#include "Repair/YAMLTypeInfo.h"
 
 #include <string>
 #include <vector>
 
 class TimerStat;
 
-/// Loads the rules and, if there is one, the type info file, before any object file is read. `reading` is the
+/// What the user's files tell about the format of object files.
+struct RulesAndTypes {
+    ovrin_yaml::MergeRules rules;
+    ovrin_yaml::YAMLTypeInfoManager types; // not loaded if there is no such file
+};
+
+/// Reads the rules and, if there is one, the type info file, before any object file is read. `reading` is the
 /// stage that this belongs to, `root` its parent. Throws as SetupRules and SetupTypeInfo do.
-void SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
-                        const std::string& typeInfoFile);
+RulesAndTypes SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
+                                 const std::string& typeInfoFile);
 
 /// One object file to be read.
 struct InputFile {

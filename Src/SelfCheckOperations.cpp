@@ -3,6 +3,7 @@
 #include "Fallback.h"
 
 #include "CommandSettings.h"
+#include "Diff/DiffContext.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
@@ -46,7 +47,7 @@ void TestChangeMappingOperation(TestResults& results) {
     expected->Remove(str("key2"));
     expected->RebuildHash(false);
     YAMLMapping* outer = UnderTest(mapping);
-    const YAMLMappingDiff* diff = YAMLMappingDiff::Diff(mapping, expected);
+    const YAMLMappingDiff* diff = YAMLMappingDiff::Diff(NoRules(), mapping, expected);
     YAMLAlloc<ChangeMappingOperation>::create(diff, true)->Apply(*outer, str("test"));
     results.Add("OperationTest change mapping operation", EqualContents(outer, UnderTest(expected)));
 }
@@ -54,12 +55,12 @@ void TestChangeMappingOperation(TestResults& results) {
 void TestChangeArrayOperation(TestResults& results) {
     const YAMLSequence* base = SequenceOf({"1"});
     const YAMLSequence* dest = SequenceOf({"2", "1"});
-    Path path{str("test")};
-    const YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindMapping(path, base, dest);
+    DiffContext context(NoRules(), {str("test")});
+    const YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindMapping(context, base, dest);
     YAMLMapping* outer = UnderTest(base->Clone());
     if (remapper) {
         const YAMLSequenceDiff* diff =
-            YAMLSequenceDiff::Diff(path, remapper->Arrange(base->m_Items), dest->m_Items);
+            YAMLSequenceDiff::Diff(context, remapper->Arrange(base->m_Items), dest->m_Items);
         YAMLAlloc<ChangeSequenceOperation>::create(diff, remapper, true)->Apply(*outer, str("test"));
     }
     results.Add("OperationTest change sequence operation", EqualContents(outer, UnderTest(dest->Clone())));
@@ -82,7 +83,7 @@ void TestMergeCommands(TestResults& results) {
 /// Whether the pair merges to `expected` without a call that its resolver takes for a defect.
 bool MergesWithoutConflict(const Operation* left, const Operation* right, const Operation* expected) {
     try {
-        ExceptionConflictResolver resolver;
+        ExceptionConflictResolver resolver(NoRules());
         return Operation::Merge(left, right, resolver) == expected;
     } catch (const YAMLError&) {
         return false;
@@ -90,13 +91,13 @@ bool MergesWithoutConflict(const Operation* left, const Operation* right, const 
 }
 
 bool ConflictIsPending(const Operation* left, const Operation* right, ConflictType type) {
-    RecordingConflictResolver resolver(ResolveBase);
+    RecordingConflictResolver resolver(NoRules(), ResolveBase);
     Operation::Merge(left, right, resolver);
     return VerifyHasConflict(resolver, "", type, ResolveConflict);
 }
 
 bool PicksSide(MergeResolve side, const Operation* left, const Operation* right, const Operation* expected) {
-    SidePickingConflictResolver resolver(side);
+    SidePickingConflictResolver resolver(NoRules(), side);
     return Operation::Merge(left, right, resolver) == expected;
 }
 

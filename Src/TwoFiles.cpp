@@ -10,9 +10,10 @@
 using namespace ovrin_yaml;
 
 void ReadAndDiff(TimerStat& root, const TwoFileConfig& config, TwoFiles& files) {
+    MergeRules rules;
     {
         TimerStat timer(root, "Read files");
-        SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
+        rules = SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile).rules;
         // The left file plays the base and the right one the changed side, in the names too.
         ReadInputs(
             timer, config.useThreads,
@@ -26,5 +27,5 @@ void ReadAndDiff(TimerStat& root, const TwoFileConfig& config, TwoFiles& files) 
     }
     TimerStat timer(root, "Creating diff");
     TimerStat diffTimer(timer, "Creating left diff");
-    files.diff = YAMLMappingDiff::Diff(&files.left.GetMapping(), &files.right.GetMapping());
+    files.diff = YAMLMappingDiff::Diff(rules, &files.left.GetMapping(), &files.right.GetMapping());
 }

@@ -9,6 +9,8 @@ class OperationMerge : public RulesTest {};
 /// Notes each question and answers with the left operation, if there is one.
 class AskedResolver final : public ConflictResolver {
 public:
+    AskedResolver() : ConflictResolver(TheRules()) {}
+
     std::string asked;
     const Operation* lastLeft = nullptr; // of the last question; the only operation of a one-sided one
     const Operation* lastRight = nullptr;

@@ -154,7 +154,7 @@ TEST_F(Resolver, AdditionsNestedDeeplyTakeNoMoreMemoryThanFlatOnes) {
             return text + last + end;
         };
         const YAMLMappingDiff *left = DiffOf("", nested("1")), *right = DiffOf("", nested("2"));
-        RecordingConflictResolver resolver(ResolveLeft);
+        RecordingConflictResolver resolver(TheRules(), ResolveLeft);
         const auto before = peak();
         YAMLMappingDiff::Merge(left, right, resolver);
         EXPECT_TRUE(resolver.HasPendingConflicts());
@@ -184,7 +184,7 @@ TEST_F(Resolver, BlanksStandForConflictsWithoutTouchingTheSides) {
     const YAMLMappingDiff* left = DiffOf("a: 1\nb: {x: 1}", "a: 2\nb: {x: 2, y: [3]}");
     const YAMLMappingDiff* right = DiffOf("a: 1\nb: {x: 1}", "b: {x: 3}\na: 3");
     const std::string before = Describe(left);
-    RecordingConflictResolver resolver(ResolveBlank);
+    RecordingConflictResolver resolver(TheRules(), ResolveBlank);
     EXPECT_EQ(Describe(YAMLMappingDiff::Merge(left, right, resolver)), "a change ; b! (x change ; y add [])");
     EXPECT_EQ(Describe(left), before);
     EXPECT_TRUE(resolver.HasPendingConflicts());
@@ -196,7 +196,7 @@ TEST_F(Resolver, AMergeCanBeDoneAgain) {
     const std::string before = Describe(left, true) + Describe(right, true);
     std::string first;
     for (int time = 0; time < 2; ++time) {
-        RecordingConflictResolver resolver(ResolveLeft);
+        RecordingConflictResolver resolver(TheRules(), ResolveLeft);
         const std::string merged = Describe(YAMLMappingDiff::Merge(left, right, resolver), true);
         if (time == 0) first = merged;
         EXPECT_EQ(merged, first);
@@ -205,7 +205,7 @@ TEST_F(Resolver, AMergeCanBeDoneAgain) {
 }
 
 TEST_F(Resolver, ALostDependencyMakesItsRemovalPending) {
-    RecordingConflictResolver resolver(ResolveBase);
+    RecordingConflictResolver resolver(TheRules(), ResolveBase);
     YAMLMappingDiff::Merge(DiffOf("1: x\n2: y", "2: y"), DiffOf("1: x\n2: y", "1: x\n2: y"), resolver);
     const auto* unknown = YAMLScalar::Lookup("7");
     resolver.OnComponentDependencyConflict({unknown, YAMLScalar::null, ConflictLeftRemoves});
@@ -218,7 +218,7 @@ TEST_F(Resolver, ALostDependencyMakesItsRemovalPending) {
 }
 
 TEST_F(Resolver, PathsNoteTheTransformsWhoseParentIsVisited) {
-    RecordingConflictResolver resolver(ResolveBase);
+    RecordingConflictResolver resolver(TheRules(), ResolveBase);
     const auto visit = [&](const std::string& path) {
         for (const YAMLScalar* element : PathOf(path)) resolver.PushPath(element);
         resolver.m_Path = {};
@@ -240,7 +240,7 @@ TEST_F(Resolver, TheSidePickerTakesItsSideAndMergesMappingsOnly) {
     const YAMLMappingDiff* left = DiffOf(kBase, "a: 2\nc: {x: 2, fileID: 1}\nl: [1, 2]\nn: 1\nz: 1");
     const YAMLMappingDiff* right = DiffOf(kBase, "a: 2\nb: 3\nc: {x: 1, fileID: 3}\nl: [3, 1]\nn: 2\nz: 9");
     const auto merge = [&](MergeResolve side) {
-        SidePickingConflictResolver resolver(side);
+        SidePickingConflictResolver resolver(TheRules(), side);
         YAMLMapping* body = Doc(kBase);
         YAMLMappingDiff::Merge(left, right, resolver)->Apply(*body);
         return Show(body);
@@ -248,7 +248,7 @@ TEST_F(Resolver, TheSidePickerTakesItsSideAndMergesMappingsOnly) {
     EXPECT_EQ(merge(ResolveLeft), "{a: 2, c: {x: 2, fileID: 3}, l: [1, 2], n: 1, z: 9}");
     EXPECT_EQ(merge(ResolveRight), "{a: 2, b: 3, c: {x: 2, fileID: 3}, l: [3, 1], n: 2, z: 9}");
     for (const MergeResolve side : {ResolveBase, ResolveMerged, ResolveNone})
-        EXPECT_EQ(ErrorOf([&] { SidePickingConflictResolver resolver(side); }),
+        EXPECT_EQ(ErrorOf([&] { SidePickingConflictResolver resolver(TheRules(), side); }),
                   "SidePickingConflictResolver only accepts side left or right");
 }
 
@@ -263,10 +263,10 @@ TEST_F(Resolver, TheStrictOneThrowsWhereBothSidesTouchedAKey) {
         {"a: 1\nb: 1", "a: 2\nb: 1", "a: 1\nb: 2", "none"}};
     for (const auto& [base, left, right, error] : cases) {
         const YAMLMappingDiff *l = DiffOf(base, left), *r = DiffOf(base, right);
-        ExceptionConflictResolver resolver;
+        ExceptionConflictResolver resolver(TheRules());
         EXPECT_EQ(ErrorOf([&] { YAMLMappingDiff::Merge(l, r, resolver); }), error);
     }
-    ExceptionConflictResolver resolver;
+    ExceptionConflictResolver resolver(TheRules());
     resolver.m_Path = PathOf("1.T.n");
     AddOperation add(Doc("\n\na: 1"), true);
     EXPECT_EQ(ErrorOf([&] { resolver.OnSameValueAdded(&add, &add); }),

@@ -292,7 +292,7 @@ TEST_F(SequenceMerge, IsWhatItsStepsSay) {
         const auto* l = As<ChangeSequenceOperation>(OperationOf("l", base, Show(left)));
         const auto* r = As<ChangeSequenceOperation>(OperationOf("l", base, Show(right)));
         if (!l || !r) continue;
-        RecordingConflictResolver resolver(ResolveBase), naiveResolver(ResolveBase);
+        RecordingConflictResolver resolver(TheRules(), ResolveBase), naiveResolver(TheRules(), ResolveBase);
         resolver.m_Path = naiveResolver.m_Path = PathOf("l");
         const std::string merged = Describe(ChangeSequenceOperation::Merge(l, r, resolver, true));
         ASSERT_EQ(merged, NaiveMerge(l, r, naiveResolver)) << "seed " << seed << "\n"

@@ -21,7 +21,7 @@ std::string Records(const RecordingConflictResolver& resolver, bool withMerged) 
 }
 
 MergeOutput Merge(const MergeInput& input) {
-    RecordingConflictResolver resolver(input.byDefault);
+    RecordingConflictResolver resolver(TheRules(), input.byDefault);
     std::istringstream decisions("Conflict handling:\n" + input.decisions);
     InputConflictRecords(decisions, resolver);
     const YAMLMappingDiff* left = DiffOf(input.base, input.left);

@@ -1,7 +1,7 @@
 // The search functions of YAMLSequenceRemapper: matching by key and by equality.
 
+#include "Diff/DiffContext.h"
 #include "Diff/EqualityMatcher.h"
-#include "Diff/MergeRules.h"
 #include "Diff/YAMLSequenceRemapper.h"
 #include "Values/KeyIndex.h"
 
@@ -75,11 +75,11 @@ YAMLSequenceRemapper* UnlessIdentity(YAMLSequenceRemapper* remapper) {
 
 } // namespace
 
-YAMLSequenceRemapper* YAMLSequenceRemapper::FindMapping(const Path& path, const YAMLSequence* base,
+YAMLSequenceRemapper* YAMLSequenceRemapper::FindMapping(const DiffContext& context, const YAMLSequence* base,
                                                         const YAMLSequence* dest) {
-    const std::vector<Path>& keyPaths = MergeRules::SelectKeyPaths(path);
-    if (keyPaths.empty()) return FindGenericMapping(base, dest);
-    const ElementKeys keys(keyPaths);
+    const ListRule& rule = context.rules.SelectKeyPaths(context.path);
+    if (rule.kind == SequenceType::Plain) return FindGenericMapping(base, dest);
+    const ElementKeys keys(rule.keys);
     std::vector<const YAMLScalar*> baseKeys, destKeys;
     KeyIndex baseIndexes, destIndexes;
     if (!FindUniqueKeys(keys, base, baseKeys, baseIndexes) ||

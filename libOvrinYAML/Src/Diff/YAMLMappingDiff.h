@@ -9,6 +9,8 @@
 namespace ovrin_yaml {
 
 class ConflictResolver;
+struct DiffContext;
+class MergeRules;
 class YAMLDiffOutput;
 
 /// The diff of two mappings: an operation for each key that differs, and how the order of the keys changed.
@@ -28,9 +30,9 @@ public:
         const Operation* operation;
     };
 
-    /// The diff from `base` to `dest`, two hashed mappings at `path`, which comes back as it was.
-    static YAMLMappingDiff* Diff(Path& path, const YAMLMapping* base, const YAMLMapping* dest);
-    static YAMLMappingDiff* Diff(const YAMLMapping* base, const YAMLMapping* dest);
+    /// The diff from `base` to `dest`, two hashed mappings at the path of `context`.
+    static YAMLMappingDiff* Diff(DiffContext& context, const YAMLMapping* base, const YAMLMapping* dest);
+    static YAMLMappingDiff* Diff(const MergeRules& rules, const YAMLMapping* base, const YAMLMapping* dest);
 
     /// Throws YAMLError "Cannot do a double change on the same key in a mapping".
     void Add(const YAMLScalar* key, const Operation* operation);

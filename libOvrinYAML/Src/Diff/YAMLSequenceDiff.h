@@ -10,6 +10,8 @@
 namespace ovrin_yaml {
 
 class ConflictResolver;
+struct DiffContext;
+class MergeRules;
 class YAMLDiffOutput;
 class YAMLSequenceRemapper;
 
@@ -32,8 +34,9 @@ public:
     };
 
     /// The position-by-position diff; `base` may hold holes where it was arranged by a remapper.
-    static YAMLSequenceDiff* Diff(Path& path, const NodeList& base, const NodeList& dest);
-    static YAMLSequenceDiff* Diff(const YAMLSequence* base, const YAMLSequence* dest);
+    static YAMLSequenceDiff* Diff(DiffContext& context, const NodeList& base, const NodeList& dest);
+    static YAMLSequenceDiff* Diff(const MergeRules& rules, const YAMLSequence* base,
+                                  const YAMLSequence* dest);
 
     /// Throws YAMLError "Cannot do a double change on the same key in a sequence".
     void Add(int index, const Operation* operation);

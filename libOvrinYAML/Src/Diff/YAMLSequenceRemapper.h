@@ -11,6 +11,8 @@
 
 namespace ovrin_yaml {
 
+struct DiffContext;
+
 /// Which element of one sequence is which element of another: an index map from base to destination.
 ///
 ///     base  A B C   destination  C D A     m_Mapping = 2, -1, 0   m_DestinationCount = 3
@@ -30,8 +32,8 @@ public:
     static YAMLSequenceRemapper* MakeIdentity(std::size_t count);
 
     /// The map that brings `base` into the order of `dest`, by key where every element of both has a key of
-    /// its own, by equality otherwise; null if every element stays where it is. `path` chooses the rule.
-    static YAMLSequenceRemapper* FindMapping(const Path& path, const YAMLSequence* base,
+    /// its own, by equality otherwise; null if every element stays where it is. The path chooses the rule.
+    static YAMLSequenceRemapper* FindMapping(const DiffContext& context, const YAMLSequence* base,
                                              const YAMLSequence* dest);
     /// The same for two lists of texts that stand in each of them once, as the keys of mappings do.
     static YAMLSequenceRemapper* FindKeyListMapping(const YAMLSequence* base, const YAMLSequence* dest);

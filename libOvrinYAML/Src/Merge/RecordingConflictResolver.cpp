@@ -1,7 +1,6 @@
 #include "Merge/RecordingConflictResolver.h"
 
 #include "Diff/KeyOrder.h"
-#include "Diff/MergeRules.h"
 #include "Diff/MergeTreeVisitors.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
@@ -139,7 +138,7 @@ const Operation* RecordingConflictResolver::OnSameValueRemoved(const RemoveOpera
 }
 
 bool RecordingConflictResolver::MayMergeInside(const Operation* left, const Operation* right) const {
-    return left->m_Mergeable && right->m_Mergeable && MergeRules::IsMergeablePath(m_Path.Elements());
+    return left->m_Mergeable && right->m_Mergeable && m_Rules.IsMergeablePath(m_Path.Elements());
 }
 
 template <class Change, class MergeInside>
@@ -205,8 +204,8 @@ const Operation* RecordingConflictResolver::MergeAddedMappings(const AddOperatio
                                                                const AddOperation* right) {
     const YAMLMapping nothing;
     const YAMLMapping* leftValue = AsMapping(left->m_Value);
-    const YAMLMappingDiff* leftDiff = YAMLMappingDiff::Diff(&nothing, leftValue);
-    const YAMLMappingDiff* rightDiff = YAMLMappingDiff::Diff(&nothing, AsMapping(right->m_Value));
+    const YAMLMappingDiff* leftDiff = YAMLMappingDiff::Diff(m_Rules, &nothing, leftValue);
+    const YAMLMappingDiff* rightDiff = YAMLMappingDiff::Diff(m_Rules, &nothing, AsMapping(right->m_Value));
     const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(leftDiff, rightDiff, *this);
     if (merged->Entries().empty() && m_DefaultResolve == ResolveBase) return nullptr;
     YAMLMapping* value = YAMLAlloc<YAMLMapping>::create(leftValue->m_Flow);
@@ -220,8 +219,8 @@ const Operation* RecordingConflictResolver::MergeAddedSequences(const AddOperati
                                                                 const AddOperation* right) {
     const YAMLSequence nothing;
     const YAMLSequence* leftValue = AsSequence(left->m_Value);
-    const YAMLSequenceDiff* leftDiff = YAMLSequenceDiff::Diff(&nothing, leftValue);
-    const YAMLSequenceDiff* rightDiff = YAMLSequenceDiff::Diff(&nothing, AsSequence(right->m_Value));
+    const YAMLSequenceDiff* leftDiff = YAMLSequenceDiff::Diff(m_Rules, &nothing, leftValue);
+    const YAMLSequenceDiff* rightDiff = YAMLSequenceDiff::Diff(m_Rules, &nothing, AsSequence(right->m_Value));
     std::set<int> ignoredDropped;
     const YAMLSequenceDiff* merged = YAMLSequenceDiff::Merge(leftDiff, rightDiff, ignoredDropped, *this);
     if (merged->Entries().empty() && m_DefaultResolve == ResolveBase) return nullptr;

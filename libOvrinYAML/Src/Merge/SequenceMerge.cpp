@@ -177,11 +177,11 @@ const ChangeSequenceOperation* ChangeSequenceOperation::Merge(const ChangeSequen
     Side leftSide{left->m_Remapper, left->m_Diff}, rightSide{right->m_Remapper, right->m_Diff};
     const YAMLSequenceRemapper* baseMap = nullptr;
     if (leftSide.remapper && rightSide.remapper) {
-        const std::vector<Path>& keyPaths = MergeRules::SelectKeyPaths(resolver.m_Path.Elements());
-        if (!left->m_Diff->Entries().empty() && !right->m_Diff->Entries().empty() &&
-            keyPaths == MergeRules::defaultPath && resolver.m_Comparison.AreEqual(left, right))
+        const ListRule& rule = resolver.m_Rules.SelectKeyPaths(resolver.m_Path.Elements());
+        if (!left->m_Diff->Entries().empty() && !right->m_Diff->Entries().empty() && rule.isDefault &&
+            resolver.m_Comparison.AreEqual(left, right))
             return left;
-        if (leftSide.remapper->m_IsSet) MergeCommonAdditions(leftSide, rightSide, keyPaths, resolver);
+        if (leftSide.remapper->m_IsSet) MergeCommonAdditions(leftSide, rightSide, rule.keys, resolver);
         baseMap = MergeNumberings(leftSide, rightSide, removeUnmatched);
     } else {
         baseMap = TakeOnlyNumbering(leftSide, rightSide);

@@ -18,7 +18,8 @@ void ConflictResolver::PopPath() {
     m_Path.Pop();
 }
 
-SidePickingConflictResolver::SidePickingConflictResolver(MergeResolve side) : m_Side(side) {
+SidePickingConflictResolver::SidePickingConflictResolver(const MergeRules& rules, MergeResolve side)
+    : ConflictResolver(rules), m_Side(side) {
     if (side != ResolveLeft && side != ResolveRight)
         throw YAMLError("SidePickingConflictResolver only accepts side left or right");
 }
