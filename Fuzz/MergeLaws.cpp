@@ -5,6 +5,7 @@
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
+#include "Merge/DiffMerge.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Reading/ObjectFileReader.h"
 #include "Repair/PreProcess.h"
@@ -165,7 +166,7 @@ private:
         const std::unique_ptr<OvrinObjects> merged(base.Clone());
         RecordingConflictResolver resolver(m_Rules, ResolveBase);
         try {
-            YAMLMappingDiff::Merge(left, right, resolver)->Apply(merged->GetMapping());
+            MergeMappingDiffs(left, right, resolver)->Apply(merged->GetMapping());
         } catch (const YAMLError& error) {
             return which + " fails: " + error.what();
         }

@@ -5,6 +5,7 @@
 
 #include "Diff/CheckDiff.h"
 #include "Merge/ConflictReport.h"
+#include "Merge/DiffMerge.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Repair/FileIDCollisions.h"
 #include "Repair/PostProcess.h"
@@ -92,7 +93,7 @@ MergeDiffs Prepare(MergeFiles& files, const MergeWay& way) {
 void Merge(MergeFiles& files, const MergeRules& rules, const MergeDiffs& diffs, MergeOutcome& outcome) {
     RecordingConflictResolver resolver(rules, ResolveBase);
     const YAMLMappingDiff* merged =
-        Checked("merged", YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver), DiffOrigin::Sides);
+        Checked("merged", MergeMappingDiffs(diffs.left, diffs.right, resolver), DiffOrigin::Sides);
     CheckAll("merged", files, TreeStage::Hashed);
     merged->Apply(files.base.GetMapping());
     CheckAll("applied", files, TreeStage::Changed);
@@ -105,7 +106,7 @@ void Merge(MergeFiles& files, const MergeRules& rules, const MergeDiffs& diffs, 
 std::string Premerge(const MergeRules& rules, MergeResolve resolve, OvrinObjects& base,
                      const MergeFiles& sides, const MergeDiffs& diffs) {
     RecordingConflictResolver resolver(rules, resolve);
-    YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver)->Apply(base.GetMapping());
+    MergeMappingDiffs(diffs.left, diffs.right, resolver)->Apply(base.GetMapping());
     Check("premerge applied", base, TreeStage::Changed);
     PostProcessMergeOnly(base.GetMapping(), sides.left.GetMapping(), sides.right.GetMapping(), resolver);
     Check("premerge repaired", base, TreeStage::Changed);

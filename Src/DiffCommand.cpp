@@ -6,8 +6,8 @@
 #include "TimerStat.h"
 #include "TwoFiles.h"
 
+#include "Diff/DiffText.h"
 #include "Diff/YAMLDiffOutput.h"
-#include "Diff/YAMLMappingDiff.h"
 
 #include <iostream>
 #include <sstream>
@@ -22,7 +22,7 @@ int HandleDiffCommand(DiffConfig& config) {
     std::ostringstream text;
     text << "Diff '" << config.leftFile << "' vs. '" << config.rightFile << "':\n";
     ovrin_yaml::YAMLDiffOutput output(text, kIndentWidth);
-    files.diff->Output(output);
+    ovrin_yaml::OutputDiff(*files.diff, output);
     output.Finish();
     const int error =
         Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});

@@ -14,6 +14,7 @@
 
 #include "Diff/YAMLMappingDiff.h"
 #include "Merge/ConflictReport.h"
+#include "Merge/DiffMerge.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Repair/FileIDCollisions.h"
 #include "Repair/PostProcess.h"
@@ -173,7 +174,7 @@ int HandleMergeCommand(const MergeConfig& config, const std::string& outputPath)
     const YAMLMappingDiff* merged = nullptr;
     {
         TimerStat timer(root, "Merging");
-        merged = YAMLMappingDiff::Merge(diffs.left, diffs.right, resolver);
+        merged = MergeMappingDiffs(diffs.left, diffs.right, resolver);
     }
     const std::unique_ptr<OvrinObjects> baseClone = CloneBase(root, config, files.base);
     const bool hasComponentDependencyConflicts =

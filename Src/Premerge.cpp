@@ -5,6 +5,7 @@
 #include "Thread.h"
 #include "TimerStat.h"
 
+#include "Merge/DiffMerge.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Repair/PostProcess.h"
 #include "Writing/ObjectFileWriter.h"
@@ -24,7 +25,7 @@ int Premerge(MergeResolve resolve, TimerStat& parent, const std::string& path, O
     const YAMLMappingDiff* merged = nullptr;
     {
         TimerStat mergeTimer(timer, "Merging premerge");
-        merged = YAMLMappingDiff::Merge(inputs.leftDiff, inputs.rightDiff, resolver);
+        merged = MergeMappingDiffs(inputs.leftDiff, inputs.rightDiff, resolver);
     }
     {
         TimerStat applyTimer(timer, "Applying premerge merged changes");

@@ -2,6 +2,7 @@
 
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
+#include "Merge/DiffMerge.h"
 
 using namespace ovrin_yaml;
 
@@ -27,7 +28,7 @@ const YAMLMappingDiff* RightDiff() {
 /// The test map with both diffs merged into it.
 YAMLMapping* MergeIntoTestMap(ConflictResolver& resolver) {
     YAMLMapping* mapping = createTestMap();
-    YAMLMappingDiff::Merge(LeftDiff(), RightDiff(), resolver)->Apply(*mapping);
+    MergeMappingDiffs(LeftDiff(), RightDiff(), resolver)->Apply(*mapping);
     return mapping;
 }
 

@@ -4,9 +4,11 @@
 
 #include "CommandSettings.h"
 #include "Diff/DiffContext.h"
+#include "Diff/SequenceMatching.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
+#include "Merge/OperationMerge.h"
 #include "Values/YAMLError.h"
 
 using namespace ovrin_yaml;
@@ -56,7 +58,7 @@ void TestChangeArrayOperation(TestResults& results) {
     const YAMLSequence* base = SequenceOf({"1"});
     const YAMLSequence* dest = SequenceOf({"2", "1"});
     DiffContext context(NoRules(), {str("test")});
-    const YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindMapping(context, base, dest);
+    const YAMLSequenceRemapper* remapper = FindMapping(context, base, dest);
     YAMLMapping* outer = UnderTest(base->Clone());
     if (remapper) {
         const YAMLSequenceDiff* diff =
@@ -84,7 +86,7 @@ void TestMergeCommands(TestResults& results) {
 bool MergesWithoutConflict(const Operation* left, const Operation* right, const Operation* expected) {
     try {
         ExceptionConflictResolver resolver(NoRules());
-        return Operation::Merge(left, right, resolver) == expected;
+        return MergeOperations(left, right, resolver) == expected;
     } catch (const YAMLError&) {
         return false;
     }
@@ -92,13 +94,13 @@ bool MergesWithoutConflict(const Operation* left, const Operation* right, const 
 
 bool ConflictIsPending(const Operation* left, const Operation* right, ConflictType type) {
     RecordingConflictResolver resolver(NoRules(), ResolveBase);
-    Operation::Merge(left, right, resolver);
+    MergeOperations(left, right, resolver);
     return VerifyHasConflict(resolver, "", type, ResolveConflict);
 }
 
 bool PicksSide(MergeResolve side, const Operation* left, const Operation* right, const Operation* expected) {
     SidePickingConflictResolver resolver(NoRules(), side);
-    return Operation::Merge(left, right, resolver) == expected;
+    return MergeOperations(left, right, resolver) == expected;
 }
 
 void TestMergeOperation(TestResults& results) {

@@ -1,3 +1,4 @@
+#include "Diff/DiffText.h"
 #include "Diff/YAMLDiffOutput.h"
 #include "Reading/ObjectFileReader.h"
 #include "Support/Diffs.h"
@@ -13,7 +14,7 @@ class DiffText : public RulesTest {};
 std::string Text(const YAMLMappingDiff* diff) {
     std::ostringstream stream;
     YAMLDiffOutput output(stream, 2);
-    diff->Output(output);
+    OutputDiff(*diff, output);
     return stream.str();
 }
 

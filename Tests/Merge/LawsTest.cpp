@@ -3,6 +3,7 @@
 // lost in lists and mappings that are merged inside; neither an empty list in place of an empty mapping nor
 // the flow flag of a container that stays is a difference.
 
+#include "Merge/DiffMerge.h"
 #include "SceneGenerator.h"
 #include "Support/Merges.h"
 #include "Support/RandomTrees.h"
@@ -25,8 +26,8 @@ protected:
     static std::string MergeBodies(const YAMLMapping* base, const YAMLMapping* left, const YAMLMapping* right,
                                    std::string& records) {
         RecordingConflictResolver resolver(TheRules(), ResolveBase);
-        const auto* merged = YAMLMappingDiff::Merge(YAMLMappingDiff::Diff(TheRules(), base, left),
-                                                    YAMLMappingDiff::Diff(TheRules(), base, right), resolver);
+        const auto* merged = MergeMappingDiffs(YAMLMappingDiff::Diff(TheRules(), base, left),
+                                               YAMLMappingDiff::Diff(TheRules(), base, right), resolver);
         YAMLMapping* result = AsMapping(base->Clone());
         merged->Apply(*result);
         records = Records(resolver, false);

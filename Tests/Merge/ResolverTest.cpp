@@ -1,3 +1,4 @@
+#include "Merge/DiffMerge.h"
 #include "Support/Merges.h"
 
 #include <cctype>
@@ -156,7 +157,7 @@ TEST_F(Resolver, AdditionsNestedDeeplyTakeNoMoreMemoryThanFlatOnes) {
         const YAMLMappingDiff *left = DiffOf("", nested("1")), *right = DiffOf("", nested("2"));
         RecordingConflictResolver resolver(TheRules(), ResolveLeft);
         const auto before = peak();
-        YAMLMappingDiff::Merge(left, right, resolver);
+        MergeMappingDiffs(left, right, resolver);
         EXPECT_TRUE(resolver.HasPendingConflicts());
         EXPECT_LT(peak() - before, 400 << 10) << "with shared paths and no diffs some tens of MB";
     }
@@ -185,7 +186,7 @@ TEST_F(Resolver, BlanksStandForConflictsWithoutTouchingTheSides) {
     const YAMLMappingDiff* right = DiffOf("a: 1\nb: {x: 1}", "b: {x: 3}\na: 3");
     const std::string before = Describe(left);
     RecordingConflictResolver resolver(TheRules(), ResolveBlank);
-    EXPECT_EQ(Describe(YAMLMappingDiff::Merge(left, right, resolver)), "a change ; b! (x change ; y add [])");
+    EXPECT_EQ(Describe(MergeMappingDiffs(left, right, resolver)), "a change ; b! (x change ; y add [])");
     EXPECT_EQ(Describe(left), before);
     EXPECT_TRUE(resolver.HasPendingConflicts());
 }
@@ -197,7 +198,7 @@ TEST_F(Resolver, AMergeCanBeDoneAgain) {
     std::string first;
     for (int time = 0; time < 2; ++time) {
         RecordingConflictResolver resolver(TheRules(), ResolveLeft);
-        const std::string merged = Describe(YAMLMappingDiff::Merge(left, right, resolver), true);
+        const std::string merged = Describe(MergeMappingDiffs(left, right, resolver), true);
         if (time == 0) first = merged;
         EXPECT_EQ(merged, first);
     }
@@ -206,7 +207,7 @@ TEST_F(Resolver, AMergeCanBeDoneAgain) {
 
 TEST_F(Resolver, ALostDependencyMakesItsRemovalPending) {
     RecordingConflictResolver resolver(TheRules(), ResolveBase);
-    YAMLMappingDiff::Merge(DiffOf("1: x\n2: y", "2: y"), DiffOf("1: x\n2: y", "1: x\n2: y"), resolver);
+    MergeMappingDiffs(DiffOf("1: x\n2: y", "2: y"), DiffOf("1: x\n2: y", "1: x\n2: y"), resolver);
     const auto* unknown = YAMLScalar::Lookup("7");
     resolver.OnComponentDependencyConflict({unknown, YAMLScalar::null, ConflictLeftRemoves});
     resolver.OnComponentDependencyConflict({YAMLScalar::null, YAMLScalar::null, ConflictLeftRemoves});
@@ -242,7 +243,7 @@ TEST_F(Resolver, TheSidePickerTakesItsSideAndMergesMappingsOnly) {
     const auto merge = [&](MergeResolve side) {
         SidePickingConflictResolver resolver(TheRules(), side);
         YAMLMapping* body = Doc(kBase);
-        YAMLMappingDiff::Merge(left, right, resolver)->Apply(*body);
+        MergeMappingDiffs(left, right, resolver)->Apply(*body);
         return Show(body);
     };
     EXPECT_EQ(merge(ResolveLeft), "{a: 2, c: {x: 2, fileID: 3}, l: [1, 2], n: 1, z: 9}");
@@ -264,7 +265,7 @@ TEST_F(Resolver, TheStrictOneThrowsWhereBothSidesTouchedAKey) {
     for (const auto& [base, left, right, error] : cases) {
         const YAMLMappingDiff *l = DiffOf(base, left), *r = DiffOf(base, right);
         ExceptionConflictResolver resolver(TheRules());
-        EXPECT_EQ(ErrorOf([&] { YAMLMappingDiff::Merge(l, r, resolver); }), error);
+        EXPECT_EQ(ErrorOf([&] { MergeMappingDiffs(l, r, resolver); }), error);
     }
     ExceptionConflictResolver resolver(TheRules());
     resolver.m_Path = PathOf("1.T.n");

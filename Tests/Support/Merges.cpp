@@ -1,4 +1,5 @@
 #include "Support/Merges.h"
+#include "Merge/DiffMerge.h"
 
 #include "Diff/CheckDiff.h"
 #include "Merge/ConflictReport.h"
@@ -26,7 +27,7 @@ MergeOutput Merge(const MergeInput& input) {
     InputConflictRecords(decisions, resolver);
     const YAMLMappingDiff* left = DiffOf(input.base, input.left);
     const YAMLMappingDiff* right = DiffOf(input.base, input.right);
-    const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(left, right, resolver);
+    const YAMLMappingDiff* merged = MergeMappingDiffs(left, right, resolver);
     EXPECT_EQ(CheckDiff(*merged, DiffOrigin::Sides), "");
     YAMLMapping* body = Doc(input.base);
     merged->Apply(*body);

@@ -1,9 +1,9 @@
 #include "Diff/CreateDiffOperation.h"
 
 #include "Diff/DiffContext.h"
+#include "Diff/SequenceMatching.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
-#include "Diff/YAMLSequenceRemapper.h"
 #include "Values/YAMLMapping.h"
 #include "Values/YAMLSequence.h"
 
@@ -57,7 +57,7 @@ const Operation* DiffMappings(DiffContext& context, const YAMLMapping* base, con
 }
 
 const Operation* DiffSequences(DiffContext& context, const YAMLSequence* base, const YAMLSequence* dest) {
-    const YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindMapping(context, base, dest);
+    const YAMLSequenceRemapper* remapper = FindMapping(context, base, dest);
     YAMLSequenceDiff* diff =
         remapper ? YAMLSequenceDiff::Diff(context, remapper->Arrange(base->m_Items), dest->m_Items)
                  : YAMLSequenceDiff::Diff(context, base->m_Items, dest->m_Items);

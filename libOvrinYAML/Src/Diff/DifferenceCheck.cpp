@@ -1,7 +1,7 @@
 #include "Diff/DifferenceCheck.h"
 
 #include "Diff/ChildPairs.h"
-#include "Diff/YAMLSequenceRemapper.h"
+#include "Diff/SequenceMatching.h"
 
 #include <functional>
 
@@ -56,7 +56,7 @@ bool DifferenceCheck::ContainersDiffer(const YAMLNode* base, const YAMLNode* des
         return differ;
     }
     const YAMLSequence *baseList = AsSequence(base), *destList = AsSequence(dest);
-    YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindMapping(m_Context, baseList, destList);
+    YAMLSequenceRemapper* remapper = FindMapping(m_Context, baseList, destList);
     const bool childrenDiffer = remapper
                                     ? ChildrenDiffer(remapper->Arrange(baseList->m_Items), destList->m_Items)
                                     : Differ(baseList, destList);

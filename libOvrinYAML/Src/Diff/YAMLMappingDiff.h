@@ -8,10 +8,8 @@
 
 namespace ovrin_yaml {
 
-class ConflictResolver;
 struct DiffContext;
 class MergeRules;
-class YAMLDiffOutput;
 
 /// The diff of two mappings: an operation for each key that differs, and how the order of the keys changed.
 ///
@@ -46,11 +44,6 @@ public:
     /// Changes `target`, which must equal the base of the diff. Throws YAMLError where it doesn't fit;
     /// `target` is then left halfway.
     void Apply(YAMLMapping& target) const;
-    void Output(YAMLDiffOutput& output) const;
-
-    /// Merges the diffs of two sides. The result holds operations of the inputs, which must outlive it.
-    static YAMLMappingDiff* Merge(const YAMLMappingDiff* left, const YAMLMappingDiff* right,
-                                  ConflictResolver& resolver);
 
     /// How the key list changed. Set by every Diff, as an identity if it didn't; null in a diff made
     /// otherwise, where the order that applying the entries leaves is kept.

@@ -9,10 +9,8 @@
 
 namespace ovrin_yaml {
 
-class ConflictResolver;
 struct DiffContext;
 class MergeRules;
-class YAMLDiffOutput;
 class YAMLSequenceRemapper;
 
 /// The per-position half of a change to a sequence; YAMLSequenceRemapper is the other half.
@@ -53,13 +51,6 @@ public:
     const std::vector<Entry>& Entries() const { return m_Entries; }
     /// The entry's operation, or null.
     const Operation* Find(int index) const;
-
-    void Output(YAMLDiffOutput& output) const;
-
-    /// Merges two diffs in one index numbering. Indexes where neither side's operation is taken are added to
-    /// `droppedIndexes`.
-    static YAMLSequenceDiff* Merge(const YAMLSequenceDiff* left, const YAMLSequenceDiff* right,
-                                   std::set<int>& droppedIndexes, ConflictResolver& resolver);
 
     void ResetForAlloc() { m_Entries.clear(); }
 

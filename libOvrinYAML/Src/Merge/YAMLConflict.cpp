@@ -1,5 +1,6 @@
 #include "Merge/YAMLConflict.h"
 
+#include "Merge/OperationMerge.h"
 #include "Values/YAMLError.h"
 
 namespace ovrin_yaml {
@@ -50,7 +51,7 @@ const Operation* SidePickingConflictResolver::OnSameValueChanged(const RemoveOpe
 
 const Operation* SidePickingConflictResolver::OnSameMappingChanged(const ChangeMappingOperation* left,
                                                                    const ChangeMappingOperation* right) {
-    return ChangeMappingOperation::Merge(left, right, *this);
+    return MergeMappingChanges(left, right, *this);
 }
 
 const Operation* SidePickingConflictResolver::OnSameSequenceChanged(const ChangeSequenceOperation* left,

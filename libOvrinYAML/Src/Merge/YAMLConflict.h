@@ -1,8 +1,8 @@
 #pragma once
 
 #include "Diff/MergeRules.h"
-#include "Diff/MergeTreeVisitors.h"
 #include "Diff/Operation.h"
+#include "Diff/OperationComparison.h"
 #include "Merge/ConflictType.h"
 #include "Merge/MergeResolve.h"
 #include "Merge/PropertyPath.h"
