@@ -1,9 +1,12 @@
+#include "Diff/RulesReader.h"
 #include "Merge/DiffMerge.h"
 #include "Support/Merges.h"
 
 #include <cctype>
+#include <set>
 #include <sstream>
 #include <sys/resource.h>
+#include <thread>
 
 namespace {
 
@@ -272,6 +275,34 @@ TEST_F(Resolver, TheStrictOneThrowsWhereBothSidesTouchedAKey) {
     AddOperation add(Doc("\n\na: 1"), true);
     EXPECT_EQ(ErrorOf([&] { resolver.OnSameValueAdded(&add, &add); }),
               "Conflict for same value added 1.T.n at line 2");
+}
+
+/// The merge of one scene by the rules of a file, again and again; what comes out, each result once.
+std::set<std::string> MergesBy(const std::string& file) {
+    static const char* const kScene = "f: 1\nl: [{id: 1, x: 1}, {id: 2}]\nm:\n  a: 1\n  b: 1";
+    MergeRules rules;
+    std::istringstream stream(file);
+    LoadSequenceUniqueKeys(stream, rules);
+    const auto diff = [&](const char* side) { return YAMLMappingDiff::Diff(rules, Doc(kScene), Doc(side)); };
+    std::set<std::string> results;
+    for (int time = 0; time < 300; ++time) {
+        RecordingConflictResolver resolver(rules, ResolveBase);
+        YAMLMapping* body = Doc(kScene);
+        MergeMappingDiffs(diff("f: 1.4\nl: [{id: 2}, {id: 1, x: 1}]\nm:\n  a: 2\n  b: 1"),
+                          diff("f: 1\nl: [{id: 1, x: 2}, {id: 2}]\nm:\n  a: 1\n  b: 2"), resolver)
+            ->Apply(*body);
+        results.insert(Show(body));
+    }
+    return results;
+}
+
+TEST_F(Resolver, MergesUnderDifferentRulesDoNotKnowOfEachOther) {
+    std::set<std::string> byNone, bySome;
+    std::thread none([&] { byNone = MergesBy(""); });
+    bySome = MergesBy("[arrays]\nset l id\n[exclusions]\nexclude m\n[comparisons]\nfloat f 1 1");
+    none.join();
+    EXPECT_EQ(byNone, std::set<std::string>{"{f: 1.4, l: [{id: 1, x: 2}, {id: 2}], m: {a: 2, b: 2}}"});
+    EXPECT_EQ(bySome, std::set<std::string>{"{f: 1, l: [{id: 2}, {id: 1, x: 2}], m: {a: 1, b: 1}}"});
 }
 
 } // namespace
