@@ -1,6 +1,5 @@
 #include "FuzzTarget.h"
 
-#include "Diff/MergeRules.h"
 #include "Values/YAMLScalar.h"
 
 #include <cstddef>
@@ -10,7 +9,6 @@
 
 extern "C" int LLVMFuzzerInitialize(int*, char***) {
     ovrin_yaml::initialize();
-    ovrin_yaml::MergeRules::Initialize();
     return 0;
 }
 

@@ -5,6 +5,7 @@
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
+#include "Merge/DiffMerge.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "Reading/ObjectFileReader.h"
 #include "Repair/PreProcess.h"
@@ -54,7 +55,7 @@ bool OnlyKeysMove(const YAMLNode& base, const YAMLNode& changed) {
     const YAMLMapping *from = AsMapping(&base), *to = AsMapping(&changed);
     const YAMLSequence *fromList = AsSequence(&base), *toList = AsSequence(&changed);
     if (from && to) {
-        if (YAMLMappingDiff::Diff(from, to)->Entries().empty()) return true;
+        if (YAMLMappingDiff::Diff(MergeRules(), from, to)->Entries().empty()) return true;
         for (const auto& [key, value] : *from)
             if (to->HasKey(key) && OnlyKeysMove(*value, *to->Get(key))) return true;
     } else if (fromList && toList) {
@@ -151,8 +152,8 @@ public:
     std::string Check() const {
         const std::unique_ptr<OvrinObjects> base = Read(m_Base);
         if (!base || !m_Changed) return "";
-        const auto* none = YAMLMappingDiff::Diff(&base->GetMapping(), &base->GetMapping());
-        const auto* change = YAMLMappingDiff::Diff(&base->GetMapping(), &m_Changed->GetMapping());
+        const auto* none = YAMLMappingDiff::Diff(m_Rules, &base->GetMapping(), &base->GetMapping());
+        const auto* change = YAMLMappingDiff::Diff(m_Rules, &base->GetMapping(), &m_Changed->GetMapping());
         std::string finding = CheckMerge("base, base, changed", *base, none, change);
         if (finding.empty()) finding = CheckMerge("base, changed, base", *base, change, none);
         if (!finding.empty() || MovesInObjects(*change)) return finding;
@@ -163,9 +164,9 @@ private:
     std::string CheckMerge(const std::string& which, OvrinObjects& base, const YAMLMappingDiff* left,
                            const YAMLMappingDiff* right) const {
         const std::unique_ptr<OvrinObjects> merged(base.Clone());
-        RecordingConflictResolver resolver(ResolveBase);
+        RecordingConflictResolver resolver(m_Rules, ResolveBase);
         try {
-            YAMLMappingDiff::Merge(left, right, resolver)->Apply(merged->GetMapping());
+            MergeMappingDiffs(left, right, resolver)->Apply(merged->GetMapping());
         } catch (const YAMLError& error) {
             return which + " fails: " + error.what();
         }
@@ -181,6 +182,7 @@ private:
         return "";
     }
 
+    const MergeRules m_Rules;
     const std::string& m_Base;
     const std::unique_ptr<OvrinObjects> m_Changed;
 };

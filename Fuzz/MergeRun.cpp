@@ -52,6 +52,7 @@ void CheckDiff(const char* which, const YAMLMappingDiff& diff, DiffOrigin origin
 /// All that comes before the merge itself.
 std::shared_ptr<MergeSession> Prepare(const MergeWay& way) {
     auto session = std::make_shared<MergeSession>(way.threads);
+    session->SetRules(way.rules);
     session->Read(way.files(), nullptr, way.options);
     CheckFiles("read", *session);
     session->Prepare();

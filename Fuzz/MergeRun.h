@@ -31,6 +31,7 @@ struct MergeWay {
     ovrin_yaml::ReaderOptions options;
     ovrin_yaml::Threads threads = ovrin_yaml::Threads::None;
     Sessions sessions = Sessions::One;
+    ovrin_yaml::MergeRules rules = {};
 };
 
 /// Takes a merge all the way to the result and two premerged files. All trees and diffs are checked after

@@ -56,7 +56,8 @@ std::string CheckTable(const std::vector<RecordResolve>& decisions) {
 } // namespace
 
 std::string CheckResolve(std::string_view input) {
-    RecordingConflictResolver resolver(ResolveBase), again(ResolveBase);
+    const MergeRules rules;
+    RecordingConflictResolver resolver(rules, ResolveBase), again(rules, ResolveBase);
     const std::string failure = Read(std::string(input), resolver);
     const std::vector<RecordResolve>& decisions = resolver.Resolves();
     if (!failure.empty()) return decisions.empty() ? "" : "decisions of a file that failed: " + failure;

@@ -1,6 +1,7 @@
 #include "SmallChecks.h"
 
 #include "Diff/MergeRules.h"
+#include "Diff/RulesReader.h"
 
 #include <cstdio>
 #include <sstream>
@@ -32,23 +33,22 @@ std::string Written(float number) {
     return text;
 }
 
-/// The rules that are loaded, as a rules file.
-std::string LoadedRules() {
+/// As a rules file.
+std::string Written(const MergeRules& rules) {
     std::string text = "[arrays]\n";
-    for (const SequenceInfo& rule : MergeRules::s_ArrayUniqueKeyMap)
-        text += (rule.type == SequenceType::Set ? "set" : "plain") + Written(rule.path) + Written(rule.keys) +
-                "\n";
+    for (const SequenceInfo& rule : rules.ListRules())
+        text += (rule.list.kind == SequenceType::Set ? "set" : "plain") + Written(rule.path) +
+                Written(rule.list.keys) + "\n";
     text += "[exclusions]\n";
-    for (const auto& [path, mergeable] : MergeRules::s_ExclusionFieldPaths)
-        text += (mergeable ? "include" : "exclude") + Written(path) + "\n";
-    for (const ExclusionInfo& rule : MergeRules::s_DiffExclusionFieldPaths)
+    for (const ExclusionInfo& rule : rules.Exclusions())
+        text += (rule.mergeable ? "include" : "exclude") + Written(rule.path) + "\n";
+    for (const ExclusionInfo& rule : rules.ConditionalExclusions())
         text += (rule.mergeable ? "includeIfContains" : "excludeIfContains") + Written(rule.path) +
                 Written(rule.fieldPaths) + "\n";
     text += "[comparisons]\n";
-    for (const auto& [path, tolerance] : MergeRules::s_ComparisonFieldPaths)
-        text += "float" + Written(path) + Written(std::get<0>(tolerance)) + Written(std::get<1>(tolerance)) +
-                "\n";
-    return text + (MergeRules::s_PremergeBaseValues ? "[premerge]\nlegacyBlankPremergeBase\n" : "");
+    for (const auto& [path, tolerance] : rules.Comparisons())
+        text += "float" + Written(path) + Written(tolerance.relative) + Written(tolerance.absolute) + "\n";
+    return text + (rules.CheckBlankPremergeBaseEnabled() ? "[premerge]\nlegacyBlankPremergeBase\n" : "");
 }
 
 struct Reading {
@@ -58,14 +58,14 @@ struct Reading {
 
 Reading Read(const std::string& text) {
     Reading reading;
-    MergeRules::ResetForTests();
+    MergeRules rules;
     std::istringstream stream(text);
     try {
-        MergeRules::LoadSequenceUniqueKeys(stream);
+        LoadSequenceUniqueKeys(stream, rules);
     } catch (const std::runtime_error& error) {
         reading.failure = error.what();
     }
-    reading.rules = LoadedRules();
+    reading.rules = Written(rules);
     return reading;
 }
 
@@ -100,8 +100,6 @@ std::string CheckRules(std::string_view input) {
     const Reading again = Read(reading.rules);
     if (finding.empty() && (!again.failure.empty() || again.rules != reading.rules))
         finding = "rules\n" + reading.rules + "are read as\n" + again.rules + again.failure;
-    MergeRules::ResetForTests();
-    MergeRules::Initialize();
     return finding;
 }
 

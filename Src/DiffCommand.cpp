@@ -7,8 +7,8 @@
 #include "TimerStat.h"
 #include "TwoFiles.h"
 
+#include "Diff/DiffText.h"
 #include "Diff/YAMLDiffOutput.h"
-#include "Diff/YAMLMappingDiff.h"
 #include "Session/MergeSession.h"
 
 #include <iostream>
@@ -24,7 +24,7 @@ int HandleDiffCommand(DiffConfig& config) {
     std::ostringstream text;
     text << "Diff '" << config.leftFile << "' vs. '" << config.rightFile << "':\n";
     ovrin_yaml::YAMLDiffOutput output(text, kIndentWidth);
-    session.LeftDiff().Output(output);
+    ovrin_yaml::OutputDiff(session.LeftDiff(), output);
     output.Finish();
     const int error =
         Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});

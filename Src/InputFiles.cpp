@@ -4,8 +4,7 @@
 #include "FileUtils.h"
 #include "TimerStat.h"
 
-#include "Diff/MergeRules.h"
-#include "Repair/YAMLTypeInfo.h"
+#include "Diff/RulesReader.h"
 #include "Session/ReadInputs.h"
 
 #include <sstream>
@@ -22,30 +21,36 @@ InputFile FileInput(const std::string& path) {
             }};
 }
 
-void SetupRules(const std::string& rulesFile) {
+MergeRules SetupRules(const std::string& rulesFile) {
     const std::string path =
         rulesFile == kDefaultRulesFile ? GetDataFilesDir() + "mergerules.txt" : rulesFile;
     std::string text;
     if (ReadWholeFile(path, text) != ReadResult::Complete)
         throw YAMLError("Cannot open rules file for reading:" + path);
     std::istringstream stream(std::move(text));
-    MergeRules::LoadSequenceUniqueKeys(stream);
+    MergeRules rules;
+    LoadSequenceUniqueKeys(stream, rules);
+    return rules;
 }
 
-void SetupTypeInfo(const std::string& typeInfoFile) {
+YAMLTypeInfoManager SetupTypeInfo(const std::string& typeInfoFile) {
     OvrinObjects objects;
     const InputFile input = FileInput(typeInfoFile);
     ReadInputs({{"Read type info", &input, &objects}}, Threads::None, nullptr, {});
-    GetTypeInfoManager()->Read(objects);
+    YAMLTypeInfoManager types;
+    types.Read(objects);
+    return types;
 }
 
-void SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
-                        const std::string& typeInfoFile) {
+RulesAndTypes SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
+                                 const std::string& typeInfoFile) {
+    RulesAndTypes read;
     {
         TimerStat timer(reading, "Reading unique keys");
-        SetupRules(rulesFile);
+        read.rules = SetupRules(rulesFile);
     }
-    if (typeInfoFile == kDefaultTypeInfoFile) return;
+    if (typeInfoFile == kDefaultTypeInfoFile) return read;
     TimerStat timer(root, "Read type info");
-    SetupTypeInfo(typeInfoFile);
+    read.types = SetupTypeInfo(typeInfoFile);
+    return read;
 }

@@ -4,7 +4,6 @@
 #include "OutputFile.h"
 #include "TimerStat.h"
 
-#include "Diff/MergeRules.h"
 #include "Session/MergeSession.h"
 #include "Session/Thread.h"
 #include "Writing/ObjectFileWriter.h"
@@ -17,7 +16,8 @@ using namespace ovrin_yaml;
 PremergeErrors PremergeBoth(TimerStat& root, const MergeConfig& config, MergeSession& session) {
     // The name announces a clone, but the line stands for nothing: it is part of the listing.
     { TimerStat timer(root, "Clone base roots"); }
-    const MergeResolve baseResolve = MergeRules::CheckBlankPremergeBaseEnabled() ? ResolveBlank : ResolveBase;
+    const MergeResolve baseResolve =
+        session.Rules().CheckBlankPremergeBaseEnabled() ? ResolveBlank : ResolveBase;
     PremergeErrors errors;
     const auto pass = [&session](MergeResolve resolve, const std::string& path, int& error) {
         const std::unique_ptr<OvrinObjects> objects = session.Premerge(resolve);

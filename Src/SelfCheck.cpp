@@ -33,6 +33,11 @@ YAMLMapping* createTestMap() {
     return MapOf({{"key1", "value1"}, {"key2", "value2"}, {"key3", "value3"}});
 }
 
+const MergeRules& NoRules() {
+    static const MergeRules rules;
+    return rules;
+}
+
 const RemoveOperation* Removal() {
     return YAMLAlloc<RemoveOperation>::create(false);
 }

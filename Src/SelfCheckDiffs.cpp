@@ -2,6 +2,7 @@
 
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
+#include "Merge/DiffMerge.h"
 
 using namespace ovrin_yaml;
 
@@ -27,7 +28,7 @@ const YAMLMappingDiff* RightDiff() {
 /// The test map with both diffs merged into it.
 YAMLMapping* MergeIntoTestMap(ConflictResolver& resolver) {
     YAMLMapping* mapping = createTestMap();
-    YAMLMappingDiff::Merge(LeftDiff(), RightDiff(), resolver)->Apply(*mapping);
+    MergeMappingDiffs(LeftDiff(), RightDiff(), resolver)->Apply(*mapping);
     return mapping;
 }
 
@@ -43,7 +44,7 @@ void TestLeftDiffApply(TestResults& results) {
 
 void TestMergeWithConflicts(TestResults& results) {
     const std::string name = "DiffTest mapping merge and diff apply";
-    RecordingConflictResolver resolver(ResolveBase);
+    RecordingConflictResolver resolver(NoRules(), ResolveBase);
     YAMLMapping* mapping = MergeIntoTestMap(resolver);
     // The base value stands wherever a conflict is pending.
     YAMLMapping* expected = MapOf({{"key2", "value2"}, {"key3", "value3"}, {"key4", "newvalue4left"}});
@@ -57,7 +58,7 @@ void TestMergeWithConflicts(TestResults& results) {
 
 void TestMergeWithDecisions(TestResults& results) {
     const std::string name = "DiffTest mapping merge and diff apply";
-    RecordingConflictResolver resolver(ResolveBase);
+    RecordingConflictResolver resolver(NoRules(), ResolveBase);
     resolver.SetResolveMethodForPaths({{{str("key2")}, ResolveLeft}, {{str("key3")}, ResolveLeft}});
     YAMLMapping* mapping = MergeIntoTestMap(resolver);
     YAMLMapping* expected = MapOf({{"key3", "newvalue3left"}, {"key4", "newvalue4left"}});
@@ -66,7 +67,7 @@ void TestMergeWithDecisions(TestResults& results) {
 }
 
 void TestMergeOfRightSide(TestResults& results) {
-    SidePickingConflictResolver resolver(ResolveRight);
+    SidePickingConflictResolver resolver(NoRules(), ResolveRight);
     YAMLMapping* mapping = MergeIntoTestMap(resolver);
     YAMLMapping* expected =
         MapOf({{"key2", "newvalue2"}, {"key3", "newvalue3right"}, {"key4", "newvalue4left"}});
@@ -83,7 +84,7 @@ void TestMapDiffApply(TestResults& results) {
 void TestMapDiffCreate(TestResults& results) {
     YAMLMapping* base = createTestMap();
     YAMLMapping* left = MapOf({{"key1", "value1"}, {"key3", "value3new"}, {"key4", "value4"}});
-    const YAMLMappingDiff* diff = YAMLMappingDiff::Diff(base, left);
+    const YAMLMappingDiff* diff = YAMLMappingDiff::Diff(NoRules(), base, left);
     results.Add("DiffTest mapping diff kept key1", !diff->HasKey(str("key1")));
     results.Add("DiffTest mapping diff removed key2", diff->HasKey(str("key2")));
     results.Add("DiffTest mapping diff changed key3", diff->HasKey(str("key3")));
@@ -102,7 +103,7 @@ bool HasValue(const ValuedOperation* operation, const char* value) {
 }
 
 void TestAppendedElement(TestResults& results) {
-    const YAMLSequenceDiff* diff = YAMLSequenceDiff::Diff(SequenceOf({}), SequenceOf({"1"}));
+    const YAMLSequenceDiff* diff = YAMLSequenceDiff::Diff(NoRules(), SequenceOf({}), SequenceOf({"1"}));
     const AddOperation* add = As<AddOperation>(diff->Find(0));
     results.Add("DiffTest sequence diff append 1 size is 1", diff->Entries().size() == 1);
     results.Add("DiffTest sequence diff append 1 key is 0", HasKeyAt(diff, 0, 0));
@@ -111,7 +112,7 @@ void TestAppendedElement(TestResults& results) {
 }
 
 void TestRemovedElement(TestResults& results) {
-    const YAMLSequenceDiff* diff = YAMLSequenceDiff::Diff(SequenceOf({"1"}), SequenceOf({}));
+    const YAMLSequenceDiff* diff = YAMLSequenceDiff::Diff(NoRules(), SequenceOf({"1"}), SequenceOf({}));
     results.Add("DiffTest sequence diff remove 1 size is 1", diff->Entries().size() == 1);
     results.Add("DiffTest sequence diff remove 1 key is 0", HasKeyAt(diff, 0, 0));
     results.Add("DiffTest sequence diff remove 1 op is remove",
@@ -119,7 +120,8 @@ void TestRemovedElement(TestResults& results) {
 }
 
 void TestChangedAndRemovedElements(TestResults& results) {
-    const YAMLSequenceDiff* diff = YAMLSequenceDiff::Diff(SequenceOf({"2", "3"}), SequenceOf({"1"}));
+    const YAMLSequenceDiff* diff =
+        YAMLSequenceDiff::Diff(NoRules(), SequenceOf({"2", "3"}), SequenceOf({"1"}));
     const ChangeOperation* change = As<ChangeOperation>(diff->Find(0));
     results.Add("DiffTest sequence diff remove/change 2 size is 2", diff->Entries().size() == 2);
     results.Add("DiffTest sequence diff remove/change 2 key is 0", HasKeyAt(diff, 0, 0));

@@ -3,9 +3,12 @@
 #include "Fallback.h"
 
 #include "CommandSettings.h"
+#include "Diff/DiffContext.h"
+#include "Diff/SequenceMatching.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
 #include "Diff/YAMLSequenceRemapper.h"
+#include "Merge/OperationMerge.h"
 #include "Values/YAMLError.h"
 
 using namespace ovrin_yaml;
@@ -46,7 +49,7 @@ void TestChangeMappingOperation(TestResults& results) {
     expected->Remove(str("key2"));
     expected->RebuildHash(false);
     YAMLMapping* outer = UnderTest(mapping);
-    const YAMLMappingDiff* diff = YAMLMappingDiff::Diff(mapping, expected);
+    const YAMLMappingDiff* diff = YAMLMappingDiff::Diff(NoRules(), mapping, expected);
     YAMLAlloc<ChangeMappingOperation>::create(diff, true)->Apply(*outer, str("test"));
     results.Add("OperationTest change mapping operation", EqualContents(outer, UnderTest(expected)));
 }
@@ -54,12 +57,12 @@ void TestChangeMappingOperation(TestResults& results) {
 void TestChangeArrayOperation(TestResults& results) {
     const YAMLSequence* base = SequenceOf({"1"});
     const YAMLSequence* dest = SequenceOf({"2", "1"});
-    Path path{str("test")};
-    const YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindMapping(path, base, dest);
+    DiffContext context(NoRules(), {str("test")});
+    const YAMLSequenceRemapper* remapper = FindMapping(context, base, dest);
     YAMLMapping* outer = UnderTest(base->Clone());
     if (remapper) {
         const YAMLSequenceDiff* diff =
-            YAMLSequenceDiff::Diff(path, remapper->Arrange(base->m_Items), dest->m_Items);
+            YAMLSequenceDiff::Diff(context, remapper->Arrange(base->m_Items), dest->m_Items);
         YAMLAlloc<ChangeSequenceOperation>::create(diff, remapper, true)->Apply(*outer, str("test"));
     }
     results.Add("OperationTest change sequence operation", EqualContents(outer, UnderTest(dest->Clone())));
@@ -82,22 +85,22 @@ void TestMergeCommands(TestResults& results) {
 /// Whether the pair merges to `expected` without a call that its resolver takes for a defect.
 bool MergesWithoutConflict(const Operation* left, const Operation* right, const Operation* expected) {
     try {
-        ExceptionConflictResolver resolver;
-        return Operation::Merge(left, right, resolver) == expected;
+        ExceptionConflictResolver resolver(NoRules());
+        return MergeOperations(left, right, resolver) == expected;
     } catch (const YAMLError&) {
         return false;
     }
 }
 
 bool ConflictIsPending(const Operation* left, const Operation* right, ConflictType type) {
-    RecordingConflictResolver resolver(ResolveBase);
-    Operation::Merge(left, right, resolver);
+    RecordingConflictResolver resolver(NoRules(), ResolveBase);
+    MergeOperations(left, right, resolver);
     return VerifyHasConflict(resolver, "", type, ResolveConflict);
 }
 
 bool PicksSide(MergeResolve side, const Operation* left, const Operation* right, const Operation* expected) {
-    SidePickingConflictResolver resolver(side);
-    return Operation::Merge(left, right, resolver) == expected;
+    SidePickingConflictResolver resolver(NoRules(), side);
+    return MergeOperations(left, right, resolver) == expected;
 }
 
 void TestMergeOperation(TestResults& results) {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Diff/MergeRules.h"
 #include "Diff/Operation.h"
 #include "Merge/RecordingConflictResolver.h"
 #include "TestResults.h"
@@ -23,6 +24,9 @@ ovrin_yaml::YAMLMapping* MapOf(std::initializer_list<std::pair<const char*, cons
 ovrin_yaml::YAMLSequence* SequenceOf(std::initializer_list<const char*> items);
 /// key1: value1, key2: value2, key3: value3.
 ovrin_yaml::YAMLMapping* createTestMap();
+
+/// Those of an empty rules file.
+const ovrin_yaml::MergeRules& NoRules();
 
 const ovrin_yaml::RemoveOperation* Removal();
 const ovrin_yaml::ChangeOperation* ChangeTo(const char* value);

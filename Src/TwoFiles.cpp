@@ -12,7 +12,8 @@ namespace {
 
 void ReadFiles(TimerStat& root, const TwoFileConfig& config, MergeSession& session) {
     TimerStat timer(root, "Read files");
-    SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
+    auto [rules, types] = SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
+    session.SetRules(std::move(rules), std::move(types));
     StepTimers steps(timer);
     session.Read({FileInput(config.leftFile), FileInput(config.rightFile)}, &steps);
 }

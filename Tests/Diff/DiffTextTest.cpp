@@ -1,3 +1,4 @@
+#include "Diff/DiffText.h"
 #include "Diff/YAMLDiffOutput.h"
 #include "Reading/ObjectFileReader.h"
 #include "Support/Diffs.h"
@@ -13,7 +14,7 @@ class DiffText : public RulesTest {};
 std::string Text(const YAMLMappingDiff* diff) {
     std::ostringstream stream;
     YAMLDiffOutput output(stream, 2);
-    diff->Output(output);
+    OutputDiff(*diff, output);
     return stream.str();
 }
 
@@ -57,7 +58,7 @@ TEST_F(DiffText, AnObjectIsShownWithoutItsHeader) {
     OvrinObjects objects;
     ParseYAMLString(ObjectText("--- !o!4 &2000 stripped\nTransform:\n  m_Father: {fileID: 0}\n"), objects);
     const std::string before = Show(&objects.GetMapping());
-    EXPECT_EQ(Text(YAMLMappingDiff::Diff(Doc(""), &objects.GetMapping())),
+    EXPECT_EQ(Text(YAMLMappingDiff::Diff(TheRules(), Doc(""), &objects.GetMapping())),
               "  2000 add as Transform:\n                m_Father: {fileID: 0}\n");
     EXPECT_EQ(Show(&objects.GetMapping()), before);
 }
@@ -65,7 +66,7 @@ TEST_F(DiffText, AnObjectIsShownWithoutItsHeader) {
 TEST_F(DiffText, AnAddedObjectShowsRepeatedKeysAsTheyStand) {
     OvrinObjects objects;
     ParseYAMLString(ObjectText("--- !o!1 &5\nC:\n  a: '1,'\n  a: '2,'\n"), objects);
-    EXPECT_EQ(Text(YAMLMappingDiff::Diff(Doc(""), &objects.GetMapping())),
+    EXPECT_EQ(Text(YAMLMappingDiff::Diff(TheRules(), Doc(""), &objects.GetMapping())),
               "  5 add as C:\n             a: 1,\n             a: 2,\n");
 }
 

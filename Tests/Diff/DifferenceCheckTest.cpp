@@ -37,8 +37,9 @@ void AskLevelByLevel(DifferenceCheck& check, const YAMLNode* left, const YAMLNod
     const std::string error = ErrorOf(
         [&] { asked = word(leftMap ? check.Differ(leftMap, rightMap) : check.Differ(leftList, rightList)); });
     EXPECT_EQ(error, ErrorOf([&] {
-                  built = word(leftMap ? !YAMLMappingDiff::Diff(leftMap, rightMap)->Entries().empty()
-                                       : !YAMLSequenceDiff::Diff(leftList, rightList)->Entries().empty());
+                  built = word(
+                      leftMap ? !YAMLMappingDiff::Diff(TheRules(), leftMap, rightMap)->Entries().empty()
+                              : !YAMLSequenceDiff::Diff(TheRules(), leftList, rightList)->Entries().empty());
               }));
     EXPECT_EQ(asked, built);
     ++answers[error == "none" ? asked : "error"];
@@ -54,13 +55,12 @@ TEST_F(Difference, IsWhatTheDiffSaysWhateverTheRules) {
     for (const char* rules : {"", "[comparisons]\nfloat a 0.1 0.1\nfloat a.b 0.1 0.1\nfloat *.*.c 0.1 0.1\n",
                               "[arrays]\nset a.a b\nplain b.b.b\nset * _\n[comparisons]\nfloat b.1 0.1 0.1\n",
                               "[exclusions]\nexcludeIfContains b a.a\nincludeIfContains *.b.c a\n"}) {
-        MergeRules::ResetForTests();
         Rules(rules);
         std::map<std::string, int> answers;
         for (unsigned seed = 0; seed < 5000; ++seed) {
             std::mt19937 random(seed);
             const auto value = [&] { return Node("{a: " + RandomValue(random, 5) + "}"); };
-            DifferenceCheck check;
+            DifferenceCheck check(TheRules());
             AskLevelByLevel(check, value(), value(), answers);
             ASSERT_FALSE(HasFailure()) << "seed " << seed << " rules " << rules;
         }

@@ -62,7 +62,7 @@ TEST_F(MappingDiff, ATargetThatDoesNotFitFails) {
 
 /// The position-by-position diff of two lists.
 YAMLSequenceDiff* Positions(const std::string& base, const std::string& dest) {
-    return YAMLSequenceDiff::Diff(List(base), List(dest));
+    return YAMLSequenceDiff::Diff(TheRules(), List(base), List(dest));
 }
 
 std::string Indexes(const YAMLSequenceDiff* diff) {
@@ -87,7 +87,7 @@ TEST_F(SequenceDiff, PositionsAreComparedOneByOne) {
     EXPECT_EQ(Describe(Positions("[a, b, c]", "[a, x]")), "1 change x; 2 delete");
     YAMLSequence* holes = List("[a]");
     holes->Set(0, nullptr);
-    EXPECT_EQ(Describe(YAMLSequenceDiff::Diff(holes, List("[b]"))), "0 add b");
+    EXPECT_EQ(Describe(YAMLSequenceDiff::Diff(TheRules(), holes, List("[b]"))), "0 add b");
 }
 
 TEST_F(SequenceDiff, EntriesStandByIndexAndOnce) {

@@ -1,4 +1,5 @@
-#include "Diff/MergeRules.h"
+#include "Diff/RulesReader.h"
+#include "Support/Diffs.h"
 #include "Values/YAMLMapping.h"
 
 #include <gtest/gtest.h>
@@ -7,38 +8,24 @@
 #include <sstream>
 #include <stdexcept>
 
-namespace ovrin_yaml {
 namespace {
 
-class MergeRulesTest : public testing::Test {
+using namespace diffs;
+
+class MergeRulesTest : public RulesTest {
 protected:
-    MergeRulesTest() {
-        initialize();
-        MergeRules::ResetForTests();
+    static std::string Failure(const std::string& text) {
+        try {
+            Rules(text);
+        } catch (const std::runtime_error& error) {
+            return error.what();
+        }
+        return "none";
     }
-    ~MergeRulesTest() override { MergeRules::ResetForTests(); }
 };
 
 Path P(const std::string& text) {
-    std::vector<std::string> elements;
-    MergeRules::Tokenize(text, '.', elements);
-    Path path;
-    for (const std::string& element : elements) path.push_back(YAMLScalar::Lookup(element));
-    return path;
-}
-
-void Load(const std::string& text) {
-    std::istringstream stream(text);
-    MergeRules::LoadSequenceUniqueKeys(stream);
-}
-
-std::string ErrorOf(const std::string& text) {
-    try {
-        Load(text);
-    } catch (const std::runtime_error& error) {
-        return error.what();
-    }
-    return "none";
+    return ToRulePath(text);
 }
 
 /// A mapping of the pairs; "a.b" as a key nests.
@@ -61,7 +48,7 @@ std::string Values(const std::vector<Path>& fieldPaths, const YAMLNode* node) {
 }
 
 std::vector<Path> Keys(const std::string& path) {
-    return MergeRules::SelectKeyPaths(P(path));
+    return TheRules().SelectKeyPaths(P(path)).keys;
 }
 
 TEST_F(MergeRulesTest, TheFirstBadLineIsReported) {
@@ -81,14 +68,14 @@ TEST_F(MergeRulesTest, TheFirstBadLineIsReported) {
         {"[premerge]\nlegacyBlankPremergeBase x", "Invalid rule format at line 2"},
         {"[premerge]\nblank", "Invalid rule format missing action at line 2"},
     };
-    for (const auto& [text, error] : cases) EXPECT_EQ(ErrorOf(text), error + std::string("\n")) << text;
-    EXPECT_EQ(ErrorOf("[arrays] extra\nplain a\tb"), "none");
+    for (const auto& [text, error] : cases) EXPECT_EQ(Failure(text), error + std::string("\n")) << text;
+    EXPECT_EQ(Failure("[arrays] extra\nplain a\tb"), "none");
 }
 
 TEST_F(MergeRulesTest, RulesAboveABadLineStay) {
-    ErrorOf("[exclusions]\nexclude a\nbad a\nexclude b");
-    EXPECT_FALSE(MergeRules::IsMergeablePath(P("a")));
-    EXPECT_TRUE(MergeRules::IsMergeablePath(P("b")));
+    Failure("[exclusions]\nexclude a\nbad a\nexclude b");
+    EXPECT_FALSE(TheRules().IsMergeablePath(P("a")));
+    EXPECT_TRUE(TheRules().IsMergeablePath(P("b")));
 }
 
 TEST_F(MergeRulesTest, AStarIsExactlyOneElement) {
@@ -99,17 +86,12 @@ TEST_F(MergeRulesTest, AStarIsExactlyOneElement) {
 }
 
 TEST_F(MergeRulesTest, TheFirstMatchingListRuleChoosesTheKeys) {
-    Load("[arrays]\nset *.T.m id owner.fileID\nplain *.T.p x\nset *.T.* name");
+    Rules("[arrays]\nset *.T.m id owner.fileID\nplain *.T.p x\nset *.T.* name");
     EXPECT_EQ(Keys("1.T.m"), (std::vector<Path>{P("id"), P("owner.fileID")}));
     EXPECT_EQ(Keys("1.T.p"), std::vector<Path>{});
     EXPECT_EQ(Keys("1.T.q"), std::vector<Path>{P("name")});
     EXPECT_EQ(Keys("1.U.q"), std::vector<Path>{P("fileID")});
     EXPECT_EQ(Keys("_"), std::vector<Path>{P("_")});
-}
-
-TEST_F(MergeRulesTest, NothingIsMatchedByKeyBeforeRulesAreLoaded) {
-    EXPECT_TRUE(Keys("1.T.m").empty());
-    EXPECT_TRUE(Keys("_").empty());
 }
 
 TEST_F(MergeRulesTest, AKeyIsCompleteOrEmpty) {
@@ -129,48 +111,48 @@ TEST_F(MergeRulesTest, RepeatedKeysCannotBeLookedUp) {
 }
 
 TEST_F(MergeRulesTest, TheFirstMatchingExclusionDecides) {
-    Load("[exclusions]\ninclude x\nexclude x\n[premerge]\n[exclusions]\nexclude y\ninclude y");
-    EXPECT_TRUE(MergeRules::IsMergeablePath(P("x")));
-    EXPECT_FALSE(MergeRules::IsMergeablePath(P("y")));
-    EXPECT_TRUE(MergeRules::IsMergeablePath(P("z")));
+    Rules("[exclusions]\ninclude x\nexclude x\n[premerge]\n[exclusions]\nexclude y\ninclude y");
+    EXPECT_TRUE(TheRules().IsMergeablePath(P("x")));
+    EXPECT_FALSE(TheRules().IsMergeablePath(P("y")));
+    EXPECT_TRUE(TheRules().IsMergeablePath(P("z")));
 }
 
 TEST_F(MergeRulesTest, AConditionalExclusionNeedsAllItsFields) {
-    Load("[exclusions]\nexcludeIfContains x a b\nincludeIfContains x c\nexcludeIfContains x a\n");
-    const auto mergeable = [](const YAMLNode* node) { return MergeRules::IsMergeablePath(P("x"), node); };
+    Rules("[exclusions]\nexcludeIfContains x a b\nincludeIfContains x c\nexcludeIfContains x a\n");
+    const auto mergeable = [](const YAMLNode* node) { return TheRules().IsMergeablePath(P("x"), node); };
     EXPECT_FALSE(mergeable(Map({{"a", "1"}, {"b", "1"}, {"c", "1"}})));
     EXPECT_TRUE(mergeable(Map({{"a", "1"}, {"c", "1"}})));
     EXPECT_FALSE(mergeable(Map({{"a", "1"}})));
     EXPECT_TRUE(mergeable(Map({})));
-    EXPECT_TRUE(MergeRules::IsMergeablePath(P("x"))) << "conditional rules need a value";
+    EXPECT_TRUE(TheRules().IsMergeablePath(P("x"))) << "conditional rules need a value";
 }
 
 TEST_F(MergeRulesTest, TolerancesAreReadLikeStreamsReadNumbers) {
-    Load("[comparisons]\nfloat a\nfloat b 0.5\nfloat c 0.5 2x\nfloat d x\n");
-    const std::tuple<float, float> expected[] = {
-        {1.1920929e-07f, 1.1920929e-07f}, {0.5f, 0.5f}, {0.5f, 2.f}, {0.f, 0.f}};
-    ASSERT_EQ(MergeRules::s_ComparisonFieldPaths.size(), std::size(expected));
-    for (std::size_t i = 0; i < std::size(expected); ++i)
-        EXPECT_EQ(MergeRules::s_ComparisonFieldPaths[i].second, expected[i]) << i;
+    Rules("[comparisons]\nfloat a\nfloat b 0.5\nfloat c 0.5 2x\nfloat d x\n");
+    const std::tuple<const char*, float, float> expected[] = {
+        {"a", 1.1920929e-07f, 1.1920929e-07f}, {"b", 0.5f, 0.5f}, {"c", 0.5f, 2.f}, {"d", 0.f, 0.f}};
+    for (const auto& [path, relative, absolute] : expected) {
+        EXPECT_EQ(TheRules().FindTolerance(P(path))->relative, relative) << path;
+        EXPECT_EQ(TheRules().FindTolerance(P(path))->absolute, absolute) << path;
+    }
 }
 
 TEST_F(MergeRulesTest, BlanksInThePremergedBaseAreAskedFor) {
-    EXPECT_FALSE(MergeRules::CheckBlankPremergeBaseEnabled());
-    Load("[premerge]\n legacyBlankPremergeBase ");
-    EXPECT_TRUE(MergeRules::CheckBlankPremergeBaseEnabled());
+    EXPECT_FALSE(TheRules().CheckBlankPremergeBaseEnabled());
+    Rules("[premerge]\n legacyBlankPremergeBase ");
+    EXPECT_TRUE(TheRules().CheckBlankPremergeBaseEnabled());
 }
 
 TEST_F(MergeRulesTest, TheFactoryRulesKeyComponentsAndOverridesAndHideNothing) {
     std::ifstream file(OVRIN_SOURCE_DIR "/Src/Data/mergerules.txt");
     ASSERT_TRUE(file);
-    MergeRules::LoadSequenceUniqueKeys(file);
+    LoadSequenceUniqueKeys(file, TheRules());
     EXPECT_EQ(Values(Keys("1.GameObject.m_Component"), Map({{"component.fileID", "12"}})), "12;");
     const YAMLMapping* change = Map({{"target.fileID", "7"}, {"propertyPath", "m_Name"}, {"value", "x"}});
     for (const char* instance : {"1.PrefabInstance", "1.Prefab"})
         EXPECT_EQ(Values(Keys(instance + std::string(".m_Modification.m_Modifications")), change),
                   "7;m_Name;");
-    EXPECT_TRUE(MergeRules::s_ComparisonFieldPaths.empty());
+    EXPECT_TRUE(TheRules().Comparisons().empty());
 }
 
 } // namespace
-} // namespace ovrin_yaml

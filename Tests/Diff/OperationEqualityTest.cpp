@@ -1,4 +1,5 @@
-#include "Diff/MergeTreeVisitors.h"
+#include "Diff/MergeTreeCloneVisitor.h"
+#include "Diff/OperationComparison.h"
 #include "Support/Diffs.h"
 
 namespace {

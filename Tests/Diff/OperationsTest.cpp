@@ -1,4 +1,5 @@
 #include "Diff/CreateDiffOperation.h"
+#include "Diff/DiffContext.h"
 #include "Support/Diffs.h"
 #include "Support/Trees.h"
 
@@ -78,13 +79,14 @@ TEST_F(Operations, FloatsWithinTheToleranceAreUnchanged) {
 
 TEST_F(Operations, EqualHashesCountAsEqualContents) {
     using namespace trees;
-    Path path;
-    EXPECT_EQ(CreateDiffOperation(path, Block({{"a", "1"}}), Block({{"b", "2"}})), nullptr) << "never hashed";
+    DiffContext context(TheRules());
+    EXPECT_EQ(CreateDiffOperation(context, Block({{"a", "1"}}), Block({{"b", "2"}})), nullptr)
+        << "never hashed";
     YAMLMapping *a = Doc("a: 1"), *b = Doc("b: 2");
     b->m_Hash = a->m_Hash;
-    EXPECT_EQ(CreateDiffOperation(path, a, b), nullptr);
+    EXPECT_EQ(CreateDiffOperation(context, a, b), nullptr);
     YAMLMapping* repeated = Block({{"a", "1"}, {"a", "2"}});
-    EXPECT_EQ(ErrorOf([&] { CreateDiffOperation(path, Block({}), repeated); }),
+    EXPECT_EQ(ErrorOf([&] { CreateDiffOperation(context, Block({}), repeated); }),
               "Cannot perform this operation on a YAML file with duplicate keys")
         << "repeated keys must not vanish";
 }

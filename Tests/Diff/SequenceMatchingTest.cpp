@@ -1,3 +1,5 @@
+#include "Diff/SequenceMatching.h"
+#include "Diff/DiffContext.h"
 #include "Support/Diffs.h"
 #include "Support/Trees.h"
 
@@ -11,11 +13,11 @@ using namespace diffs;
 class SequenceMatching : public RulesTest {};
 
 std::string Match(const std::string& path, const std::string& base, const std::string& dest) {
-    return Describe(YAMLSequenceRemapper::FindMapping(PathOf(path), List(base), List(dest)));
+    return Describe(FindMapping(DiffContext(TheRules(), PathOf(path)), List(base), List(dest)));
 }
 
 std::string Generic(const std::string& base, const std::string& dest) {
-    return Describe(YAMLSequenceRemapper::FindGenericMapping(List(base), List(dest)));
+    return Describe(FindGenericMapping(List(base), List(dest)));
 }
 
 TEST_F(SequenceMatching, ByKeyElementsAreFollowedWhereverTheyGo) {
@@ -65,12 +67,6 @@ TEST_F(SequenceMatching, AKeyListIsMatchedByTheKeysThemselves) {
     EXPECT_EQ(Match("_", "[a, b, c]", "[c, a, d]"), "1 -1 0 >3");
     EXPECT_EQ(Match("1._", "[a, b, c]", "[c, a, d]"), "1 -1 0 ~>3") << "only the path _ alone is one";
     EXPECT_EQ(Match("_", "[a]", "[a]"), "=");
-}
-
-TEST_F(SequenceMatching, BeforeRulesAreLoadedEverythingIsMatchedByEquality) {
-    MergeRules::ResetForTests();
-    EXPECT_EQ(Match("_", "[a, b]", "[b, a]"), "1 0 ~>2");
-    EXPECT_EQ(Match("x", "[{fileID: 1}]", "[{fileID: 1, x: 1}]"), "-1 ~>1");
 }
 
 TEST_F(SequenceMatching, ByEqualityTheFirstEqualElementIsTaken) {
@@ -146,8 +142,7 @@ TEST_F(SequenceMatching, BucketsGiveWhatAScanGives) {
         YAMLSequence base, dest;
         for (std::size_t i = random() % 12; i > 0; --i) base.m_Items.push_back(AnyElement(random));
         for (std::size_t i = random() % 12; i > 0; --i) dest.m_Items.push_back(AnyElement(random));
-        ASSERT_EQ(Describe(YAMLSequenceRemapper::FindGenericMapping(&base, &dest)),
-                  NaiveGeneric(base.m_Items, dest.m_Items))
+        ASSERT_EQ(Describe(FindGenericMapping(&base, &dest)), NaiveGeneric(base.m_Items, dest.m_Items))
             << "seed " << seed << "\n"
             << Show(&base) << "\n"
             << Show(&dest);
@@ -160,7 +155,7 @@ TEST_F(SequenceMatching, LongListsOfEqualElementsAreNoTrouble) {
         base.m_Items.push_back(YAMLScalar::Lookup(std::to_string(i % 3)));
         dest.m_Items.push_back(YAMLScalar::Lookup(std::to_string((i + 1) % 3)));
     }
-    const auto* remapper = YAMLSequenceRemapper::FindGenericMapping(&base, &dest);
+    const auto* remapper = FindGenericMapping(&base, &dest);
     EXPECT_EQ(remapper->m_Mapping[0], 2);
     EXPECT_EQ(std::count(remapper->m_Mapping.begin(), remapper->m_Mapping.end(), -1), 1) << "one 0 too many";
 }
@@ -168,7 +163,7 @@ TEST_F(SequenceMatching, LongListsOfEqualElementsAreNoTrouble) {
 TEST_F(SequenceMatching, LenientMatchingSkipsWhatHasNoKeyAndTakesTheLastOfRepeats) {
     const std::vector<Path> keys = {PathOf("fileID")};
     const auto match = [&](const char* first, const char* second) {
-        return Describe(YAMLSequenceRemapper::FindIdMapping(keys, List(first), List(second)));
+        return Describe(FindIdMapping(keys, List(first), List(second)));
     };
     EXPECT_EQ(match("[x, {fileID: 1}, {fileID: 2}, {fileID: 1}]", "[{fileID: 1}, y, {fileID: 1}]"),
               "-1 2 -1 2 >3");

@@ -3,6 +3,7 @@
 // lost in lists and mappings that are merged inside; neither an empty list in place of an empty mapping nor
 // the flow flag of a container that stays is a difference.
 
+#include "Merge/DiffMerge.h"
 #include "SceneGenerator.h"
 #include "Support/Merges.h"
 #include "Support/RandomTrees.h"
@@ -24,9 +25,9 @@ protected:
     /// The body of `base` with a merge of two bodies applied; the records of conflicts go to `records`.
     static std::string MergeBodies(const YAMLMapping* base, const YAMLMapping* left, const YAMLMapping* right,
                                    std::string& records) {
-        RecordingConflictResolver resolver(ResolveBase);
-        const auto* merged = YAMLMappingDiff::Merge(YAMLMappingDiff::Diff(base, left),
-                                                    YAMLMappingDiff::Diff(base, right), resolver);
+        RecordingConflictResolver resolver(TheRules(), ResolveBase);
+        const auto* merged = MergeMappingDiffs(YAMLMappingDiff::Diff(TheRules(), base, left),
+                                               YAMLMappingDiff::Diff(TheRules(), base, right), resolver);
         YAMLMapping* result = AsMapping(base->Clone());
         merged->Apply(*result);
         records = Records(resolver, false);
@@ -40,7 +41,7 @@ TEST_F(Laws, ADiffAppliedToItsBaseGivesItsDestination) {
         const YAMLMapping* base = trees.Body();
         const YAMLMapping* dest = trees.Edited(base, {});
         YAMLMapping* result = AsMapping(base->Clone());
-        YAMLMappingDiff::Diff(base, dest)->Apply(*result);
+        YAMLMappingDiff::Diff(TheRules(), base, dest)->Apply(*result);
         ASSERT_EQ(Show(result), Show(dest)) << "seed " << seed << "\n" << Show(base);
     }
 }

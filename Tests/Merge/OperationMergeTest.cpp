@@ -1,3 +1,5 @@
+#include "Merge/OperationMerge.h"
+#include "Merge/DiffMerge.h"
 #include "Support/Merges.h"
 
 namespace {
@@ -9,6 +11,8 @@ class OperationMerge : public RulesTest {};
 /// Notes each question and answers with the left operation, if there is one.
 class AskedResolver final : public ConflictResolver {
 public:
+    AskedResolver() : ConflictResolver(TheRules()) {}
+
     std::string asked;
     const Operation* lastLeft = nullptr; // of the last question; the only operation of a one-sided one
     const Operation* lastRight = nullptr;
@@ -90,7 +94,7 @@ TEST_F(OperationMerge, EveryPairAsksItsOneQuestion) {
     for (std::size_t l = 0; l < 6; ++l) {
         for (std::size_t r = 0; r < 6; ++r) {
             AskedResolver resolver;
-            const Operation* result = Operation::Merge(lefts[l], rights[r], resolver);
+            const Operation* result = MergeOperations(lefts[l], rights[r], resolver);
             EXPECT_EQ(resolver.asked, expected[l][r]) << l << " " << r;
             EXPECT_EQ(result, resolver.lastLeft);
             const bool right = resolver.asked.ends_with('>');
@@ -104,7 +108,7 @@ TEST_F(OperationMerge, EveryPairAsksItsOneQuestion) {
 /// The questions of the merge of two diffs, with their paths.
 std::string Questions(const std::string& base, const std::string& left, const std::string& right) {
     AskedResolver resolver;
-    YAMLMappingDiff::Merge(DiffOf(base, left), DiffOf(base, right), resolver);
+    MergeMappingDiffs(DiffOf(base, left), DiffOf(base, right), resolver);
     EXPECT_TRUE(resolver.m_Path.Elements().empty());
     return resolver.asked;
 }
@@ -125,9 +129,9 @@ TEST_F(OperationMerge, OneSidesKeyOrderIsTakenWhereTheOtherHasNone) {
     AskedResolver resolver;
     const YAMLMappingDiff none;
     const YAMLMappingDiff* moved = DiffOf("a: 1\nb: 2", "b: 2\na: 1");
-    EXPECT_EQ(YAMLMappingDiff::Merge(moved, &none, resolver)->m_KeyOrder, moved->m_KeyOrder);
-    EXPECT_EQ(YAMLMappingDiff::Merge(&none, moved, resolver)->m_KeyOrder, moved->m_KeyOrder);
-    EXPECT_EQ(YAMLMappingDiff::Merge(&none, &none, resolver)->m_KeyOrder, nullptr);
+    EXPECT_EQ(MergeMappingDiffs(moved, &none, resolver)->m_KeyOrder, moved->m_KeyOrder);
+    EXPECT_EQ(MergeMappingDiffs(&none, moved, resolver)->m_KeyOrder, moved->m_KeyOrder);
+    EXPECT_EQ(MergeMappingDiffs(&none, &none, resolver)->m_KeyOrder, nullptr);
 }
 
 } // namespace

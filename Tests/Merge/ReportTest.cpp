@@ -57,7 +57,7 @@ TEST_F(Report, WhatWasNoConflictIsDescribed) {
 }
 
 TEST_F(Report, ACycleIsOneLineThatEndsInABlank) {
-    RecordingConflictResolver resolver(ResolveBase);
+    RecordingConflictResolver resolver(TheRules(), ResolveBase);
     resolver.OnTransformCycleDetected(YAMLScalar::Lookup("12"), *Doc("Transform: {m_Father: {fileID: 13}}"));
     std::ostringstream stream;
     OutputConflictRecords(stream, resolver, false);
@@ -66,7 +66,7 @@ TEST_F(Report, ACycleIsOneLineThatEndsInABlank) {
 
 /// The decisions in a file, as a report writes them, or what is thrown.
 std::string Decisions(const std::string& file) {
-    RecordingConflictResolver resolver(ResolveBase);
+    RecordingConflictResolver resolver(TheRules(), ResolveBase);
     resolver.SetResolveMethodForPaths({{PathOf("old"), ResolveLeft}});
     std::istringstream in(file);
     std::ostringstream out;

@@ -1,8 +1,12 @@
+#include "Diff/RulesReader.h"
+#include "Merge/DiffMerge.h"
 #include "Support/Merges.h"
 
 #include <cctype>
+#include <set>
 #include <sstream>
 #include <sys/resource.h>
+#include <thread>
 
 namespace {
 
@@ -154,9 +158,9 @@ TEST_F(Resolver, AdditionsNestedDeeplyTakeNoMoreMemoryThanFlatOnes) {
             return text + last + end;
         };
         const YAMLMappingDiff *left = DiffOf("", nested("1")), *right = DiffOf("", nested("2"));
-        RecordingConflictResolver resolver(ResolveLeft);
+        RecordingConflictResolver resolver(TheRules(), ResolveLeft);
         const auto before = peak();
-        YAMLMappingDiff::Merge(left, right, resolver);
+        MergeMappingDiffs(left, right, resolver);
         EXPECT_TRUE(resolver.HasPendingConflicts());
         EXPECT_LT(peak() - before, 400 << 10) << "with shared paths and no diffs some tens of MB";
     }
@@ -184,8 +188,8 @@ TEST_F(Resolver, BlanksStandForConflictsWithoutTouchingTheSides) {
     const YAMLMappingDiff* left = DiffOf("a: 1\nb: {x: 1}", "a: 2\nb: {x: 2, y: [3]}");
     const YAMLMappingDiff* right = DiffOf("a: 1\nb: {x: 1}", "b: {x: 3}\na: 3");
     const std::string before = Describe(left);
-    RecordingConflictResolver resolver(ResolveBlank);
-    EXPECT_EQ(Describe(YAMLMappingDiff::Merge(left, right, resolver)), "a change ; b! (x change ; y add [])");
+    RecordingConflictResolver resolver(TheRules(), ResolveBlank);
+    EXPECT_EQ(Describe(MergeMappingDiffs(left, right, resolver)), "a change ; b! (x change ; y add [])");
     EXPECT_EQ(Describe(left), before);
     EXPECT_TRUE(resolver.HasPendingConflicts());
 }
@@ -196,8 +200,8 @@ TEST_F(Resolver, AMergeCanBeDoneAgain) {
     const std::string before = Describe(left, true) + Describe(right, true);
     std::string first;
     for (int time = 0; time < 2; ++time) {
-        RecordingConflictResolver resolver(ResolveLeft);
-        const std::string merged = Describe(YAMLMappingDiff::Merge(left, right, resolver), true);
+        RecordingConflictResolver resolver(TheRules(), ResolveLeft);
+        const std::string merged = Describe(MergeMappingDiffs(left, right, resolver), true);
         if (time == 0) first = merged;
         EXPECT_EQ(merged, first);
     }
@@ -205,8 +209,8 @@ TEST_F(Resolver, AMergeCanBeDoneAgain) {
 }
 
 TEST_F(Resolver, ALostDependencyMakesItsRemovalPending) {
-    RecordingConflictResolver resolver(ResolveBase);
-    YAMLMappingDiff::Merge(DiffOf("1: x\n2: y", "2: y"), DiffOf("1: x\n2: y", "1: x\n2: y"), resolver);
+    RecordingConflictResolver resolver(TheRules(), ResolveBase);
+    MergeMappingDiffs(DiffOf("1: x\n2: y", "2: y"), DiffOf("1: x\n2: y", "1: x\n2: y"), resolver);
     const auto* unknown = YAMLScalar::Lookup("7");
     resolver.OnComponentDependencyConflict({unknown, YAMLScalar::null, ConflictLeftRemoves});
     resolver.OnComponentDependencyConflict({YAMLScalar::null, YAMLScalar::null, ConflictLeftRemoves});
@@ -218,7 +222,7 @@ TEST_F(Resolver, ALostDependencyMakesItsRemovalPending) {
 }
 
 TEST_F(Resolver, PathsNoteTheTransformsWhoseParentIsVisited) {
-    RecordingConflictResolver resolver(ResolveBase);
+    RecordingConflictResolver resolver(TheRules(), ResolveBase);
     const auto visit = [&](const std::string& path) {
         for (const YAMLScalar* element : PathOf(path)) resolver.PushPath(element);
         resolver.m_Path = {};
@@ -240,15 +244,15 @@ TEST_F(Resolver, TheSidePickerTakesItsSideAndMergesMappingsOnly) {
     const YAMLMappingDiff* left = DiffOf(kBase, "a: 2\nc: {x: 2, fileID: 1}\nl: [1, 2]\nn: 1\nz: 1");
     const YAMLMappingDiff* right = DiffOf(kBase, "a: 2\nb: 3\nc: {x: 1, fileID: 3}\nl: [3, 1]\nn: 2\nz: 9");
     const auto merge = [&](MergeResolve side) {
-        SidePickingConflictResolver resolver(side);
+        SidePickingConflictResolver resolver(TheRules(), side);
         YAMLMapping* body = Doc(kBase);
-        YAMLMappingDiff::Merge(left, right, resolver)->Apply(*body);
+        MergeMappingDiffs(left, right, resolver)->Apply(*body);
         return Show(body);
     };
     EXPECT_EQ(merge(ResolveLeft), "{a: 2, c: {x: 2, fileID: 3}, l: [1, 2], n: 1, z: 9}");
     EXPECT_EQ(merge(ResolveRight), "{a: 2, b: 3, c: {x: 2, fileID: 3}, l: [3, 1], n: 2, z: 9}");
     for (const MergeResolve side : {ResolveBase, ResolveMerged, ResolveNone})
-        EXPECT_EQ(ErrorOf([&] { SidePickingConflictResolver resolver(side); }),
+        EXPECT_EQ(ErrorOf([&] { SidePickingConflictResolver resolver(TheRules(), side); }),
                   "SidePickingConflictResolver only accepts side left or right");
 }
 
@@ -263,14 +267,42 @@ TEST_F(Resolver, TheStrictOneThrowsWhereBothSidesTouchedAKey) {
         {"a: 1\nb: 1", "a: 2\nb: 1", "a: 1\nb: 2", "none"}};
     for (const auto& [base, left, right, error] : cases) {
         const YAMLMappingDiff *l = DiffOf(base, left), *r = DiffOf(base, right);
-        ExceptionConflictResolver resolver;
-        EXPECT_EQ(ErrorOf([&] { YAMLMappingDiff::Merge(l, r, resolver); }), error);
+        ExceptionConflictResolver resolver(TheRules());
+        EXPECT_EQ(ErrorOf([&] { MergeMappingDiffs(l, r, resolver); }), error);
     }
-    ExceptionConflictResolver resolver;
+    ExceptionConflictResolver resolver(TheRules());
     resolver.m_Path = PathOf("1.T.n");
     AddOperation add(Doc("\n\na: 1"), true);
     EXPECT_EQ(ErrorOf([&] { resolver.OnSameValueAdded(&add, &add); }),
               "Conflict for same value added 1.T.n at line 2");
+}
+
+/// The merge of one scene by the rules of a file, again and again; what comes out, each result once.
+std::set<std::string> MergesBy(const std::string& file) {
+    static const char* const kScene = "f: 1\nl: [{id: 1, x: 1}, {id: 2}]\nm:\n  a: 1\n  b: 1";
+    MergeRules rules;
+    std::istringstream stream(file);
+    LoadSequenceUniqueKeys(stream, rules);
+    const auto diff = [&](const char* side) { return YAMLMappingDiff::Diff(rules, Doc(kScene), Doc(side)); };
+    std::set<std::string> results;
+    for (int time = 0; time < 300; ++time) {
+        RecordingConflictResolver resolver(rules, ResolveBase);
+        YAMLMapping* body = Doc(kScene);
+        MergeMappingDiffs(diff("f: 1.4\nl: [{id: 2}, {id: 1, x: 1}]\nm:\n  a: 2\n  b: 1"),
+                          diff("f: 1\nl: [{id: 1, x: 2}, {id: 2}]\nm:\n  a: 1\n  b: 2"), resolver)
+            ->Apply(*body);
+        results.insert(Show(body));
+    }
+    return results;
+}
+
+TEST_F(Resolver, MergesUnderDifferentRulesDoNotKnowOfEachOther) {
+    std::set<std::string> byNone, bySome;
+    std::thread none([&] { byNone = MergesBy(""); });
+    bySome = MergesBy("[arrays]\nset l id\n[exclusions]\nexclude m\n[comparisons]\nfloat f 1 1");
+    none.join();
+    EXPECT_EQ(byNone, std::set<std::string>{"{f: 1.4, l: [{id: 1, x: 2}, {id: 2}], m: {a: 2, b: 2}}"});
+    EXPECT_EQ(bySome, std::set<std::string>{"{f: 1, l: [{id: 2}, {id: 1, x: 2}], m: {a: 1, b: 1}}"});
 }
 
 } // namespace

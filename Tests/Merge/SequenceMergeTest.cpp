@@ -1,4 +1,7 @@
-#include "Diff/MergeTreeVisitors.h"
+#include "Merge/SequenceMerge.h"
+#include "Diff/OperationComparison.h"
+#include "Merge/OperationMerge.h"
+#include "Merge/RemapperMerge.h"
 #include "Support/Merges.h"
 
 #include <map>
@@ -70,9 +73,7 @@ TEST_F(SequenceMerge, TakesAnyTwoMaps) {
         }
     for (const YAMLSequenceRemapper& left : maps) {
         for (const YAMLSequenceRemapper& right : maps) {
-            YAMLSequenceRemapper *leftToMerged, *rightToMerged;
-            const auto* merged =
-                YAMLSequenceRemapper::Merge(&left, &right, leftToMerged, rightToMerged, &left < &right);
+            const auto [merged, leftToMerged, rightToMerged] = MergeRemappers(&left, &right, &left < &right);
             EXPECT_EQ(merged->m_Mapping.size(), left.m_Mapping.size());
             for (const auto* map :
                  std::initializer_list<const YAMLSequenceRemapper*>{merged, leftToMerged, rightToMerged})
@@ -168,7 +169,7 @@ void SettleCommonAdditions(Entries& left, Entries& right, Numbering& rightNumber
             });
         if (match == right.rend()) continue;
         resolver.PushPath(IndexScalar(index));
-        left[index] = Operation::Merge(operation, match->second, resolver);
+        left[index] = MergeOperations(operation, match->second, resolver);
         resolver.PopPath();
         matched.insert(match->first);
     }
@@ -233,8 +234,8 @@ std::string NaiveMerge(const ChangeSequenceOperation* leftOne, const ChangeSeque
     YAMLSequenceDiff diff;
     for (const int index : indexes) {
         resolver.PushPath(IndexScalar(index));
-        const Operation* operation = Operation::Merge(left.count(index) ? left[index] : nullptr,
-                                                      right.count(index) ? right[index] : nullptr, resolver);
+        const Operation* operation = MergeOperations(left.count(index) ? left[index] : nullptr,
+                                                     right.count(index) ? right[index] : nullptr, resolver);
         resolver.PopPath();
         if (operation)
             diff.Add(index, operation);
@@ -292,9 +293,9 @@ TEST_F(SequenceMerge, IsWhatItsStepsSay) {
         const auto* l = As<ChangeSequenceOperation>(OperationOf("l", base, Show(left)));
         const auto* r = As<ChangeSequenceOperation>(OperationOf("l", base, Show(right)));
         if (!l || !r) continue;
-        RecordingConflictResolver resolver(ResolveBase), naiveResolver(ResolveBase);
+        RecordingConflictResolver resolver(TheRules(), ResolveBase), naiveResolver(TheRules(), ResolveBase);
         resolver.m_Path = naiveResolver.m_Path = PathOf("l");
-        const std::string merged = Describe(ChangeSequenceOperation::Merge(l, r, resolver, true));
+        const std::string merged = Describe(MergeSequenceChanges(l, r, resolver, true));
         ASSERT_EQ(merged, NaiveMerge(l, r, naiveResolver)) << "seed " << seed << "\n"
                                                            << base << "\n"
                                                            << Show(left) << "\n"

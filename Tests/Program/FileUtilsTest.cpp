@@ -23,7 +23,7 @@ public:
     const std::string path;
 };
 
-std::string ErrorOf(void (*act)(const std::string&), const std::string& path) {
+template <class Act> std::string ErrorOf(const Act& act, const std::string& path) {
     try {
         act(path);
     } catch (const ovrin_yaml::YAMLError& error) {

@@ -12,7 +12,8 @@ namespace {
 std::string Repaired(const std::string& merged, const std::string& left = "", const std::string& right = "") {
     Scene m(merged), l(left), r(right);
     const std::string failure = FailureOf([&] {
-        RecordingConflictResolver resolver(ResolveBase);
+        const MergeRules rules;
+        RecordingConflictResolver resolver(rules, ResolveBase);
         PostProcessMergeOnly(m.Root(), l.Root(), r.Root(), resolver);
     });
     return failure.empty() ? m.Text() : failure;
@@ -68,13 +69,12 @@ TEST(PostProcess, RepeatedKeysAnywhereAreNoticed) {
 TEST(PostProcess, SidesStayAsTheyAre) {
     const std::string side = Linked("9") + "1107 &3 AnimatorStateMachine: {m_StateMachineTransitions: []}\n";
     Scene merged(side), left(side + kPrefab), right(side);
-    RecordingConflictResolver resolver(ResolveBase);
-    bool hasConflicts = true;
-    PostProcess(merged.Root(), left.Root(), right.Root(), resolver, hasConflicts);
+    const MergeRules rules;
+    RecordingConflictResolver resolver(rules, ResolveBase);
+    EXPECT_FALSE(PostProcess(merged.Root(), left.Root(), right.Root(), {}, resolver));
     EXPECT_EQ(left.Text(), side + kPrefab);
     EXPECT_EQ(right.Text(), side);
     EXPECT_EQ(merged.Text(), "1107 &3 AnimatorStateMachine: {m_StateMachineTransitions: {}}\n");
-    EXPECT_FALSE(hasConflicts);
 }
 
 } // namespace

@@ -16,7 +16,7 @@ std::string Child(const std::string& id, const std::string& parent) {
 struct Check {
     Check(const std::string& merged, const std::vector<std::string>& touched, Scene left = "",
           MergeResolve byDefault = ResolveBase)
-        : scene(merged), resolver(byDefault) {
+        : scene(merged), resolver(rules, byDefault) {
         for (const std::string& id : touched) {
             for (const YAMLScalar* key : {Id(id), Id("Transform"), Id("m_Father")}) resolver.PushPath(key);
             for (int i = 0; i < 3; ++i) resolver.PopPath();
@@ -30,6 +30,7 @@ struct Check {
     }
 
     Scene scene;
+    const MergeRules rules;
     RecordingConflictResolver resolver;
     std::string failure;
     std::string cycles; // the ids reported

@@ -1,10 +1,17 @@
 #include "Support/Diffs.h"
 
 #include "Diff/CreateDiffOperation.h"
+#include "Diff/DiffContext.h"
+#include "Diff/RulesReader.h"
 
 #include <sstream>
 
 namespace diffs {
+
+MergeRules& TheRules() {
+    static MergeRules rules;
+    return rules;
+}
 
 std::string Describe(const YAMLSequenceRemapper* remapper) {
     if (!remapper) return "=";
@@ -49,20 +56,15 @@ std::string Describe(const Operation* operation) {
 }
 
 const Operation* OperationOf(const std::string& path, const std::string& base, const std::string& dest) {
-    Path elements = PathOf(path);
+    DiffContext context(TheRules(), PathOf(path));
     const auto node = [](const std::string& text) { return text.empty() ? nullptr : Node(text); };
-    return CreateDiffOperation(elements, node(base), node(dest));
-}
-
-RulesTest::RulesTest() {
-    MergeRules::ResetForTests();
-    MergeRules::Initialize();
+    return CreateDiffOperation(context, node(base), node(dest));
 }
 
 void RulesTest::Rules(const std::string& text) {
-    MergeRules::ResetForTests();
+    TheRules() = {};
     std::istringstream stream(text);
-    MergeRules::LoadSequenceUniqueKeys(stream);
+    LoadSequenceUniqueKeys(stream, TheRules());
 }
 
 } // namespace diffs

@@ -21,6 +21,9 @@ namespace diffs {
 
 using namespace documents;
 
+/// The rules of the test under way: those of RulesTest::Rules, or no more than the default keys.
+MergeRules& TheRules();
+
 std::string Describe(const Operation* operation);
 std::string Describe(const YAMLSequenceRemapper* remapper);
 std::string Describe(const YAMLSequenceDiff* diff);
@@ -28,18 +31,18 @@ std::string Describe(const YAMLSequenceDiff* diff);
 std::string Describe(const YAMLMappingDiff* diff, bool withKeyOrder = false);
 
 inline const YAMLMappingDiff* DiffOf(const std::string& base, const std::string& dest) {
-    const YAMLMappingDiff* diff = YAMLMappingDiff::Diff(Doc(base), Doc(dest));
+    const YAMLMappingDiff* diff = YAMLMappingDiff::Diff(TheRules(), Doc(base), Doc(dest));
     EXPECT_EQ(CheckDiff(*diff, DiffOrigin::Trees), "");
     return diff;
 }
 /// One operation, from one text to another at a path.
 const Operation* OperationOf(const std::string& path, const std::string& base, const std::string& dest);
 
-/// Tests that need rules begin with the default keys and no other rule, and leave none behind.
+/// Tests that may have rules of their own.
 class RulesTest : public testing::Test {
 protected:
-    RulesTest();
-    ~RulesTest() override { MergeRules::ResetForTests(); }
+    RulesTest() { TheRules() = {}; }
+    /// In place of earlier ones.
     static void Rules(const std::string& text);
 };
 

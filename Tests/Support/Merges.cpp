@@ -1,4 +1,5 @@
 #include "Support/Merges.h"
+#include "Merge/DiffMerge.h"
 
 #include "Diff/CheckDiff.h"
 #include "Merge/ConflictReport.h"
@@ -21,12 +22,12 @@ std::string Records(const RecordingConflictResolver& resolver, bool withMerged) 
 }
 
 MergeOutput Merge(const MergeInput& input) {
-    RecordingConflictResolver resolver(input.byDefault);
+    RecordingConflictResolver resolver(TheRules(), input.byDefault);
     std::istringstream decisions("Conflict handling:\n" + input.decisions);
     resolver.SetResolveMethodForPaths(ReadDecisions(decisions));
     const YAMLMappingDiff* left = DiffOf(input.base, input.left);
     const YAMLMappingDiff* right = DiffOf(input.base, input.right);
-    const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(left, right, resolver);
+    const YAMLMappingDiff* merged = MergeMappingDiffs(left, right, resolver);
     EXPECT_EQ(CheckDiff(*merged, DiffOrigin::Sides), "");
     YAMLMapping* body = Doc(input.base);
     merged->Apply(*body);

@@ -1,9 +1,9 @@
 #include "Diff/CreateDiffOperation.h"
 
-#include "Diff/MergeRules.h"
+#include "Diff/DiffContext.h"
+#include "Diff/SequenceMatching.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
-#include "Diff/YAMLSequenceRemapper.h"
 #include "Values/YAMLMapping.h"
 #include "Values/YAMLSequence.h"
 
@@ -21,7 +21,8 @@ void RequireNormalState(const YAMLNode* node) {
 
 /// Whether two floats differ by less than the larger of the two bounds, in single precision throughout. A
 /// bound that is not greater than zero switches the tolerance off.
-bool WithinTolerance(float a, float b, float relative, float absolute) {
+bool WithinTolerance(float a, float b, const Tolerance& tolerance) {
+    const auto [relative, absolute] = tolerance;
     if (!(relative > 0) || !(absolute > 0)) return false;
     if (a == b) return true;
     const float magnitude = std::min(std::fabs(a) + std::fabs(b), std::numeric_limits<float>::max());
@@ -34,13 +35,9 @@ bool IsMergeableByStyle(const YAMLMapping* base, const YAMLMapping* dest) {
     return base->HasKey(YAMLScalar::fileID) || dest->HasKey(YAMLScalar::fileID);
 }
 
-bool IsMergeableMapping(const Path& path, const YAMLMapping* base, const YAMLMapping* dest) {
-    for (const auto& rule : MergeRules::s_DiffExclusionFieldPaths)
-        if (MergeRules::MatchesPath(rule.path, path) &&
-            !MergeRules::GetUniqueMappingValues(rule.fieldPaths, dest).empty())
-            return rule.mergeable;
-    for (const auto& [pattern, mergeable] : MergeRules::s_ExclusionFieldPaths)
-        if (MergeRules::MatchesPath(pattern, path)) return mergeable;
+bool IsMergeableMapping(const DiffContext& context, const YAMLMapping* base, const YAMLMapping* dest) {
+    if (const auto mergeable = context.rules.FindExclusion(context.path, dest)) return *mergeable;
+    if (const auto mergeable = context.rules.FindExclusion(context.path)) return *mergeable;
     return IsMergeableByStyle(base, dest);
 }
 
@@ -49,38 +46,34 @@ bool HasNewScript(const Path& path, const YAMLMappingDiff* diff) {
     return path.size() == 2 && path[1] == YAMLScalar::monoBehaviour && diff->HasKey(YAMLScalar::mScript);
 }
 
-const Operation* DiffMappings(Path& path, const YAMLMapping* base, const YAMLMapping* dest) {
-    YAMLMappingDiff* diff = YAMLMappingDiff::Diff(path, base, dest);
+const Operation* DiffMappings(DiffContext& context, const YAMLMapping* base, const YAMLMapping* dest) {
+    YAMLMappingDiff* diff = YAMLMappingDiff::Diff(context, base, dest);
     if (diff->Entries().empty()) {
         YAMLAlloc<YAMLMappingDiff>::free(diff);
         return nullptr;
     }
-    const bool mergeable = IsMergeableMapping(path, base, dest) && !HasNewScript(path, diff);
+    const bool mergeable = IsMergeableMapping(context, base, dest) && !HasNewScript(context.path, diff);
     return YAMLAlloc<ChangeMappingOperation>::create(diff, mergeable);
 }
 
-const Operation* DiffSequences(Path& path, const YAMLSequence* base, const YAMLSequence* dest) {
-    const YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindMapping(path, base, dest);
+const Operation* DiffSequences(DiffContext& context, const YAMLSequence* base, const YAMLSequence* dest) {
+    const YAMLSequenceRemapper* remapper = FindMapping(context, base, dest);
     YAMLSequenceDiff* diff =
-        remapper ? YAMLSequenceDiff::Diff(path, remapper->Arrange(base->m_Items), dest->m_Items)
-                 : YAMLSequenceDiff::Diff(path, base->m_Items, dest->m_Items);
+        remapper ? YAMLSequenceDiff::Diff(context, remapper->Arrange(base->m_Items), dest->m_Items)
+                 : YAMLSequenceDiff::Diff(context, base->m_Items, dest->m_Items);
     if (!remapper && diff->Entries().empty()) {
         YAMLAlloc<YAMLSequenceDiff>::free(diff);
         return nullptr;
     }
     return YAMLAlloc<ChangeSequenceOperation>::create(diff, remapper,
-                                                      MergeRules::IsMergeablePath(path, dest));
+                                                      context.rules.IsMergeablePath(context.path, dest));
 }
 
 } // namespace
 
-bool ScalarsDiffer(const Path& path, const YAMLScalar* base, const YAMLScalar* dest) {
-    for (const auto& [pattern, bounds] : MergeRules::s_ComparisonFieldPaths) {
-        if (!MergeRules::MatchesPath(pattern, path)) continue;
-        const auto [relative, absolute] = bounds;
-        return !WithinTolerance(base->GetFloatValue(), dest->GetFloatValue(), relative, absolute);
-    }
-    return true;
+bool ScalarsDiffer(const DiffContext& context, const YAMLScalar* base, const YAMLScalar* dest) {
+    const std::optional<Tolerance> tolerance = context.rules.FindTolerance(context.path);
+    return !tolerance || !WithinTolerance(base->GetFloatValue(), dest->GetFloatValue(), *tolerance);
 }
 
 bool CountAsEqual(const YAMLNode* base, const YAMLNode* dest) {
@@ -94,20 +87,21 @@ bool CountAsEqual(const YAMLNode* base, const YAMLNode* dest) {
     return true;
 }
 
-const Operation* CreateDiffOperation(Path& path, const YAMLNode* base, const YAMLNode* dest) {
+const Operation* CreateDiffOperation(DiffContext& context, const YAMLNode* base, const YAMLNode* dest) {
     if (base == dest) return nullptr;
-    if (!dest) return YAMLAlloc<RemoveOperation>::create(MergeRules::IsMergeablePath(path, base));
-    if (!base) return YAMLAlloc<AddOperation>::create(dest, MergeRules::IsMergeablePath(path, dest));
+    if (!dest) return YAMLAlloc<RemoveOperation>::create(context.rules.IsMergeablePath(context.path, base));
+    if (!base)
+        return YAMLAlloc<AddOperation>::create(dest, context.rules.IsMergeablePath(context.path, dest));
     if (CountAsEqual(base, dest)) return nullptr;
     if (base->GetKind() != dest->GetKind()) return YAMLAlloc<ChangeOperation>::create(dest);
     switch (base->GetKind()) {
     case YAMLNode::Kind::Scalar:
-        if (!ScalarsDiffer(path, AsScalar(base), AsScalar(dest))) return nullptr;
+        if (!ScalarsDiffer(context, AsScalar(base), AsScalar(dest))) return nullptr;
         return YAMLAlloc<ChangeOperation>::create(dest);
     case YAMLNode::Kind::Mapping:
-        return DiffMappings(path, AsMapping(base), AsMapping(dest));
+        return DiffMappings(context, AsMapping(base), AsMapping(dest));
     case YAMLNode::Kind::Sequence:
-        return DiffSequences(path, AsSequence(base), AsSequence(dest));
+        return DiffSequences(context, AsSequence(base), AsSequence(dest));
     }
     throw YAMLError("Cannot diff unknown yaml value");
 }

@@ -1,4 +1,4 @@
-// The text of diffs: the Output methods of the operations and of the two kinds of diff.
+#include "Diff/DiffText.h"
 
 #include "Diff/Operation.h"
 #include "Diff/YAMLDiffOutput.h"
@@ -42,19 +42,9 @@ void OutputMoves(YAMLDiffOutput& output, const YAMLSequenceRemapper& remapper, c
     output.Unindent();
 }
 
-} // namespace
-
-void RemoveOperation::Output(YAMLDiffOutput& output) const {
-    output << "delete" << endl;
-}
-
-void ChangeOperation::Output(YAMLDiffOutput& output) const {
-    output << "change to " << GetYAMLString(*m_Value) << endl;
-}
-
-void AddOperation::Output(YAMLDiffOutput& output) const {
+void OutputAddition(const AddOperation& add, YAMLDiffOutput& output) {
     output << "add as ";
-    const std::string text = TextOf(m_Value);
+    const std::string text = TextOf(add.m_Value);
     if (text.find('\n') == std::string::npos)
         output << text;
     else
@@ -62,39 +52,58 @@ void AddOperation::Output(YAMLDiffOutput& output) const {
     output << endl;
 }
 
-void ChangeMappingOperation::Output(YAMLDiffOutput& output) const {
+void OutputMappingChange(const ChangeMappingOperation& change, YAMLDiffOutput& output) {
     output << endl;
     output.Indent();
-    m_Diff->Output(output);
+    OutputDiff(*change.m_Diff, output);
     output.Unindent();
 }
 
-void ChangeSequenceOperation::Output(YAMLDiffOutput& output) const {
+void OutputEntries(const YAMLSequenceDiff& diff, YAMLDiffOutput& output) {
+    if (diff.Entries().empty()) return;
+    output.Indent();
+    for (const auto& [index, operation] : diff.Entries()) {
+        output << "index " << static_cast<std::size_t>(index) << " ";
+        OutputOperation(*operation, output);
+    }
+    output.Unindent();
+}
+
+void OutputSequenceChange(const ChangeSequenceOperation& change, YAMLDiffOutput& output) {
     output << "[";
-    if (m_Remapper) output << m_Remapper->m_Mapping.size();
+    if (change.m_Remapper) output << change.m_Remapper->m_Mapping.size();
     output << "]" << endl;
-    if (m_Remapper) OutputMoves(output, *m_Remapper, *m_Diff);
-    m_Diff->Output(output);
+    if (change.m_Remapper) OutputMoves(output, *change.m_Remapper, *change.m_Diff);
+    OutputEntries(*change.m_Diff, output);
 }
 
-void YAMLMappingDiff::Output(YAMLDiffOutput& output) const {
-    if (m_Entries.empty()) return;
+} // namespace
+
+void OutputDiff(const YAMLMappingDiff& diff, YAMLDiffOutput& output) {
+    if (diff.Entries().empty()) return;
     output.Indent();
-    for (const Entry& entry : m_Entries) {
-        output << entry.key->Value() << " ";
-        entry.operation->Output(output);
+    for (const auto& [key, operation] : diff.Entries()) {
+        output << key->Value() << " ";
+        OutputOperation(*operation, output);
     }
     output.Unindent();
 }
 
-void YAMLSequenceDiff::Output(YAMLDiffOutput& output) const {
-    if (m_Entries.empty()) return;
-    output.Indent();
-    for (const Entry& entry : m_Entries) {
-        output << "index " << static_cast<std::size_t>(entry.index) << " ";
-        entry.operation->Output(output);
+void OutputOperation(const Operation& operation, YAMLDiffOutput& output) {
+    switch (operation.GetKind()) {
+    case Operation::Kind::Remove:
+        output << "delete" << endl;
+        break;
+    case Operation::Kind::Change:
+        output << "change to " << GetYAMLString(*As<ChangeOperation>(&operation)->m_Value) << endl;
+        break;
+    case Operation::Kind::Add:
+        return OutputAddition(*As<AddOperation>(&operation), output);
+    case Operation::Kind::ChangeMapping:
+        return OutputMappingChange(*As<ChangeMappingOperation>(&operation), output);
+    case Operation::Kind::ChangeSequence:
+        return OutputSequenceChange(*As<ChangeSequenceOperation>(&operation), output);
     }
-    output.Unindent();
 }
 
 } // namespace ovrin_yaml

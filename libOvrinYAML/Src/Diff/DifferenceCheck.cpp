@@ -1,14 +1,14 @@
 #include "Diff/DifferenceCheck.h"
 
 #include "Diff/ChildPairs.h"
-#include "Diff/MergeRules.h"
-#include "Diff/YAMLSequenceRemapper.h"
+#include "Diff/SequenceMatching.h"
 
 #include <functional>
 
 namespace ovrin_yaml {
 
-DifferenceCheck::DifferenceCheck() : m_LongestRule(MergeRules::LongestPath()) {}
+DifferenceCheck::DifferenceCheck(const MergeRules& rules)
+    : m_Context(rules), m_LongestRule(rules.LongestPath()) {}
 
 std::size_t DifferenceCheck::PairHash::operator()(const Pair& pair) const {
     const std::hash<const YAMLNode*> hash;
@@ -27,7 +27,7 @@ bool DifferenceCheck::Differ(const YAMLSequence* base, const YAMLSequence* dest)
 template <class Container>
 bool DifferenceCheck::ChildrenDiffer(const Container& base, const Container& dest) {
     bool differ = false;
-    ForEachChildPair(m_Path, base, dest,
+    ForEachChildPair(m_Context, base, dest,
                      [&](const auto&, const YAMLNode* baseChild, const YAMLNode* destChild) {
                          if (DifferAtPath(baseChild, destChild)) differ = true;
                      });
@@ -40,8 +40,8 @@ bool DifferenceCheck::DifferAtPath(const YAMLNode* base, const YAMLNode* dest) {
         return true;
     }
     if (base->GetKind() != dest->GetKind()) return true;
-    if (const YAMLScalar* scalar = AsScalar(base)) return ScalarsDiffer(m_Path, scalar, AsScalar(dest));
-    if (m_Path.size() <= m_LongestRule) return ContainersDiffer(base, dest);
+    if (const YAMLScalar* scalar = AsScalar(base)) return ScalarsDiffer(m_Context, scalar, AsScalar(dest));
+    if (m_Context.path.size() <= m_LongestRule) return ContainersDiffer(base, dest);
     const auto known = m_Known.find({base, dest});
     if (known != m_Known.end()) return known->second;
     const bool differ = ContainersDiffer(base, dest);
@@ -56,7 +56,7 @@ bool DifferenceCheck::ContainersDiffer(const YAMLNode* base, const YAMLNode* des
         return differ;
     }
     const YAMLSequence *baseList = AsSequence(base), *destList = AsSequence(dest);
-    YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindMapping(m_Path, baseList, destList);
+    YAMLSequenceRemapper* remapper = FindMapping(m_Context, baseList, destList);
     const bool childrenDiffer = remapper
                                     ? ChildrenDiffer(remapper->Arrange(baseList->m_Items), destList->m_Items)
                                     : Differ(baseList, destList);
@@ -67,7 +67,7 @@ bool DifferenceCheck::ContainersDiffer(const YAMLNode* base, const YAMLNode* des
 }
 
 void DifferenceCheck::LetRulesLook(const YAMLNode* node) const {
-    MergeRules::IsMergeablePath(m_Path, node);
+    m_Context.rules.IsMergeablePath(m_Context.path, node);
 }
 
 } // namespace ovrin_yaml

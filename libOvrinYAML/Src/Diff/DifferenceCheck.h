@@ -1,7 +1,7 @@
 #pragma once
 
+#include "Diff/DiffContext.h"
 #include "Values/YAMLMapping.h"
-#include "Values/YAMLScalar.h"
 #include "Values/YAMLSequence.h"
 
 #include <cstddef>
@@ -27,7 +27,7 @@ namespace ovrin_yaml {
 /// stay as they are, and the rules too, as long as the check is in use. Belongs to one thread.
 class DifferenceCheck {
 public:
-    DifferenceCheck();
+    explicit DifferenceCheck(const MergeRules& rules);
 
     bool Differ(const YAMLMapping* base, const YAMLMapping* dest);
     /// Position by position.
@@ -40,14 +40,14 @@ private:
     };
 
     template <class Container> bool ChildrenDiffer(const Container& base, const Container& dest);
-    /// Whether two nodes at m_Path differ that don't count as equal; one of them may be null.
+    /// Whether two nodes at the current path differ that don't count as equal; one of them may be null.
     bool DifferAtPath(const YAMLNode* base, const YAMLNode* dest);
     /// The same for two mappings or two sequences.
     bool ContainersDiffer(const YAMLNode* base, const YAMLNode* dest);
     /// Throws where the rules that look at fields would meet repeated keys.
     void LetRulesLook(const YAMLNode* node) const;
 
-    Path m_Path;
+    DiffContext m_Context;
     const std::size_t m_LongestRule;
     std::unordered_map<Pair, bool, PairHash> m_Known; // pairs of containers out of the rules' reach
 };

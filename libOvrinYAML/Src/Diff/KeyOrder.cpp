@@ -1,8 +1,8 @@
 #include "Diff/KeyOrder.h"
 
-#include "Diff/MergeRules.h"
+#include "Diff/DiffContext.h"
+#include "Diff/SequenceMatching.h"
 #include "Diff/YAMLSequenceDiff.h"
-#include "Diff/YAMLSequenceRemapper.h"
 #include "Values/YAMLMapping.h"
 #include "Values/YAMLSequence.h"
 
@@ -43,17 +43,18 @@ const ChangeSequenceOperation* Identity(std::size_t count) {
 
 } // namespace
 
-const ChangeSequenceOperation* DiffKeyOrder(const YAMLMapping* base, const YAMLMapping* dest) {
+const ChangeSequenceOperation* DiffKeyOrder(const MergeRules& rules, const YAMLMapping* base,
+                                            const YAMLMapping* dest) {
     if (HaveSameKeys(base, dest)) return Identity(base->Size());
-    Path path = {YAMLScalar::underscore};
+    DiffContext context(rules, {YAMLScalar::underscore});
     YAMLSequence* baseKeys = KeysOf(base);
     YAMLSequence* destKeys = KeysOf(dest);
     // Never null: the lists differ. They are told apart by their keys, for lists of one hash need not be
     // equal.
-    const YAMLSequenceRemapper* remapper = YAMLSequenceRemapper::FindKeyListMapping(baseKeys, destKeys);
+    const YAMLSequenceRemapper* remapper = FindKeyListMapping(baseKeys, destKeys);
     const YAMLSequenceDiff* diff =
-        YAMLSequenceDiff::Diff(path, remapper->Arrange(baseKeys->m_Items), destKeys->m_Items);
-    const bool mergeable = MergeRules::IsMergeablePath(path, destKeys);
+        YAMLSequenceDiff::Diff(context, remapper->Arrange(baseKeys->m_Items), destKeys->m_Items);
+    const bool mergeable = rules.IsMergeablePath(context.path, destKeys);
     // The operations inside point at the keys, which outlive their lists.
     YAMLAlloc<YAMLSequence>::free(baseKeys);
     YAMLAlloc<YAMLSequence>::free(destKeys);

@@ -4,8 +4,11 @@
 
 namespace ovrin_yaml {
 
+class MergeRules;
+
 /// The change of the key list from `base` to `dest`; an identity where the order is the same.
-const ChangeSequenceOperation* DiffKeyOrder(const YAMLMapping* base, const YAMLMapping* dest);
+const ChangeSequenceOperation* DiffKeyOrder(const MergeRules& rules, const YAMLMapping* base,
+                                            const YAMLMapping* dest);
 
 /// Whether the key list stays as it is: no element moves and no operation touches one.
 bool IsIdentityKeyOrder(const ChangeSequenceOperation* order);

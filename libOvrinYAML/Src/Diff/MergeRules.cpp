@@ -6,45 +6,28 @@
 
 namespace ovrin_yaml {
 
-std::vector<SequenceInfo> MergeRules::s_ArrayUniqueKeyMap;
-std::vector<std::pair<Path, bool>> MergeRules::s_ExclusionFieldPaths;
-std::vector<std::pair<Path, std::tuple<float, float>>> MergeRules::s_ComparisonFieldPaths;
-std::vector<ExclusionInfo> MergeRules::s_DiffExclusionFieldPaths;
-bool MergeRules::s_PremergeBaseValues = false;
-std::vector<Path> MergeRules::defaultPath;
-std::vector<Path> MergeRules::defaultDirectPath;
-const std::vector<Path> MergeRules::noPaths;
-
-void MergeRules::Initialize() {
-    defaultDirectPath.push_back({YAMLScalar::underscore});
-    defaultPath.push_back({YAMLScalar::fileID});
-}
+MergeRules::MergeRules()
+    : m_DefaultRule{SequenceType::Set, {{YAMLScalar::fileID}}, true},
+      m_KeyListRule{SequenceType::Set, {{YAMLScalar::underscore}}, false} {}
 
 void MergeRules::AddSequenceUniqueKeys(SequenceType type, const Path& path, const std::vector<Path>& keys) {
-    s_ArrayUniqueKeyMap.push_back({type, path, keys});
+    if (type == SequenceType::Plain)
+        m_ListRules.push_back({path, {type, {}, false}});
+    else
+        m_ListRules.push_back({path, {type, keys, keys == m_DefaultRule.keys}});
 }
 
 void MergeRules::AddExclusionFieldPath(const Path& path, bool exclude) {
-    s_ExclusionFieldPaths.emplace_back(path, !exclude);
+    m_Exclusions.push_back({path, {}, !exclude});
 }
 
 void MergeRules::AddExclusionIfContainsFieldPath(const Path& path, const std::vector<Path>& fieldPaths,
                                                  bool exclude) {
-    s_DiffExclusionFieldPaths.push_back({path, fieldPaths, !exclude});
+    m_ConditionalExclusions.push_back({path, fieldPaths, !exclude});
 }
 
 void MergeRules::AddComparisonFieldPath(const Path& path, float relative, float absolute) {
-    s_ComparisonFieldPaths.emplace_back(path, std::tuple(relative, absolute));
-}
-
-void MergeRules::ResetForTests() {
-    s_ArrayUniqueKeyMap.clear();
-    s_ExclusionFieldPaths.clear();
-    s_ComparisonFieldPaths.clear();
-    s_DiffExclusionFieldPaths.clear();
-    s_PremergeBaseValues = false;
-    defaultPath.clear();
-    defaultDirectPath.clear();
+    m_Comparisons.push_back({path, {relative, absolute}});
 }
 
 bool MergeRules::MatchesPath(const Path& pattern, const Path& path) {
@@ -54,21 +37,21 @@ bool MergeRules::MatchesPath(const Path& pattern, const Path& path) {
                       });
 }
 
-std::size_t MergeRules::LongestPath() {
+std::size_t MergeRules::LongestPath() const {
     std::size_t longest = 1; // that of key lists
     const auto count = [&](const Path& pattern) { longest = std::max(longest, pattern.size()); };
-    for (const SequenceInfo& rule : s_ArrayUniqueKeyMap) count(rule.path);
-    for (const auto& rule : s_ExclusionFieldPaths) count(rule.first);
-    for (const auto& rule : s_ComparisonFieldPaths) count(rule.first);
-    for (const ExclusionInfo& rule : s_DiffExclusionFieldPaths) count(rule.path);
+    for (const SequenceInfo& rule : m_ListRules) count(rule.path);
+    for (const ExclusionInfo& rule : m_Exclusions) count(rule.path);
+    for (const ExclusionInfo& rule : m_ConditionalExclusions) count(rule.path);
+    for (const auto& rule : m_Comparisons) count(rule.first);
     return longest;
 }
 
-const std::vector<Path>& MergeRules::SelectKeyPaths(const Path& path) {
-    if (path.size() == 1 && path[0] == YAMLScalar::underscore) return defaultDirectPath;
-    for (const SequenceInfo& rule : s_ArrayUniqueKeyMap)
-        if (MatchesPath(rule.path, path)) return rule.type == SequenceType::Set ? rule.keys : noPaths;
-    return defaultPath;
+const ListRule& MergeRules::SelectKeyPaths(const Path& path) const {
+    if (path.size() == 1 && path[0] == YAMLScalar::underscore) return m_KeyListRule;
+    for (const SequenceInfo& rule : m_ListRules)
+        if (MatchesPath(rule.path, path)) return rule.list;
+    return m_DefaultRule;
 }
 
 const YAMLNode* MergeRules::GetYAMLNodeFieldByPath(const YAMLNode* node, const Path& fieldPath) {
@@ -97,17 +80,23 @@ std::vector<const YAMLScalar*> MergeRules::GetUniqueMappingValues(const std::vec
     return values;
 }
 
-bool MergeRules::IsMergeablePath(const Path& path) {
-    for (const auto& [pattern, mergeable] : s_ExclusionFieldPaths)
-        if (MatchesPath(pattern, path)) return mergeable;
-    return true;
+std::optional<bool> MergeRules::FindExclusion(const Path& path) const {
+    for (const ExclusionInfo& rule : m_Exclusions)
+        if (MatchesPath(rule.path, path)) return rule.mergeable;
+    return std::nullopt;
 }
 
-bool MergeRules::IsMergeablePath(const Path& path, const YAMLNode* node) {
-    for (const ExclusionInfo& rule : s_DiffExclusionFieldPaths)
+std::optional<bool> MergeRules::FindExclusion(const Path& path, const YAMLNode* node) const {
+    for (const ExclusionInfo& rule : m_ConditionalExclusions)
         if (MatchesPath(rule.path, path) && !GetUniqueMappingValues(rule.fieldPaths, node).empty())
             return rule.mergeable;
-    return true;
+    return std::nullopt;
+}
+
+std::optional<Tolerance> MergeRules::FindTolerance(const Path& path) const {
+    for (const auto& [pattern, tolerance] : m_Comparisons)
+        if (MatchesPath(pattern, path)) return tolerance;
+    return std::nullopt;
 }
 
 } // namespace ovrin_yaml

@@ -6,8 +6,6 @@
 
 namespace ovrin_yaml {
 
-class ConflictResolver;
-class YAMLDiffOutput;
 class YAMLMapping;
 class YAMLMappingDiff;
 class YAMLSequence;
@@ -29,17 +27,11 @@ public:
     /// the diff is made, and only acted on by the resolver.
     const bool m_Mergeable;
 
-    /// Prints the operation and ends the line that the caller began.
-    virtual void Output(YAMLDiffOutput& output) const = 0;
     /// Carries the change out on the value of `key`. Throws YAMLError where the key doesn't allow it and
     /// std::bad_cast where the value is of another kind than the operation changes.
     virtual void Apply(YAMLMapping& mapping, const YAMLScalar* key) const = 0;
     /// The same on the element at `index`, counted in the destination: positions do not shift.
     virtual void Apply(YAMLSequence& sequence, int index) const = 0;
-
-    /// What enters the merged diff for one key or index: one call of the resolver, or none where neither side
-    /// has an operation. Either side may be null, and so may the result: the base value stays.
-    static const Operation* Merge(const Operation* left, const Operation* right, ConflictResolver& resolver);
 
 protected:
     Operation(Kind kind, bool mergeable) : m_Mergeable(mergeable), m_Kind(kind) {}
@@ -66,7 +58,6 @@ public:
     static constexpr Kind kKind = Kind::Remove;
     explicit RemoveOperation(bool mergeable) : Operation(kKind, mergeable) {}
 
-    void Output(YAMLDiffOutput& output) const override;
     void Apply(YAMLMapping& mapping, const YAMLScalar* key) const override;
     void Apply(YAMLSequence& sequence, int index) const override;
 };
@@ -77,7 +68,6 @@ public:
     static constexpr Kind kKind = Kind::Change;
     explicit ChangeOperation(const YAMLNode* value) : ValuedOperation(kKind, value, false) {}
 
-    void Output(YAMLDiffOutput& output) const override;
     void Apply(YAMLMapping& mapping, const YAMLScalar* key) const override;
     void Apply(YAMLSequence& sequence, int index) const override;
 };
@@ -88,7 +78,6 @@ public:
     static constexpr Kind kKind = Kind::Add;
     AddOperation(const YAMLNode* value, bool mergeable) : ValuedOperation(kKind, value, mergeable) {}
 
-    void Output(YAMLDiffOutput& output) const override;
     void Apply(YAMLMapping& mapping, const YAMLScalar* key) const override;
     void Apply(YAMLSequence& sequence, int index) const override;
 };
@@ -102,12 +91,6 @@ public:
 
     const YAMLMappingDiff* const m_Diff;
 
-    /// The two diffs merged into a new operation; never null.
-    static const ChangeMappingOperation* Merge(const ChangeMappingOperation* left,
-                                               const ChangeMappingOperation* right,
-                                               ConflictResolver& resolver);
-
-    void Output(YAMLDiffOutput& output) const override;
     void Apply(YAMLMapping& mapping, const YAMLScalar* key) const override;
     void Apply(YAMLSequence& sequence, int index) const override;
 };
@@ -124,13 +107,6 @@ public:
     const YAMLSequenceRemapper* const m_Remapper; // null where all elements stay in place
     const YAMLSequenceDiff* const m_Diff;         // never null
 
-    /// The changes of two sides to one sequence, brought into one numbering and merged; never null. With
-    /// `removeUnmatched` an element that one side removed is gone, without it the other side keeps it.
-    static const ChangeSequenceOperation* Merge(const ChangeSequenceOperation* left,
-                                                const ChangeSequenceOperation* right,
-                                                ConflictResolver& resolver, bool removeUnmatched);
-
-    void Output(YAMLDiffOutput& output) const override;
     void Apply(YAMLMapping& mapping, const YAMLScalar* key) const override;
     void Apply(YAMLSequence& sequence, int index) const override;
 

@@ -1,21 +1,5 @@
-// Reads the rules file into the lists of MergeRules:
-//
-//     # a comment, or an empty line
-//     [arrays]
-//     set PATH KEYPATH...               elements are matched by key
-//     plain PATH                        elements are matched by equality
-//     [exclusions]
-//     include PATH                      both sides' changes below PATH are combined
-//     exclude PATH                      they conflict
-//     includeIfContains PATH FIELDPATH...
-//     excludeIfContains PATH FIELDPATH...
-//     [comparisons]
-//     float PATH [RELATIVE [ABSOLUTE]]  a tolerance
-//     [premerge]
-//     legacyBlankPremergeBase
-//
-// Only blanks separate tokens, and the elements of a path are joined by dots. Sections may come in any order
-// and again.
+#include "Diff/RulesReader.h"
+
 #include "Diff/MergeRules.h"
 
 #include <algorithm>
@@ -27,16 +11,18 @@ namespace ovrin_yaml {
 
 namespace {
 
-Path ToPath(const std::string& token) {
-    std::vector<std::string> elements;
-    MergeRules::Tokenize(token, '.', elements);
-    Path path;
-    for (const std::string& element : elements) path.push_back(YAMLScalar::Lookup(element));
-    return path;
+/// Appends the pieces of `text` between separators to `tokens`, empty ones left out.
+void Tokenize(const std::string& text, char separator, std::vector<std::string>& tokens) {
+    for (std::size_t begin = 0, end; begin < text.size(); begin = end + 1) {
+        end = std::min(text.find(separator, begin), text.size());
+        if (end > begin) tokens.push_back(text.substr(begin, end - begin));
+    }
 }
 
 class RulesReader {
 public:
+    explicit RulesReader(MergeRules& rules) : m_Rules(rules) {}
+
     void ReadLine(const std::string& line);
 
 private:
@@ -53,6 +39,7 @@ private:
     float FloatToken(std::size_t index) const { return YAMLScalar::Lookup(m_Tokens[index])->GetFloatValue(); }
     void Require(bool condition, const char* message) const;
 
+    MergeRules& m_Rules;
     Section m_Section = Section::None;
     int m_LineNumber = 0;
     std::vector<std::string> m_Tokens; // of the current line
@@ -62,7 +49,7 @@ void RulesReader::ReadLine(const std::string& line) {
     ++m_LineNumber;
     if (line.starts_with('#')) return;
     m_Tokens.clear();
-    MergeRules::Tokenize(line, ' ', m_Tokens);
+    Tokenize(line, ' ', m_Tokens);
     if (!m_Tokens.empty() && !OpenSection()) ReadRule();
 }
 
@@ -101,7 +88,7 @@ void RulesReader::ReadArrayRule() const {
     Require(set || m_Tokens[0] == "plain", "Invalid rule format missing action at line ");
     Require(!set || m_Tokens.size() > 2, "Invalid format of unique key specification at line ");
     const SequenceType type = set ? SequenceType::Set : SequenceType::Plain;
-    MergeRules::AddSequenceUniqueKeys(type, ToPath(m_Tokens[1]), FieldPaths());
+    m_Rules.AddSequenceUniqueKeys(type, ToRulePath(m_Tokens[1]), FieldPaths());
 }
 
 void RulesReader::ReadExclusionRule() const {
@@ -114,9 +101,9 @@ void RulesReader::ReadExclusionRule() const {
     Require(!conditional || m_Tokens.size() > 2,
             "Invalid format of excludeIfContains specification at line ");
     if (conditional)
-        MergeRules::AddExclusionIfContainsFieldPath(ToPath(m_Tokens[1]), FieldPaths(), exclude);
+        m_Rules.AddExclusionIfContainsFieldPath(ToRulePath(m_Tokens[1]), FieldPaths(), exclude);
     else
-        MergeRules::AddExclusionFieldPath(ToPath(m_Tokens[1]), exclude);
+        m_Rules.AddExclusionFieldPath(ToRulePath(m_Tokens[1]), exclude);
 }
 
 void RulesReader::ReadComparisonRule() const {
@@ -124,18 +111,18 @@ void RulesReader::ReadComparisonRule() const {
     Require(m_Tokens[0] == "float", "Invalid rule format missing action at line ");
     const float relative = m_Tokens.size() > 2 ? FloatToken(2) : std::numeric_limits<float>::epsilon();
     const float absolute = m_Tokens.size() > 3 ? FloatToken(3) : relative;
-    MergeRules::AddComparisonFieldPath(ToPath(m_Tokens[1]), relative, absolute);
+    m_Rules.AddComparisonFieldPath(ToRulePath(m_Tokens[1]), relative, absolute);
 }
 
 void RulesReader::ReadPremergeRule() const {
     Require(m_Tokens.size() == 1, "Invalid rule format at line ");
     Require(m_Tokens[0] == "legacyBlankPremergeBase", "Invalid rule format missing action at line ");
-    MergeRules::s_PremergeBaseValues = true;
+    m_Rules.EnableBlankPremergeBase();
 }
 
 std::vector<Path> RulesReader::FieldPaths() const {
     std::vector<Path> paths;
-    for (std::size_t i = 2; i < m_Tokens.size(); ++i) paths.push_back(ToPath(m_Tokens[i]));
+    for (std::size_t i = 2; i < m_Tokens.size(); ++i) paths.push_back(ToRulePath(m_Tokens[i]));
     return paths;
 }
 
@@ -145,17 +132,17 @@ void RulesReader::Require(bool condition, const char* message) const {
 
 } // namespace
 
-void MergeRules::LoadSequenceUniqueKeys(std::istream& in) {
-    Initialize();
-    RulesReader reader;
-    for (std::string line; std::getline(in, line);) reader.ReadLine(line);
+Path ToRulePath(const std::string& text) {
+    std::vector<std::string> elements;
+    Tokenize(text, '.', elements);
+    Path path;
+    for (const std::string& element : elements) path.push_back(YAMLScalar::Lookup(element));
+    return path;
 }
 
-void MergeRules::Tokenize(const std::string& text, char separator, std::vector<std::string>& tokens) {
-    for (std::size_t begin = 0, end; begin < text.size(); begin = end + 1) {
-        end = std::min(text.find(separator, begin), text.size());
-        if (end > begin) tokens.push_back(text.substr(begin, end - begin));
-    }
+void LoadSequenceUniqueKeys(std::istream& in, MergeRules& rules) {
+    RulesReader reader(rules);
+    for (std::string line; std::getline(in, line);) reader.ReadLine(line);
 }
 
 } // namespace ovrin_yaml

@@ -1,8 +1,6 @@
-// The search functions of YAMLSequenceRemapper: matching by key and by equality.
+#include "Diff/SequenceMatching.h"
 
 #include "Diff/EqualityMatcher.h"
-#include "Diff/MergeRules.h"
-#include "Diff/YAMLSequenceRemapper.h"
 #include "Values/KeyIndex.h"
 
 #include <algorithm>
@@ -11,6 +9,16 @@
 namespace ovrin_yaml {
 
 namespace {
+
+/// The texts joined by ":".
+std::string CollapseKeyElementValues(const std::vector<const YAMLScalar*>& values) {
+    std::string text;
+    for (std::size_t i = 0; i < values.size(); ++i) {
+        if (i > 0) text += ':';
+        text += values[i]->Value();
+    }
+    return text;
+}
 
 /// Gives the key of sequence elements as one scalar, so that equal keys are the same object.
 class ElementKeys {
@@ -29,7 +37,7 @@ public:
         if (values.empty()) return nullptr;
         const auto guid = MergeRules::GetUniqueMappingValues(m_GuidPaths, element);
         if (values.size() == 1 && guid.empty()) return values[0];
-        std::string text = YAMLSequenceRemapper::CollapseKeyElementValues(values);
+        std::string text = CollapseKeyElementValues(values);
         if (!guid.empty()) text.append(":").append(guid[0]->Value());
         return YAMLScalar::Lookup(text);
     }
@@ -75,11 +83,11 @@ YAMLSequenceRemapper* UnlessIdentity(YAMLSequenceRemapper* remapper) {
 
 } // namespace
 
-YAMLSequenceRemapper* YAMLSequenceRemapper::FindMapping(const Path& path, const YAMLSequence* base,
-                                                        const YAMLSequence* dest) {
-    const std::vector<Path>& keyPaths = MergeRules::SelectKeyPaths(path);
-    if (keyPaths.empty()) return FindGenericMapping(base, dest);
-    const ElementKeys keys(keyPaths);
+YAMLSequenceRemapper* FindMapping(const DiffContext& context, const YAMLSequence* base,
+                                  const YAMLSequence* dest) {
+    const ListRule& rule = context.rules.SelectKeyPaths(context.path);
+    if (rule.kind == SequenceType::Plain) return FindGenericMapping(base, dest);
+    const ElementKeys keys(rule.keys);
     std::vector<const YAMLScalar*> baseKeys, destKeys;
     KeyIndex baseIndexes, destIndexes;
     if (!FindUniqueKeys(keys, base, baseKeys, baseIndexes) ||
@@ -92,8 +100,7 @@ YAMLSequenceRemapper* YAMLSequenceRemapper::FindMapping(const Path& path, const 
     return UnlessIdentity(remapper);
 }
 
-YAMLSequenceRemapper* YAMLSequenceRemapper::FindKeyListMapping(const YAMLSequence* base,
-                                                               const YAMLSequence* dest) {
+YAMLSequenceRemapper* FindKeyListMapping(const YAMLSequence* base, const YAMLSequence* dest) {
     const auto& from = base->m_Items;
     const auto& to = dest->m_Items;
     YAMLSequenceRemapper* remapper = YAMLAlloc<YAMLSequenceRemapper>::create(from.size(), to.size(), true);
@@ -112,8 +119,7 @@ YAMLSequenceRemapper* YAMLSequenceRemapper::FindKeyListMapping(const YAMLSequenc
     return UnlessIdentity(remapper);
 }
 
-YAMLSequenceRemapper* YAMLSequenceRemapper::FindGenericMapping(const YAMLSequence* base,
-                                                               const YAMLSequence* dest) {
+YAMLSequenceRemapper* FindGenericMapping(const YAMLSequence* base, const YAMLSequence* dest) {
     const auto& from = base->m_Items;
     const auto& to = dest->m_Items;
     const std::size_t n = from.size(), m = to.size(), common = std::min(n, m);
@@ -135,9 +141,8 @@ YAMLSequenceRemapper* YAMLSequenceRemapper::FindGenericMapping(const YAMLSequenc
     return UnlessIdentity(remapper);
 }
 
-YAMLSequenceRemapper* YAMLSequenceRemapper::FindIdMapping(const std::vector<Path>& keyPaths,
-                                                          const YAMLSequence* first,
-                                                          const YAMLSequence* second) {
+YAMLSequenceRemapper* FindIdMapping(const std::vector<Path>& keyPaths, const YAMLSequence* first,
+                                    const YAMLSequence* second) {
     const ElementKeys keys(keyPaths);
     KeyIndex indexes;
     for (std::size_t i = 0; i < second->m_Items.size(); ++i)
@@ -148,15 +153,6 @@ YAMLSequenceRemapper* YAMLSequenceRemapper::FindIdMapping(const std::vector<Path
     for (std::size_t i = 0; i < first->m_Items.size(); ++i)
         remapper->m_Mapping[i] = IndexOf(indexes, keys.Of(first->m_Items[i]));
     return remapper;
-}
-
-std::string YAMLSequenceRemapper::CollapseKeyElementValues(const std::vector<const YAMLScalar*>& values) {
-    std::string text;
-    for (std::size_t i = 0; i < values.size(); ++i) {
-        if (i > 0) text += ':';
-        text += values[i]->Value();
-    }
-    return text;
 }
 
 } // namespace ovrin_yaml

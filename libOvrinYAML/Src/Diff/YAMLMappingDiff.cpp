@@ -5,20 +5,22 @@
 
 namespace ovrin_yaml {
 
-YAMLMappingDiff* YAMLMappingDiff::Diff(Path& path, const YAMLMapping* base, const YAMLMapping* dest) {
+YAMLMappingDiff* YAMLMappingDiff::Diff(DiffContext& context, const YAMLMapping* base,
+                                       const YAMLMapping* dest) {
     YAMLMappingDiff* diff = YAMLAlloc<YAMLMappingDiff>::create();
-    ForEachChildPair(path, base, dest,
+    ForEachChildPair(context, base, dest,
                      [&](const YAMLScalar* key, const YAMLNode* baseValue, const YAMLNode* destValue) {
-                         if (const Operation* operation = CreateDiffOperation(path, baseValue, destValue))
+                         if (const Operation* operation = CreateDiffOperation(context, baseValue, destValue))
                              diff->Add(key, operation);
                      });
-    diff->m_KeyOrder = DiffKeyOrder(base, dest);
+    diff->m_KeyOrder = DiffKeyOrder(context.rules, base, dest);
     return diff;
 }
 
-YAMLMappingDiff* YAMLMappingDiff::Diff(const YAMLMapping* base, const YAMLMapping* dest) {
-    Path path;
-    return Diff(path, base, dest);
+YAMLMappingDiff* YAMLMappingDiff::Diff(const MergeRules& rules, const YAMLMapping* base,
+                                       const YAMLMapping* dest) {
+    DiffContext context(rules);
+    return Diff(context, base, dest);
 }
 
 void YAMLMappingDiff::Add(const YAMLScalar* key, const Operation* operation) {

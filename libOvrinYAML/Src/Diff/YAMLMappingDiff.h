@@ -8,8 +8,8 @@
 
 namespace ovrin_yaml {
 
-class ConflictResolver;
-class YAMLDiffOutput;
+struct DiffContext;
+class MergeRules;
 
 /// The diff of two mappings: an operation for each key that differs, and how the order of the keys changed.
 ///
@@ -28,9 +28,9 @@ public:
         const Operation* operation;
     };
 
-    /// The diff from `base` to `dest`, two hashed mappings at `path`, which comes back as it was.
-    static YAMLMappingDiff* Diff(Path& path, const YAMLMapping* base, const YAMLMapping* dest);
-    static YAMLMappingDiff* Diff(const YAMLMapping* base, const YAMLMapping* dest);
+    /// The diff from `base` to `dest`, two hashed mappings at the path of `context`.
+    static YAMLMappingDiff* Diff(DiffContext& context, const YAMLMapping* base, const YAMLMapping* dest);
+    static YAMLMappingDiff* Diff(const MergeRules& rules, const YAMLMapping* base, const YAMLMapping* dest);
 
     /// Throws YAMLError "Cannot do a double change on the same key in a mapping".
     void Add(const YAMLScalar* key, const Operation* operation);
@@ -44,11 +44,6 @@ public:
     /// Changes `target`, which must equal the base of the diff. Throws YAMLError where it doesn't fit;
     /// `target` is then left halfway.
     void Apply(YAMLMapping& target) const;
-    void Output(YAMLDiffOutput& output) const;
-
-    /// Merges the diffs of two sides. The result holds operations of the inputs, which must outlive it.
-    static YAMLMappingDiff* Merge(const YAMLMappingDiff* left, const YAMLMappingDiff* right,
-                                  ConflictResolver& resolver);
 
     /// How the key list changed. Set by every Diff, as an identity if it didn't; null in a diff made
     /// otherwise, where the order that applying the entries leaves is kept.

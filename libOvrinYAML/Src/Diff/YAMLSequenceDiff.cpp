@@ -7,18 +7,19 @@
 
 namespace ovrin_yaml {
 
-YAMLSequenceDiff* YAMLSequenceDiff::Diff(Path& path, const NodeList& base, const NodeList& dest) {
+YAMLSequenceDiff* YAMLSequenceDiff::Diff(DiffContext& context, const NodeList& base, const NodeList& dest) {
     YAMLSequenceDiff* diff = YAMLAlloc<YAMLSequenceDiff>::create();
-    ForEachChildPair(path, base, dest, [&](int index, const YAMLNode* baseItem, const YAMLNode* destItem) {
-        if (const Operation* operation = CreateDiffOperation(path, baseItem, destItem))
+    ForEachChildPair(context, base, dest, [&](int index, const YAMLNode* baseItem, const YAMLNode* destItem) {
+        if (const Operation* operation = CreateDiffOperation(context, baseItem, destItem))
             diff->Add(index, operation);
     });
     return diff;
 }
 
-YAMLSequenceDiff* YAMLSequenceDiff::Diff(const YAMLSequence* base, const YAMLSequence* dest) {
-    Path path;
-    return Diff(path, base->m_Items, dest->m_Items);
+YAMLSequenceDiff* YAMLSequenceDiff::Diff(const MergeRules& rules, const YAMLSequence* base,
+                                         const YAMLSequence* dest) {
+    DiffContext context(rules);
+    return Diff(context, base->m_Items, dest->m_Items);
 }
 
 std::vector<YAMLSequenceDiff::Entry>::iterator YAMLSequenceDiff::LowerBound(int index) {

@@ -9,8 +9,8 @@
 
 namespace ovrin_yaml {
 
-class ConflictResolver;
-class YAMLDiffOutput;
+struct DiffContext;
+class MergeRules;
 class YAMLSequenceRemapper;
 
 /// The per-position half of a change to a sequence; YAMLSequenceRemapper is the other half.
@@ -32,8 +32,9 @@ public:
     };
 
     /// The position-by-position diff; `base` may hold holes where it was arranged by a remapper.
-    static YAMLSequenceDiff* Diff(Path& path, const NodeList& base, const NodeList& dest);
-    static YAMLSequenceDiff* Diff(const YAMLSequence* base, const YAMLSequence* dest);
+    static YAMLSequenceDiff* Diff(DiffContext& context, const NodeList& base, const NodeList& dest);
+    static YAMLSequenceDiff* Diff(const MergeRules& rules, const YAMLSequence* base,
+                                  const YAMLSequence* dest);
 
     /// Throws YAMLError "Cannot do a double change on the same key in a sequence".
     void Add(int index, const Operation* operation);
@@ -50,13 +51,6 @@ public:
     const std::vector<Entry>& Entries() const { return m_Entries; }
     /// The entry's operation, or null.
     const Operation* Find(int index) const;
-
-    void Output(YAMLDiffOutput& output) const;
-
-    /// Merges two diffs in one index numbering. Indexes where neither side's operation is taken are added to
-    /// `droppedIndexes`.
-    static YAMLSequenceDiff* Merge(const YAMLSequenceDiff* left, const YAMLSequenceDiff* right,
-                                   std::set<int>& droppedIndexes, ConflictResolver& resolver);
 
     void ResetForAlloc() { m_Entries.clear(); }
 

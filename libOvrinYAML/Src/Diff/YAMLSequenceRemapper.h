@@ -5,8 +5,6 @@
 #include "Values/YAMLSequence.h"
 
 #include <cstddef>
-#include <string>
-#include <utility>
 #include <vector>
 
 namespace ovrin_yaml {
@@ -28,29 +26,6 @@ public:
         : m_Mapping(baseCount, -1), m_DestinationCount(destinationCount), m_IsSet(isSet) {}
 
     static YAMLSequenceRemapper* MakeIdentity(std::size_t count);
-
-    /// The map that brings `base` into the order of `dest`, by key where every element of both has a key of
-    /// its own, by equality otherwise; null if every element stays where it is. `path` chooses the rule.
-    static YAMLSequenceRemapper* FindMapping(const Path& path, const YAMLSequence* base,
-                                             const YAMLSequence* dest);
-    /// The same for two lists of texts that stand in each of them once, as the keys of mappings do.
-    static YAMLSequenceRemapper* FindKeyListMapping(const YAMLSequence* base, const YAMLSequence* dest);
-    /// The same by equality: a common prefix and suffix, which may overlap, and between them each base
-    /// element with the first equal destination element that is still free.
-    static YAMLSequenceRemapper* FindGenericMapping(const YAMLSequence* base, const YAMLSequence* dest);
-    /// Lenient matching by key, from indexes of `first` to indexes of `second`. An element without a key
-    /// stays unmatched and of a repeated key in `second` the last one counts. Never null.
-    static YAMLSequenceRemapper* FindIdMapping(const std::vector<Path>& keyPaths, const YAMLSequence* first,
-                                               const YAMLSequence* second);
-    /// The texts joined by ":".
-    static std::string CollapseKeyElementValues(const std::vector<const YAMLScalar*>& values);
-
-    /// Merges the maps of two sides over one base; see SequenceMerge.cpp. All three results are new. Takes
-    /// any map: a target beyond its destination counts as none, base elements beyond the left map don't
-    /// count, and those beyond the right one have no place there.
-    static YAMLSequenceRemapper* Merge(const YAMLSequenceRemapper* left, const YAMLSequenceRemapper* right,
-                                       YAMLSequenceRemapper*& leftToMerged,
-                                       YAMLSequenceRemapper*& rightToMerged, bool removeUnmatched);
 
     bool IsIdentity() const;
     /// The destination index of base element `index`; -1 also for an index beyond the map.

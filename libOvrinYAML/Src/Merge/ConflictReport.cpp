@@ -1,5 +1,6 @@
 #include "Merge/ConflictReport.h"
 
+#include "Diff/DiffText.h"
 #include "Diff/YAMLDiffOutput.h"
 #include "Merge/PathRanks.h"
 
@@ -63,7 +64,7 @@ std::vector<RankedRecord> RecordsByPath(const std::vector<Record>& records, bool
 void OutputSide(YAMLDiffOutput& output, const char* side, const std::string& path,
                 const Operation* operation) {
     output << side << path << " ";
-    if (operation) operation->Output(output);
+    if (operation) OutputOperation(*operation, output);
     output.EndLineIfOpen();
 }
 
@@ -89,7 +90,7 @@ void OutputNonConflict(YAMLDiffOutput& output, const Record& record) {
     if (!IsOneSided(record.type)) {
         output << "content" << endl;
     } else if (const Operation* operation = IsLeftSide(record.type) ? record.left : record.right) {
-        operation->Output(output);
+        OutputOperation(*operation, output);
     } else {
         output << endl;
     }

@@ -1,9 +1,8 @@
-// The merge of two diffs of one mapping or one sequence, key by key.
+#include "Merge/DiffMerge.h"
 
 #include "Diff/KeyOrder.h"
-#include "Diff/YAMLMappingDiff.h"
-#include "Diff/YAMLSequenceDiff.h"
-#include "Diff/YAMLSequenceRemapper.h"
+#include "Merge/OperationMerge.h"
+#include "Merge/SequenceMerge.h"
 #include "Merge/YAMLConflict.h"
 
 namespace ovrin_yaml {
@@ -21,7 +20,7 @@ const ChangeSequenceOperation* MergeKeyOrder(const ChangeSequenceOperation* left
     if (left == right && IsIdentityKeyOrder(left)) return left;
     WalkedPath path = Path{YAMLScalar::underscore};
     std::swap(path, resolver.m_Path);
-    const ChangeSequenceOperation* merged = ChangeSequenceOperation::Merge(left, right, resolver, false);
+    const ChangeSequenceOperation* merged = MergeSequenceChanges(left, right, resolver, false);
     std::swap(path, resolver.m_Path);
     return merged;
 }
@@ -42,21 +41,21 @@ void ForEachKey(const YAMLMappingDiff* left, const YAMLMappingDiff* right, const
 
 } // namespace
 
-YAMLMappingDiff* YAMLMappingDiff::Merge(const YAMLMappingDiff* left, const YAMLMappingDiff* right,
-                                        ConflictResolver& resolver) {
+YAMLMappingDiff* MergeMappingDiffs(const YAMLMappingDiff* left, const YAMLMappingDiff* right,
+                                   ConflictResolver& resolver) {
     YAMLMappingDiff* merged = YAMLAlloc<YAMLMappingDiff>::create();
     merged->m_KeyOrder = MergeKeyOrder(left->m_KeyOrder, right->m_KeyOrder, resolver);
     ForEachKey(left, right, [&](const YAMLScalar* key, const Operation* leftOne, const Operation* rightOne) {
         resolver.PushPath(key);
-        if (const Operation* operation = Operation::Merge(leftOne, rightOne, resolver))
+        if (const Operation* operation = MergeOperations(leftOne, rightOne, resolver))
             merged->Add(key, operation);
         resolver.PopPath();
     });
     return merged;
 }
 
-YAMLSequenceDiff* YAMLSequenceDiff::Merge(const YAMLSequenceDiff* left, const YAMLSequenceDiff* right,
-                                          std::set<int>& droppedIndexes, ConflictResolver& resolver) {
+YAMLSequenceDiff* MergeSequenceDiffs(const YAMLSequenceDiff* left, const YAMLSequenceDiff* right,
+                                     std::set<int>& droppedIndexes, ConflictResolver& resolver) {
     YAMLSequenceDiff* merged = YAMLAlloc<YAMLSequenceDiff>::create();
     auto l = left->Entries().begin();
     auto r = right->Entries().begin();
@@ -67,7 +66,7 @@ YAMLSequenceDiff* YAMLSequenceDiff::Merge(const YAMLSequenceDiff* left, const YA
         const Operation* leftOne = l != leftEnd && l->index == index ? (l++)->operation : nullptr;
         const Operation* rightOne = r != rightEnd && r->index == index ? (r++)->operation : nullptr;
         resolver.PushPath(IndexScalar(index));
-        if (const Operation* operation = Operation::Merge(leftOne, rightOne, resolver))
+        if (const Operation* operation = MergeOperations(leftOne, rightOne, resolver))
             merged->Add(index, operation);
         else
             droppedIndexes.insert(index);

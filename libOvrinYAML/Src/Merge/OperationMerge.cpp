@@ -1,7 +1,7 @@
-// The merge of two operations at one key: who is asked, and about what.
+#include "Merge/OperationMerge.h"
 
-#include "Diff/Operation.h"
 #include "Diff/YAMLMappingDiff.h"
+#include "Merge/DiffMerge.h"
 #include "Merge/YAMLConflict.h"
 
 namespace ovrin_yaml {
@@ -39,7 +39,7 @@ const Operation* MergeInnerChanges(const Operation* left, const Operation* right
 /// The order of the tests is the rule. Where the kinds differ, the stronger one goes through as if the other
 /// side had done nothing: removal before change before addition before a change inside, and a mapping before
 /// a sequence. It isn't even: a right removal beats any left operation, while a left one can meet a conflict.
-const Operation* Operation::Merge(const Operation* left, const Operation* right, ConflictResolver& resolver) {
+const Operation* MergeOperations(const Operation* left, const Operation* right, ConflictResolver& resolver) {
     const auto* leftRemove = As<RemoveOperation>(left);
     if (const auto* rightRemove = As<RemoveOperation>(right))
         return leftRemove ? resolver.OnSameValueRemoved(leftRemove, rightRemove)
@@ -61,10 +61,10 @@ const Operation* Operation::Merge(const Operation* left, const Operation* right,
     return MergeInnerChanges(left, right, resolver);
 }
 
-const ChangeMappingOperation* ChangeMappingOperation::Merge(const ChangeMappingOperation* left,
-                                                            const ChangeMappingOperation* right,
-                                                            ConflictResolver& resolver) {
-    const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(left->m_Diff, right->m_Diff, resolver);
+const ChangeMappingOperation* MergeMappingChanges(const ChangeMappingOperation* left,
+                                                  const ChangeMappingOperation* right,
+                                                  ConflictResolver& resolver) {
+    const YAMLMappingDiff* merged = MergeMappingDiffs(left->m_Diff, right->m_Diff, resolver);
     return YAMLAlloc<ChangeMappingOperation>::create(merged, left->m_Mergeable && right->m_Mergeable);
 }
 

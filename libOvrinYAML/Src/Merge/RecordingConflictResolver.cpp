@@ -1,10 +1,12 @@
 #include "Merge/RecordingConflictResolver.h"
 
 #include "Diff/KeyOrder.h"
-#include "Diff/MergeRules.h"
-#include "Diff/MergeTreeVisitors.h"
+#include "Diff/MergeTreeCloneVisitor.h"
 #include "Diff/YAMLMappingDiff.h"
 #include "Diff/YAMLSequenceDiff.h"
+#include "Merge/DiffMerge.h"
+#include "Merge/OperationMerge.h"
+#include "Merge/SequenceMerge.h"
 #include "Values/YAMLError.h"
 #include "Values/YAMLMapping.h"
 
@@ -139,7 +141,7 @@ const Operation* RecordingConflictResolver::OnSameValueRemoved(const RemoveOpera
 }
 
 bool RecordingConflictResolver::MayMergeInside(const Operation* left, const Operation* right) const {
-    return left->m_Mergeable && right->m_Mergeable && MergeRules::IsMergeablePath(m_Path.Elements());
+    return left->m_Mergeable && right->m_Mergeable && m_Rules.IsMergeablePath(m_Path.Elements());
 }
 
 template <class Change, class MergeInside>
@@ -154,13 +156,12 @@ const Operation* RecordingConflictResolver::ResolveContainers(const Change* left
 
 const Operation* RecordingConflictResolver::OnSameMappingChanged(const ChangeMappingOperation* left,
                                                                  const ChangeMappingOperation* right) {
-    return ResolveContainers(left, right, [&] { return ChangeMappingOperation::Merge(left, right, *this); });
+    return ResolveContainers(left, right, [&] { return MergeMappingChanges(left, right, *this); });
 }
 
 const Operation* RecordingConflictResolver::OnSameSequenceChanged(const ChangeSequenceOperation* left,
                                                                   const ChangeSequenceOperation* right) {
-    return ResolveContainers(left, right,
-                             [&] { return ChangeSequenceOperation::Merge(left, right, *this, true); });
+    return ResolveContainers(left, right, [&] { return MergeSequenceChanges(left, right, *this, true); });
 }
 
 const Operation* RecordingConflictResolver::OnSameValueAdded(const AddOperation* left,
@@ -205,9 +206,9 @@ const Operation* RecordingConflictResolver::MergeAddedMappings(const AddOperatio
                                                                const AddOperation* right) {
     const YAMLMapping nothing;
     const YAMLMapping* leftValue = AsMapping(left->m_Value);
-    const YAMLMappingDiff* leftDiff = YAMLMappingDiff::Diff(&nothing, leftValue);
-    const YAMLMappingDiff* rightDiff = YAMLMappingDiff::Diff(&nothing, AsMapping(right->m_Value));
-    const YAMLMappingDiff* merged = YAMLMappingDiff::Merge(leftDiff, rightDiff, *this);
+    const YAMLMappingDiff* leftDiff = YAMLMappingDiff::Diff(m_Rules, &nothing, leftValue);
+    const YAMLMappingDiff* rightDiff = YAMLMappingDiff::Diff(m_Rules, &nothing, AsMapping(right->m_Value));
+    const YAMLMappingDiff* merged = MergeMappingDiffs(leftDiff, rightDiff, *this);
     if (merged->Entries().empty() && m_DefaultResolve == ResolveBase) return nullptr;
     YAMLMapping* value = YAMLAlloc<YAMLMapping>::create(leftValue->m_Flow);
     for (const auto& [key, operation] : merged->Entries())
@@ -220,10 +221,10 @@ const Operation* RecordingConflictResolver::MergeAddedSequences(const AddOperati
                                                                 const AddOperation* right) {
     const YAMLSequence nothing;
     const YAMLSequence* leftValue = AsSequence(left->m_Value);
-    const YAMLSequenceDiff* leftDiff = YAMLSequenceDiff::Diff(&nothing, leftValue);
-    const YAMLSequenceDiff* rightDiff = YAMLSequenceDiff::Diff(&nothing, AsSequence(right->m_Value));
+    const YAMLSequenceDiff* leftDiff = YAMLSequenceDiff::Diff(m_Rules, &nothing, leftValue);
+    const YAMLSequenceDiff* rightDiff = YAMLSequenceDiff::Diff(m_Rules, &nothing, AsSequence(right->m_Value));
     std::set<int> ignoredDropped;
-    const YAMLSequenceDiff* merged = YAMLSequenceDiff::Merge(leftDiff, rightDiff, ignoredDropped, *this);
+    const YAMLSequenceDiff* merged = MergeSequenceDiffs(leftDiff, rightDiff, ignoredDropped, *this);
     if (merged->Entries().empty() && m_DefaultResolve == ResolveBase) return nullptr;
     YAMLSequence* value = YAMLAlloc<YAMLSequence>::create(leftValue->m_Flow);
     for (const auto& [index, operation] : merged->Entries())

@@ -26,8 +26,8 @@ public:
     };
     using RecordResolve = ovrin_yaml::RecordResolve;
 
-    /// The rules must have been read, and stay.
-    explicit RecordingConflictResolver(MergeResolve defaultResolve) : m_DefaultResolve(defaultResolve) {}
+    RecordingConflictResolver(const MergeRules& rules, MergeResolve defaultResolve)
+        : ConflictResolver(rules), m_DifferenceCheck(rules), m_DefaultResolve(defaultResolve) {}
 
     /// The decisions to go by, in place of earlier ones. Of several that match a path the first counts.
     void SetResolveMethodForPaths(const std::vector<RecordResolve>& resolves) { m_Resolves.Set(resolves); }

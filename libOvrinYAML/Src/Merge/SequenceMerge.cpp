@@ -14,9 +14,13 @@
 //  4. Both diffs are brought into the merged numbering and merged index by index.
 //  5. Indexes at which nothing was taken leave the numbering again.
 
-#include "Diff/MergeRules.h"
+#include "Merge/SequenceMerge.h"
+
+#include "Diff/SequenceMatching.h"
 #include "Diff/YAMLSequenceDiff.h"
-#include "Diff/YAMLSequenceRemapper.h"
+#include "Merge/DiffMerge.h"
+#include "Merge/OperationMerge.h"
+#include "Merge/RemapperMerge.h"
 #include "Merge/YAMLConflict.h"
 
 #include <algorithm>
@@ -71,8 +75,7 @@ struct Additions {
 void MergeCommonAdditions(Side& left, Side& right, const std::vector<Path>& keyPaths,
                           ConflictResolver& resolver) {
     const Additions leftAdded(left.diff), rightAdded(right.diff);
-    YAMLSequenceRemapper* matches =
-        YAMLSequenceRemapper::FindIdMapping(keyPaths, &leftAdded.values, &rightAdded.values);
+    YAMLSequenceRemapper* matches = FindIdMapping(keyPaths, &leftAdded.values, &rightAdded.values);
     std::set<int> matchedRight;
     YAMLSequenceDiff* settled = nullptr;
     for (std::size_t i = 0; i < matches->m_Mapping.size(); ++i) {
@@ -81,7 +84,7 @@ void MergeCommonAdditions(Side& left, Side& right, const std::vector<Path>& keyP
         if (!settled) settled = YAMLAlloc<YAMLSequenceDiff>::create(*left.diff);
         resolver.PushPath(IndexScalar(leftAdded.indexes[i]));
         const Operation* result =
-            Operation::Merge(leftAdded.operations[i], rightAdded.operations[j], resolver);
+            MergeOperations(leftAdded.operations[i], rightAdded.operations[j], resolver);
         resolver.PopPath();
         settled->Replace(leftAdded.indexes[i], result);
         matchedRight.insert(rightAdded.indexes[j]);
@@ -98,15 +101,12 @@ void MergeCommonAdditions(Side& left, Side& right, const std::vector<Path>& keyP
 /// Brings both sides into one numbering, where both have one of their own; the result leads to it from the
 /// base.
 const YAMLSequenceRemapper* MergeNumberings(Side& left, Side& right, bool removeUnmatched) {
-    YAMLSequenceRemapper* leftToMerged = nullptr;
-    YAMLSequenceRemapper* rightToMerged = nullptr;
-    const YAMLSequenceRemapper* merged = YAMLSequenceRemapper::Merge(
-        left.remapper, right.remapper, leftToMerged, rightToMerged, removeUnmatched);
-    left.diff = left.diff->Remap(leftToMerged);
-    right.diff = right.diff->Remap(rightToMerged);
-    YAMLAlloc<YAMLSequenceRemapper>::free(leftToMerged);
-    YAMLAlloc<YAMLSequenceRemapper>::free(rightToMerged);
-    return merged;
+    const MergedRemappers numberings = MergeRemappers(left.remapper, right.remapper, removeUnmatched);
+    left.diff = left.diff->Remap(numberings.leftToMerged);
+    right.diff = right.diff->Remap(numberings.rightToMerged);
+    YAMLAlloc<YAMLSequenceRemapper>::free(numberings.leftToMerged);
+    YAMLAlloc<YAMLSequenceRemapper>::free(numberings.rightToMerged);
+    return numberings.merged;
 }
 
 /// The numbering of the one side that has one becomes the other side's. A change of an element that was
@@ -117,78 +117,26 @@ const YAMLSequenceRemapper* TakeOnlyNumbering(Side& left, Side& right) {
     return left.remapper ? left.remapper : right.remapper;
 }
 
-/// The destination index of base element `index`; -1 also for one that the destination doesn't have.
-int TargetInDestination(const YAMLSequenceRemapper* remapper, std::size_t index) {
-    const int target = remapper->Target(index);
-    return target >= 0 && static_cast<std::size_t>(target) < remapper->m_DestinationCount ? target : -1;
-}
-
-/// Base element of each destination index, -1 for a new one.
-std::vector<int> Invert(const YAMLSequenceRemapper* remapper) {
-    std::vector<int> inverse(remapper->m_DestinationCount, -1);
-    for (std::size_t i = 0; i < remapper->m_Mapping.size(); ++i) {
-        const int target = TargetInDestination(remapper, i);
-        if (target != -1) inverse[target] = static_cast<int>(i);
-    }
-    return inverse;
-}
-
-/// Numbers the new elements of a side from its index `k` on, up to the next that the base has.
-void NumberAdditions(std::size_t k, const std::vector<int>& inverse, YAMLSequenceRemapper* toMerged,
-                     int& next) {
-    for (; k < inverse.size() && inverse[k] == -1; ++k) toMerged->m_Mapping[k] = next++;
-}
-
 } // namespace
 
-YAMLSequenceRemapper* YAMLSequenceRemapper::Merge(const YAMLSequenceRemapper* left,
-                                                  const YAMLSequenceRemapper* right,
-                                                  YAMLSequenceRemapper*& leftToMerged,
-                                                  YAMLSequenceRemapper*& rightToMerged,
-                                                  bool removeUnmatched) {
-    using Alloc = YAMLAlloc<YAMLSequenceRemapper>;
-    leftToMerged = Alloc::create(left->m_DestinationCount, left->m_DestinationCount, left->m_IsSet);
-    rightToMerged = Alloc::create(right->m_DestinationCount, right->m_DestinationCount, right->m_IsSet);
-    const std::vector<int> leftInverse = Invert(left), rightInverse = Invert(right);
-    int next = 0;
-    NumberAdditions(0, leftInverse, leftToMerged, next);
-    NumberAdditions(0, rightInverse, rightToMerged, next);
-    YAMLSequenceRemapper* merged = Alloc::create(left->m_Mapping.size(), 0, left->m_IsSet && right->m_IsSet);
-    for (std::size_t i = 0; i < left->m_Mapping.size(); ++i) {
-        const int l = TargetInDestination(left, i), r = TargetInDestination(right, i);
-        const bool goes = (l == -1 && r == -1) || (removeUnmatched && (l == -1 || r == -1));
-        if (!goes) {
-            if (l != -1) leftToMerged->m_Mapping[l] = next;
-            if (r != -1) rightToMerged->m_Mapping[r] = next;
-            merged->m_Mapping[i] = next++;
-        }
-        // What was added behind an element stays there, also if that element is gone from the merge.
-        if (l != -1) NumberAdditions(static_cast<std::size_t>(l) + 1, leftInverse, leftToMerged, next);
-        if (r != -1) NumberAdditions(static_cast<std::size_t>(r) + 1, rightInverse, rightToMerged, next);
-    }
-    merged->m_DestinationCount = static_cast<std::size_t>(next);
-    return merged;
-}
-
-const ChangeSequenceOperation* ChangeSequenceOperation::Merge(const ChangeSequenceOperation* left,
-                                                              const ChangeSequenceOperation* right,
-                                                              ConflictResolver& resolver,
-                                                              bool removeUnmatched) {
+const ChangeSequenceOperation* MergeSequenceChanges(const ChangeSequenceOperation* left,
+                                                    const ChangeSequenceOperation* right,
+                                                    ConflictResolver& resolver, bool removeUnmatched) {
     Side leftSide{left->m_Remapper, left->m_Diff}, rightSide{right->m_Remapper, right->m_Diff};
     const YAMLSequenceRemapper* baseMap = nullptr;
     if (leftSide.remapper && rightSide.remapper) {
-        const std::vector<Path>& keyPaths = MergeRules::SelectKeyPaths(resolver.m_Path.Elements());
-        if (!left->m_Diff->Entries().empty() && !right->m_Diff->Entries().empty() &&
-            keyPaths == MergeRules::defaultPath && resolver.m_Comparison.AreEqual(left, right))
+        const ListRule& rule = resolver.m_Rules.SelectKeyPaths(resolver.m_Path.Elements());
+        if (!left->m_Diff->Entries().empty() && !right->m_Diff->Entries().empty() && rule.isDefault &&
+            resolver.m_Comparison.AreEqual(left, right))
             return left;
-        if (leftSide.remapper->m_IsSet) MergeCommonAdditions(leftSide, rightSide, keyPaths, resolver);
+        if (leftSide.remapper->m_IsSet) MergeCommonAdditions(leftSide, rightSide, rule.keys, resolver);
         baseMap = MergeNumberings(leftSide, rightSide, removeUnmatched);
     } else {
         baseMap = TakeOnlyNumbering(leftSide, rightSide);
     }
     std::set<int> droppedIndexes;
     const YAMLSequenceDiff* merged =
-        YAMLSequenceDiff::Merge(leftSide.diff, rightSide.diff, droppedIndexes, resolver);
+        MergeSequenceDiffs(leftSide.diff, rightSide.diff, droppedIndexes, resolver);
     if (baseMap && baseMap->m_Mapping.empty()) baseMap = nullptr;
     // The indexes of the merged diff are not shifted along, and an element of the base that is dropped takes
     // its entry in the numbering with it: a list conflict that keeps the base can cost a later element its

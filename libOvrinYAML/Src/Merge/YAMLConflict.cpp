@@ -1,5 +1,6 @@
 #include "Merge/YAMLConflict.h"
 
+#include "Merge/OperationMerge.h"
 #include "Values/YAMLError.h"
 
 namespace ovrin_yaml {
@@ -18,7 +19,8 @@ void ConflictResolver::PopPath() {
     m_Path.Pop();
 }
 
-SidePickingConflictResolver::SidePickingConflictResolver(MergeResolve side) : m_Side(side) {
+SidePickingConflictResolver::SidePickingConflictResolver(const MergeRules& rules, MergeResolve side)
+    : ConflictResolver(rules), m_Side(side) {
     if (side != ResolveLeft && side != ResolveRight)
         throw YAMLError("SidePickingConflictResolver only accepts side left or right");
 }
@@ -49,7 +51,7 @@ const Operation* SidePickingConflictResolver::OnSameValueChanged(const RemoveOpe
 
 const Operation* SidePickingConflictResolver::OnSameMappingChanged(const ChangeMappingOperation* left,
                                                                    const ChangeMappingOperation* right) {
-    return ChangeMappingOperation::Merge(left, right, *this);
+    return MergeMappingChanges(left, right, *this);
 }
 
 const Operation* SidePickingConflictResolver::OnSameSequenceChanged(const ChangeSequenceOperation* left,

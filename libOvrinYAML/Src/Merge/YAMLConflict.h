@@ -1,7 +1,8 @@
 #pragma once
 
-#include "Diff/MergeTreeVisitors.h"
+#include "Diff/MergeRules.h"
 #include "Diff/Operation.h"
+#include "Diff/OperationComparison.h"
 #include "Merge/ConflictType.h"
 #include "Merge/MergeResolve.h"
 #include "Merge/PropertyPath.h"
@@ -25,6 +26,8 @@ struct ComponentDependencyConflict {
 /// A resolver serves one merge on one thread. `left` and `right` are the sides' operations for one key.
 class ConflictResolver {
 public:
+    /// The rules that the sides' diffs were made by. They must outlive the resolver and stay as they are.
+    const MergeRules& m_Rules;
     /// The path of the property being merged: the object's file id, then mapping keys and, for elements of
     /// sequences, the merged index (for elements added on both sides of a list with keys, the left index).
     /// The key list of any mapping has the path "_". The merge of key lists replaces the path as a whole.
@@ -74,6 +77,7 @@ public:
     const std::vector<const YAMLScalar*>& ChangedTransforms() const { return m_ChangedTransforms; }
 
 protected:
+    explicit ConflictResolver(const MergeRules& rules) : m_Rules(rules) {}
     ~ConflictResolver() = default;
 
 private:
@@ -85,7 +89,7 @@ private:
 class SidePickingConflictResolver final : public ConflictResolver {
 public:
     /// Throws YAMLError unless `side` is ResolveLeft or ResolveRight.
-    explicit SidePickingConflictResolver(MergeResolve side);
+    SidePickingConflictResolver(const MergeRules& rules, MergeResolve side);
 
     const Operation* OnSameValueAdded(const AddOperation* left, const AddOperation* right) override;
     const Operation* OnSameValueChanged(const ChangeOperation* left, const ChangeOperation* right) override;
@@ -107,6 +111,8 @@ private:
 /// Takes it for a defect when both sides touched a key, but for a removal on both: throws YAMLError.
 class ExceptionConflictResolver final : public ConflictResolver {
 public:
+    explicit ExceptionConflictResolver(const MergeRules& rules) : ConflictResolver(rules) {}
+
     [[noreturn]] const Operation* OnSameValueAdded(const AddOperation* left,
                                                    const AddOperation* right) override;
     [[noreturn]] const Operation* OnSameValueChanged(const ChangeOperation* left,

@@ -75,14 +75,14 @@ void PostProcessMergeOnly(YAMLMapping& merged, const YAMLMapping& left, const YA
     RestoreRepeatedKeys(merged);
 }
 
-void PostProcess(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
-                 RecordingConflictResolver& resolver, bool& hasComponentDependencyConflicts) {
+bool PostProcess(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
+                 const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver) {
     PostProcessMergeOnly(merged, left, right, resolver);
     const std::vector<ComponentDependencyConflict> conflicts =
-        FindComponentDependencyConflicts(merged, left, right, *GetTypeInfoManager());
+        FindComponentDependencyConflicts(merged, left, right, types);
     for (const ComponentDependencyConflict& conflict : conflicts)
         resolver.OnComponentDependencyConflict(conflict);
-    hasComponentDependencyConflicts = !conflicts.empty();
+    return !conflicts.empty();
 }
 
 } // namespace ovrin_yaml

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Merge/RecordingConflictResolver.h"
+#include "Repair/YAMLTypeInfo.h"
 
 namespace ovrin_yaml {
 
@@ -15,9 +16,9 @@ namespace ovrin_yaml {
 void PostProcessMergeOnly(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
                           ConflictResolver& resolver);
 
-/// The same, and then the check of component dependencies (ComponentDependencies.h). Tells in
-/// `hasComponentDependencyConflicts` whether that found any.
-void PostProcess(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
-                 RecordingConflictResolver& resolver, bool& hasComponentDependencyConflicts);
+/// The same, and then the check of component dependencies (ComponentDependencies.h) by `types`. Returns
+/// whether that found broken ones, each of which is a conflict.
+bool PostProcess(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
+                 const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver);
 
 } // namespace ovrin_yaml

@@ -72,11 +72,6 @@ const YAMLTypeInfo* YAMLTypeInfoManager::GetTypeInfo(const YAMLScalar* id) const
     return found == m_Types.end() ? nullptr : &found->second;
 }
 
-YAMLTypeInfoManager* GetTypeInfoManager() {
-    static YAMLTypeInfoManager manager;
-    return &manager;
-}
-
 void ReadCompactSerializedSet(std::string_view text, std::set<int>& result) {
     constexpr std::size_t kGroup = 8;
     for (; text.size() >= kGroup; text.remove_prefix(kGroup)) {

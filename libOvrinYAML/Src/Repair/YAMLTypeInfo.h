@@ -31,8 +31,8 @@ struct YAMLTypeInfo {
     void Read(const YAMLMapping* mapping);
 };
 
-/// The type information of a merge, by class id. Filled before threads are started, and only read from then
-/// on.
+/// The type information of a merge, by class id. A value: filled first, then only read, by any number of
+/// threads.
 class YAMLTypeInfoManager {
 public:
     /// Takes the list MergeTypeInfo of the object with file id 1, in place of what was read before. Of
@@ -51,9 +51,6 @@ private:
     std::unordered_map<const YAMLScalar*, YAMLTypeInfo> m_Types;
     bool m_IsLoaded = false;
 };
-
-/// The type information of this process.
-YAMLTypeInfoManager* GetTypeInfoManager();
 
 /// Adds the numbers of a compact set: 8 hexadecimal digits each, a 32-bit integer with its lowest byte first,
 /// so that "72000000" is 114. What is left behind the last whole group is ignored. Digits are not validated:

@@ -2,6 +2,7 @@
 
 #include "Diff/YAMLMappingDiff.h"
 #include "Merge/ConflictReport.h"
+#include "Merge/DiffMerge.h"
 #include "Repair/FileIDCollisions.h"
 #include "Repair/PostProcess.h"
 #include "Repair/PreProcess.h"
@@ -44,13 +45,20 @@ void MoveCollidingIDs(const YAMLMapping& base, const YAMLMapping& left, YAMLMapp
     RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
 }
 
-const YAMLMappingDiff* DiffFiles(const OvrinObjects& base, const OvrinObjects& changed) {
+const YAMLMappingDiff* DiffFiles(const MergeRules& rules, const OvrinObjects& base,
+                                 const OvrinObjects& changed) {
     const YAMLMappingDiff* diff = nullptr;
-    WithStage(Stage::Diff, [&] { diff = YAMLMappingDiff::Diff(&base.GetMapping(), &changed.GetMapping()); });
+    WithStage(Stage::Diff,
+              [&] { diff = YAMLMappingDiff::Diff(rules, &base.GetMapping(), &changed.GetMapping()); });
     return diff;
 }
 
 } // namespace
+
+void MergeSession::SetRules(MergeRules rules, YAMLTypeInfoManager types) {
+    m_Rules = std::move(rules);
+    m_Types = std::move(types);
+}
 
 void MergeSession::Read(const std::vector<InputFile>& files, StageWatcher* watcher, ReaderOptions options) {
     static constexpr const char* kSteps[] = {"Read base", "Read left", "Read right"};
@@ -76,18 +84,18 @@ void MergeSession::Diff(StageWatcher* watcher) {
     if (m_Threads != Threads::None && HasRight()) return DiffOnThreads(watcher);
     {
         const WatchedStep step(watcher, "Creating left diff");
-        m_LeftDiff = DiffFiles(m_Base, m_Left);
+        m_LeftDiff = DiffFiles(m_Rules, m_Base, m_Left);
     }
     if (!HasRight()) return;
     const WatchedStep step(watcher, "Creating right diff");
-    m_RightDiff = DiffFiles(m_Base, m_Right);
+    m_RightDiff = DiffFiles(m_Rules, m_Base, m_Right);
 }
 
 void MergeSession::DiffOnThreads(StageWatcher* watcher) {
     constexpr std::size_t kFewObjects = 1000;
     const bool isLittle = m_Threads == Threads::WhereWorthwhile && m_Base.GetMapping().Size() < kFewObjects;
-    Thread left([this] { m_LeftDiff = DiffFiles(m_Base, m_Left); }, isLittle);
-    Thread right([this] { m_RightDiff = DiffFiles(m_Base, m_Right); }, isLittle);
+    Thread left([this] { m_LeftDiff = DiffFiles(m_Rules, m_Base, m_Left); }, isLittle);
+    Thread right([this] { m_RightDiff = DiffFiles(m_Rules, m_Base, m_Right); }, isLittle);
     {
         const WatchedStep step(watcher, "Waiting for left diff");
         left.Join();
@@ -103,10 +111,9 @@ void MergeSession::Decide(std::vector<RecordResolve> decisions, MergeResolve byD
 }
 
 void MergeSession::Merge() {
-    m_Resolver.emplace(m_ByDefault);
+    m_Resolver.emplace(m_Rules, m_ByDefault);
     m_Resolver->SetResolveMethodForPaths(m_Decisions);
-    WithStage(Stage::Merge,
-              [&] { m_MergedDiff = YAMLMappingDiff::Merge(m_LeftDiff, m_RightDiff, *m_Resolver); });
+    WithStage(Stage::Merge, [&] { m_MergedDiff = MergeMappingDiffs(m_LeftDiff, m_RightDiff, *m_Resolver); });
 }
 
 void MergeSession::Apply(Base base) {
@@ -118,8 +125,8 @@ void MergeSession::Apply(Base base) {
 
 void MergeSession::Repair() {
     WithStage(Stage::Repair, [&] {
-        PostProcess(m_Result->GetMapping(), m_Left.GetMapping(), m_Right.GetMapping(), *m_Resolver,
-                    m_HasBrokenDependencies);
+        m_HasBrokenDependencies = PostProcess(m_Result->GetMapping(), m_Left.GetMapping(),
+                                              m_Right.GetMapping(), m_Types, *m_Resolver);
     });
 }
 
@@ -128,9 +135,9 @@ std::unique_ptr<OvrinObjects> MergeSession::Premerge(MergeResolve resolve) {
     // Its objects are marked as shared already, so that cloning it again only reads them.
     std::unique_ptr<OvrinObjects> result(m_Base.Clone());
     YAMLMapping& root = result->GetMapping();
-    RecordingConflictResolver resolver(resolve);
+    RecordingConflictResolver resolver(m_Rules, resolve);
     const YAMLMappingDiff* merged = nullptr;
-    WithStage(Stage::Merge, [&] { merged = YAMLMappingDiff::Merge(m_LeftDiff, m_RightDiff, resolver); });
+    WithStage(Stage::Merge, [&] { merged = MergeMappingDiffs(m_LeftDiff, m_RightDiff, resolver); });
     WithStage(Stage::Apply, [&] { merged->Apply(root); });
     WithStage(Stage::Repair,
               [&] { PostProcessMergeOnly(root, m_Left.GetMapping(), m_Right.GetMapping(), resolver); });

@@ -1,6 +1,8 @@
 #pragma once
 
+#include "Diff/MergeRules.h"
 #include "Merge/RecordingConflictResolver.h"
+#include "Repair/YAMLTypeInfo.h"
 #include "Session/MergeError.h"
 #include "Session/ReadInputs.h"
 #include "Values/OvrinObjects.h"
@@ -39,7 +41,7 @@ class YAMLMappingDiff;
 /// Every stage throws MergeError for what is wrong with the files, and std::bad_alloc where there is no
 /// memory. After a failure of Read, Prepare or Diff the session can only go; after one of a merge it may be
 /// merged again, with other decisions. It belongs to one thread at a time, Premerge aside, and must outlive
-/// all that it gives away. The rules must have been read, and stay.
+/// all that it gives away.
 class MergeSession {
 public:
     using Record = RecordingConflictResolver::Record;
@@ -53,6 +55,10 @@ public:
     explicit MergeSession(Threads threads = Threads::WhereWorthwhile) : m_Threads(threads) {}
     MergeSession(const MergeSession&) = delete;
     MergeSession& operator=(const MergeSession&) = delete;
+
+    /// What is known of the format of the files; wherever it stands ahead of Diff.
+    void SetRules(MergeRules rules, YAMLTypeInfoManager types = {});
+    const MergeRules& Rules() const { return m_Rules; }
 
     /// Reads base, left and, unless it is a session of two, right.
     void Read(const std::vector<InputFile>& files, StageWatcher* watcher = nullptr,
@@ -101,6 +107,8 @@ private:
     void DiffOnThreads(StageWatcher* watcher);
 
     const Threads m_Threads;
+    MergeRules m_Rules;
+    YAMLTypeInfoManager m_Types;
     std::vector<std::string> m_Names; // of base, left and right
     OvrinObjects m_Base, m_Left, m_Right;
     const YAMLMappingDiff* m_LeftDiff = nullptr;

@@ -7,33 +7,6 @@
 
 namespace ovrin_yaml {
 
-/// Deep copies of operation trees. A copy shares no value, diff or remapper with its source.
-class MergeTreeCloneVisitor {
-public:
-    static Operation* Clone(const Operation* operation);
-    /// The same with every scalar value replaced by the empty text: keys, lengths, structure and key order
-    /// stay.
-    static Operation* CloneBlank(const Operation* operation);
-
-private:
-    explicit MergeTreeCloneVisitor(bool blank) : m_Blank(blank) {}
-
-    Operation* Visit(const Operation* operation) const;
-    YAMLMappingDiff* Visit(const YAMLMappingDiff* diff) const;
-    YAMLSequenceDiff* Visit(const YAMLSequenceDiff* diff) const;
-    YAMLNode* CopyValue(const YAMLNode* value) const;
-
-    const bool m_Blank;
-};
-
-/// Replaces every scalar value below a container by the empty text.
-class YAMLNodeClearVisitor final : public YAMLNodeVisitor {
-public:
-    void Visit(const YAMLScalar&) override {}
-    void Visit(YAMLMapping& mapping) override;
-    void Visit(YAMLSequence& sequence) override;
-};
-
 /// Finds out whether two operations are the same change: of one kind, with equal values, at the same keys in
 /// the same order, with the same key order and the same moves. m_Mergeable doesn't count.
 ///
