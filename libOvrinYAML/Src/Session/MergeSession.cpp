@@ -24,11 +24,11 @@ template <class Step> void WithStage(Stage stage, const Step& step) {
     try {
         step();
     } catch (const YAMLError& error) {
-        throw MergeError(stage, "", error.what(), error.what());
+        throw MergeError(stage, "", error, error.what());
     } catch (const std::bad_alloc&) {
         throw;
     } catch (const std::exception& error) {
-        throw MergeError(stage, "", error.what(), error.what());
+        throw MergeError(stage, "", YAMLError(error.what()), error.what());
     }
 }
 
@@ -36,8 +36,7 @@ void PreProcessFile(const std::string& name, OvrinObjects& objects) {
     try {
         PreProcess(objects.GetMapping());
     } catch (const YAMLError& error) {
-        throw MergeError(Stage::Prepare, name, error.what(),
-                         "Cannot merge file '" + name + "': " + error.what());
+        throw MergeError(Stage::Prepare, name, error, "Cannot merge file '" + name + "': " + error.what());
     }
 }
 
@@ -51,6 +50,18 @@ const YAMLMappingDiff* DiffFiles(const MergeRules& rules, const OvrinObjects& ba
     WithStage(Stage::Diff,
               [&] { diff = YAMLMappingDiff::Diff(rules, &base.GetMapping(), &changed.GetMapping()); });
     return diff;
+}
+
+/// A failure is told with the object at which the resolver stood.
+const YAMLMappingDiff* MergeDiffs(const YAMLMappingDiff& left, const YAMLMappingDiff& right,
+                                  ConflictResolver& resolver) {
+    try {
+        return MergeMappingDiffs(&left, &right, resolver);
+    } catch (YAMLError& error) {
+        const Path& path = resolver.m_Path.Elements();
+        if (!path.empty()) error.SetPlace(path.front()->Value());
+        throw;
+    }
 }
 
 } // namespace
@@ -113,7 +124,7 @@ void MergeSession::Decide(std::vector<RecordResolve> decisions, MergeResolve byD
 void MergeSession::Merge() {
     m_Resolver.emplace(m_Rules, m_ByDefault);
     m_Resolver->SetResolveMethodForPaths(m_Decisions);
-    WithStage(Stage::Merge, [&] { m_MergedDiff = MergeMappingDiffs(m_LeftDiff, m_RightDiff, *m_Resolver); });
+    WithStage(Stage::Merge, [&] { m_MergedDiff = MergeDiffs(*m_LeftDiff, *m_RightDiff, *m_Resolver); });
 }
 
 void MergeSession::Apply(Base base) {
@@ -137,7 +148,7 @@ std::unique_ptr<OvrinObjects> MergeSession::Premerge(MergeResolve resolve) {
     YAMLMapping& root = result->GetMapping();
     RecordingConflictResolver resolver(m_Rules, resolve);
     const YAMLMappingDiff* merged = nullptr;
-    WithStage(Stage::Merge, [&] { merged = MergeMappingDiffs(m_LeftDiff, m_RightDiff, resolver); });
+    WithStage(Stage::Merge, [&] { merged = MergeDiffs(*m_LeftDiff, *m_RightDiff, resolver); });
     WithStage(Stage::Apply, [&] { merged->Apply(root); });
     WithStage(Stage::Repair,
               [&] { PostProcessMergeOnly(root, m_Left.GetMapping(), m_Right.GetMapping(), resolver); });

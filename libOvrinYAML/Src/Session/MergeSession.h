@@ -41,7 +41,8 @@ class YAMLMappingDiff;
 /// Every stage throws MergeError for what is wrong with the files, and std::bad_alloc where there is no
 /// memory. After a failure of Read, Prepare or Diff the session can only go; after one of a merge it may be
 /// merged again, with other decisions. It belongs to one thread at a time, Premerge aside, and must outlive
-/// all that it gives away.
+/// all that it gives away. What a merge takes of memory for decisions and changed objects stays until the
+/// process ends.
 class MergeSession {
 public:
     using Record = RecordingConflictResolver::Record;

@@ -20,18 +20,18 @@ namespace {
 /// Takes a step of reading a file. What it throws is thrown again with the name of the file, but for
 /// std::bad_alloc: no file is at fault.
 template <class Step> void WithFileName(const std::string& name, const Step& step) {
-    const auto fail = [&](const char* fault, const std::string& reason) {
+    const auto fail = [&](const char* fault, const YAMLError& reason) {
         throw MergeError(MergeError::Stage::Read, name, reason,
-                         "Error parsing file '" + name + "'" + fault + ": " + reason);
+                         "Error parsing file '" + name + "'" + fault + ": " + reason.what());
     };
     try {
         step();
     } catch (const YAMLError& error) {
-        fail("", error.what());
+        fail("", error);
     } catch (const std::bad_alloc&) {
         throw;
     } catch (const std::exception& error) {
-        fail(" caught unknown exception", error.what());
+        fail(" caught unknown exception", YAMLError(error.what()));
     }
 }
 
