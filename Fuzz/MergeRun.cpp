@@ -1,21 +1,15 @@
 #include "MergeRun.h"
 
-#include "Thread.h"
 #include "TreeComparison.h"
 
 #include "Diff/CheckDiff.h"
 #include "Merge/ConflictReport.h"
-#include "Merge/DiffMerge.h"
-#include "Merge/RecordingConflictResolver.h"
-#include "Repair/FileIDCollisions.h"
-#include "Repair/PostProcess.h"
-#include "Repair/PreProcess.h"
+#include "Session/MergeSession.h"
 #include "Writing/CheckTree.h"
 #include "Writing/ObjectFileWriter.h"
 
 #include <exception>
 #include <sstream>
-#include <vector>
 
 using namespace ovrin_yaml;
 
@@ -44,95 +38,84 @@ void Check(const char* when, const OvrinObjects& objects, TreeStage stage) {
     if (!fault.empty()) throw BrokenTree(std::string(when) + ": " + fault);
 }
 
-/// The diff, checked.
-const YAMLMappingDiff* Checked(const char* which, const YAMLMappingDiff* diff, DiffOrigin origin) {
-    const std::string fault = CheckDiff(*diff, origin);
+void CheckFiles(const char* when, MergeSession& session, TreeStage baseStage = TreeStage::Hashed) {
+    Check(when, session.BaseObjects(), baseStage);
+    Check(when, session.LeftObjects(), TreeStage::Hashed);
+    Check(when, session.RightObjects(), TreeStage::Hashed);
+}
+
+void CheckDiff(const char* which, const YAMLMappingDiff& diff, DiffOrigin origin) {
+    const std::string fault = CheckDiff(diff, origin);
     if (!fault.empty()) throw BrokenTree(std::string(which) + " diff: " + fault);
-    return diff;
-}
-
-void CheckAll(const char* when, const MergeFiles& files, TreeStage baseStage) {
-    Check(when, files.base, baseStage);
-    Check(when, files.left, TreeStage::Hashed);
-    Check(when, files.right, TreeStage::Hashed);
-}
-
-struct MergeDiffs {
-    const YAMLMappingDiff* left;
-    const YAMLMappingDiff* right;
-};
-
-/// The diffs to both sides, each on a thread of its own if so wanted.
-MergeDiffs Diff(const MergeFiles& files, const MergeWay& way) {
-    const YAMLMappingDiff* diffs[2];
-    const OvrinObjects* const sides[2] = {&files.left, &files.right};
-    std::vector<Thread> threads;
-    for (int i = 0; i < 2; ++i)
-        threads.emplace_back(
-            [&files, &way, &diffs, &sides, i] {
-                diffs[i] =
-                    YAMLMappingDiff::Diff(way.rules, &files.base.GetMapping(), &sides[i]->GetMapping());
-            },
-            !way.onThreads);
-    for (Thread& thread : threads) thread.Join();
-    for (const Thread& thread : threads) thread.CheckForExceptions();
-    return {Checked("left", diffs[0], DiffOrigin::Trees), Checked("right", diffs[1], DiffOrigin::Trees)};
 }
 
 /// All that comes before the merge itself.
-MergeDiffs Prepare(MergeFiles& files, const MergeWay& way) {
-    YAMLMapping &base = files.base.GetMapping(), &left = files.left.GetMapping(),
-                &right = files.right.GetMapping();
-    CheckAll("read", files, TreeStage::Hashed);
-    for (YAMLMapping* root : {&base, &left, &right}) PreProcess(*root);
-    RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
-    CheckAll("prepared", files, TreeStage::Hashed);
-    return Diff(files, way);
+std::shared_ptr<MergeSession> Prepare(const MergeWay& way) {
+    auto session = std::make_shared<MergeSession>(way.threads);
+    session->SetRules(way.rules);
+    session->Read(way.files(), nullptr, way.options);
+    CheckFiles("read", *session);
+    session->Prepare();
+    CheckFiles("prepared", *session);
+    session->Diff();
+    CheckDiff("left", session->LeftDiff(), DiffOrigin::Trees);
+    CheckDiff("right", session->RightDiff(), DiffOrigin::Trees);
+    return session;
 }
 
-void Merge(MergeFiles& files, const MergeRules& rules, const MergeDiffs& diffs, MergeOutcome& outcome) {
-    RecordingConflictResolver resolver(rules, ResolveBase);
-    const YAMLMappingDiff* merged =
-        Checked("merged", MergeMappingDiffs(diffs.left, diffs.right, resolver), DiffOrigin::Sides);
-    CheckAll("merged", files, TreeStage::Hashed);
-    merged->Apply(files.base.GetMapping());
-    CheckAll("applied", files, TreeStage::Changed);
-    PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), {}, resolver);
-    CheckAll("repaired", files, TreeStage::Changed);
-    outcome.report = Written([&](std::ostream& stream) { OutputConflictRecords(stream, resolver, true); });
-    outcome.result = Written([&](std::ostream& stream) { Output(files.base, stream); });
+void Merge(MergeSession& session, MergeResolve resolve, MergeSession::Base base) {
+    session.Decide({}, resolve);
+    session.Merge();
+    CheckDiff("merged", session.MergedDiff(), DiffOrigin::Sides);
+    CheckFiles("merged", session);
+    const TreeStage baseStage = base == MergeSession::Base::Kept ? TreeStage::Hashed : TreeStage::Changed;
+    session.Apply(base);
+    Check("applied", session.Result(), TreeStage::Changed);
+    CheckFiles("applied", session, baseStage);
+    session.Repair();
+    Check("repaired", session.Result(), TreeStage::Changed);
+    CheckFiles("repaired", session, baseStage);
 }
 
-std::string Premerge(const MergeRules& rules, MergeResolve resolve, OvrinObjects& base,
-                     const MergeFiles& sides, const MergeDiffs& diffs) {
-    RecordingConflictResolver resolver(rules, resolve);
-    MergeMappingDiffs(diffs.left, diffs.right, resolver)->Apply(base.GetMapping());
-    Check("premerge applied", base, TreeStage::Changed);
-    PostProcessMergeOnly(base.GetMapping(), sides.left.GetMapping(), sides.right.GetMapping(), resolver);
-    Check("premerge repaired", base, TreeStage::Changed);
-    return Written([&](std::ostream& stream) { Output(base, stream); });
+std::string Written(const OvrinObjects& objects) {
+    return Written([&](std::ostream& stream) { Output(objects, stream); });
+}
+
+void TakeResult(const MergeSession& session, MergeOutcome& outcome) {
+    outcome.report =
+        Written([&](std::ostream& stream) { OutputConflictRecords(stream, session.Resolver(), true); }) +
+        (session.HasBrokenDependencies() ? "broken dependencies" : "");
+    outcome.result = Written(session.Result());
 }
 
 constexpr MergeResolve kPremerges[] = {ResolveBlank, ResolveRight};
 
-void MergeAll(const MergeWay& way, MergeOutcome& outcome) {
-    const auto& [read, from, onThreads, rules] = way;
-    MergeFiles& files = *outcome.files;
-    read(files);
-    const MergeDiffs diffs = Prepare(files, way);
-    std::vector<std::unique_ptr<OvrinObjects>> clones;
-    if (from == PremergeFrom::Clone)
-        for (std::size_t i = 0; i < std::size(kPremerges); ++i) clones.emplace_back(files.base.Clone());
-    Merge(files, rules, diffs, outcome);
+/// One session for everything. An earlier merge of it, which may fail, leaves no trace.
+void MergeInOneSession(const MergeWay& way, MergeOutcome& outcome) {
+    MergeSession& session = *(outcome.session = Prepare(way));
+    try {
+        Merge(session, ResolveRight, MergeSession::Base::Kept);
+    } catch (const MergeError&) {
+    }
+    Merge(session, ResolveBase, MergeSession::Base::Kept);
+    TakeResult(session, outcome);
     for (std::size_t i = 0; i < std::size(kPremerges); ++i) {
-        if (from == PremergeFrom::Clone) {
-            outcome.premerged[i] = Premerge(rules, kPremerges[i], *clones[i], files, diffs);
-        } else {
-            MergeFiles again;
-            read(again);
-            const MergeDiffs ownDiffs = Prepare(again, way);
-            outcome.premerged[i] = Premerge(rules, kPremerges[i], again.base, again, ownDiffs);
-        }
+        const std::unique_ptr<OvrinObjects> premerged = session.Premerge(kPremerges[i]);
+        Check("premerged", *premerged, TreeStage::Changed);
+        outcome.premerged[i] = Written(*premerged);
+    }
+    CheckFiles("premerged", session);
+}
+
+/// A session for each result, which is built in its base.
+void MergeInSessions(const MergeWay& way, MergeOutcome& outcome) {
+    outcome.session = Prepare(way);
+    Merge(*outcome.session, ResolveBase, MergeSession::Base::UsedUp);
+    TakeResult(*outcome.session, outcome);
+    for (std::size_t i = 0; i < std::size(kPremerges); ++i) {
+        const std::shared_ptr<MergeSession> session = Prepare(way);
+        Merge(*session, kPremerges[i], MergeSession::Base::UsedUp);
+        outcome.premerged[i] = Written(session->Result());
     }
 }
 
@@ -140,10 +123,9 @@ void MergeAll(const MergeWay& way, MergeOutcome& outcome) {
 
 MergeOutcome RunMerge(const MergeWay& way) {
     MergeOutcome outcome;
-    outcome.files = std::make_shared<MergeFiles>();
     outcome.failure = "none";
     try {
-        MergeAll(way, outcome);
+        (way.sessions == Sessions::One ? MergeInOneSession : MergeInSessions)(way, outcome);
     } catch (const YAMLError& error) {
         outcome.failure = error.what();
     } catch (const YAMLError* error) { // of a cycle that can't be broken
@@ -167,11 +149,11 @@ std::string CompareOutcomes(const MergeOutcome& expected, const MergeOutcome& ac
                              compare("result", expected.result, actual.result) +
                              compare("premerged with blanks", expected.premerged[0], actual.premerged[0]) +
                              compare("premerged right", expected.premerged[1], actual.premerged[1]);
-    // A failed reading leaves what it has, which depends on the order.
     if (!difference.empty() || expected.failure != "none") return difference;
-    for (const auto file : {&MergeFiles::base, &MergeFiles::left, &MergeFiles::right})
-        difference += FirstDifference((expected.files.get()->*file).GetMapping(),
-                                      (actual.files.get()->*file).GetMapping());
+    MergeSession &one = *expected.session, &other = *actual.session;
+    difference = FirstDifference(one.Result().GetMapping(), other.Result().GetMapping()) +
+                 FirstDifference(one.LeftObjects().GetMapping(), other.LeftObjects().GetMapping()) +
+                 FirstDifference(one.RightObjects().GetMapping(), other.RightObjects().GetMapping());
     return difference.empty() ? "" : "trees after the merge:" + difference;
 }
 

@@ -1,19 +1,14 @@
 #pragma once
 
-#include "Diff/MergeRules.h"
-#include "Values/OvrinObjects.h"
+#include "Session/MergeSession.h"
 
 #include <array>
 #include <functional>
 #include <memory>
 #include <string>
+#include <vector>
 
 namespace ovrin_fuzz {
-
-/// The three files of a merge. The result is built in the base.
-struct MergeFiles {
-    ovrin_yaml::OvrinObjects base, left, right;
-};
 
 /// All that a merge gives.
 struct MergeOutcome {
@@ -22,19 +17,20 @@ struct MergeOutcome {
     std::string report;     // with the decisions that were no conflicts
     std::string result;
     std::array<std::string, 2> premerged; // with blanks and with the right side's values at conflicts
-    std::shared_ptr<MergeFiles> files;    // as they are at the end
+    std::shared_ptr<ovrin_yaml::MergeSession> session; // of the result
 };
 
-/// Where the premerged files begin.
-enum class PremergeFrom {
-    Clone,  // the base as it was copied before the merge, with the sides that the merge used
-    Reading // files that are read once more for each
+/// Which sessions give the result and the premerged files.
+enum class Sessions {
+    One,    // merged again and again, with its base kept
+    OneEach // each with files that are read once more, and with its base used up
 };
 
 struct MergeWay {
-    std::function<void(MergeFiles&)> read; // reads the three files
-    PremergeFrom from = PremergeFrom::Clone;
-    bool onThreads = false; // the diffs are made on two threads
+    std::function<std::vector<ovrin_yaml::InputFile>()> files;
+    ovrin_yaml::ReaderOptions options;
+    ovrin_yaml::Threads threads = ovrin_yaml::Threads::None;
+    Sessions sessions = Sessions::One;
     ovrin_yaml::MergeRules rules = {};
 };
 

@@ -16,7 +16,7 @@ namespace {
 std::string Read(const std::string& text, RecordingConflictResolver& resolver) {
     std::istringstream stream(text);
     try {
-        InputConflictRecords(stream, resolver);
+        resolver.SetResolveMethodForPaths(ReadDecisions(stream));
     } catch (const std::runtime_error& error) {
         return error.what();
     }

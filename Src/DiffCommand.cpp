@@ -3,11 +3,13 @@
 #include "CommandSettings.h"
 #include "Destination.h"
 #include "DriverErrors.h"
+#include "InputFiles.h"
 #include "TimerStat.h"
 #include "TwoFiles.h"
 
 #include "Diff/DiffText.h"
 #include "Diff/YAMLDiffOutput.h"
+#include "Session/MergeSession.h"
 
 #include <iostream>
 #include <sstream>
@@ -15,14 +17,14 @@
 ExitStatus HandleDiffCommand(DiffConfig& config) {
     constexpr std::size_t kIndentWidth = 2;
     TimerStat root("Diff Command", config.timing ? &std::cout : nullptr);
-    TwoFiles files;
-    ReadAndDiff(root, config, files);
+    ovrin_yaml::MergeSession session(ThreadsOf(config.useThreads));
+    ReadAndDiff(root, config, session);
     TimerStat timer(root, "Output diff");
     // The text is complete before the destination is touched: an object that can't be shown ends the command.
     std::ostringstream text;
     text << "Diff '" << config.leftFile << "' vs. '" << config.rightFile << "':\n";
     ovrin_yaml::YAMLDiffOutput output(text, kIndentWidth);
-    ovrin_yaml::OutputDiff(*files.diff, output);
+    ovrin_yaml::OutputDiff(session.LeftDiff(), output);
     output.Finish();
     const int error =
         Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});

@@ -1,30 +1,24 @@
 #include "InputFiles.h"
 
 #include "CommandSettings.h"
-#include "Diff/RulesReader.h"
 #include "FileUtils.h"
+#include "TimerStat.h"
 
-#include <exception>
+#include "Diff/RulesReader.h"
+#include "Session/ReadInputs.h"
+
 #include <sstream>
 
 using namespace ovrin_yaml;
 
-void TakeFile(const std::string& path, ObjectFile& file) {
-    std::string bytes;
-    const ReadResult result = ReadWholeFile(path, bytes);
-    if (result == ReadResult::CannotOpen) throw YAMLError("Cannot open file");
-    if (result == ReadResult::CannotRead) throw YAMLError("Cannot read file");
-    file.Take(std::move(bytes));
-}
-
-void ReadYAMLPath(const std::string& path, OvrinObjects& objects) {
-    WithFileName(path, [&] {
-        ObjectFile file(objects, {});
-        TakeFile(path, file);
-        file.Cut(nullptr);
-        for (std::size_t piece = 0; piece < file.PieceCount(); ++piece) file.ReadPiece(piece);
-        file.Finish();
-    });
+InputFile FileInput(const std::string& path) {
+    return {path, FileSize(path), [path] {
+                std::string bytes;
+                const ReadResult result = ReadWholeFile(path, bytes);
+                if (result == ReadResult::CannotOpen) throw YAMLError("Cannot open file");
+                if (result == ReadResult::CannotRead) throw YAMLError("Cannot read file");
+                return bytes;
+            }};
 }
 
 MergeRules SetupRules(const std::string& rulesFile) {
@@ -41,8 +35,22 @@ MergeRules SetupRules(const std::string& rulesFile) {
 
 YAMLTypeInfoManager SetupTypeInfo(const std::string& typeInfoFile) {
     OvrinObjects objects;
-    ReadYAMLPath(typeInfoFile, objects);
+    const InputFile input = FileInput(typeInfoFile);
+    ReadInputs({{"Read type info", &input, &objects}}, Threads::None, nullptr, {});
     YAMLTypeInfoManager types;
     types.Read(objects);
     return types;
+}
+
+RulesAndTypes SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
+                                 const std::string& typeInfoFile) {
+    RulesAndTypes read;
+    {
+        TimerStat timer(reading, "Reading unique keys");
+        read.rules = SetupRules(rulesFile);
+    }
+    if (typeInfoFile == kDefaultTypeInfoFile) return read;
+    TimerStat timer(root, "Read type info");
+    read.types = SetupTypeInfo(typeInfoFile);
+    return read;
 }

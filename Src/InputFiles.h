@@ -1,34 +1,21 @@
 #pragma once
 
 #include "Diff/MergeRules.h"
-#include "Reading/ObjectFile.h"
 #include "Repair/YAMLTypeInfo.h"
-#include "Values/YAMLError.h"
+#include "Session/InputFile.h"
+#include "Session/Thread.h"
 
-#include <exception>
-#include <new>
 #include <string>
 
-/// Takes a step of reading the file `path`. What it throws is thrown again as YAMLError with the path and the
-/// fault, but for std::bad_alloc: no file is at fault.
-template <class Step> void WithFileName(const std::string& path, const Step& step) {
-    try {
-        step();
-    } catch (const ovrin_yaml::YAMLError& error) {
-        throw ovrin_yaml::YAMLError("Error parsing file '" + path + "': " + error.what());
-    } catch (const std::bad_alloc&) {
-        throw;
-    } catch (const std::exception& error) {
-        throw ovrin_yaml::YAMLError("Error parsing file '" + path +
-                                    "' caught unknown exception: " + error.what());
-    }
+class TimerStat;
+
+/// The object file at `path`. Taking it throws YAMLError for a file that can't be read.
+ovrin_yaml::InputFile FileInput(const std::string& path);
+
+/// What the option for threads means to the library.
+inline ovrin_yaml::Threads ThreadsOf(bool useThreads) {
+    return useThreads ? ovrin_yaml::Threads::WhereWorthwhile : ovrin_yaml::Threads::None;
 }
-
-/// The first step of reading an object file. Throws YAMLError for a file that can't be read.
-void TakeFile(const std::string& path, ovrin_yaml::ObjectFile& file);
-
-/// Reads an object file into `objects`, which must be empty. Throws YAMLError with the path and the fault.
-void ReadYAMLPath(const std::string& path, ovrin_yaml::OvrinObjects& objects);
 
 /// Reads the rules file of that name, "auto" being the one beside the executable. Throws YAMLError if the
 /// file can't be read and std::runtime_error for a bad line.
@@ -37,3 +24,14 @@ ovrin_yaml::MergeRules SetupRules(const std::string& rulesFile);
 /// Reads the type information of that object file. Throws YAMLError if the file can't be read and
 /// std::runtime_error for a bad entry.
 ovrin_yaml::YAMLTypeInfoManager SetupTypeInfo(const std::string& typeInfoFile);
+
+/// What the user's files tell about the format of object files.
+struct RulesAndTypes {
+    ovrin_yaml::MergeRules rules;
+    ovrin_yaml::YAMLTypeInfoManager types; // not loaded if there is no such file
+};
+
+/// Reads the rules and, if there is one, the type info file, before any object file is read. `reading` is the
+/// stage that this belongs to, `root` its parent. Throws as SetupRules and SetupTypeInfo do.
+RulesAndTypes SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
+                                 const std::string& typeInfoFile);

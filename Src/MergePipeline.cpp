@@ -6,105 +6,39 @@
 #include "DriverErrors.h"
 #include "ErrMsg.h"
 #include "FileUtils.h"
+#include "InputFiles.h"
 #include "OutputFile.h"
 #include "Premerge.h"
-#include "ReadInputs.h"
-#include "Thread.h"
-#include "TimerStat.h"
+#include "StepTimers.h"
 
-#include "Diff/YAMLMappingDiff.h"
 #include "Merge/ConflictReport.h"
-#include "Merge/DiffMerge.h"
-#include "Merge/RecordingConflictResolver.h"
-#include "Repair/FileIDCollisions.h"
-#include "Repair/PostProcess.h"
-#include "Repair/PreProcess.h"
-#include "Values/OvrinObjects.h"
-#include "Values/YAMLError.h"
+#include "Session/MergeSession.h"
 #include "Writing/ObjectFileWriter.h"
 
 #include <iostream>
-#include <memory>
 #include <sstream>
 
 using namespace ovrin_yaml;
 
 namespace {
 
-/// The three files of a merge. The result is built in the base.
-struct MergeFiles {
-    OvrinObjects base, left, right;
-};
-
-struct MergeDiffs {
-    const YAMLMappingDiff* left = nullptr;
-    const YAMLMappingDiff* right = nullptr;
-};
-
-RulesAndTypes ReadFiles(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
+void ReadFiles(TimerStat& root, const MergeConfig& config, MergeSession& session) {
     TimerStat timer(root, "Read files");
-    RulesAndTypes rulesAndTypes = SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
-    ReadInputs(timer, config.useThreads,
-               {{"Read base", &config.baseFile, &files.base},
-                {"Read left", &config.leftFile, &files.left},
-                {"Read right", &config.rightFile, &files.right}});
-    return rulesAndTypes;
+    auto [rules, types] = SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
+    session.SetRules(std::move(rules), std::move(types));
+    StepTimers steps(timer);
+    session.Read({FileInput(config.baseFile), FileInput(config.leftFile), FileInput(config.rightFile)},
+                 &steps);
 }
 
-void PreProcessFile(const std::string& path, OvrinObjects& objects) {
-    try {
-        PreProcess(objects.GetMapping());
-    } catch (const YAMLError& error) {
-        throw YAMLError("Cannot merge file '" + path + "': " + error.what());
-    }
-}
-
-void PreProcessMappings(TimerStat& root, const MergeConfig& config, MergeFiles& files) {
-    TimerStat timer(root, "Preprocess mappings");
-    PreProcessFile(config.baseFile, files.base);
-    PreProcessFile(config.leftFile, files.left);
-    PreProcessFile(config.rightFile, files.right);
-    const YAMLMapping& base = files.base.GetMapping();
-    const YAMLMapping& left = files.left.GetMapping();
-    YAMLMapping& right = files.right.GetMapping();
-    RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
-}
-
-MergeDiffs DiffOnThreads(TimerStat& timer, const MergeRules& rules, const MergeFiles& files) {
-    constexpr std::size_t kFewObjects = 1000;
-    const YAMLMapping& base = files.base.GetMapping();
-    const bool isLittle = base.Size() < kFewObjects;
-    MergeDiffs diffs;
-    Thread left([&] { diffs.left = YAMLMappingDiff::Diff(rules, &base, &files.left.GetMapping()); },
-                isLittle);
-    Thread right([&] { diffs.right = YAMLMappingDiff::Diff(rules, &base, &files.right.GetMapping()); },
-                 isLittle);
-    {
-        TimerStat waitTimer(timer, "Waiting for left diff");
-        left.Join();
-        right.Join();
-    }
-    left.CheckForExceptions();
-    right.CheckForExceptions();
-    return diffs;
-}
-
-MergeDiffs CreateDiffs(TimerStat& root, const MergeConfig& config, const MergeRules& rules,
-                       const MergeFiles& files) {
+void CreateDiffs(TimerStat& root, MergeSession& session) {
     TimerStat timer(root, "Creating diffs");
-    if (config.useThreads) return DiffOnThreads(timer, rules, files);
-    MergeDiffs diffs;
-    {
-        TimerStat leftTimer(timer, "Creating left diff");
-        diffs.left = YAMLMappingDiff::Diff(rules, &files.base.GetMapping(), &files.left.GetMapping());
-    }
-    TimerStat rightTimer(timer, "Creating right diff");
-    diffs.right = YAMLMappingDiff::Diff(rules, &files.base.GetMapping(), &files.right.GetMapping());
-    return diffs;
+    StepTimers steps(timer);
+    session.Diff(&steps);
 }
 
 /// False, after a message, if the file can't be read.
-bool ReadResolveFile(TimerStat& root, const MergeConfig& config, RecordingConflictResolver& resolver) {
+bool ReadResolveFile(TimerStat& root, const MergeConfig& config, std::vector<RecordResolve>& decisions) {
     if (config.resolveFile.empty()) return true;
     TimerStat timer(root, "Reading resolve file");
     std::string text;
@@ -114,25 +48,21 @@ bool ReadResolveFile(TimerStat& root, const MergeConfig& config, RecordingConfli
         return false;
     }
     std::istringstream stream(std::move(text));
-    InputConflictRecords(stream, resolver);
+    decisions = ReadDecisions(stream);
     return true;
 }
 
-/// Null where no premerge can follow: nobody else reads the base once it is changed.
-std::unique_ptr<OvrinObjects> CloneBase(TimerStat& root, const MergeConfig& config, OvrinObjects& base) {
-    TimerStat timer(root, "Cloning base roots");
-    if (config.premergeBaseDest.empty() || config.premergeRightDest.empty()) return nullptr;
-    return std::unique_ptr<OvrinObjects>(base.Clone());
+/// The base is needed again where a premerge can follow.
+MergeSession::Base UseOfBase(const MergeConfig& config) {
+    const bool mayPremerge = !config.premergeBaseDest.empty() && !config.premergeRightDest.empty();
+    return mayPremerge ? MergeSession::Base::Kept : MergeSession::Base::UsedUp;
 }
 
-/// Returns whether component dependencies were found broken.
-bool ApplyMergedChanges(TimerStat& root, const YAMLMappingDiff& merged, MergeFiles& files,
-                        const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver) {
+void ApplyMergedChanges(TimerStat& root, const MergeConfig& config, MergeSession& session) {
     TimerStat timer(root, "Applying merged changes");
-    merged.Apply(files.base.GetMapping());
+    session.Apply(UseOfBase(config));
     TimerStat postTimer(timer, "Post process merged changes");
-    return PostProcess(files.base.GetMapping(), files.left.GetMapping(), files.right.GetMapping(), types,
-                       resolver);
+    session.Repair();
 }
 
 /// A report that can't be written is lost without a word, but for one that shares standard output with the
@@ -152,8 +82,8 @@ int OutputResult(TimerStat& root, const std::string& path, const OvrinObjects& r
 
 /// Premerged files that can't be written are lost without a word where nobody is to work on them. Returns
 /// Done; Failed, after a message, if a tool would.
-ExitStatus PremergeForTool(TimerStat& root, const MergeConfig& config, const PremergeInputs& inputs) {
-    const PremergeErrors errors = PremergeBoth(root, config, inputs);
+ExitStatus PremergeForTool(TimerStat& root, const MergeConfig& config, MergeSession& session) {
+    const PremergeErrors errors = PremergeBoth(root, config, session);
     if (!config.premerge || config.fallbackSpecFile == kNoSpecFile) return ExitStatus::Done;
     if (errors.base) return FailToWrite(config.premergeBaseDest, errors.base);
     if (errors.right) return FailToWrite(config.premergeRightDest, errors.right);
@@ -164,27 +94,29 @@ ExitStatus PremergeForTool(TimerStat& root, const MergeConfig& config, const Pre
 
 ExitStatus HandleMergeCommand(const MergeConfig& config, const std::string& outputPath) {
     TimerStat root("Merging", config.timing ? &std::cout : nullptr);
-    MergeFiles files;
-    const RulesAndTypes known = ReadFiles(root, config, files);
-    RecordingConflictResolver resolver(known.rules, config.resolve);
+    MergeSession session(ThreadsOf(config.useThreads));
+    ReadFiles(root, config, session);
     { TimerStat timer(root, "Creating mappings"); }
-    PreProcessMappings(root, config, files);
-    const MergeDiffs diffs = CreateDiffs(root, config, known.rules, files);
-    if (!ReadResolveFile(root, config, resolver)) return ExitStatus::Failed;
-    const YAMLMappingDiff* merged = nullptr;
+    {
+        TimerStat timer(root, "Preprocess mappings");
+        session.Prepare();
+    }
+    CreateDiffs(root, session);
+    std::vector<RecordResolve> decisions;
+    if (!ReadResolveFile(root, config, decisions)) return ExitStatus::Failed;
+    session.Decide(std::move(decisions), config.resolve);
     {
         TimerStat timer(root, "Merging");
-        merged = MergeMappingDiffs(diffs.left, diffs.right, resolver);
+        session.Merge();
     }
-    const std::unique_ptr<OvrinObjects> baseClone = CloneBase(root, config, files.base);
-    const bool hasComponentDependencyConflicts =
-        ApplyMergedChanges(root, *merged, files, known.types, resolver);
-    if (const int error = OutputConflicts(root, config, resolver)) return FailToWrite({}, error);
-    if (const int error = OutputResult(root, outputPath, files.base)) return FailToWrite(outputPath, error);
-    if (!resolver.HasPendingConflicts()) return ExitStatus::Done;
-    if (baseClone && PremergeForTool(root, config,
-                                     {known.rules, *baseClone, files.left.GetMapping(),
-                                      files.right.GetMapping(), diffs.left, diffs.right}) != ExitStatus::Done)
+    { TimerStat timer(root, "Cloning base roots"); }
+    ApplyMergedChanges(root, config, session);
+    if (const int error = OutputConflicts(root, config, session.Resolver())) return FailToWrite({}, error);
+    if (const int error = OutputResult(root, outputPath, session.Result()))
+        return FailToWrite(outputPath, error);
+    if (!session.Resolver().HasPendingConflicts()) return ExitStatus::Done;
+    if (UseOfBase(config) == MergeSession::Base::Kept &&
+        PremergeForTool(root, config, session) != ExitStatus::Done)
         return ExitStatus::Failed;
-    return hasComponentDependencyConflicts ? ExitStatus::BrokenDependencies : ExitStatus::Conflicts;
+    return session.HasBrokenDependencies() ? ExitStatus::BrokenDependencies : ExitStatus::Conflicts;
 }

@@ -3,10 +3,12 @@
 #include "CommandSettings.h"
 #include "Destination.h"
 #include "DriverErrors.h"
+#include "InputFiles.h"
 #include "TimerStat.h"
 #include "TwoFiles.h"
 
 #include "Diff/YAMLMappingDiff.h"
+#include "Session/MergeSession.h"
 #include "Values/YAMLMapping.h"
 #include "Writing/ObjectFileWriter.h"
 
@@ -39,14 +41,14 @@ void StripUnchangedMapping(YAMLMapping& mapping, const YAMLMappingDiff& diff) {
 
 ExitStatus HandleStripCommand(StripConfig& config) {
     TimerStat root("Strip Command", config.timing ? &std::cout : nullptr);
-    TwoFiles files;
-    ReadAndDiff(root, config, files);
-    StripUnchangedMapping(files.right.GetMapping(), *files.diff);
+    MergeSession session(ThreadsOf(config.useThreads));
+    ReadAndDiff(root, config, session);
+    StripUnchangedMapping(session.LeftObjects().GetMapping(), session.LeftDiff());
     TimerStat timer(root, "Output result");
     // The text is complete before the destination is touched: an object that can't be written ends the
     // command.
     std::ostringstream text;
-    Output(files.right, text);
+    Output(session.LeftObjects(), text);
     const int error =
         Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});
     return error ? FailToWrite(config.destFile, error) : ExitStatus::Done;

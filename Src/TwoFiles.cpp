@@ -1,31 +1,42 @@
 #include "TwoFiles.h"
 
 #include "CommandSettings.h"
-#include "ReadInputs.h"
-#include "TimerStat.h"
+#include "InputFiles.h"
+#include "StepTimers.h"
 
-#include "Diff/YAMLMappingDiff.h"
-#include "Repair/PreProcess.h"
+#include "Session/MergeSession.h"
 
 using namespace ovrin_yaml;
 
-void ReadAndDiff(TimerStat& root, const TwoFileConfig& config, TwoFiles& files) {
-    MergeRules rules;
-    {
-        TimerStat timer(root, "Read files");
-        rules = SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile).rules;
-        // The left file plays the base and the right one the changed side, in the names too.
-        ReadInputs(
-            timer, config.useThreads,
-            {{"Read base", &config.leftFile, &files.left}, {"Read left", &config.rightFile, &files.right}});
-    }
-    { TimerStat timer(root, "Creating mappings"); }
-    {
-        TimerStat timer(root, "Preprocess mappings");
-        PreProcess(files.left.GetMapping());
-        PreProcess(files.right.GetMapping());
-    }
+namespace {
+
+void ReadFiles(TimerStat& root, const TwoFileConfig& config, MergeSession& session) {
+    TimerStat timer(root, "Read files");
+    auto [rules, types] = SetupRulesAndTypes(root, timer, config.rulesFile, config.typeInfoFile);
+    session.SetRules(std::move(rules), std::move(types));
+    StepTimers steps(timer);
+    session.Read({FileInput(config.leftFile), FileInput(config.rightFile)}, &steps);
+}
+
+void CreateDiff(TimerStat& root, MergeSession& session) {
     TimerStat timer(root, "Creating diff");
-    TimerStat diffTimer(timer, "Creating left diff");
-    files.diff = YAMLMappingDiff::Diff(rules, &files.left.GetMapping(), &files.right.GetMapping());
+    StepTimers steps(timer);
+    session.Diff(&steps);
+}
+
+} // namespace
+
+void ReadAndDiff(TimerStat& root, const TwoFileConfig& config, MergeSession& session) {
+    try {
+        ReadFiles(root, config, session);
+        { TimerStat timer(root, "Creating mappings"); }
+        {
+            TimerStat timer(root, "Preprocess mappings");
+            session.Prepare();
+        }
+        CreateDiff(root, session);
+    } catch (const MergeError& error) {
+        // These commands die of it, and the system tells its type. Nothing is told of a merge.
+        throw YAMLError(error.stage == MergeError::Stage::Prepare ? error.reason : error.what());
+    }
 }

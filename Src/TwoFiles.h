@@ -1,19 +1,13 @@
 #pragma once
 
-#include "Values/OvrinObjects.h"
-
 struct TwoFileConfig;
 class TimerStat;
 
 namespace ovrin_yaml {
-class YAMLMappingDiff;
+class MergeSession;
 }
 
-/// Two object files and what makes the left one the right one: the front half of `diff` and `strip`.
-struct TwoFiles {
-    ovrin_yaml::OvrinObjects left, right;
-    const ovrin_yaml::YAMLMappingDiff* diff = nullptr; // points into `right`
-};
-
-/// Reads, pre-processes and diffs the files. Throws YAMLError and the standard family.
-void ReadAndDiff(TimerStat& root, const TwoFileConfig& config, TwoFiles& files);
+/// Reads, pre-processes and diffs two object files, the front half of `diff` and `strip`: a session in which
+/// the left file plays the base and the right one the left side. Throws YAMLError, no MergeError, and the
+/// standard family.
+void ReadAndDiff(TimerStat& root, const TwoFileConfig& config, ovrin_yaml::MergeSession& session);

@@ -71,7 +71,7 @@ std::string Decisions(const std::string& file) {
     std::istringstream in(file);
     std::ostringstream out;
     try {
-        InputConflictRecords(in, resolver);
+        resolver.SetResolveMethodForPaths(ReadDecisions(in));
     } catch (const std::runtime_error& error) {
         EXPECT_EQ(resolver.Resolves().size(), 1u) << "the old ones stay";
         return error.what();

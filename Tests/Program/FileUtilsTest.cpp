@@ -2,6 +2,7 @@
 
 #include "ErrorOf.h"
 #include "InputFiles.h"
+#include "Session/MergeSession.h"
 
 #include <gtest/gtest.h>
 
@@ -25,8 +26,7 @@ public:
 };
 
 std::string ReadError(const std::string& path) {
-    ovrin_yaml::OvrinObjects objects;
-    return ErrorOf([&] { ReadYAMLPath(path, objects); });
+    return ErrorOf([&] { ovrin_yaml::MergeSession().Read({FileInput(path), FileInput(path)}); });
 }
 
 TEST(FileUtils, TheExtensionStandsBehindTheLastDotOfThePath) {

@@ -1,9 +1,8 @@
-#include "ReadInputs.h"
+#include "InputFiles.h"
 #include "MergeRun.h"
 #include "SceneGenerator.h"
 #include "Support/Diffs.h"
 #include "Support/Program.h"
-#include "TimerStat.h"
 
 #include <sstream>
 
@@ -24,14 +23,11 @@ protected:
     }
 
     MergeOutcome Merge(bool useThreads, ReaderOptions options) const {
-        const std::string base = m_Directory.Path() / "base", left = m_Directory.Path() / "left",
-                          right = m_Directory.Path() / "right";
-        return RunMerge({[&](MergeFiles& files) {
-            TimerStat timer("Read files", nullptr);
-            ReadInputs(timer, useThreads,
-                       {{"", &base, &files.base}, {"", &left, &files.left}, {"", &right, &files.right}},
-                       options);
-        }});
+        const auto files = [&]() -> std::vector<InputFile> {
+            return {FileInput(m_Directory.Path() / "base"), FileInput(m_Directory.Path() / "left"),
+                    FileInput(m_Directory.Path() / "right")};
+        };
+        return RunMerge({files, options, ThreadsOf(useThreads)});
     }
 
     /// Of all options and both orders; the first difference from the library's reading in turn.

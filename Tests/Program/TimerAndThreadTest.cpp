@@ -1,4 +1,4 @@
-#include "Thread.h"
+#include "Session/Thread.h"
 #include "TimerStat.h"
 #include "Values/YAMLError.h"
 
@@ -9,6 +9,8 @@
 #include <vector>
 
 namespace {
+
+using ovrin_yaml::Thread;
 
 /// The lines without the times, which are bare numbers.
 std::string Stages(const std::ostringstream& output) {

@@ -24,7 +24,7 @@ std::string Records(const RecordingConflictResolver& resolver, bool withMerged) 
 MergeOutput Merge(const MergeInput& input) {
     RecordingConflictResolver resolver(TheRules(), input.byDefault);
     std::istringstream decisions("Conflict handling:\n" + input.decisions);
-    InputConflictRecords(decisions, resolver);
+    resolver.SetResolveMethodForPaths(ReadDecisions(decisions));
     const YAMLMappingDiff* left = DiffOf(input.base, input.left);
     const YAMLMappingDiff* right = DiffOf(input.base, input.right);
     const YAMLMappingDiff* merged = MergeMappingDiffs(left, right, resolver);

@@ -162,7 +162,14 @@ void OutputConflictRecords(std::ostream& out, const RecordingConflictResolver& r
     output.Finish();
 }
 
-void InputConflictRecords(std::istream& in, RecordingConflictResolver& resolver) {
+std::vector<const Record*> PendingByPath(const std::vector<Record>& records) {
+    std::vector<const Record*> pending;
+    for (const auto& [rank, record] : RecordsByPath(records, false))
+        if (record->resolve == ResolveConflict) pending.push_back(record);
+    return pending;
+}
+
+std::vector<RecordResolve> ReadDecisions(std::istream& in) {
     std::vector<RecordResolve> resolves;
     bool inHandlingSection = false;
     std::string line;
@@ -177,7 +184,7 @@ void InputConflictRecords(std::istream& in, RecordingConflictResolver& resolver)
         else if (inHandlingSection)
             InputResolve(line, resolves);
     }
-    resolver.SetResolveMethodForPaths(resolves);
+    return resolves;
 }
 
 } // namespace ovrin_yaml

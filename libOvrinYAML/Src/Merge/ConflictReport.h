@@ -4,6 +4,7 @@
 
 #include <iosfwd>
 #include <string>
+#include <vector>
 
 namespace ovrin_yaml {
 
@@ -29,9 +30,12 @@ Path StringToPath(const std::string& text);
 /// records but those of changes on both sides. Records stand in the order of their paths.
 void OutputConflictRecords(std::ostream& out, const RecordingConflictResolver& resolver, bool describe);
 
-/// Reads decisions and hands them to the resolver, in place of earlier ones. Only the lines of the section
-/// "Conflict handling:" count, up to "Non-conflicts:".
-/// Throws std::runtime_error for a line that it can't make out; the resolver keeps what it had.
-void InputConflictRecords(std::istream& in, RecordingConflictResolver& resolver);
+/// The pending conflicts among the records, in the order of the report.
+std::vector<const RecordingConflictResolver::Record*>
+PendingByPath(const std::vector<RecordingConflictResolver::Record>& records);
+
+/// Reads decisions. Only the lines of the section "Conflict handling:" count, up to "Non-conflicts:".
+/// Throws std::runtime_error for a line that it can't make out.
+std::vector<RecordResolve> ReadDecisions(std::istream& in);
 
 } // namespace ovrin_yaml

@@ -241,16 +241,29 @@ void ObjectFile::FinishDocuments() {
     }
 }
 
+/// Reads the next document of a walker that began at `offset`.
+bool ObjectFile::ReadNext(ChunkWalker& walker, std::size_t offset) const {
+    try {
+        return walker.ReadDocument();
+    } catch (YAMLError& error) {
+        const char* begin = m_Text->data() + std::min(offset + walker.Position(), m_Text->size());
+        const auto linesBefore = std::count(m_Text->data(), begin, '\n');
+        error.SetPlace(ovrin_yaml::FileIDOf({begin, End()}), static_cast<std::uint32_t>(linesBefore) + 1);
+        throw;
+    }
+}
+
 /// Reads a single document with libyaml. If it doesn't end where the next one begins, all that follows goes
 /// the same way, and false is returned.
 bool ObjectFile::ReadByLibrary(const Document& document, bool isLast) {
+    const auto offset = static_cast<std::size_t>(document.begin - m_Text->data());
     std::string chunk(m_Header);
     chunk.append(document.begin, document.length);
     if (!isLast) chunk += kDocumentMark;
     ChunkWalker walker(std::move(chunk), std::string(m_Header), m_Objects.GetMapping(), m_AliasBudget);
-    if (!walker.ReadDocument()) return false;
+    if (!ReadNext(walker, offset)) return false;
     if (!isLast && walker.Position() == document.length) return true;
-    ReadRestByLibrary(static_cast<std::size_t>(document.begin - m_Text->data()) + walker.Position());
+    ReadRestByLibrary(offset + walker.Position());
     return false;
 }
 
@@ -259,7 +272,7 @@ void ObjectFile::ReadRestByLibrary(std::size_t offset) {
     std::string text(m_Header);
     text.append(*m_Text, offset);
     ChunkWalker walker(std::move(text), std::string(m_Header), m_Objects.GetMapping(), m_AliasBudget);
-    while (walker.ReadDocument()) {
+    while (ReadNext(walker, offset)) {
     }
 }
 

@@ -16,6 +16,7 @@
 
 namespace ovrin_yaml {
 
+class ChunkWalker;
 class WrittenFormReader;
 
 /// How object files are read. What they mean doesn't depend on it: tests and benchmarks switch parts off.
@@ -99,6 +100,7 @@ private:
     void Read(WrittenFormReader& reader, Document& document) const;
     void Complete(Document& document) const;
     void FinishDocuments();
+    bool ReadNext(ChunkWalker& walker, std::size_t offset) const;
     bool ReadByLibrary(const Document& document, bool isLast);
     void ReadRestByLibrary(std::size_t offset);
 

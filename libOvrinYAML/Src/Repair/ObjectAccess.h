@@ -28,7 +28,7 @@ struct RepairRoots {
 
 /// Calls visit(id, value) for the objects of a root, but for those of which a look at what was found when
 /// they were read tells that they are of no interest: isOfInterest(traits) is only asked for objects that
-/// were looked at.
+/// were looked at. A YAMLError from there learns of the object.
 template <class IsOfInterest, class Visit>
 void ForEachObject(const YAMLMapping& root, const IsOfInterest& isOfInterest, const Visit& visit) {
     // The objects lie far from each other in memory: ask for those that come next.
@@ -41,7 +41,12 @@ void ForEachObject(const YAMLMapping& root, const IsOfInterest& isOfInterest, co
         if (!id) continue;
         const YAMLMapping* object = AsMapping(value);
         if (object && object->TraitsAsRead() && !isOfInterest(object->TraitsAsRead())) continue;
-        visit(id, value);
+        try {
+            visit(id, value);
+        } catch (YAMLError& error) {
+            error.SetPlace(id->Value());
+            throw;
+        }
     }
 }
 

@@ -25,8 +25,8 @@ public:
     const YAMLMapping& GetMapping() const { return m_Root; }
 
     /// A copy, owned by the caller. The two share their objects from now on: each is copied by whoever
-    /// changes it first, so that either may be changed while another thread uses the other. Throws the
-    /// duplicate-keys text.
+    /// changes it first, so that either may be changed while another thread uses the other. What was cloned
+    /// before may be cloned on several threads at once. Throws the duplicate-keys text.
     OvrinObjects* Clone();
 
     /// Keeps the text that objects point into with their source bytes.

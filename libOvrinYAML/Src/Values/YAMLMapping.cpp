@@ -297,7 +297,9 @@ void YAMLMapping::ShareInto(YAMLMapping& target) {
     target.Reserve(Size());
     for (const Entry entry : *this) {
         target.PushBack(entry.key, entry.value);
-        if (YAMLMapping* object = AsMapping(entry.value)) object->MarkAsShared();
+        YAMLMapping* object = AsMapping(entry.value);
+        // Only read once it is marked: several threads may take shares then.
+        if (object && !object->IsShared()) object->MarkAsShared();
     }
 }
 

@@ -1,6 +1,8 @@
-#include "Thread.h"
+#include "Session/Thread.h"
 
 #include <system_error>
+
+namespace ovrin_yaml {
 
 Thread::Thread(std::function<void()> body, bool isLittle) : m_Work(new Work{std::move(body), nullptr}) {
     if (isLittle) {
@@ -29,3 +31,5 @@ void Thread::Join() {
 void Thread::CheckForExceptions() const {
     if (m_Work->exception) std::rethrow_exception(m_Work->exception);
 }
+
+} // namespace ovrin_yaml

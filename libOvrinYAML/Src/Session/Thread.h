@@ -5,6 +5,15 @@
 #include <memory>
 #include <thread>
 
+namespace ovrin_yaml {
+
+/// Where a stage may start threads.
+enum class Threads {
+    None,
+    WhereWorthwhile, ///< not for so little work that starting one would take longer
+    Everywhere       ///< for tests
+};
+
 /// A thread that carries an exception to the one who waits for it. Join every thread of a stage before asking
 /// any for its exception: then no failure leaves another thread running.
 class Thread {
@@ -30,3 +39,5 @@ private:
     std::unique_ptr<Work> m_Work; // the started thread holds its address
     std::jthread m_Thread;        // none once joined, or when the body ran on the spawning thread
 };
+
+} // namespace ovrin_yaml

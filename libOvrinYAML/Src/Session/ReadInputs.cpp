@@ -1,32 +1,47 @@
-#include "ReadInputs.h"
-
-#include "CommandSettings.h"
-#include "FileUtils.h"
-#include "InputFiles.h"
-#include "Thread.h"
-#include "TimerStat.h"
+#include "Session/ReadInputs.h"
 
 #include "Repair/ObjectTraits.h"
+#include "Session/MergeError.h"
+#include "Session/StageWatcher.h"
 
 #include <algorithm>
 #include <atomic>
 #include <deque>
 #include <exception>
 #include <functional>
+#include <new>
 #include <optional>
 #include <thread>
 
-using namespace ovrin_yaml;
+namespace ovrin_yaml {
 
 namespace {
+
+/// Takes a step of reading a file. What it throws is thrown again with the name of the file, but for
+/// std::bad_alloc: no file is at fault.
+template <class Step> void WithFileName(const std::string& name, const Step& step) {
+    const auto fail = [&](const char* fault, const YAMLError& reason) {
+        throw MergeError(MergeError::Stage::Read, name, reason,
+                         "Error parsing file '" + name + "'" + fault + ": " + reason.what());
+    };
+    try {
+        step();
+    } catch (const YAMLError& error) {
+        fail("", error);
+    } catch (const std::bad_alloc&) {
+        throw;
+    } catch (const std::exception& error) {
+        fail(" caught unknown exception", YAMLError(error.what()));
+    }
+}
 
 /// A file that is being read along with others, and what went wrong with it.
 struct FileInWork {
     /// What has no size may be a pipe. One program may fill several of them, in an order of its own, so each
     /// is taken on a thread of its own, which begins at once.
-    FileInWork(const InputFile& input, ReaderOptions options)
-        : path(*input.path), file(*input.objects, options) {
-        if (FileSize(path) == 0) m_Stream.emplace([this] { TakeHere(); });
+    FileInWork(const FileReading& reading, ReaderOptions options)
+        : input(*reading.input), file(*reading.objects, options) {
+        if (input.size == 0) m_Stream.emplace([this] { TakeHere(); });
     }
 
     /// Gets hold of the bytes.
@@ -41,19 +56,19 @@ struct FileInWork {
     template <class Step> void Try(const Step& step) {
         if (failure) return;
         try {
-            WithFileName(path, step);
+            WithFileName(input.name, step);
         } catch (...) {
             failure = std::current_exception();
         }
     }
 
-    const std::string& path;
+    const InputFile& input;
     ObjectFile file;
     std::exception_ptr failure;
 
 private:
     void TakeHere() {
-        Try([this] { TakeFile(path, file); });
+        Try([this] { file.Take(input.take()); });
     }
 
     std::optional<Thread> m_Stream;
@@ -62,9 +77,9 @@ private:
 /// Below this size of all files together, threads cost more than they bring.
 constexpr std::size_t kLittleWork = std::size_t{1} << 20;
 
-bool IsLittleWork(const std::vector<InputFile>& inputs) {
+bool IsLittleWork(const std::deque<FileInWork>& files) {
     std::size_t bytes = 0;
-    for (const InputFile& input : inputs) bytes += FileSize(*input.path);
+    for (const FileInWork& work : files) bytes += work.input.size;
     return bytes < kLittleWork;
 }
 
@@ -90,12 +105,9 @@ void ReadPieces(FileInWork& work) {
 /// First the bytes of all files. Then the others are cut along the first; by then it is known which of its
 /// objects they want. All pieces are read, in any order, and last the objects are put together in the order
 /// of the files.
-void ReadOnThreads(TimerStat& parent, const std::vector<InputFile>& inputs, ReaderOptions options) {
-    TimerStat timer(parent, "Read base, left and right");
-    std::deque<FileInWork> files;
-    for (const InputFile& input : inputs) files.emplace_back(input, options);
+void ReadOnThreads(std::deque<FileInWork>& files, bool isLittle, StageWatcher* watcher) {
+    const WatchedStep step(watcher, "Read base, left and right");
     FileInWork& first = files.front();
-
     std::vector<std::function<void()>> takes, cuts, pieces;
     for (FileInWork& work : files) {
         takes.emplace_back([&] {
@@ -104,7 +116,6 @@ void ReadOnThreads(TimerStat& parent, const std::vector<InputFile>& inputs, Read
         });
         if (&work != &first) cuts.emplace_back([&] { work.Try([&] { work.file.Cut(&first.file); }); });
     }
-    const bool isLittle = IsLittleWork(inputs);
     RunTasks(takes, isLittle);
     RunTasks(cuts, isLittle);
     for (FileInWork& work : files)
@@ -117,11 +128,10 @@ void ReadOnThreads(TimerStat& parent, const std::vector<InputFile>& inputs, Read
         if (work.failure) std::rethrow_exception(work.failure);
 }
 
-void ReadInOrder(TimerStat& parent, const std::vector<InputFile>& inputs, ReaderOptions options) {
-    std::deque<FileInWork> files;
-    for (const InputFile& input : inputs) files.emplace_back(input, options);
-    for (std::size_t i = 0; i < inputs.size(); ++i) {
-        TimerStat timer(parent, inputs[i].timerName);
+void ReadInOrder(std::deque<FileInWork>& files, const std::vector<FileReading>& readings,
+                 StageWatcher* watcher) {
+    for (std::size_t i = 0; i < files.size(); ++i) {
+        const WatchedStep step(watcher, readings[i].step);
         FileInWork& work = files[i];
         work.Take();
         work.Try([&] {
@@ -135,19 +145,6 @@ void ReadInOrder(TimerStat& parent, const std::vector<InputFile>& inputs, Reader
 
 } // namespace
 
-RulesAndTypes SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
-                                 const std::string& typeInfoFile) {
-    RulesAndTypes read;
-    {
-        TimerStat timer(reading, "Reading unique keys");
-        read.rules = SetupRules(rulesFile);
-    }
-    if (typeInfoFile == kDefaultTypeInfoFile) return read;
-    TimerStat timer(root, "Read type info");
-    read.types = SetupTypeInfo(typeInfoFile);
-    return read;
-}
-
 ReaderOptions DefaultReaderOptions() {
     ReaderOptions options;
     options.inspect = InspectObject;
@@ -156,10 +153,14 @@ ReaderOptions DefaultReaderOptions() {
     return options;
 }
 
-void ReadInputs(TimerStat& parent, bool useThreads, const std::vector<InputFile>& inputs,
+void ReadInputs(const std::vector<FileReading>& readings, Threads threads, StageWatcher* watcher,
                 ReaderOptions options) {
-    if (useThreads)
-        ReadOnThreads(parent, inputs, options);
+    std::deque<FileInWork> files;
+    for (const FileReading& reading : readings) files.emplace_back(reading, options);
+    if (threads == Threads::None)
+        ReadInOrder(files, readings, watcher);
     else
-        ReadInOrder(parent, inputs, options);
+        ReadOnThreads(files, threads == Threads::WhereWorthwhile && IsLittleWork(files), watcher);
 }
+
+} // namespace ovrin_yaml

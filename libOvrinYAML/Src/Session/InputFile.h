@@ -1,0 +1,25 @@
+#pragma once
+
+#include <cstddef>
+#include <functional>
+#include <string>
+
+namespace ovrin_yaml {
+
+/// An object file that is to be read, wherever it is.
+struct InputFile {
+    std::string name; ///< in messages
+    /// Bytes; 0 if that can't be told beforehand. Such a file may be a pipe: `take` is called on a thread of
+    /// its own then.
+    std::size_t size;
+    /// Gives the bytes of the whole file. Called once, on any thread; may throw.
+    std::function<std::string()> take;
+};
+
+/// A file that is in memory already.
+inline InputFile TextInput(std::string name, std::string text) {
+    const std::size_t size = text.size();
+    return {std::move(name), size, [text = std::move(text)]() mutable { return std::move(text); }};
+}
+
+} // namespace ovrin_yaml
