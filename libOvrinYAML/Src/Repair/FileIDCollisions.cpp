@@ -38,12 +38,14 @@ template <class IsTaken> const YAMLScalar* NextFreeID(const YAMLScalar& id, cons
     throw YAMLError("Cannot create new fileID for conflicting fileID: " + std::string(id.Value()));
 }
 
-/// Gives an object the hash that reading it would give, in which the data of its header has no part.
+/// Gives an object the hash that reading it would give, in which the data of its header, from the file id on,
+/// has no part.
 void RebuildObjectHash(YAMLMapping& object) {
     std::uint32_t hash = 0, index = 0;
-    for (const YAMLMapping::Entry entry : object)
-        if (!IsPlaceHolderKey(entry.key))
-            hash = FoldPair(hash, entry.key->m_Hash, entry.value->m_Hash, index++);
+    for (const YAMLMapping::Entry entry : object) {
+        if (entry.key == YAMLScalar::fileIDPlaceHolderName) break;
+        hash = FoldPair(hash, entry.key->m_Hash, entry.value->m_Hash, index++);
+    }
     object.m_Hash = hash;
 }
 
