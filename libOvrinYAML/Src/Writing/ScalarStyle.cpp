@@ -51,7 +51,7 @@ ScalarForms ClassifyScalar(std::string_view text) {
     }
     indicator |= text.back() == ':';
     forms.plainInBlock = !indicator;
-    forms.plainInFlow = !indicator && !(seen & (kFlowIndicator | kColon));
+    forms.plainInFlow = !indicator && !(seen & kFlowIndicator) && !(seen & kColon);
     return forms;
 }
 
