@@ -15,29 +15,12 @@ using namespace diffs;
 class MergeRulesTest : public RulesTest {
 protected:
     static std::string Failure(const std::string& text) {
-        try {
-            Rules(text);
-        } catch (const std::runtime_error& error) {
-            return error.what();
-        }
-        return "none";
+        return ErrorOf<std::runtime_error>([&] { Rules(text); });
     }
 };
 
 Path P(const std::string& text) {
     return ToRulePath(text);
-}
-
-/// A mapping of the pairs; "a.b" as a key nests.
-YAMLMapping* Map(const std::vector<std::pair<std::string, std::string>>& pairs) {
-    YAMLMapping* mapping = YAMLAlloc<YAMLMapping>::create();
-    for (const auto& [key, value] : pairs) {
-        const std::size_t dot = key.find('.');
-        YAMLNode* node = YAMLScalar::Lookup(value);
-        if (dot != std::string::npos) node = Map({{key.substr(dot + 1), value}});
-        mapping->Append(YAMLScalar::Lookup(key.substr(0, dot)), node);
-    }
-    return mapping;
 }
 
 std::string Values(const std::vector<Path>& fieldPaths, const YAMLNode* node) {
@@ -95,17 +78,17 @@ TEST_F(MergeRulesTest, TheFirstMatchingListRuleChoosesTheKeys) {
 }
 
 TEST_F(MergeRulesTest, AKeyIsCompleteOrEmpty) {
-    const YAMLMapping* node = Map({{"a", "1"}, {"b.c", "2"}});
+    const YAMLMapping* node = Doc("a: 1\nb: {c: 2}");
     EXPECT_EQ(Values({P("a"), P("b.c"), P("*"), P("b.*"), P("_.b._.c")}, node), "1;2;1;2;2;");
     for (const char* missing : {"x", "a.x", "b", "b.x", "_"})
         EXPECT_EQ(Values({P("a"), P(missing)}, node), "") << missing;
     EXPECT_EQ(Values({P("_")}, YAMLScalar::one), "1;");
-    EXPECT_EQ(Values({P("*")}, Map({})), "");
+    EXPECT_EQ(Values({P("*")}, Doc("")), "");
     EXPECT_EQ(Values({P("_")}, nullptr), "");
 }
 
 TEST_F(MergeRulesTest, RepeatedKeysCannotBeLookedUp) {
-    const YAMLMapping* node = Map({{"a", "1"}, {"a", "2"}});
+    const YAMLMapping* node = Doc("a: 1\na: 2");
     for (const char* path : {"a", "*"})
         EXPECT_THROW(MergeRules::GetYAMLNodeFieldByPath(node, P(path)), YAMLError) << path;
 }
@@ -120,10 +103,10 @@ TEST_F(MergeRulesTest, TheFirstMatchingExclusionDecides) {
 TEST_F(MergeRulesTest, AConditionalExclusionNeedsAllItsFields) {
     Rules("[exclusions]\nexcludeIfContains x a b\nincludeIfContains x c\nexcludeIfContains x a\n");
     const auto mergeable = [](const YAMLNode* node) { return TheRules().IsMergeablePath(P("x"), node); };
-    EXPECT_FALSE(mergeable(Map({{"a", "1"}, {"b", "1"}, {"c", "1"}})));
-    EXPECT_TRUE(mergeable(Map({{"a", "1"}, {"c", "1"}})));
-    EXPECT_FALSE(mergeable(Map({{"a", "1"}})));
-    EXPECT_TRUE(mergeable(Map({})));
+    EXPECT_FALSE(mergeable(Doc("{a: 1, b: 1, c: 1}")));
+    EXPECT_TRUE(mergeable(Doc("{a: 1, c: 1}")));
+    EXPECT_FALSE(mergeable(Doc("a: 1")));
+    EXPECT_TRUE(mergeable(Doc("")));
     EXPECT_TRUE(TheRules().IsMergeablePath(P("x"))) << "conditional rules need a value";
 }
 
@@ -147,8 +130,8 @@ TEST_F(MergeRulesTest, TheFactoryRulesKeyComponentsAndOverridesAndHideNothing) {
     std::ifstream file(OVRIN_SOURCE_DIR "/Src/Data/mergerules.txt");
     ASSERT_TRUE(file);
     LoadSequenceUniqueKeys(file, TheRules());
-    EXPECT_EQ(Values(Keys("1.GameObject.m_Component"), Map({{"component.fileID", "12"}})), "12;");
-    const YAMLMapping* change = Map({{"target.fileID", "7"}, {"propertyPath", "m_Name"}, {"value", "x"}});
+    EXPECT_EQ(Values(Keys("1.GameObject.m_Component"), Doc("component: {fileID: 12}")), "12;");
+    const YAMLMapping* change = Doc("target: {fileID: 7}\npropertyPath: m_Name\nvalue: x");
     for (const char* instance : {"1.PrefabInstance", "1.Prefab"})
         EXPECT_EQ(Values(Keys(instance + std::string(".m_Modification.m_Modifications")), change),
                   "7;m_Name;");
