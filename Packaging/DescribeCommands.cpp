@@ -5,8 +5,9 @@
 
 #include <fstream>
 #include <iostream>
-#include <ranges>
 #include <string>
+#include <string_view>
+#include <vector>
 
 namespace {
 
@@ -16,23 +17,29 @@ std::string Form(const Option& option) {
     return option.value.empty() ? word : word + " " + std::string(option.value);
 }
 
-/// The words, with a blank between each two.
-std::string Joined(auto&& words) {
-    std::string text;
-    for (std::string_view word : words) (text += text.empty() ? "" : " ") += word;
-    return text;
+/// The options of a command, of all its groups.
+std::vector<Option> OptionsOf(const Command& command) {
+    std::vector<Option> options;
+    for (const auto& group : command.options) options.insert(options.end(), group.begin(), group.end());
+    return options;
+}
+
+void AddWord(std::string& text, std::string_view word) {
+    (text += text.empty() ? "" : " ") += word;
 }
 
 std::string CommandWords() {
-    return Joined(kCommands | std::views::transform(&Command::word));
+    std::string text;
+    for (const Command& command : kCommands) AddWord(text, command.word);
+    return text;
 }
 
 /// The words of the options that take a value, or of those that don't.
 std::string OptionWords(const Command& command, bool withValue) {
-    return Joined(command.options | std::views::join | std::views::filter([=](const Option& option) {
-                      return option.value.empty() != withValue;
-                  }) |
-                  std::views::transform(&Option::word));
+    std::string text;
+    for (const Option& option : OptionsOf(command))
+        if (option.value.empty() != withValue) AddWord(text, option.word);
+    return text;
 }
 
 /// bash tells values from paths by itself: options end at the first path.
@@ -66,7 +73,7 @@ _OvrinMerge() {
     elif [ "$expected" = value ]; then
         case ${COMP_WORDS[COMP_CWORD - 1]} in
 )";
-    for (const Option& option : kCommands.front().options | std::views::join)
+    for (const Option& option : OptionsOf(kCommands.front()))
         if (!option.notAFile.empty())
             out << "        " << option.word << ") mapfile -t COMPREPLY < <(compgen -f -W " << option.notAFile
                 << " -- \"$word\") && compopt -o filenames 2>/dev/null ;;\n";
@@ -108,7 +115,7 @@ case $words[1] in
         if (command.paths.empty()) continue;
         // No options behind the first path.
         out << command.word << ")\n    _arguments -A '-*'";
-        for (const Option& option : command.options | std::views::join) WriteZshOption(out, option);
+        for (const Option& option : OptionsOf(command)) WriteZshOption(out, option);
         for (std::size_t i = 0; i < command.paths.size(); ++i)
             out << " \\\n        '" << i + 1 << (i < command.requiredPaths ? ":" : "::")
                 << command.paths[i].name << ":_files'";
@@ -137,7 +144,7 @@ end
         out << "complete -c OvrinMerge -n '__OvrinMerge_runs \"\"' -f -a " << command.word << " -d '"
             << command.meaning << "'\n";
     for (const Command& command : kCommands)
-        for (const Option& option : command.options | std::views::join) WriteFishOption(out, command, option);
+        for (const Option& option : OptionsOf(command)) WriteFishOption(out, command, option);
 }
 
 /// BASE LEFT RIGHT [DEST [PREMERGED_BASE [PREMERGED_RIGHT]]]
@@ -154,18 +161,17 @@ void WriteSynopsis(std::ostream& out) {
         if (&command == &kCommands.front())
             out << " [options]";
         else
-            for (const Option& option : command.options | std::views::join)
-                out << " [" << Form(option) << ']';
+            for (const Option& option : OptionsOf(command)) out << " [" << Form(option) << ']';
         out << PathForms(command) << '\n';
     }
 }
 
 void WriteOptions(std::ostream& out) {
-    for (const Option& option : kCommands.front().options | std::views::join) out << Form(option) << '\n';
+    for (const Option& option : OptionsOf(kCommands.front())) out << Form(option) << '\n';
 }
 
 void WriteReadmeTable(std::ostream& out) {
-    for (const Option& option : kCommands.front().options | std::views::join)
+    for (const Option& option : OptionsOf(kCommands.front()))
         out << "| `" << Form(option) << "` | " << option.meaning << " |\n";
 }
 
