@@ -1,45 +1,34 @@
 // Merges two changes of a scene and prints the open conflicts by path.
 
-#include "Diff/MergeRules.h"
 #include "Diff/RulesReader.h"
-#include "Diff/YAMLMappingDiff.h"
-#include "Merge/DiffMerge.h"
-#include "Merge/RecordingConflictResolver.h"
-#include "Reading/ObjectFileReader.h"
-#include "Repair/FileIDCollisions.h"
-#include "Repair/PreProcess.h"
-#include "Values/YAMLError.h"
+#include "Session/MergeSession.h"
 
 #include <fstream>
 #include <iostream>
 #include <iterator>
-#include <string>
 
 using namespace ovrin_yaml;
 
 namespace {
 
-YAMLMapping& Read(const char* path, OvrinObjects& objects) {
+InputFile FileInput(const char* path) {
     std::ifstream file(path, std::ios::binary);
-    ParseYAMLFile(std::string(std::istreambuf_iterator<char>(file), {}), objects);
-    PreProcess(objects.GetMapping());
-    return objects.GetMapping();
+    return TextInput(path, std::string(std::istreambuf_iterator<char>(file), {}));
 }
 
 void PrintConflicts(char** paths) {
     MergeRules rules;
     std::ifstream rulesFile(paths[0]);
     LoadSequenceUniqueKeys(rulesFile, rules);
-    OvrinObjects files[3];
-    const YAMLMapping& base = Read(paths[1], files[0]);
-    const YAMLMapping& left = Read(paths[2], files[1]);
-    YAMLMapping& right = Read(paths[3], files[2]);
-    RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
-    RecordingConflictResolver resolver(rules, ResolveBase);
-    MergeMappingDiffs(YAMLMappingDiff::Diff(rules, &base, &left), YAMLMappingDiff::Diff(rules, &base, &right),
-                      resolver);
-    for (const auto& record : resolver.Records())
-        if (record.resolve == ResolveConflict) std::cout << PathToString(record.path) << '\n';
+    MergeSession session;
+    session.SetRules(std::move(rules));
+    session.Read({FileInput(paths[1]), FileInput(paths[2]), FileInput(paths[3])});
+    session.Prepare();
+    session.Diff();
+    session.Merge();
+    session.Apply();
+    session.Repair();
+    for (const auto* conflict : session.PendingConflicts()) std::cout << PathToString(conflict->path) << '\n';
 }
 
 } // namespace
