@@ -1,0 +1,91 @@
+#include "Commands/CommandLine.h"
+
+#include "Commands/CommandTable.h"
+#include "Commands/Suggestion.h"
+#include "Words/Failure.h"
+
+#include "Descriptor.h"
+#include "Values/YAMLScalar.h"
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <iostream>
+#include <new>
+
+namespace ovrin {
+
+namespace {
+
+constexpr const char* kDescription =
+    "Merges, checks and compares scenes by their objects, with version control.";
+
+struct Described {
+    CLI::App* app;
+    Action action;
+};
+
+Described Describe(CLI::App& program, const Command& command) {
+    CLI::App* app = program.add_subcommand(command.name, command.summary);
+    return {app, command.describe(*app)};
+}
+
+/// The version control systems call this program for every file: where the command is named first, as they
+/// do, the others needn't be described.
+std::vector<Described> DescribeWanted(CLI::App& program, const std::vector<std::string>& arguments) {
+    program.set_version_flag("--version", "ovrin " OVRIN_VERSION);
+    program.require_subcommand(1);
+    const auto commands = Commands();
+    const auto named = std::ranges::find_if(
+        commands, [&](const Command& command) { return !arguments.empty() && arguments[0] == command.name; });
+    std::vector<Described> described;
+    if (named != commands.end())
+        described.push_back(Describe(program, *named));
+    else
+        for (const Command& command : commands) described.push_back(Describe(program, command));
+    return described;
+}
+
+Outcome TellMisuse(const CLI::App& program, const CLI::ParseError& error) {
+    if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) { // --help and --version
+        return program.exit(error) == 0 && std::cout.flush() ? Outcome::Done : Outcome::Failed;
+    }
+    const auto parsed = program.get_subcommands();
+    const CLI::App& app = parsed.empty() ? program : *parsed.front();
+    std::cerr << "ovrin: " << error.what() << '\n' << Suggestions(app, program.remaining(true));
+    std::cerr << "\"" << (parsed.empty() ? "ovrin" : "ovrin " + app.get_name())
+              << " --help\" tells what there is.\n";
+    return Outcome::Failed;
+}
+
+Outcome RunAction(const Action& action) {
+    try {
+        return action();
+    } catch (const std::bad_alloc&) {
+        std::cerr << "ovrin: out of memory\n";
+    } catch (const std::exception& error) {
+        std::cerr << "ovrin: " << error.what() << '\n';
+    }
+    return Outcome::Failed;
+}
+
+} // namespace
+
+Outcome RunCommandLine(const std::vector<std::string>& arguments) {
+    OutliveFailedWrites();
+    CLI::App program(kDescription, "ovrin");
+    const std::vector<Described> commands = DescribeWanted(program, arguments);
+    try {
+        program.parse(std::vector<std::string>(arguments.rbegin(), arguments.rend()));
+    } catch (const CLI::ParseError& error) {
+        return TellMisuse(program, error);
+    }
+    const auto named =
+        std::ranges::find_if(commands, [](const Described& command) { return command.app->parsed(); });
+    return RunAction(named->action);
+}
+
+void DescribeAll(CLI::App& app) {
+    DescribeWanted(app, {});
+}
+
+} // namespace ovrin
