@@ -1,6 +1,6 @@
 #include "Systems/Git.h"
 
-#include "Systems/GitOperation.h"
+#include "Systems/Operation.h"
 #include "Systems/Repository.h"
 #include "Words/Failure.h"
 
@@ -64,11 +64,11 @@ TEST_F(GitTest, TakesAPathForItself) {
 }
 
 TEST_F(GitTest, KnowsWhatIsUnderWay) {
-    EXPECT_EQ(GitOperationIn(repository()).action, "merge");
-    const std::string incoming = git().Commit(GitOperationIn(repository()).incoming);
+    EXPECT_EQ(OperationIn(repository()).action, "merge");
+    const std::string incoming = git().Commit(OperationIn(repository()).incoming);
     EXPECT_EQ(git().NameOfCommit(incoming), "topic");
     RunHere({"git", "merge", "--abort"});
-    EXPECT_EQ(GitOperationIn(repository()).action, "");
+    EXPECT_EQ(OperationIn(repository()).action, "");
     EXPECT_EQ(git().Commit("MERGE_HEAD"), "");
 }
 
