@@ -29,6 +29,12 @@ GitEntry ParseEntry(const std::string& field) {
             static_cast<GitEntry::Stage>(field[object + 1] - '0')};
 }
 
+std::vector<GitEntry> ParseEntries(std::string_view listed) {
+    std::vector<GitEntry> entries;
+    for (const std::string& field : Fields(listed)) entries.push_back(ParseEntry(field));
+    return entries;
+}
+
 std::string WithoutLineEnd(std::string text) {
     while (text.ends_with('\n')) text.pop_back();
     return text;
@@ -63,10 +69,11 @@ std::string Git::Output(CommandWords arguments, std::string input) const {
 }
 
 std::vector<GitEntry> Git::Unmerged() const {
-    std::vector<GitEntry> entries;
-    for (const std::string& field : Fields(Output({"ls-files", "--unmerged", "-z"})))
-        entries.push_back(ParseEntry(field));
-    return entries;
+    return ParseEntries(Output({"ls-files", "--unmerged", "-z"}));
+}
+
+std::vector<GitEntry> Git::Entries(const std::string& path) const {
+    return ParseEntries(Output({"ls-files", "--stage", "-z", "--", path}));
 }
 
 std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& paths,

@@ -35,6 +35,8 @@ public:
 
     /// The versions of all paths that are unmerged, path by path.
     std::vector<GitEntry> Unmerged() const;
+    /// Those of one path, merged or not.
+    std::vector<GitEntry> Entries(const std::string& path) const;
     /// Those of the paths that differ from the last commit, in the index or, if wanted, in the working tree.
     /// All that the index has where there is no commit.
     std::vector<std::string> DifferingFromHead(const std::vector<std::string>& paths,

@@ -17,9 +17,14 @@ std::vector<std::string> OfGit(const Repository& repository) {
     return paths;
 }
 
+/// Mercurial without what its user likes to see, Subversion with all letters in paths.
+ProcessSetting SettingFor(const Repository& repository) {
+    return {.folder = repository.top, .environment = {{"HGPLAIN", "1"}, {"LC_ALL", "C.UTF-8"}}};
+}
+
 std::vector<std::string> OfMercurial(const Repository& repository) {
-    const std::string listed = OutputOf({"hg", "resolve", "--list", "--template", "{mergestatus}{path}\\0"},
-                                        {.folder = repository.top, .environment = {{"HGPLAIN", "1"}}});
+    const std::string listed =
+        OutputOf({"hg", "resolve", "--list", "--template", "{mergestatus}{path}\\0"}, SettingFor(repository));
     std::vector<std::string> paths;
     std::istringstream entries(listed);
     for (std::string entry; std::getline(entries, entry, '\0');)
@@ -29,7 +34,7 @@ std::vector<std::string> OfMercurial(const Repository& repository) {
 
 std::vector<std::string> OfSubversion(const Repository& repository) {
     constexpr std::size_t kColumns = 8; // in front of the path, which has no line feed here
-    std::istringstream lines(OutputOf({"svn", "status", "--quiet"}, {.folder = repository.top}));
+    std::istringstream lines(OutputOf({"svn", "status", "--quiet"}, SettingFor(repository)));
     std::vector<std::string> paths;
     for (std::string line; std::getline(lines, line);)
         if (line.starts_with('C') && line.size() > kColumns) paths.push_back(line.substr(kColumns));
@@ -55,7 +60,7 @@ void MarkMerged(const Repository& repository, const std::vector<std::string>& pa
                                : CommandWords{"svn", "resolve", "--quiet", "--accept", "working", "--"};
     // Both would read more into a bare path: a pattern, and a revision behind an "@".
     for (const std::string& path : paths) command.push_back(isMercurial ? "path:" + path : path + "@");
-    OutputOf(command, {.folder = repository.top});
+    OutputOf(command, SettingFor(repository));
 }
 
 } // namespace ovrin
