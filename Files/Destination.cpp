@@ -63,7 +63,7 @@ bool IsRefusal(int error) {
 /// Makes the file, resembling `old` unless that is null.
 int Make(NewFile& file, const Descriptor* old, const Content& content) {
     const int error = old ? file.Resemble(*old) : 0;
-    return error ? error : file.Fill(content.write);
+    return error ? error : file.Fill(content.write, content.durability);
 }
 
 /// Puts a whole new file at `place`. `old` is what stands there, null for nothing. The file has no name in
@@ -105,14 +105,14 @@ int Reserve(const Descriptor& file, std::uint64_t size) {
     return Uninterrupted(reserve) == 0 || errno == EOPNOTSUPP || errno == ENOSYS ? 0 : errno;
 }
 
-int WriteFromStart(const Descriptor& file, const OutputWriter& write) {
+int WriteFromStart(const Descriptor& file, const Content& content) {
     OutputStream stream(file.Get());
-    write(stream);
+    content.write(stream);
     if (const int error = stream.Finish()) return error;
     const off_t end = lseek(file.Get(), 0, SEEK_CUR);
     if (end < 0) return errno;
     const int error = SetSize(file.Get(), end);
-    return error ? error : Sync(file.Get());
+    return error || content.durability == Durability::Unsynced ? error : Sync(file.Get());
 }
 
 /// As far as the system lets it.
@@ -130,7 +130,7 @@ int Overwrite(const Descriptor& file, const std::string& path, const Content& co
     Descriptor second = Duplicate(file.Get());
     if (!second.IsOpen()) return errno;
     int error = Reserve(file, content.size);
-    if (error == 0) error = WriteFromStart(second, content.write);
+    if (error == 0) error = WriteFromStart(second, content);
     const int closeError = second.Close();
     if (error == 0) error = closeError;
     if (error != 0) PutBack(file, old);

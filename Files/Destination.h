@@ -9,6 +9,7 @@
 struct Content {
     std::uint64_t size = 0;
     OutputWriter write;
+    Durability durability = Durability::Synced;
 };
 
 /// Brings `content` to the user's destination, or to standard output where the path is empty. Returns 0 when

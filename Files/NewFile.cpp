@@ -79,11 +79,11 @@ int NewFile::Resemble(const Descriptor& other) {
     return fchmod(m_File.Get(), status.st_mode & 0777) == 0 ? 0 : errno;
 }
 
-int NewFile::Fill(const OutputWriter& write) {
+int NewFile::Fill(const OutputWriter& write, Durability durability) {
     OutputStream stream(m_File.Get());
     write(stream);
     const int error = stream.Finish();
-    return error ? error : Sync(m_File.Get());
+    return error || durability == Durability::Unsynced ? error : Sync(m_File.Get());
 }
 
 int NewFile::TakeName() {

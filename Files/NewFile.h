@@ -19,8 +19,7 @@ public:
     int OpenNamed(mode_t mode);
     /// Gives the file the mode, the access list and, as far as that is permitted, the owner of another one.
     int Resemble(const Descriptor& other);
-    /// Fills the file and brings it to the disk.
-    int Fill(const OutputWriter& write);
+    int Fill(const OutputWriter& write, Durability durability);
     /// Gives the hidden name to a file without name.
     int TakeName();
     /// Closes the file and puts it into its place. It must have a name.

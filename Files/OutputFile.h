@@ -7,6 +7,10 @@
 
 class Descriptor;
 
+/// Whether what is written outlives a failure of the machine too, or the end of the process alone. The first
+/// costs a few milliseconds and more.
+enum class Durability { Synced, Unsynced };
+
 /// Fills a file.
 using OutputWriter = std::function<void(OutputStream&)>;
 

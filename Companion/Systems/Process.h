@@ -11,9 +11,9 @@ using CommandWords = std::vector<std::string>;
 
 /// What a program is started with.
 struct ProcessSetting {
-    std::string folder;                                           ///< to run in; empty for the present one
-    std::string input;                                            ///< its standard input
-    std::vector<std::pair<std::string, std::string>> environment; ///< added to the one of this process
+    std::string folder = {}; ///< to run in; empty for the present one
+    std::string input = {};  ///< its standard input
+    std::vector<std::pair<std::string, std::string>> environment = {}; ///< added to the one of this process
     bool showErrors = false; ///< its standard error is that of this process, not kept
 };
 

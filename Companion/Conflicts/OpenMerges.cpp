@@ -1,0 +1,233 @@
+#include "Conflicts/OpenMerges.h"
+
+#include "Descriptor.h"
+#include "Destination.h"
+#include "FileUtils.h"
+#include "Systems/Repository.h"
+#include "Words/Failure.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <fcntl.h>
+#include <filesystem>
+#include <nlohmann/json.hpp>
+#include <random>
+#include <system_error>
+#include <unistd.h>
+
+namespace ovrin {
+
+namespace {
+
+namespace fs = std::filesystem;
+using nlohmann::json;
+
+constexpr const char* kMergeExtension = ".merge";
+constexpr const char* kProgressExtension = ".progress";
+constexpr std::size_t kMostHeader = std::size_t{1} << 20; // bytes
+
+/// FNV-1a, of 64 bits, in hexadecimal digits. Paths of one number are told apart by what the files say.
+std::string NumberOf(const std::string& path, std::uint64_t attempt) {
+    std::uint64_t hash = 14695981039346656037u + attempt;
+    for (const char character : path) hash = (hash ^ static_cast<unsigned char>(character)) * 1099511628211u;
+    char digits[17];
+    std::snprintf(digits, sizeof(digits), "%016llx", static_cast<unsigned long long>(hash));
+    return digits;
+}
+
+std::string NewIdentity() {
+    std::random_device device;
+    std::string identity;
+    for (int i = 0; i < 4; ++i) {
+        char digits[9];
+        std::snprintf(digits, sizeof(digits), "%08x", static_cast<unsigned>(device()));
+        identity += digits;
+    }
+    return identity;
+}
+
+/// Labels may be of any bytes; they are only shown.
+std::string TextOf(const json& value) {
+    return value.dump(-1, ' ', false, json::error_handler_t::replace);
+}
+
+void Write(const std::string& file, const std::string& header, const std::vector<const std::string*>& parts) {
+    Content content;
+    content.size = header.size();
+    for (const std::string* part : parts) content.size += part->size();
+    content.write = [&](OutputStream& stream) {
+        stream << header;
+        for (const std::string* part : parts) stream << *part;
+    };
+    // As safe as what version control writes of the merge itself.
+    content.durability = Durability::Unsynced;
+    if (const int error = Deliver(file, content))
+        throw Failure("Cannot write " + file + ": " + std::system_category().message(error));
+}
+
+std::string HeaderOf(const OpenMerge& merge) {
+    const Occasion& occasion = merge.occasion;
+    const json header = {
+        {"version", 1},
+        {"identity", merge.identity},
+        {"action", occasion.action},
+        {"base", occasion.base},
+        {"ours", occasion.ours},
+        {"theirs", occasion.theirs},
+        {"head", occasion.head},
+        {"take", SideName(merge.take)},
+        {"bothAdded", merge.isBothAdded},
+        {"conflicts", merge.conflicts},
+        {"sizes",
+         {merge.path.size(), merge.rules.size(), merge.typeInfo.size(), merge.texts.base.size(),
+          merge.texts.ours.size(), merge.texts.theirs.size()}},
+    };
+    return TextOf(header) + "\n";
+}
+
+/// The parts behind the header, in their order.
+std::vector<std::string*> PartsOf(OpenMerge& merge) {
+    return {&merge.path,       &merge.rules,      &merge.typeInfo,
+            &merge.texts.base, &merge.texts.ours, &merge.texts.theirs};
+}
+
+enum class Extent { WithoutTexts, Whole };
+constexpr std::size_t kPartsWithoutTexts = 3;
+
+void TakeHeader(const json& header, OpenMerge& merge) {
+    if (header.at("version") != 1) throw Failure("written by a newer version of ovrin");
+    merge.identity = header.at("identity");
+    merge.occasion = {header.at("action"), header.at("base"), header.at("ours"), header.at("theirs"),
+                      header.at("head")};
+    merge.take = SideNamed(header.at("take").get<std::string>());
+    merge.isBothAdded = header.at("bothAdded");
+    merge.conflicts = header.at("conflicts");
+}
+
+OpenMerge Parse(const std::string& bytes, Extent extent) {
+    const std::size_t end = bytes.find('\n');
+    if (end == std::string::npos) throw Failure("cut off");
+    OpenMerge merge;
+    const json header = json::parse(bytes.begin(), bytes.begin() + static_cast<std::ptrdiff_t>(end));
+    TakeHeader(header, merge);
+    const auto sizes = header.at("sizes").get<std::vector<std::size_t>>();
+    const auto parts = PartsOf(merge);
+    const std::size_t wanted = extent == Extent::Whole ? parts.size() : kPartsWithoutTexts;
+    std::size_t position = end + 1;
+    for (std::size_t i = 0; i < wanted; ++i) {
+        if (sizes.at(i) > bytes.size() - position) throw Failure("cut off");
+        *parts[i] = bytes.substr(position, sizes[i]);
+        position += sizes[i];
+    }
+    return merge;
+}
+
+/// Up to `most` bytes of a file.
+std::string ReadBeginning(const std::string& file, std::size_t most) {
+    const Descriptor descriptor = OpenFile(file.c_str(), O_RDONLY);
+    if (!descriptor.IsOpen()) throw Failure(std::system_category().message(errno));
+    std::string bytes(most, '\0');
+    std::size_t length = 0;
+    while (length < most) {
+        const ssize_t count =
+            Uninterrupted([&] { return read(descriptor.Get(), bytes.data() + length, most - length); });
+        if (count < 0) throw Failure(std::system_category().message(errno));
+        if (count == 0) break;
+        length += static_cast<std::size_t>(count);
+    }
+    bytes.resize(length);
+    return bytes;
+}
+
+OpenMerge ReadMerge(const std::string& file, Extent extent) {
+    try {
+        std::string bytes;
+        if (extent == Extent::WithoutTexts)
+            bytes = ReadBeginning(file, kMostHeader);
+        else if (ReadWholeFile(file, bytes) != ReadResult::Complete)
+            throw Failure(std::system_category().message(errno));
+        return Parse(bytes, extent);
+    } catch (const std::exception& error) {
+        throw Failure("Cannot read the open merge in " + file + ": " + error.what());
+    }
+}
+
+} // namespace
+
+OpenMerges::OpenMerges(const Repository& repository) : m_Folder(repository.data + "/ovrin/") {}
+
+OpenMerges::Place OpenMerges::PlaceOf(const std::string& path) const {
+    for (std::uint64_t attempt = 0;; ++attempt) {
+        const std::string file = m_Folder + NumberOf(path, attempt);
+        if (IsMissing(file + kMergeExtension)) return {file, false};
+        if (ReadMerge(file + kMergeExtension, Extent::WithoutTexts).path == path) return {file, true};
+    }
+}
+
+void OpenMerges::Add(OpenMerge& merge) {
+    std::error_code error;
+    fs::create_directories(m_Folder, error);
+    if (error) throw Failure("Cannot make the folder " + m_Folder + ": " + error.message());
+    merge.identity = NewIdentity();
+    const auto parts = PartsOf(merge);
+    Write(PlaceOf(merge.path).file + kMergeExtension, HeaderOf(merge), {parts.begin(), parts.end()});
+}
+
+std::vector<OpenMerge> OpenMerges::List() const {
+    std::vector<OpenMerge> merges;
+    std::error_code error;
+    for (const fs::directory_entry& entry : fs::directory_iterator(m_Folder, error))
+        if (entry.path().extension() == kMergeExtension)
+            merges.push_back(ReadMerge(entry.path().string(), Extent::WithoutTexts));
+    if (error && error != std::errc::no_such_file_or_directory)
+        throw Failure("Cannot look into " + m_Folder + ": " + error.message());
+    std::ranges::sort(merges, {}, &OpenMerge::path);
+    return merges;
+}
+
+std::optional<OpenMerge> OpenMerges::Find(const std::string& path) const {
+    const Place place = PlaceOf(path);
+    if (!place.isTaken) return {};
+    return ReadMerge(place.file + kMergeExtension, Extent::Whole);
+}
+
+Progress OpenMerges::ProgressOf(const OpenMerge& merge) const {
+    Progress progress{{}, merge.conflicts};
+    const std::string file = PlaceOf(merge.path).file + kProgressExtension;
+    std::string bytes;
+    const ReadResult result = ReadWholeFile(file, bytes);
+    if (result == ReadResult::CannotOpen && IsMissing(file)) return progress;
+    try {
+        if (result != ReadResult::Complete) throw Failure(std::system_category().message(errno));
+        const json read = json::parse(bytes);
+        if (read.at("identity") != merge.identity) return progress;
+        progress.open = read.at("open");
+        for (const json& decision : read.at("decisions"))
+            progress.decisions.push_back(
+                {decision.at("path"), SideNamed(decision.at("side").get<std::string>())});
+    } catch (const std::exception& error) {
+        throw Failure("Cannot read the decisions in " + file + ": " + error.what());
+    }
+    return progress;
+}
+
+void OpenMerges::SetProgress(const OpenMerge& merge, const Progress& progress) {
+    json decisions = json::array();
+    for (const Decision& decision : progress.decisions)
+        decisions.push_back({{"path", decision.path}, {"side", SideName(decision.side)}});
+    const json written = {{"identity", merge.identity}, {"open", progress.open}, {"decisions", decisions}};
+    Write(PlaceOf(merge.path).file + kProgressExtension, TextOf(written) + "\n", {});
+}
+
+void OpenMerges::Remove(const std::string& path) {
+    const Place place = PlaceOf(path);
+    for (const char* extension : {kProgressExtension, kMergeExtension}) {
+        std::error_code error;
+        if (place.isTaken && !fs::remove(place.file + extension, error) && error)
+            throw Failure("Cannot remove " + place.file + extension + ": " + error.message());
+    }
+    std::error_code ignored; // the folder goes with the last one
+    fs::remove(m_Folder, ignored);
+}
+
+} // namespace ovrin
