@@ -147,7 +147,9 @@ std::string ChangeStat(std::span<const FileChange> changes, bool inColour) {
     for (const FileChange& change : changes) {
         const std::string path = Printable(change.file.newPath), status = StatusText(change.file);
         text += " " + paint(kBold, path) + std::string(width - CharacterCount(path), ' ') + " | ";
-        text += change.scene ? Counts(*change.scene) : change.reason.empty() ? "no scene" : change.reason;
+        text += change.scene            ? Counts(*change.scene)
+                : change.reason.empty() ? "no scene"
+                                        : "can't be compared by objects";
         text += (status.empty() ? "" : " (" + status + ")") + "\n";
         if (!change.scene) continue;
         ++scenes;

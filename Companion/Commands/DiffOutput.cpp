@@ -65,28 +65,22 @@ public:
             return m_Others.size() < kAtATime || WriteOthers();
         }
         if (!change.scene && !isUnmerged) change.lines = m_Changes.lines(std::span(&change.file, 1));
-        return m_Outlet.Write(m_Separator + ChangeText(change, m_InColour)) && Separate();
+        return m_Outlet.Write(ChangeText(change, m_InColour) + "\n");
     }
     bool WriteOthers() {
         if (m_Others.empty()) return true;
         const std::string lines = m_Changes.lines(m_Others);
         m_Others.clear();
-        return m_Outlet.Write(m_Separator + PaintedLines(lines, m_InColour)) && Separate();
+        return m_Outlet.Write(PaintedLines(lines, m_InColour) + "\n");
     }
 
 private:
     static constexpr std::size_t kAtATime = 200;
 
-    bool Separate() {
-        m_Separator = "\n";
-        return true;
-    }
-
     const ChangedFiles& m_Changes;
     const bool m_InColour;
     Outlet m_Outlet;
     std::vector<FilePair> m_Others;
-    std::string m_Separator;
 };
 
 void OutputText(const ChangedFiles& changes, const ovrin_yaml::MergeRules& rules, const ChangeWish& wish,

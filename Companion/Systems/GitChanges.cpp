@@ -69,8 +69,9 @@ FileStatus StatusOf(char letter) {
 
 class Listing {
 public:
-    explicit Listing(const Repository& repository)
-        : m_Top(repository.top), m_Blobs(std::make_shared<BlobReader>(ProcessSetting{})) {}
+    /// `top` is that of the working tree, if the newer versions are those that stand there.
+    explicit Listing(std::optional<std::string> top)
+        : m_Top(std::move(top)), m_Blobs(std::make_shared<BlobReader>(ProcessSetting{})) {}
 
     /// ":MODE MODE ID ID STATUS", then one path or two.
     ChangedFile TakeEntry(Pieces& pieces) const {
@@ -85,20 +86,21 @@ public:
         file.oldPath = pieces.Next('\0');
         const bool hasTwo = file.status == FileStatus::Renamed || file.status == FileStatus::Copied;
         file.newPath = hasTwo ? pieces.Next('\0') : file.oldPath;
-        changed.before = VersionOf(before, file.oldPath);
-        changed.after = VersionOf(after, file.newPath);
+        changed.before = VersionOf(before);
+        // What git tells of a file in the working tree may be the id of a blob that it never stored.
+        changed.after =
+            m_Top && after.IsFile() ? VersionOnDisk(*m_Top + "/" + file.newPath) : VersionOf(after);
         return changed;
     }
 
 private:
-    FileVersion VersionOf(const Side& side, const std::string& path) const {
+    FileVersion VersionOf(const Side& side) const {
         if (!side.IsFile()) return nullptr;
-        if (side.IsOnDisk()) return VersionOnDisk(m_Top + "/" + path);
         return
             [blobs = m_Blobs, id = side.id](const IsWanted& isWanted) { return blobs->ReadIf(id, isWanted); };
     }
 
-    const std::string m_Top;
+    const std::optional<std::string> m_Top;
     const std::shared_ptr<BlobReader> m_Blobs;
 };
 
@@ -119,6 +121,15 @@ std::vector<std::string> Ends(const std::string& revision) {
     if (dots == std::string::npos) return {revision};
     const std::size_t behind = revision.find_first_not_of('.', dots);
     return {revision.substr(0, dots), behind == std::string::npos ? "" : revision.substr(behind)};
+}
+
+/// A word may stand for two commits.
+bool IsAgainstWorkingTree(const ComparisonWish& wish) {
+    if (wish.isStaged) return false;
+    if (wish.revisions.empty()) return true;
+    CommandWords call = {"git", "rev-parse", "--revs-only", "--end-of-options"};
+    call.insert(call.end(), wish.revisions.begin(), wish.revisions.end());
+    return std::ranges::count(OutputOf(call), '\n') == 1;
 }
 
 bool NamesSomething(const std::string& path, const ComparisonWish& wish) {
@@ -148,13 +159,18 @@ bool IsGitRevision(const std::string& word) {
 }
 
 ChangedFiles ListGitChanges(const Repository& repository, const ComparisonWish& wish) {
+    const bool isAgainstTree = IsAgainstWorkingTree(wish);
+    if (isAgainstTree && repository.top.empty())
+        throw Failure("A repository without a working tree: name two revisions, \"ovrin diff OLD NEW\"");
     CommandWords call = DiffCall(wish, {"--raw", "-z", "--no-abbrev"});
     call.insert(call.end(), wish.paths.begin(), wish.paths.end());
     const std::string listed = OutputOf(call);
     for (const std::string& path : wish.paths)
         if (!NamesSomething(path, wish))
-            throw Failure("git knows no file " + path + ": \"git status\" tells what isn't tracked");
-    const Listing listing(repository);
+            throw Failure(
+                "\"" + path +
+                "\" is no revision, and no file that git knows: \"git status\" tells what isn't tracked");
+    const Listing listing(isAgainstTree ? std::optional(repository.top) : std::nullopt);
     ChangedFiles changes;
     for (Pieces pieces(listed); !pieces.IsEmpty();) changes.files.push_back(listing.TakeEntry(pieces));
     DropRepeatedUnmerged(changes.files);

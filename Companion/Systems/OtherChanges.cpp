@@ -4,6 +4,7 @@
 #include "Systems/Repository.h"
 #include "Words/Failure.h"
 
+#include <cctype>
 #include <memory>
 #include <utility>
 
@@ -59,6 +60,20 @@ private:
     const ComparisonWish m_Wish;
 };
 
+/// A path as it stands in an address.
+std::string AsAddress(const std::string& path) {
+    constexpr std::string_view kPlainSigns = "/-._~";
+    std::string address;
+    for (const char letter : path) {
+        const auto byte = static_cast<unsigned char>(letter);
+        if (std::isalnum(byte) || kPlainSigns.find(letter) != std::string_view::npos)
+            address += letter;
+        else
+            address += std::string("%") + "0123456789ABCDEF"[byte >> 4] + "0123456789ABCDEF"[byte & 15];
+    }
+    return address;
+}
+
 class Subversion final : public Caller {
 public:
     explicit Subversion(ComparisonWish wish) : m_Wish(std::move(wish)) {}
@@ -77,7 +92,11 @@ public:
         return entries;
     }
     CommandWords Cat(const std::string& revision, const std::string& path) const override {
-        return {"svn", "cat", "-r", revision, "--", Operand(path)};
+        if (revision == Parent()) return {"svn", "cat", "-r", revision, "--", Operand(path)};
+        // By its address, since the working copy may have lost the file.
+        std::string folder = OutputOf({"svn", "info", "--show-item", "url", "."}, kPlain);
+        while (folder.ends_with('\n')) folder.pop_back();
+        return {"svn", "cat", folder + "/" + AsAddress(path) + "@" + revision};
     }
     CommandWords Diff() const override {
         CommandWords call = {"svn", "diff"};
