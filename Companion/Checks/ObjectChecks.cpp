@@ -233,15 +233,12 @@ void ObjectChecks::FindLoops(Faults& faults) const {
     }
 }
 
-/// One fault for all of them: a file whose line ends were changed has nothing else.
+/// One for all of them: a file whose line ends were changed has nothing else.
 void ObjectChecks::FindUnusualForm(Faults& faults) const {
     const auto& objects = m_Table.All().objects;
     const auto first = std::ranges::find(objects, false, &ObjectOutline::isAsWritten);
     if (first == objects.end()) return;
-    const auto count =
-        std::count_if(first, objects.end(), [](const ObjectOutline& object) { return !object.isAsWritten; });
-    faults.push_back({Code::NotAsWritten, static_cast<std::size_t>(first - objects.begin()), 0, nullptr,
-                      nullptr, static_cast<std::size_t>(count)});
+    faults.push_back({Code::NotAsWritten, static_cast<std::size_t>(first - objects.begin())});
 }
 
 } // namespace

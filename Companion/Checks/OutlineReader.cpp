@@ -1,13 +1,13 @@
 #include "Checks/OutlineReader.h"
 
 #include "Checks/OutlineBuilder.h"
+#include "Checks/WrittenSo.h"
 #include "Scenes/InOrder.h"
 
 #include "Reading/DocumentCut.h"
 #include "Reading/Fast/WrittenFormReader.h"
 #include "Session/ReadInputs.h"
 #include "Values/YAMLSequence.h"
-#include "Writing/ObjectFileWriter.h"
 
 #include <algorithm>
 #include <optional>
@@ -53,16 +53,17 @@ std::vector<std::span<const std::string_view>> PiecesOf(const Documents& documen
 /// Nothing if the fast reader isn't sure of one of them.
 std::optional<Outlines> ReadPiece(const std::string& text, std::span<const std::string_view> documents) {
     WrittenFormReader<OutlineBuilder> reader(text.data() + text.size());
-    std::vector<bool> areAsWritten;
+    FormSearch search(text);
+    std::vector<bool> areFirst;
     for (const std::string_view document : documents) {
         const auto read = reader.Read(document, 0);
         if (!read.object) return std::nullopt;
-        areAsWritten.push_back(read.isAsWritten);
+        areFirst.push_back(search.IsFirst(document, read.isAsWritten));
     }
     Outlines outlines = reader.TheBuilder().TakeOutlines();
     for (std::size_t i = 0; i < documents.size(); ++i) {
         outlines.objects[i].begin = static_cast<std::size_t>(documents[i].data() - text.data());
-        outlines.objects[i].isAsWritten = areAsWritten[i];
+        outlines.objects[i].isAsWritten = !areFirst[i];
     }
     return outlines;
 }
@@ -147,14 +148,6 @@ private:
     std::size_t m_Next = 0;
 };
 
-/// What repeats a key at its top can't be written at all, which is told of the key.
-bool IsAsWritten(const YAMLScalar& id, const YAMLMapping& object, std::string_view document) {
-    if (!object.Source().empty() || object.HasDuplicates()) return true;
-    std::string written;
-    AppendObject(id, object, written);
-    return written == document;
-}
-
 Outlines ReadByTrees(const std::string& name, const std::string& text, const Documents& documents) {
     OvrinObjects objects;
     const InputFile input = TextInput(name, text);
@@ -168,7 +161,9 @@ Outlines ReadByTrees(const std::string& name, const std::string& text, const Doc
     for (std::size_t i = 0; i < entries.size(); ++i) {
         const std::string_view document = documentOf(*entries[i].key);
         outlines.objects[i].begin = static_cast<std::size_t>(document.data() - text.data());
-        outlines.objects[i].isAsWritten = IsAsWritten(*entries[i].key, ToMapping(entries[i].value), document);
+        const YAMLMapping& object = ToMapping(entries[i].value);
+        outlines.objects[i].isAsWritten =
+            !object.Source().empty() || IsWrittenSo(*entries[i].key, object, document);
     }
     return outlines;
 }
