@@ -29,12 +29,6 @@ GitEntry ParseEntry(const std::string& field) {
             static_cast<GitEntry::Stage>(field[object + 1] - '0')};
 }
 
-std::vector<GitEntry> ParseEntries(std::string_view listed) {
-    std::vector<GitEntry> entries;
-    for (const std::string& field : Fields(listed)) entries.push_back(ParseEntry(field));
-    return entries;
-}
-
 std::string WithoutLineEnd(std::string text) {
     while (text.ends_with('\n')) text.pop_back();
     return text;
@@ -69,11 +63,10 @@ std::string Git::Output(CommandWords arguments, std::string input) const {
 }
 
 std::vector<GitEntry> Git::Unmerged() const {
-    return ParseEntries(Output({"ls-files", "--unmerged", "-z"}));
-}
-
-std::vector<GitEntry> Git::Entries(const std::string& path) const {
-    return ParseEntries(Output({"ls-files", "--stage", "-z", "--", path}));
+    std::vector<GitEntry> entries;
+    for (const std::string& field : Fields(Output({"ls-files", "--unmerged", "-z"})))
+        entries.push_back(ParseEntry(field));
+    return entries;
 }
 
 std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& paths,
@@ -88,8 +81,22 @@ std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& 
     return Fields(Output(std::move(command)));
 }
 
-std::string Git::Blob(const std::string& object) const {
-    return Output({"cat-file", "blob", object});
+std::vector<std::string> Git::Blobs(const std::vector<std::string>& objects) const {
+    std::string wanted;
+    for (const std::string& object : objects) wanted += object + '\n';
+    const std::string output = Output({"cat-file", "--batch"}, std::move(wanted));
+    std::vector<std::string> blobs;
+    std::size_t position = 0;
+    for (const std::string& object : objects) { // "NUMBER blob SIZE", the bytes, a line feed
+        const std::size_t end = output.find('\n', position);
+        const std::string header = output.substr(position, end - position);
+        const std::string beginning = object + " blob ";
+        if (!header.starts_with(beginning)) throw Failure("git can't give a version of a file: " + header);
+        const std::size_t size = std::stoull(header.substr(beginning.size()));
+        blobs.push_back(output.substr(end + 1, size));
+        position = end + 1 + size + 1;
+    }
+    return blobs;
 }
 
 bool Git::StoresAs(const std::string& path, const std::string& bytes) const {

@@ -35,13 +35,12 @@ public:
 
     /// The versions of all paths that are unmerged, path by path.
     std::vector<GitEntry> Unmerged() const;
-    /// Those of one path, merged or not.
-    std::vector<GitEntry> Entries(const std::string& path) const;
     /// Those of the paths that differ from the last commit, in the index or, if wanted, in the working tree.
     /// All that the index has where there is no commit.
     std::vector<std::string> DifferingFromHead(const std::vector<std::string>& paths,
                                                bool inIndexAlone) const;
-    std::string Blob(const std::string& object) const;
+    /// The bytes of blobs, in the order of their numbers.
+    std::vector<std::string> Blobs(const std::vector<std::string>& objects) const;
     /// Whether a file of the working tree, as git would store it, is these bytes.
     bool StoresAs(const std::string& path, const std::string& bytes) const;
     /// The commit that a name stands for; empty if it is none.

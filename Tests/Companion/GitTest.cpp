@@ -52,7 +52,8 @@ TEST_F(GitTest, ListsTheVersionsOfAnUnmergedPathWithAnyName) {
     ASSERT_EQ(entries.size(), 3);
     EXPECT_EQ(entries[0].path, kOddName);
     EXPECT_EQ(entries[1].stage, GitEntry::Ours);
-    EXPECT_EQ(git().Blob(entries[2].object), "theirs\n");
+    EXPECT_EQ(git().Blobs({entries[2].object, entries[0].object}),
+              (std::vector<std::string>{"theirs\n", "base\n"}));
 }
 
 TEST_F(GitTest, TakesAPathForItself) {

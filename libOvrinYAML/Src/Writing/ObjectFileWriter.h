@@ -11,6 +11,10 @@ namespace ovrin_yaml {
 /// stands below the object's own keys may repeat keys. Throws the duplicate-keys text if those do.
 void AppendObjectBody(const YAMLMapping& object, std::string& text);
 
+/// Appends an object as it stands in a file, with its header line; its id is that of its header's data, or
+/// else `rootKey`. Throws as Output does.
+void AppendObject(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text);
+
 /// Writes an object file as the editor does. Throws YAMLError "Object has no class id: " and the id's text
 /// when an object lost the entry, and the duplicate-keys text when an object holds repeated keys at its top.
 void Output(const OvrinObjects& objects, std::ostream& stream);
