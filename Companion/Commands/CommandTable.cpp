@@ -1,5 +1,6 @@
 #include "Commands/CommandTable.h"
 
+#include "Commands/MergeCommand.h"
 #include "Commands/SetupCommand.h"
 
 namespace ovrin {
@@ -7,6 +8,7 @@ namespace ovrin {
 namespace {
 
 constexpr Command kCommands[] = {
+    {"merge", "merge a scene, as version control has it done", DescribeMerge},
     {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
 };
 
