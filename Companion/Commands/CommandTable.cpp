@@ -1,13 +1,15 @@
 #include "Commands/CommandTable.h"
 
-#include "Commands/SetupCommand.h"
+#include "Commands/SettleCommand.h"
+#include "Commands/StatusCommand.h"
 
 namespace ovrin {
 
 namespace {
 
 constexpr Command kCommands[] = {
-    {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
+    {"status", "tell which scenes have open conflicts", DescribeStatus},
+    {"settle", "settle the open conflicts of scenes", DescribeSettle},
 };
 
 } // namespace

@@ -21,6 +21,8 @@ std::string TellValue(const Conflict& conflict, Side side, const std::string& la
     return line + '\n';
 }
 
+} // namespace
+
 std::string TellConflict(const Conflict& conflict, const SideLabels& labels) {
     std::string text = "  " + (conflict.property.empty() ? "" : conflict.property + ": ");
     text += std::string(WhatHappened(conflict.kind)) + '\n';
@@ -30,8 +32,6 @@ std::string TellConflict(const Conflict& conflict, const SideLabels& labels) {
         text += TellValue(conflict, side, labels.Of(side), width);
     return text;
 }
-
-} // namespace
 
 std::string TellConflicts(SceneMerge& merge, const SideLabels& labels, std::size_t most) {
     const ConflictWords words(merge, kValueWidth);
