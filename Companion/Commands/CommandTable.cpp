@@ -1,7 +1,9 @@
 #include "Commands/CommandTable.h"
 
 #include "Commands/MergeCommand.h"
+#include "Commands/SettleCommand.h"
 #include "Commands/SetupCommand.h"
+#include "Commands/StatusCommand.h"
 
 namespace ovrin {
 
@@ -9,6 +11,8 @@ namespace {
 
 constexpr Command kCommands[] = {
     {"merge", "merge a scene, as version control has it done", DescribeMerge},
+    {"status", "tell which scenes have open conflicts", DescribeStatus},
+    {"settle", "settle the open conflicts of scenes", DescribeSettle},
     {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
 };
 

@@ -6,8 +6,6 @@
 #include "Systems/Repository.h"
 #include "Words/Failure.h"
 
-#include <vector>
-
 namespace ovrin {
 
 namespace {
@@ -23,13 +21,14 @@ Occasion OccasionOf(const Repository& repository, const Git& git) {
 
 } // namespace
 
-IndexMerges::IndexMerges(const Repository& repository) : m_Repository(repository) {
+IndexMerges::IndexMerges(const Repository& repository)
+    : m_Repository(repository), m_Blobs(Git(repository).Setting()) {
     if (repository.kind != SystemKind::Git) return;
     for (GitEntry& entry : Git(repository).WithOwnIndex().Unmerged())
         m_Unmerged[entry.path].at(entry.stage) = std::move(entry.object);
 }
 
-OpenMerge IndexMerges::Read(const std::string& path) const {
+OpenMerge IndexMerges::Read(const std::string& path) {
     const auto found = m_Unmerged.find(path);
     if (found == m_Unmerged.end())
         throw Failure(
@@ -47,29 +46,21 @@ OpenMerge IndexMerges::Read(const std::string& path) const {
     merge.path = path;
     merge.occasion = OccasionOf(m_Repository, git);
     merge.isBothAdded = objects[GitEntry::Base].empty();
-    const std::vector<std::string> texts =
-        git.Blobs({objects[GitEntry::Ours], objects[GitEntry::Theirs],
-                   merge.isBothAdded ? objects[GitEntry::Ours] : objects[GitEntry::Base]});
-    merge.texts = {merge.isBothAdded ? "" : texts[2], texts[0], texts[1]};
+    merge.texts.ours = m_Blobs.Read(objects[GitEntry::Ours]);
+    merge.texts.theirs = m_Blobs.Read(objects[GitEntry::Theirs]);
+    if (!merge.isBothAdded) merge.texts.base = m_Blobs.Read(objects[GitEntry::Base]);
     return merge;
 }
 
-bool IndexMerges::Confirm(const OpenMerge& merge) const {
+bool IndexMerges::Confirm(const OpenMerge& merge) {
     const auto found = m_Unmerged.find(merge.path);
     if (found == m_Unmerged.end()) return true;
-    const ThreeTexts& texts = merge.texts;
-    const std::string* const all[] = {nullptr, &texts.base, &texts.ours, &texts.theirs};
-    std::vector<std::string> objects;
-    std::vector<const std::string*> expected;
-    for (const auto stage : {GitEntry::Base, GitEntry::Ours, GitEntry::Theirs}) {
-        if (found->second.at(stage).empty()) continue;
-        objects.push_back(found->second.at(stage));
-        expected.push_back(all[stage]);
-    }
-    const std::vector<std::string> blobs = Git(m_Repository).Blobs(objects);
-    for (std::size_t i = 0; i < blobs.size(); ++i)
-        if (blobs[i] != *expected[i]) return false;
-    return true;
+    const auto isText = [&](GitEntry::Stage stage, const std::string& text) {
+        const std::string& object = found->second.at(stage);
+        return object.empty() || m_Blobs.Read(object) == text;
+    };
+    return isText(GitEntry::Base, merge.texts.base) && isText(GitEntry::Ours, merge.texts.ours) &&
+           isText(GitEntry::Theirs, merge.texts.theirs);
 }
 
 } // namespace ovrin

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Conflicts/OpenMerge.h"
+#include "Systems/BlobReader.h"
 
 #include <array>
 #include <map>
@@ -14,19 +15,21 @@ struct Repository;
 /// whether or not anybody wrote them down.
 class IndexMerges {
 public:
+    /// The repository must stay.
     explicit IndexMerges(const Repository& repository);
 
     /// The merge of a scene, without identity and count. Throws Failure that tells what to do where there is
     /// none to be read: one side has removed the file, or the system is another than git.
-    OpenMerge Read(const std::string& path) const;
+    OpenMerge Read(const std::string& path);
     /// Whether the texts are those of the index. If not the file was merged again since. True where the index
     /// has none to compare.
-    bool Confirm(const OpenMerge& merge) const;
+    bool Confirm(const OpenMerge& merge);
 
 private:
     using Objects = std::array<std::string, 4>; // by stage; empty for what isn't there
 
     const Repository& m_Repository;
+    BlobReader m_Blobs;
     std::map<std::string, Objects> m_Unmerged;
 };
 

@@ -87,12 +87,31 @@ std::vector<std::string> SettleScenes::Paths() const {
     return paths;
 }
 
+SceneCount SettleScenes::CountUnrecorded(IndexMerges& index, const std::string& path) const {
+    Remarks none;
+    try {
+        return SceneCount::Of(*Load(index, path, none));
+    } catch (const Failure& failure) {
+        return {.path = path, .problem = failure.what()};
+    }
+}
+
+std::vector<SceneCount> SettleScenes::Count() const {
+    std::vector<SceneCount> counts;
+    for (const OpenMerge& merge : m_Live.live)
+        counts.push_back(SceneCount::Of(merge, m_Store.ProgressOf(merge)));
+    IndexMerges index(m_Repository);
+    for (const std::string& path : m_Live.unrecorded) counts.push_back(CountUnrecorded(index, path));
+    std::ranges::sort(counts, {}, &SceneCount::path);
+    return counts;
+}
+
 bool SettleScenes::IsRecorded(const std::string& path) const {
     return std::ranges::binary_search(m_Live.live, path, {}, &OpenMerge::path);
 }
 
-std::unique_ptr<SettleSession> SettleScenes::Load(const IndexMerges& index, const std::string& path,
-                                                  Remarks& remarks) {
+std::unique_ptr<SettleSession> SettleScenes::Load(IndexMerges& index, const std::string& path,
+                                                  Remarks& remarks) const {
     std::optional<OpenMerge> merge = IsRecorded(path) ? m_Store.Find(path) : std::nullopt;
     if (merge && !index.Confirm(*merge)) {
         remarks.push_back(Printable(path) + " was merged again without ovrin: earlier decisions don't count");
@@ -104,7 +123,7 @@ std::unique_ptr<SettleSession> SettleScenes::Load(const IndexMerges& index, cons
 }
 
 std::size_t SettleScenes::Open(Remarks& remarks) {
-    const IndexMerges index(m_Repository);
+    IndexMerges index(m_Repository);
     std::size_t failed = 0;
     for (const std::string& path : Paths()) {
         try {
@@ -169,6 +188,14 @@ void SettleScenes::TakeAsTheyStand() {
 
 void SettleScenes::Forget() {
     for (const OpenMerge& merge : m_Live.live) m_Store.Remove(merge.path);
+}
+
+void ForgetSettledFile(const std::string& given) {
+    const std::optional<Repository> repository = FindRepository();
+    if (!repository || repository->top.empty()) return;
+    const std::string file = std::filesystem::weakly_canonical(given).string();
+    if (!file.starts_with(repository->top + "/")) return;
+    OpenMerges(*repository).Remove(WorkingPath(*repository, given));
 }
 
 } // namespace ovrin

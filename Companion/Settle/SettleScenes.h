@@ -2,6 +2,7 @@
 
 #include "Conflicts/LiveMerges.h"
 #include "Conflicts/OpenMerges.h"
+#include "Settle/SceneCount.h"
 #include "Settle/SettleSession.h"
 #include "Systems/Repository.h"
 
@@ -32,6 +33,8 @@ public:
     /// The paths of all that is left, in order.
     std::vector<std::string> Paths() const;
 
+    /// How far all that is left is. Scenes of which nothing is written down are merged for it.
+    std::vector<SceneCount> Count() const;
     /// Reads and merges all that is left, each with its decisions. What can't be is told in `remarks`, stays
     /// out of Sessions, and is counted.
     std::size_t Open(Remarks& remarks);
@@ -52,7 +55,8 @@ public:
     void Forget();
 
 private:
-    std::unique_ptr<SettleSession> Load(const IndexMerges& index, const std::string& path, Remarks& remarks);
+    std::unique_ptr<SettleSession> Load(IndexMerges& index, const std::string& path, Remarks& remarks) const;
+    SceneCount CountUnrecorded(IndexMerges& index, const std::string& path) const;
     void Conclude(const std::vector<std::string>& paths);
     bool IsRecorded(const std::string& path) const;
     std::string FileOf(const std::string& path) const { return m_Repository.top + "/" + path; }
@@ -64,5 +68,8 @@ private:
     LiveMerges m_Live;
     std::vector<std::unique_ptr<SettleSession>> m_Sessions;
 };
+
+/// Forgets the record of a file that was settled in another way, if there is one. The file may be anywhere.
+void ForgetSettledFile(const std::string& given);
 
 } // namespace ovrin

@@ -43,6 +43,7 @@ public:
     };
     /// The conflicts of the merge as it began and those that decisions led to, in the order of the hierarchy.
     std::vector<Met> Conflicts() const;
+    std::size_t CountMet() const { return m_Conflicts.size(); }
     const std::vector<OpenConflict>& Open() const { return m_Merge.Open(); }
     /// Whether a path or pattern matches anything that either side changed, as far as the decisions let that
     /// through.

@@ -53,8 +53,9 @@ Git Git::WithOwnIndex() const {
 
 ProcessResult Git::Run(CommandWords arguments, std::string input) const {
     arguments.insert(arguments.begin(), {"git", "--literal-pathspecs"});
-    return RunProcess(arguments,
-                      {.folder = m_Folder, .input = std::move(input), .environment = m_Environment});
+    ProcessSetting setting = Setting();
+    setting.input = std::move(input);
+    return RunProcess(arguments, setting);
 }
 
 std::string Git::Output(CommandWords arguments, std::string input) const {
@@ -79,24 +80,6 @@ std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& 
     command.emplace_back("--");
     command.insert(command.end(), paths.begin(), paths.end());
     return Fields(Output(std::move(command)));
-}
-
-std::vector<std::string> Git::Blobs(const std::vector<std::string>& objects) const {
-    std::string wanted;
-    for (const std::string& object : objects) wanted += object + '\n';
-    const std::string output = Output({"cat-file", "--batch"}, std::move(wanted));
-    std::vector<std::string> blobs;
-    std::size_t position = 0;
-    for (const std::string& object : objects) { // "NUMBER blob SIZE", the bytes, a line feed
-        const std::size_t end = output.find('\n', position);
-        const std::string header = output.substr(position, end - position);
-        const std::string beginning = object + " blob ";
-        if (!header.starts_with(beginning)) throw Failure("git can't give a version of a file: " + header);
-        const std::size_t size = std::stoull(header.substr(beginning.size()));
-        blobs.push_back(output.substr(end + 1, size));
-        position = end + 1 + size + 1;
-    }
-    return blobs;
 }
 
 bool Git::StoresAs(const std::string& path, const std::string& bytes) const {

@@ -30,6 +30,8 @@ public:
     /// another one, which holds what is to be committed.
     Git WithOwnIndex() const;
 
+    /// What a process that serves this repository is started with.
+    ProcessSetting Setting() const { return {.folder = m_Folder, .environment = m_Environment}; }
     ProcessResult Run(CommandWords arguments, std::string input = {}) const;
     std::string Output(CommandWords arguments, std::string input = {}) const;
 
@@ -39,8 +41,6 @@ public:
     /// All that the index has where there is no commit.
     std::vector<std::string> DifferingFromHead(const std::vector<std::string>& paths,
                                                bool inIndexAlone) const;
-    /// The bytes of blobs, in the order of their numbers.
-    std::vector<std::string> Blobs(const std::vector<std::string>& objects) const;
     /// Whether a file of the working tree, as git would store it, is these bytes.
     bool StoresAs(const std::string& path, const std::string& bytes) const;
     /// The commit that a name stands for; empty if it is none.
