@@ -1,5 +1,6 @@
 #include "Commands/CommandTable.h"
 
+#include "Commands/DoctorCommand.h"
 #include "Commands/SetupCommand.h"
 
 namespace ovrin {
@@ -8,6 +9,7 @@ namespace {
 
 constexpr Command kCommands[] = {
     {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
+    {"doctor", "tell what keeps version control from merging scenes, and the cure", DescribeDoctor},
 };
 
 } // namespace

@@ -15,7 +15,7 @@ namespace {
 /// to stay in the cache.
 constexpr std::size_t kPieceSize = std::size_t{1} << 20;
 
-constexpr std::string_view kFileHeaderEnd = OVRIN_TAG_AUTHORITY ",2011:\n";
+constexpr std::string_view kTagAuthority = OVRIN_TAG_AUTHORITY;
 
 void AppendHeaderLine(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text) {
     const YAMLScalar* fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
@@ -40,9 +40,13 @@ void AppendObjectBody(const YAMLMapping& object, std::string& text) {
     YAMLEmitter(text).EmitDocument({keys.data(), values.data(), keys.size()}, object.m_Flow);
 }
 
+std::string_view TagAuthority() {
+    return kTagAuthority;
+}
+
 void Output(const OvrinObjects& objects, std::ostream& stream) {
     std::string text(kFileHeaderStart);
-    text += kFileHeaderEnd;
+    text.append(kTagAuthority).append(kFileHeaderEnd);
     for (const YAMLMapping::Entry entry : objects.GetMapping()) {
         const YAMLMapping& object = ToMapping(entry.value);
         if (!object.Source().empty()) {
