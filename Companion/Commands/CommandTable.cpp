@@ -1,5 +1,6 @@
 #include "Commands/CommandTable.h"
 
+#include "Commands/DoctorCommand.h"
 #include "Commands/MergeCommand.h"
 #include "Commands/SettleCommand.h"
 #include "Commands/SetupCommand.h"
@@ -14,6 +15,7 @@ constexpr Command kCommands[] = {
     {"status", "tell which scenes have open conflicts", DescribeStatus},
     {"settle", "settle the open conflicts of scenes", DescribeSettle},
     {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
+    {"doctor", "tell what keeps version control from merging scenes, and the cure", DescribeDoctor},
 };
 
 } // namespace

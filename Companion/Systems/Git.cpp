@@ -11,14 +11,6 @@ namespace ovrin {
 
 namespace {
 
-/// Texts that each end in a zero byte.
-std::vector<std::string> Fields(std::string_view bytes) {
-    std::vector<std::string> fields;
-    for (std::size_t end; (end = bytes.find('\0')) != std::string_view::npos; bytes.remove_prefix(end + 1))
-        fields.emplace_back(bytes.substr(0, end));
-    return fields;
-}
-
 /// "MODE OBJECT STAGE\tPATH"
 GitEntry ParseEntry(const std::string& field) {
     const std::size_t mode = field.find(' ');
@@ -65,7 +57,7 @@ std::string Git::Output(CommandWords arguments, std::string input) const {
 
 std::vector<GitEntry> Git::Unmerged() const {
     std::vector<GitEntry> entries;
-    for (const std::string& field : Fields(Output({"ls-files", "--unmerged", "-z"})))
+    for (const std::string& field : ZeroEndedTexts(Output({"ls-files", "--unmerged", "-z"})))
         entries.push_back(ParseEntry(field));
     return entries;
 }
@@ -79,7 +71,7 @@ std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& 
     if (hasCommit) command.emplace_back("HEAD");
     command.emplace_back("--");
     command.insert(command.end(), paths.begin(), paths.end());
-    return Fields(Output(std::move(command)));
+    return ZeroEndedTexts(Output(std::move(command)));
 }
 
 bool Git::StoresAs(const std::string& path, const std::string& bytes) const {
@@ -103,7 +95,7 @@ std::string Git::NameOfCommit(const std::string& commit) const {
 
 std::optional<std::string> Git::ConfigValue(const std::string& name) const {
     const ProcessResult result = Run({"config", "-z", "--get", name});
-    const std::vector<std::string> values = Fields(result.output);
+    const std::vector<std::string> values = ZeroEndedTexts(result.output);
     if (!result.Succeeded() || values.empty()) return {};
     return values.front();
 }

@@ -15,7 +15,7 @@ namespace {
 /// to stay in the cache.
 constexpr std::size_t kPieceSize = std::size_t{1} << 20;
 
-constexpr std::string_view kFileHeaderEnd = OVRIN_TAG_AUTHORITY ",2011:\n";
+constexpr std::string_view kTagAuthority = OVRIN_TAG_AUTHORITY;
 
 void AppendHeaderLine(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text) {
     const YAMLScalar* fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
@@ -46,9 +46,13 @@ void AppendObject(const YAMLScalar& rootKey, const YAMLMapping& object, std::str
     text.push_back('\n');
 }
 
+std::string_view TagAuthority() {
+    return kTagAuthority;
+}
+
 void Output(const OvrinObjects& objects, std::ostream& stream) {
     std::string text(kFileHeaderStart);
-    text += kFileHeaderEnd;
+    text.append(kTagAuthority).append(kFileHeaderEnd);
     for (const YAMLMapping::Entry entry : objects.GetMapping()) {
         const YAMLMapping& object = ToMapping(entry.value);
         if (!object.Source().empty())

@@ -4,6 +4,7 @@
 
 #include <iosfwd>
 #include <string>
+#include <string_view>
 
 namespace ovrin_yaml {
 
@@ -14,6 +15,9 @@ void AppendObjectBody(const YAMLMapping& object, std::string& text);
 /// Appends an object as it stands in a file, with its header line; its id is that of its header's data, or
 /// else `rootKey`. Throws as Output does.
 void AppendObject(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text);
+
+/// The domain name in the second line of every file that is written; the build decides.
+std::string_view TagAuthority();
 
 /// Writes an object file as the editor does. Throws YAMLError "Object has no class id: " and the id's text
 /// when an object lost the entry, and the duplicate-keys text when an object holds repeated keys at its top.
