@@ -47,11 +47,12 @@ std::vector<Described> DescribeWanted(CLI::App& program, const std::vector<std::
     return described;
 }
 
-Outcome TellMisuse(const CLI::App& program, const CLI::ParseError& error) {
+Outcome TellMisuse(const CLI::App& program, const CLI::ParseError& error,
+                   const std::vector<std::string>& arguments) {
     if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) { // --help and --version
         return program.exit(error) == 0 && std::cout.flush() ? Outcome::Done : Outcome::Failed;
     }
-    std::cerr << DescribeMisuse(program, error);
+    std::cerr << DescribeMisuse(program, error, arguments);
     return Outcome::Failed;
 }
 
@@ -76,7 +77,7 @@ Outcome RunCommandLine(const std::vector<std::string>& arguments) {
     try {
         program.parse(std::vector<std::string>(arguments.rbegin(), arguments.rend()));
     } catch (const CLI::ParseError& error) {
-        return TellMisuse(program, error);
+        return TellMisuse(program, error, arguments);
     }
     const auto named =
         std::ranges::find_if(commands, [](const Described& command) { return command.app->parsed(); });

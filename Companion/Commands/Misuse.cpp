@@ -9,28 +9,41 @@ namespace ovrin {
 
 namespace {
 
-bool IsOption(const std::string& word) {
-    return word.size() > 1 && word.starts_with('-');
-}
+using Words = std::vector<std::string>;
 
 std::string InQuotes(const std::string& text) {
     return "\"" + text + "\"";
 }
 
-std::string WithoutCommand(const std::vector<std::string>& unexpected) {
+/// Whether a word is meant as an option: behind -- none is.
+bool IsOption(const std::string& word, const Words& arguments) {
+    const auto end = std::ranges::find(arguments, "--");
+    return word.size() > 1 && word.starts_with('-') &&
+           (end == arguments.end() || std::find(arguments.begin(), end, word) != end);
+}
+
+/// What nothing was found for, in the order of the arguments.
+Words UnexpectedWords(const CLI::App& program, const Words& arguments) {
+    Words words = program.remaining(true);
+    std::erase(words, "--");
+    std::ranges::stable_sort(words, {},
+                             [&](const std::string& word) { return std::ranges::find(arguments, word); });
+    return words;
+}
+
+std::string WithoutCommand(const Words& unexpected, const Words& arguments) {
     if (unexpected.empty()) return "a command is missing";
-    return std::string(IsOption(unexpected.front()) ? "there is no option " : "there is no command ") +
+    return std::string(IsOption(unexpected.front(), arguments) ? "there is no option "
+                                                               : "there is no command ") +
            InQuotes(unexpected.front());
 }
 
-/// Behind -- nothing is an option.
-std::string Unexpected(std::vector<std::string> words) {
-    const auto end = std::ranges::find(words, "--");
-    const auto option = std::find_if(words.begin(), end, IsOption);
-    if (option != end) return "there is no option " + InQuotes(*option);
-    std::erase(words, "--");
-    return InQuotes(words.front()) + (words.size() == 1 ? " is an argument" : " and more are arguments") +
-           " too many";
+std::string Unexpected(const Words& unexpected, const Words& arguments) {
+    const auto option =
+        std::ranges::find_if(unexpected, [&](const std::string& word) { return IsOption(word, arguments); });
+    if (option != unexpected.end()) return "there is no option " + InQuotes(*option);
+    return InQuotes(unexpected.front()) +
+           (unexpected.size() == 1 ? " is an argument" : " and more are arguments") + " too many";
 }
 
 /// "--format: xml not in {text,json}", where the library knows all values.
@@ -59,12 +72,12 @@ std::string Mismatch(const std::string& message) {
     return message.starts_with(name + ": At Most ") ? name + " is given too often" : message;
 }
 
-std::string Problem(const CLI::App& program, const CLI::ParseError& error,
-                    const std::vector<std::string>& unexpected) {
-    if (program.get_subcommands().empty()) return WithoutCommand(unexpected);
+std::string Problem(const CLI::App& program, const CLI::ParseError& error, const Words& unexpected,
+                    const Words& arguments) {
+    if (program.get_subcommands().empty()) return WithoutCommand(unexpected, arguments);
     switch (static_cast<CLI::ExitCodes>(error.get_exit_code())) {
     case CLI::ExitCodes::ExtrasError:
-        return Unexpected(unexpected);
+        return Unexpected(unexpected, arguments);
     case CLI::ExitCodes::ValidationError:
         return NotAllowed(error.what());
     case CLI::ExitCodes::ConversionError:
@@ -78,12 +91,13 @@ std::string Problem(const CLI::App& program, const CLI::ParseError& error,
 
 } // namespace
 
-std::string DescribeMisuse(const CLI::App& program, const CLI::ParseError& error) {
+std::string DescribeMisuse(const CLI::App& program, const CLI::ParseError& error,
+                           const std::vector<std::string>& arguments) {
     const auto parsed = program.get_subcommands();
     const CLI::App& app = parsed.empty() ? program : *parsed.front();
     const std::string name = parsed.empty() ? "ovrin" : "ovrin " + app.get_name();
-    const std::vector<std::string> unexpected = program.remaining(true);
-    const std::string problem = name + ": " + Problem(program, error, unexpected) + ".\n";
+    const Words unexpected = UnexpectedWords(program, arguments);
+    const std::string problem = name + ": " + Problem(program, error, unexpected, arguments) + ".\n";
     if (parsed.empty() && unexpected.empty()) return problem + program.help();
     return problem + Suggestions(app, unexpected) + InQuotes(name + " --help") + " tells what there is.\n";
 }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 namespace CLI {
 class App;
@@ -9,7 +10,8 @@ class ParseError;
 
 namespace ovrin {
 
-/// Why `program` refused its arguments with `error`, and what to do: lines for standard error.
-std::string DescribeMisuse(const CLI::App& program, const CLI::ParseError& error);
+/// Why `program` refused the arguments with `error`, and what to do: lines for standard error.
+std::string DescribeMisuse(const CLI::App& program, const CLI::ParseError& error,
+                           const std::vector<std::string>& arguments);
 
 } // namespace ovrin

@@ -44,12 +44,11 @@ struct Sample {
     }
 
     /// The first line that a misuse is told with, and what is suggested.
-    std::string Misuse(std::vector<std::string> arguments) {
-        std::ranges::reverse(arguments);
+    std::string Misuse(const std::vector<std::string>& arguments) {
         try {
-            program.parse(arguments);
+            program.parse(std::vector<std::string>(arguments.rbegin(), arguments.rend()));
         } catch (const CLI::ParseError& error) {
-            const std::string told = DescribeMisuse(program, error);
+            const std::string told = DescribeMisuse(program, error, arguments);
             return told.substr(0, told.find("\n\"ovrin"));
         }
         return "";
@@ -62,6 +61,7 @@ TEST(CommandLine, AMisuseIsToldInPlainWords) {
     EXPECT_EQ(sample.Misuse({"check", "a", "--jbos"}),
               "ovrin check: there is no option \"--jbos\".\nDid you mean --jobs?");
     EXPECT_EQ(sample.Misuse({"check", "a", "--", "-b"}), "ovrin check: \"-b\" is an argument too many.");
+    EXPECT_EQ(sample.Misuse({"check", "a", "b", "c"}), "ovrin check: \"b\" and more are arguments too many.");
     EXPECT_EQ(sample.Misuse({"check"}), "ovrin check: FILE is required.");
     EXPECT_EQ(sample.Misuse({"check", "a", "--jobs"}), "ovrin check: --jobs needs a value.");
     EXPECT_EQ(sample.Misuse({"check", "a", "-jx"}), "ovrin check: --jobs can't be \"x\".");
