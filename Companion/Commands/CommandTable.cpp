@@ -1,5 +1,6 @@
 #include "Commands/CommandTable.h"
 
+#include "Commands/CheckCommand.h"
 #include "Commands/SetupCommand.h"
 
 namespace ovrin {
@@ -7,6 +8,7 @@ namespace ovrin {
 namespace {
 
 constexpr Command kCommands[] = {
+    {"check", "tell what is wrong with scenes", DescribeCheck},
     {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
 };
 
