@@ -89,8 +89,9 @@ private:
     }
 
     void CheckReferences(std::size_t index, Faults& faults);
-    void CheckChild(std::size_t index, std::size_t child, const Reference& reference, Faults& faults);
-    void CheckComponent(std::size_t index, std::size_t component, const Reference& reference, Faults& faults);
+    void CheckChild(std::size_t index, std::size_t child, const LocalReference& reference, Faults& faults);
+    void CheckComponent(std::size_t index, std::size_t component, const LocalReference& reference,
+                        Faults& faults);
     void CheckRequirements(std::size_t index, Faults& faults) const;
     void CheckOwners(std::size_t index, Faults& faults);
     void CheckFather(std::size_t index, Faults& faults) const;
@@ -118,7 +119,7 @@ void ObjectChecks::CheckReferences(std::size_t index, Faults& faults) {
     }
     const bool hasChildren = IsTransform(object) && !isRepeated;
     const bool hasComponents = IsGameObject(object) && !isRepeated;
-    for (const Reference& reference : m_Table.All().ReferencesOf(object)) {
+    for (const LocalReference& reference : m_Table.All().ReferencesOf(object)) {
         const std::size_t target = m_Table.Find(reference.target);
         if (target == ObjectTable::kNone)
             faults.push_back(
@@ -132,7 +133,7 @@ void ObjectChecks::CheckReferences(std::size_t index, Faults& faults) {
 }
 
 /// A stripped object says nothing of its parent or owner: its prefab does.
-void ObjectChecks::CheckChild(std::size_t index, std::size_t child, const Reference& reference,
+void ObjectChecks::CheckChild(std::size_t index, std::size_t child, const LocalReference& reference,
                               Faults& faults) {
     const ObjectOutline& other = m_Table.At(child);
     if (other.isStripped || !other.father) return;
@@ -142,7 +143,7 @@ void ObjectChecks::CheckChild(std::size_t index, std::size_t child, const Refere
         faults.push_back({Code::RepeatedChild, index, reference.line, reference.field, other.id});
 }
 
-void ObjectChecks::CheckComponent(std::size_t index, std::size_t component, const Reference& reference,
+void ObjectChecks::CheckComponent(std::size_t index, std::size_t component, const LocalReference& reference,
                                   Faults& faults) {
     const ObjectOutline& other = m_Table.At(component);
     if (other.isStripped || !other.gameObject) return;
@@ -155,7 +156,7 @@ void ObjectChecks::CheckComponent(std::size_t index, std::size_t component, cons
 /// By the same rule as the merge.
 void ObjectChecks::CheckRequirements(std::size_t index, Faults& faults) const {
     std::vector<GameObjectComponent> components;
-    for (const Reference& reference : m_Table.All().ReferencesOf(m_Table.At(index))) {
+    for (const LocalReference& reference : m_Table.All().ReferencesOf(m_Table.At(index))) {
         if (reference.field != YAMLScalar::mComponent) continue;
         const ObjectOutline* component = m_Table.Get(reference.target);
         const YAMLTypeInfo* type = component ? m_Types.GetTypeInfo(component->classID) : nullptr;
@@ -198,7 +199,7 @@ void ObjectChecks::CheckGameObject(std::size_t index, Faults& faults) const {
 }
 
 std::uint32_t ObjectChecks::LineOfReference(const ObjectOutline& object, const YAMLScalar* field) const {
-    for (const Reference& reference : m_Table.All().ReferencesOf(object))
+    for (const LocalReference& reference : m_Table.All().ReferencesOf(object))
         if (reference.field == field) return reference.line;
     return 0;
 }

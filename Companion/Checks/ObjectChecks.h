@@ -18,7 +18,7 @@ struct ObjectFault {
     std::uint32_t line = 0;                        ///< from that of the object's document, which is 0
     const ovrin_yaml::YAMLScalar* field = nullptr; ///< the field or key that it is about
     const ovrin_yaml::YAMLScalar* other = nullptr; ///< the other object's id, or the missing one's class id
-    std::size_t count = 0;                         ///< of objects in a loop
+    std::size_t number = 0;                        ///< of objects in a loop
 };
 
 /// Looks at the objects of a scene and at what they say of each other, on all processors. The faults come in

@@ -10,7 +10,7 @@
 namespace ovrin {
 
 /// A reference to another object of the same file: a mapping of a fileID alone, that isn't 0.
-struct Reference {
+struct LocalReference {
     const ovrin_yaml::YAMLScalar* target;
     const ovrin_yaml::YAMLScalar* field; ///< of the object's class, wherever inside; null if it isn't in one
     std::uint32_t line;                  ///< where it begins
@@ -43,11 +43,11 @@ struct ObjectOutline {
 /// document, which is 0.
 struct Outlines {
     std::vector<ObjectOutline> objects;
-    std::vector<Reference> references;
+    std::vector<LocalReference> references;
     std::vector<RepeatedKey> repeatedKeys;
 
     /// Those of an object.
-    std::span<const Reference> ReferencesOf(const ObjectOutline& object) const {
+    std::span<const LocalReference> ReferencesOf(const ObjectOutline& object) const {
         return std::span(references).subspan(object.firstReference, object.references);
     }
     /// Puts `others` behind these.

@@ -148,9 +148,9 @@ private:
     std::size_t m_Next = 0;
 };
 
-Outlines ReadByTrees(const std::string& name, const std::string& text, const Documents& documents) {
+Outlines ReadByTrees(const std::string& text, const Documents& documents) {
     OvrinObjects objects;
-    const InputFile input = TextInput(name, text);
+    const InputFile input = TextInput("the scene", text);
     ReadInputs({{"Read scene", &input, &objects}}, Threads::WhereWorthwhile);
     const std::string_view header = FileHeaderOf(text);
     TreeWalk walk(static_cast<std::uint32_t>(std::count(header.begin(), header.end(), '\n')));
@@ -170,10 +170,10 @@ Outlines ReadByTrees(const std::string& name, const std::string& text, const Doc
 
 } // namespace
 
-Outlines ReadOutlines(const std::string& name, const std::string& text) {
+Outlines ReadOutlines(const std::string& text) {
     const Documents documents = Cut(text);
     std::optional<Outlines> outlines = ReadFast(text, documents);
-    return outlines ? std::move(*outlines) : ReadByTrees(name, text, documents);
+    return outlines ? std::move(*outlines) : ReadByTrees(text, documents);
 }
 
 } // namespace ovrin

@@ -21,6 +21,12 @@ GitEntry ParseEntry(const std::string& field) {
             static_cast<GitEntry::Stage>(field[object + 1] - '0')};
 }
 
+std::vector<GitEntry> ParseEntries(std::string_view listing) {
+    std::vector<GitEntry> entries;
+    for (const std::string& field : Fields(listing)) entries.push_back(ParseEntry(field));
+    return entries;
+}
+
 std::string WithoutLineEnd(std::string text) {
     while (text.ends_with('\n')) text.pop_back();
     return text;
@@ -43,23 +49,30 @@ Git Git::WithOwnIndex() const {
     return other;
 }
 
+ProcessSetting Git::Setting(std::string input) const {
+    return {.folder = m_Folder, .input = std::move(input), .environment = m_Environment};
+}
+
 ProcessResult Git::Run(CommandWords arguments, std::string input) const {
     arguments.insert(arguments.begin(), {"git", "--literal-pathspecs"});
-    ProcessSetting setting = Setting();
-    setting.input = std::move(input);
-    return RunProcess(arguments, setting);
+    return RunProcess(arguments, Setting(std::move(input)));
 }
 
 std::string Git::Output(CommandWords arguments, std::string input) const {
     arguments.insert(arguments.begin(), {"git", "--literal-pathspecs"});
-    return OutputOf(arguments, {.folder = m_Folder, .input = std::move(input), .environment = m_Environment});
+    return OutputOf(arguments, Setting(std::move(input)));
 }
 
 std::vector<GitEntry> Git::Unmerged() const {
-    std::vector<GitEntry> entries;
-    for (const std::string& field : ZeroEndedTexts(Output({"ls-files", "--unmerged", "-z"})))
-        entries.push_back(ParseEntry(field));
-    return entries;
+    return ParseEntries(Output({"ls-files", "--unmerged", "-z"}));
+}
+
+std::vector<GitEntry> Git::Entries() const {
+    return ParseEntries(Output({"ls-files", "--stage", "-z"}));
+}
+
+std::vector<std::string> Git::Untracked() const {
+    return ZeroEndedTexts(Output({"ls-files", "--others", "--exclude-standard", "-z"}));
 }
 
 std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& paths,
