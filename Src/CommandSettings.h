@@ -1,5 +1,7 @@
 #pragma once
 
+#include "InputFiles.h"
+
 #include "Merge/MergeResolve.h"
 
 #include <string>
@@ -7,8 +9,6 @@
 /// Defaults of the options that name a file: "auto" stands for the file the program finds by itself.
 inline const std::string kDefaultSpecFile = "auto";
 inline const std::string kNoSpecFile = "none"; // no external tool at all
-inline const std::string kDefaultRulesFile = "auto";
-inline const std::string kDefaultTypeInfoFile;
 
 /// The settings of a command over two files.
 struct TwoFileConfig {

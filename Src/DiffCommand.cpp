@@ -3,7 +3,7 @@
 #include "CommandSettings.h"
 #include "Destination.h"
 #include "DriverErrors.h"
-#include "InputFiles.h"
+#include "RulesAndTypes.h"
 #include "TimerStat.h"
 #include "TwoFiles.h"
 

@@ -6,21 +6,14 @@
 #include "Fallback.h"
 #include "FileUtils.h"
 #include "MergePipeline.h"
+#include "SceneExtensions.h"
 
 #include "Values/YAMLError.h"
 
-#include <algorithm>
 #include <exception>
-#include <iterator>
 #include <new>
 
 namespace {
-
-bool IsSmartExtension(const std::string& extension) {
-    static const char* const kSmartExtensions[] = {"ovrin", "prefab", "meta", "OVR", "PRE", "MET"};
-    return std::find(std::begin(kSmartExtensions), std::end(kSmartExtensions), extension) !=
-           std::end(kSmartExtensions);
-}
 
 /// False after a message.
 bool SetupPremergePath(std::string& path) {
@@ -77,7 +70,7 @@ ExitStatus MergeSmartly(MergeConfig& config, const std::string& output, bool use
 
 ExitStatus ProcessMergeCommand(MergeConfig& config) {
     const std::string extension = GetFileExtension(config.leftFile);
-    const bool smart = config.force || IsSmartExtension(extension);
+    const bool smart = config.force || IsSceneExtension(extension);
     const bool useFallback = config.fallbackSpecFile != kNoSpecFile;
     const std::string output = CreateTempFile();
     if (output.empty()) return Fail("Couldn't create temporary output file for merge result");

@@ -9,6 +9,7 @@
 #include "InputFiles.h"
 #include "OutputFile.h"
 #include "Premerge.h"
+#include "RulesAndTypes.h"
 #include "StepTimers.h"
 
 #include "Merge/ConflictReport.h"

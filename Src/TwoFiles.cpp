@@ -2,6 +2,7 @@
 
 #include "CommandSettings.h"
 #include "InputFiles.h"
+#include "RulesAndTypes.h"
 #include "StepTimers.h"
 
 #include "Session/MergeSession.h"

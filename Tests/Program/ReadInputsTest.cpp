@@ -1,5 +1,6 @@
 #include "InputFiles.h"
 #include "MergeRun.h"
+#include "RulesAndTypes.h"
 #include "SceneGenerator.h"
 #include "Support/Diffs.h"
 #include "Support/Program.h"

@@ -25,9 +25,13 @@ std::string_view ObjectFile::FileIDOf(const Document& document) {
     return ovrin_yaml::FileIDOf({document.begin, document.length});
 }
 
+/// A byte order mark may stand in front of it.
+bool HasSignature(std::string_view bytes) {
+    return bytes.substr(0, kFileSignature.size() + 4).find(kFileSignature) != std::string_view::npos;
+}
+
 void ObjectFile::Take(std::string bytes) {
-    if (std::string_view(bytes).substr(0, kFileSignature.size() + 4).find(kFileSignature) ==
-        std::string_view::npos)
+    if (!HasSignature(bytes))
         throw YAMLError(
             "File is not a valid text serialized YAML file. Make sure that Asset Serialization is "
             "set to 'Force text' in Editor Settings.");

@@ -30,6 +30,9 @@ struct ReaderOptions {
     std::uint8_t unshared = 0;
 };
 
+/// Whether the bytes of a file begin as those of object files do.
+bool HasSignature(std::string_view bytes);
+
 /// An object file on its way from text to objects.
 ///
 ///  1. `Take` tests the signature, and `Cut` cuts the text at the document headers. A file that is cut along

@@ -1,8 +1,6 @@
 #include "InputFiles.h"
 
-#include "CommandSettings.h"
 #include "FileUtils.h"
-#include "TimerStat.h"
 
 #include "Diff/RulesReader.h"
 #include "Session/ReadInputs.h"
@@ -40,17 +38,4 @@ YAMLTypeInfoManager SetupTypeInfo(const std::string& typeInfoFile) {
     YAMLTypeInfoManager types;
     types.Read(objects);
     return types;
-}
-
-RulesAndTypes SetupRulesAndTypes(TimerStat& root, TimerStat& reading, const std::string& rulesFile,
-                                 const std::string& typeInfoFile) {
-    RulesAndTypes read;
-    {
-        TimerStat timer(reading, "Reading unique keys");
-        read.rules = SetupRules(rulesFile);
-    }
-    if (typeInfoFile == kDefaultTypeInfoFile) return read;
-    TimerStat timer(root, "Read type info");
-    read.types = SetupTypeInfo(typeInfoFile);
-    return read;
 }

@@ -1,0 +1,55 @@
+#include "Scenes/SceneRules.h"
+
+#include "Words/Failure.h"
+
+#include "Values/YAMLError.h"
+
+#include <cstdlib>
+#include <new>
+
+namespace ovrin {
+
+namespace {
+
+/// What `read` returns; whatever it throws becomes a Failure.
+template <class Read> auto OrFailure(const char* what, const std::string& path, const Read& read) {
+    const auto fail = [&](std::string reason) {
+        while (reason.ends_with('\n')) reason.pop_back();
+        throw Failure("The " + std::string(what) + " " + path + " can't be used: " + reason);
+    };
+    try {
+        return read();
+    } catch (const ovrin_yaml::YAMLError& error) {
+        fail(error.what());
+    } catch (const std::bad_alloc&) {
+        throw;
+    } catch (const std::exception& error) {
+        fail(error.what());
+    }
+    __builtin_unreachable();
+}
+
+void TakeVariable(const char* name, std::string& value) {
+    const char* text = std::getenv(name);
+    if (text && *text) value = text;
+}
+
+} // namespace
+
+FormatFiles FormatFiles::OfEnvironment() {
+    FormatFiles files;
+    TakeVariable("OVRIN_RULES", files.rules);
+    TakeVariable("OVRIN_TYPE_INFO", files.typeInfo);
+    return files;
+}
+
+SceneRules ReadSceneRules(const FormatFiles& files) {
+    SceneRules read;
+    read.rules = OrFailure("rules file", files.rules, [&] { return SetupRules(files.rules); });
+    if (files.typeInfo != kDefaultTypeInfoFile)
+        read.types =
+            OrFailure("type information", files.typeInfo, [&] { return SetupTypeInfo(files.typeInfo); });
+    return read;
+}
+
+} // namespace ovrin
