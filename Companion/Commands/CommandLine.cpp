@@ -72,6 +72,7 @@ Outcome RunAction(const Action& action) {
 
 Outcome RunCommandLine(const std::vector<std::string>& arguments) {
     OutliveFailedWrites();
+    ovrin_yaml::initialize();
     CLI::App program(kDescription, "ovrin");
     const std::vector<Described> commands = DescribeWanted(program, arguments);
     try {
