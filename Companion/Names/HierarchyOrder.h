@@ -1,0 +1,20 @@
+#pragma once
+
+#include "Names/ObjectNames.h"
+
+#include <cstdint>
+#include <span>
+#include <vector>
+
+namespace ovrin {
+
+/// For each of `ids` its place in the order of the hierarchy, to sort by: a GameObject stands ahead of its
+/// components, these, in the order of its list, ahead of the GameObjects below it, and those in the order of
+/// m_Children. What stands under nothing goes by its place in the file. Equal ids have equal ranks.
+///
+/// Of several trees the first that has an object says where it stands; what none has comes last, in the order
+/// of `ids`. The time goes by the number of ids, of what stands above them, and of the children there.
+std::vector<std::uint32_t> HierarchyRanks(std::span<const ObjectNames* const> trees,
+                                          std::span<const ovrin_yaml::YAMLScalar* const> ids);
+
+} // namespace ovrin
