@@ -24,11 +24,15 @@ std::size_t Number(std::string_view text) {
 
 } // namespace
 
+bool Part::IsSound() const {
+    return number >= 1 && number <= parts && parts <= kMostParts;
+}
+
 Part ParsePart(const std::string& text) {
     const std::size_t slash = std::min(text.find('/'), text.size());
     const Part part = {Number(std::string_view(text).substr(0, slash)),
                        slash < text.size() ? Number(std::string_view(text).substr(slash + 1)) : 0};
-    if (!part.number || part.number > part.parts || part.parts > kMostParts)
+    if (!part.IsSound())
         throw Failure("\"" + text + "\" is no part: \"2/4\" is part 2 of 4, and there may be " +
                       std::to_string(kMostParts));
     return part;

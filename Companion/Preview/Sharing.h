@@ -12,6 +12,9 @@ namespace ovrin {
 struct Part {
     std::size_t number = 1; ///< from 1
     std::size_t parts = 1;
+
+    /// Whether there can be such a part.
+    bool IsSound() const;
 };
 
 /// Reads "2/4", part 2 of 4. Throws Failure.
