@@ -26,7 +26,8 @@ struct ProcessResult {
     bool Succeeded() const { return status == 0; }
 };
 
-/// Runs a program, found on the path, to its end. Throws Failure if it can't be started.
+/// Runs a program, found on the path, to its end. It may end without reading its input, which a process
+/// survives that called OutliveFailedWrites. Throws Failure if it can't be started.
 ProcessResult RunProcess(const CommandWords& command, const ProcessSetting& setting = {});
 
 /// The same for a program that must succeed: its output. Throws Failure with what it said on standard error.

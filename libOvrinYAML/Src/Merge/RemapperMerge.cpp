@@ -1,5 +1,6 @@
 #include "Merge/RemapperMerge.h"
 
+#include <algorithm>
 #include <vector>
 
 namespace ovrin_yaml {
@@ -56,6 +57,21 @@ MergedRemappers MergeRemappers(const YAMLSequenceRemapper* left, const YAMLSeque
     }
     merged->m_DestinationCount = static_cast<std::size_t>(next);
     return {merged, leftToMerged, rightToMerged};
+}
+
+const YAMLSequenceRemapper* ShiftRemapperDown(const YAMLSequenceRemapper* remapper,
+                                              const std::set<int>& indexes) {
+    const int count = static_cast<int>(remapper->m_DestinationCount);
+    const std::vector<int> taken(indexes.begin(), indexes.lower_bound(count));
+    YAMLSequenceRemapper* shifted = YAMLAlloc<YAMLSequenceRemapper>::create(
+        0, remapper->m_DestinationCount - taken.size(), remapper->m_IsSet);
+    shifted->m_Mapping.reserve(remapper->m_Mapping.size());
+    for (const int target : remapper->m_Mapping) {
+        const auto below = std::lower_bound(taken.begin(), taken.end(), target);
+        if (below != taken.end() && *below == target) continue;
+        shifted->m_Mapping.push_back(target - static_cast<int>(below - taken.begin()));
+    }
+    return shifted;
 }
 
 } // namespace ovrin_yaml

@@ -2,6 +2,8 @@
 
 #include "Diff/YAMLSequenceRemapper.h"
 
+#include <set>
+
 namespace ovrin_yaml {
 
 /// The numberings of two sides brought into one; all three maps are new.
@@ -22,5 +24,11 @@ struct MergedRemappers {
 /// count, and those beyond the right one have no place there.
 MergedRemappers MergeRemappers(const YAMLSequenceRemapper* left, const YAMLSequenceRemapper* right,
                                bool removeUnmatched);
+
+/// Takes destination indexes out of a remapper, as if one after the other from the greatest to the smallest:
+/// an entry that names one of them is erased, which moves all later entries one base element forward, and
+/// entries above one are lowered. Indexes beyond the destination don't count.
+const YAMLSequenceRemapper* ShiftRemapperDown(const YAMLSequenceRemapper* remapper,
+                                              const std::set<int>& indexes);
 
 } // namespace ovrin_yaml

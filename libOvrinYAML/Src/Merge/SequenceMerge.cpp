@@ -16,14 +16,13 @@
 
 #include "Merge/SequenceMerge.h"
 
-#include "Diff/SequenceMatching.h"
 #include "Diff/YAMLSequenceDiff.h"
+#include "Merge/CommonAdditions.h"
 #include "Merge/DiffMerge.h"
 #include "Merge/OperationMerge.h"
 #include "Merge/RemapperMerge.h"
 #include "Merge/YAMLConflict.h"
 
-#include <algorithm>
 #include <set>
 
 namespace ovrin_yaml {
@@ -36,60 +35,19 @@ struct Side {
     const YAMLSequenceDiff* diff;
 };
 
-/// Takes destination indexes out of a remapper, as if one after the other from the greatest to the smallest:
-/// an entry that names one of them is erased, which moves all later entries one base element forward, and
-/// entries above one are lowered. Indexes beyond the destination don't count.
-const YAMLSequenceRemapper* ShiftRemapperDown(const YAMLSequenceRemapper* remapper,
-                                              const std::set<int>& indexes) {
-    const int count = static_cast<int>(remapper->m_DestinationCount);
-    const std::vector<int> taken(indexes.begin(), indexes.lower_bound(count));
-    YAMLSequenceRemapper* shifted = YAMLAlloc<YAMLSequenceRemapper>::create(
-        0, remapper->m_DestinationCount - taken.size(), remapper->m_IsSet);
-    shifted->m_Mapping.reserve(remapper->m_Mapping.size());
-    for (const int target : remapper->m_Mapping) {
-        const auto below = std::lower_bound(taken.begin(), taken.end(), target);
-        if (below != taken.end() && *below == target) continue;
-        shifted->m_Mapping.push_back(target - static_cast<int>(below - taken.begin()));
-    }
-    return shifted;
-}
-
-/// The additions of one side's diff, as a list of their values.
-struct Additions {
-    explicit Additions(const YAMLSequenceDiff* diff) {
-        for (const auto& entry : diff->Entries()) {
-            const auto* add = As<AddOperation>(entry.operation);
-            if (!add) continue;
-            operations.push_back(add);
-            indexes.push_back(entry.index);
-            values.m_Items.push_back(const_cast<YAMLNode*>(add->m_Value));
-        }
-    }
-
-    std::vector<const AddOperation*> operations;
-    std::vector<int> indexes; // in the numbering of the side
-    YAMLSequence values;      // only looked at; the nodes belong to the operations' trees
-};
-
 /// Settles the elements that both sides added under one key, so that the merged list holds each once.
 void MergeCommonAdditions(Side& left, Side& right, const std::vector<Path>& keyPaths,
                           ConflictResolver& resolver) {
-    const Additions leftAdded(left.diff), rightAdded(right.diff);
-    YAMLSequenceRemapper* matches = FindIdMapping(keyPaths, &leftAdded.values, &rightAdded.values);
     std::set<int> matchedRight;
     YAMLSequenceDiff* settled = nullptr;
-    for (std::size_t i = 0; i < matches->m_Mapping.size(); ++i) {
-        const int j = matches->m_Mapping[i];
-        if (j == -1) continue;
+    for (const CommonAddition& common : FindCommonAdditions(*left.diff, *right.diff, keyPaths)) {
         if (!settled) settled = YAMLAlloc<YAMLSequenceDiff>::create(*left.diff);
-        resolver.PushPath(IndexScalar(leftAdded.indexes[i]));
-        const Operation* result =
-            MergeOperations(leftAdded.operations[i], rightAdded.operations[j], resolver);
+        resolver.PushPath(IndexScalar(common.leftIndex));
+        const Operation* result = MergeOperations(common.left, common.right, resolver);
         resolver.PopPath();
-        settled->Replace(leftAdded.indexes[i], result);
-        matchedRight.insert(rightAdded.indexes[j]);
+        settled->Replace(common.leftIndex, result);
+        matchedRight.insert(common.rightIndex);
     }
-    YAMLAlloc<YAMLSequenceRemapper>::free(matches);
     if (!settled) return;
     left.diff = settled;
     YAMLSequenceDiff* rest = YAMLAlloc<YAMLSequenceDiff>::create(*right.diff);
