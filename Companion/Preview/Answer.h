@@ -1,7 +1,7 @@
 #pragma once
 
 #include "Preview/Sharing.h"
-#include "Systems/Git.h"
+#include "Systems/GitHistory.h"
 
 #include <cstddef>
 #include <nlohmann/json.hpp>

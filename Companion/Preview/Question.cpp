@@ -2,9 +2,8 @@
 
 #include "Preview/ScenePreview.h"
 #include "Scenes/SceneFile.h"
-#include "Systems/Repository.h"
+#include "Systems/Git.h"
 #include "Words/Failure.h"
-#include "Words/Suggestion.h"
 
 #include <algorithm>
 
@@ -23,19 +22,16 @@ void CheckGit() {
         throw Failure("A preview needs git " + kOldestGit.Text() + " or later; this is git " + version.Text());
 }
 
-[[noreturn]] void FailForRevision(const Repository& repository, const std::string& revision) {
-    const std::vector<std::string> names = RevisionNames(repository);
-    const auto remote =
-        std::ranges::find_if(names, [&](const std::string& name) { return name.ends_with("/" + revision); });
-    const std::string near = remote != names.end() ? *remote : Nearest(revision, names);
-    throw Failure("There is no revision \"" + revision + "\" here" +
-                  (near.empty() ? ". A branch of another repository comes with \"git fetch\""
-                                : "\nDid you mean " + near + "?"));
+[[noreturn]] void FailForRevision(const Git& git, const std::string& revision) {
+    std::string text = "There is no revision \"" + revision + "\" here";
+    for (const std::string& name : RevisionNames(git))
+        if (name.ends_with("/" + revision)) throw Failure(text + "\nDid you mean " + name + "?");
+    throw Failure(text + ": \"git fetch\" gets what others have published, \"git branch -a\" lists branches");
 }
 
-NamedCommit Find(const Repository& repository, const std::string& revision) {
-    const auto commit = FindCommit(repository, revision);
-    if (!commit) FailForRevision(repository, revision);
+NamedCommit Find(const Git& git, const std::string& revision) {
+    const auto commit = FindCommit(git, revision);
+    if (!commit) FailForRevision(git, revision);
     return {revision, *commit};
 }
 
@@ -46,34 +42,34 @@ bool IsScene(const UnmergedFile& file) {
 }
 
 /// git's hash of everything that the answer comes from.
-std::string HashOf(const Repository& repository, const PreviewQuestion& question) {
-    ProcessSetting setting = GitSetting(repository);
-    setting.input = question.answer.ours.id + question.answer.theirs.id;
+std::string HashOf(const Git& git, const PreviewQuestion& question) {
+    std::string text = question.answer.ours.id + question.answer.theirs.id;
     for (const UnmergedFile& file : question.files) {
-        setting.input += '\0' + file.path + '\0';
+        text += '\0' + file.path + '\0';
         for (const auto* entry : {&file.base, &file.ours, &file.theirs})
-            setting.input += (*entry ? (*entry)->id : "none") + '\0';
-        for (const std::string& conflict : file.conflicts) setting.input += conflict + '\0';
-        setting.input += file.isByObjects ? "objects" : "lines";
+            text += (*entry ? (*entry)->id : "none") + '\0';
+        for (const std::string& conflict : file.conflicts) text += conflict + '\0';
+        text += file.isByObjects ? "objects" : "lines";
     }
-    std::string hash = OutputOf({"git", "hash-object", "--stdin"}, setting);
+    std::string hash = git.Output({"hash-object", "--stdin"}, std::move(text));
     while (hash.ends_with('\n')) hash.pop_back();
     return hash;
 }
 
 std::uint64_t CostOf(const UnmergedFile& file) {
-    return kCostOfScene + (IsMerged(file) ? SizeOf(file) : 0);
+    return kCostOfScene + (IsMerged(file) ? file.Size() : 0);
 }
 
 } // namespace
 
 PreviewQuestion AskFor(const Repository& repository, const std::string& revision) {
     CheckGit();
+    const Git git(repository);
     PreviewQuestion question;
     PreviewAnswer& answer = question.answer;
-    answer.ours = CheckedOut(repository);
-    answer.theirs = Find(repository, revision);
-    const std::vector<std::string> bases = MergeBases(repository, answer.ours, answer.theirs);
+    answer.ours = CheckedOut(git);
+    answer.theirs = Find(git, revision);
+    const std::vector<std::string> bases = MergeBases(git, answer.ours, answer.theirs);
     if (bases.empty())
         throw Failure(answer.ours.name + " and " + revision + " have no common history: git refuses to merge them");
     question.isMergedAlready = std::ranges::find(bases, answer.theirs.id) != bases.end();
@@ -85,7 +81,7 @@ PreviewQuestion AskFor(const Repository& repository, const std::string& revision
         answer.scenes.back().number = answer.scenes.size();
     }
     answer.count = answer.scenes.size();
-    answer.question = HashOf(repository, question);
+    answer.question = HashOf(git, question);
     return question;
 }
 

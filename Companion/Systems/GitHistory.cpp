@@ -1,11 +1,11 @@
-#include "Systems/Git.h"
+#include "Systems/GitHistory.h"
 
 #include "FileUtils.h"
-#include "Systems/Repository.h"
+#include "Systems/Git.h"
+#include "Systems/Process.h"
 #include "Words/Failure.h"
 
 #include <cstdio>
-#include <cstdlib>
 #include <set>
 
 namespace ovrin {
@@ -27,18 +27,17 @@ std::string FirstLine(const std::string& text) {
 }
 
 /// Runs git, whose status 1 is an answer as well, "no".
-std::optional<std::string> Ask(const Repository& repository, const CommandWords& command) {
-    const ProcessSetting setting = GitSetting(repository);
-    ProcessResult result = RunProcess(command, setting);
+std::optional<std::string> Ask(const Git& git, const CommandWords& arguments) {
+    ProcessResult result = git.Run(arguments);
     if (result.status == 1) return {};
     if (result.Succeeded()) return std::move(result.output);
-    throw Failure("git can't work here: " + FirstLine(result.errors) + "\n" + result.errors);
+    throw Failure("git can't work here:\n" + result.errors);
 }
 
 /// The commits whose parents a shallow clone left out; none in a whole clone.
-std::set<std::string> CutOffCommits(const Repository& repository) {
-    const std::string path = FirstLine(OutputOf(
-        {"git", "rev-parse", "--path-format=absolute", "--git-path", "shallow"}, GitSetting(repository)));
+std::set<std::string> CutOffCommits(const Git& git) {
+    const std::string path =
+        FirstLine(git.Output({"rev-parse", "--path-format=absolute", "--git-path", "shallow"}));
     std::string text;
     if (ReadWholeFile(path, text) != ReadResult::Complete) return {};
     const std::vector<std::string> lines = Lines(text);
@@ -47,14 +46,14 @@ std::set<std::string> CutOffCommits(const Repository& repository) {
 
 /// Whether a common ancestor may stand where the history was cut off. It may not if all that was cut off is
 /// older than the common ancestors that are known.
-bool IsDecisionCutOff(const Repository& repository, const std::vector<std::string>& sides,
+bool IsDecisionCutOff(const Git& git, const std::vector<std::string>& sides,
                       const std::vector<std::string>& bases) {
-    const std::set<std::string> cutOff = CutOffCommits(repository);
+    const std::set<std::string> cutOff = CutOffCommits(git);
     if (cutOff.empty()) return false;
-    CommandWords command = {"git", "rev-list"};
+    CommandWords command = {"rev-list"};
     command.insert(command.end(), sides.begin(), sides.end());
     for (const std::string& base : bases) command.push_back("^" + base);
-    for (const std::string& commit : Lines(OutputOf(command, GitSetting(repository))))
+    for (const std::string& commit : Lines(git.Output(command)))
         if (cutOff.contains(commit)) return true;
     return false;
 }
@@ -70,38 +69,29 @@ GitVersion InstalledGit() {
     return version;
 }
 
-ProcessSetting GitSetting(const Repository& repository) {
-    ProcessSetting setting;
-    setting.folder = repository.top.empty() ? repository.data : repository.top;
-    // What it says may count from another folder.
-    if (std::getenv("GIT_DIR")) setting.environment.emplace_back("GIT_DIR", repository.data);
-    if (std::getenv("GIT_WORK_TREE")) setting.environment.emplace_back("GIT_WORK_TREE", repository.top);
-    return setting;
-}
-
-std::optional<std::string> FindCommit(const Repository& repository, const std::string& revision) {
+std::optional<std::string> FindCommit(const Git& git, const std::string& revision) {
     const auto found = Ask(
-        repository, {"git", "rev-parse", "--verify", "--quiet", "--end-of-options", revision + "^{commit}"});
+        git, {"rev-parse", "--verify", "--quiet", "--end-of-options", revision + "^{commit}"});
     return found ? std::optional(FirstLine(*found)) : std::nullopt;
 }
 
-NamedCommit CheckedOut(const Repository& repository) {
-    const auto commit = FindCommit(repository, "HEAD");
-    const auto branch = Ask(repository, {"git", "symbolic-ref", "--quiet", "--short", "HEAD"});
+NamedCommit CheckedOut(const Git& git) {
+    const auto commit = FindCommit(git, "HEAD");
+    const auto branch = Ask(git, {"symbolic-ref", "--quiet", "--short", "HEAD"});
     if (!commit) throw Failure("There is no commit here yet" + (branch ? " on " + FirstLine(*branch) : ""));
     constexpr std::size_t kShownDigits = 10;
     return {branch ? FirstLine(*branch) : commit->substr(0, kShownDigits), *commit};
 }
 
-std::vector<std::string> RevisionNames(const Repository& repository) {
-    return Lines(OutputOf({"git", "for-each-ref", "--format=%(refname:short)"}, GitSetting(repository)));
+std::vector<std::string> RevisionNames(const Git& git) {
+    return Lines(git.Output({"for-each-ref", "--format=%(refname:short)"}));
 }
 
-std::vector<std::string> MergeBases(const Repository& repository, const NamedCommit& ours,
+std::vector<std::string> MergeBases(const Git& git, const NamedCommit& ours,
                                     const NamedCommit& theirs) {
-    const auto found = Ask(repository, {"git", "merge-base", "--all", ours.id, theirs.id});
+    const auto found = Ask(git, {"merge-base", "--all", ours.id, theirs.id});
     std::vector<std::string> bases = found ? Lines(*found) : std::vector<std::string>();
-    if (IsDecisionCutOff(repository, {ours.id, theirs.id}, bases))
+    if (IsDecisionCutOff(git, {ours.id, theirs.id}, bases))
         throw Failure("This clone is shallow: it lacks the history that says where " + ours.name + " and " +
                       theirs.name + " come from.\nGet it with \"git fetch --unshallow\"; a CI job that " +
                       "checks out with a depth needs the whole history, such as by \"fetch-depth: 0\"");

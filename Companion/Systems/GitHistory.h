@@ -1,7 +1,5 @@
 #pragma once
 
-#include "Systems/Process.h"
-
 #include <compare>
 #include <optional>
 #include <string>
@@ -9,7 +7,7 @@
 
 namespace ovrin {
 
-struct Repository;
+class Git;
 
 /// A version of git, as far as features come with it.
 struct GitVersion {
@@ -22,29 +20,23 @@ struct GitVersion {
 /// The one that is on the path. Throws Failure if there is none, or none that tells its version.
 GitVersion InstalledGit();
 
-/// How git is started for a repository: in the top folder of its working tree, so that paths count from there,
-/// or in its data where there is none. git looks for the repository itself, with all its checks, unless the
-/// environment names it.
-ProcessSetting GitSetting(const Repository& repository);
-
 /// A commit, and what a person calls it.
 struct NamedCommit {
     std::string name, id;
 };
 
-/// The commit of any revision, or nothing if there is no such revision. Throws Failure for all else.
-std::optional<std::string> FindCommit(const Repository& repository, const std::string& revision);
+/// The commit of any revision, or nothing if there is no such revision. Throws Failure where git can't look.
+std::optional<std::string> FindCommit(const Git& git, const std::string& revision);
 
 /// What is checked out: the name of the branch or, without one, the first digits of the commit. Throws Failure
 /// where there is no commit yet.
-NamedCommit CheckedOut(const Repository& repository);
+NamedCommit CheckedOut(const Git& git);
 
 /// The names of all branches and tags, short as people write them.
-std::vector<std::string> RevisionNames(const Repository& repository);
+std::vector<std::string> RevisionNames(const Git& git);
 
 /// The best common ancestors of two commits, in no order that means anything; none if there aren't any. Throws
 /// Failure, with the cure, where a shallow clone lacks what decides about them.
-std::vector<std::string> MergeBases(const Repository& repository, const NamedCommit& ours,
-                                    const NamedCommit& theirs);
+std::vector<std::string> MergeBases(const Git& git, const NamedCommit& ours, const NamedCommit& theirs);
 
 } // namespace ovrin

@@ -31,33 +31,30 @@ std::string QuotedFolder(const std::string& path) {
     return quoted + '"';
 }
 
-/// git with the objects of a repository, whose new objects go into a folder of their own, and with an empty
-/// working tree, where it puts files for merge drivers.
-ProcessSetting SettingBeside(const Repository& repository, const ScratchFolder& scratch) {
-    std::string objects = OutputOf(
-        {"git", "rev-parse", "--path-format=absolute", "--git-path", "objects"}, GitSetting(repository));
+/// git with the objects of a repository, whose new objects go into a folder of their own.
+Git GitBeside(const Repository& repository, const std::string& tree, const std::string& newObjects) {
+    const Git git(repository);
+    std::string objects = git.Output({"rev-parse", "--path-format=absolute", "--git-path", "objects"});
     if (objects.ends_with('\n')) objects.pop_back();
     std::string alternates = QuotedFolder(objects);
     if (const char* others = std::getenv("GIT_ALTERNATE_OBJECT_DIRECTORIES"))
         alternates += ':' + std::string(others);
-    ProcessSetting setting;
-    setting.folder = scratch.NewFolder("tree");
-    setting.environment = {{"GIT_DIR", repository.data},
-                           {"GIT_WORK_TREE", setting.folder},
-                           {"GIT_OBJECT_DIRECTORY", scratch.NewFolder("objects")},
-                           {"GIT_ALTERNATE_OBJECT_DIRECTORIES", alternates},
-                           {"GIT_ATTR_NOSYSTEM", "1"}};
-    return setting;
+    return git.With({{"GIT_DIR", repository.data},
+                     {"GIT_WORK_TREE", tree},
+                     {"GIT_OBJECT_DIRECTORY", newObjects},
+                     {"GIT_ALTERNATE_OBJECT_DIRECTORIES", alternates},
+                     {"GIT_ATTR_NOSYSTEM", "1"}});
 }
 
-/// What `git merge-tree -z` says. Its driver for binary files, which takes no look at them, is made that of all
-/// files: so every content that needs merging is a conflict. The repository's own attributes may still name
-/// ours, which is made to fail.
-std::string RunMergeTree(const ProcessSetting& setting, const std::string& ours, const std::string& theirs) {
-    ProcessResult result = RunProcess({"git", "-c", "core.attributesFile=/dev/null", "-c", "merge.default=binary",
-                                       "-c", "merge.ovrin.driver=false", "-c", "merge.ovrin.recursive=binary",
-                                       "merge-tree", "--write-tree", "-z", ours, theirs},
-                                      setting);
+/// What `git merge-tree -z` says, started in `tree`, where it puts files for merge drivers. Its driver for
+/// binary files, which takes no look at them, is made that of all files: so every content that needs merging
+/// is a conflict. The repository's own attributes may still name ours, which is made to fail.
+std::string RunMergeTree(const Git& git, const std::string& tree, const std::string& ours,
+                         const std::string& theirs) {
+    ProcessResult result =
+        git.Run({"-C", tree, "-c", "core.attributesFile=/dev/null", "-c", "merge.default=binary", "-c",
+                 "merge.ovrin.driver=false", "-c", "merge.ovrin.recursive=binary", "merge-tree", "--write-tree",
+                 "-z", ours, theirs});
     if (result.status > 1) throw Failure("git can't try the merge:\n" + result.errors);
     return std::move(result.output);
 }
@@ -136,10 +133,11 @@ std::vector<TreeEntry*> BlobsOf(std::vector<UnmergedFile>& files) {
     return blobs;
 }
 
-void LookUpSizes(ProcessSetting setting, std::vector<UnmergedFile>& files) {
+void LookUpSizes(const Git& git, std::vector<UnmergedFile>& files) {
     const std::vector<TreeEntry*> blobs = BlobsOf(files);
-    for (const TreeEntry* blob : blobs) setting.input += blob->id + "\n";
-    const std::string output = OutputOf({"git", "cat-file", "--batch-check=%(objectsize)"}, setting);
+    std::string ids;
+    for (const TreeEntry* blob : blobs) ids += blob->id + "\n";
+    const std::string output = git.Output({"cat-file", "--batch-check=%(objectsize)"}, std::move(ids));
     std::string_view lines = output;
     for (TreeEntry* blob : blobs) {
         const std::string line(TakeUntil(lines, '\n'));
@@ -150,21 +148,18 @@ void LookUpSizes(ProcessSetting setting, std::vector<UnmergedFile>& files) {
 }
 
 /// Without a working tree the attributes are those of the commit.
-ProcessSetting AttributesSetting(const Repository& repository, const std::string& commit,
-                                 const ScratchFolder& scratch) {
-    ProcessSetting setting = GitSetting(repository);
-    if (!repository.top.empty()) return setting;
-    setting.environment.emplace_back("GIT_INDEX_FILE", scratch.File("index"));
-    OutputOf({"git", "read-tree", commit}, setting);
-    return setting;
-}
-
-void LookUpAttributes(ProcessSetting setting, bool isBare, std::vector<UnmergedFile>& files) {
-    for (const UnmergedFile& file : files) setting.input += file.path + '\0';
-    CommandWords command = {"git", "check-attr", "-z", "--stdin"};
-    if (isBare) command.emplace_back("--cached");
-    command.emplace_back("merge");
-    const std::string output = OutputOf(command, setting);
+void LookUpAttributes(const Repository& repository, const std::string& commit, const ScratchFolder& scratch,
+                      std::vector<UnmergedFile>& files) {
+    Git git(repository);
+    CommandWords command = {"check-attr", "-z", "--stdin", "merge"};
+    if (repository.top.empty()) {
+        git = git.With({{"GIT_INDEX_FILE", scratch.File("index")}});
+        git.Output({"read-tree", commit});
+        command.insert(command.begin() + 1, "--cached");
+    }
+    std::string paths;
+    for (const UnmergedFile& file : files) paths += file.path + '\0';
+    const std::string output = git.Output(command, std::move(paths));
     std::string_view text = output;
     for (UnmergedFile& file : files) {
         TakeUntil(text, '\0'); // the path
@@ -178,11 +173,12 @@ void LookUpAttributes(ProcessSetting setting, bool isBare, std::vector<UnmergedF
 std::vector<UnmergedFile> ListUnmerged(const Repository& repository, const std::string& ours,
                                        const std::string& theirs) {
     const ScratchFolder scratch;
-    const ProcessSetting beside = SettingBeside(repository, scratch);
-    std::vector<UnmergedFile> files = Answer(ours, theirs).Read(RunMergeTree(beside, ours, theirs));
+    const std::string tree = scratch.NewFolder("tree");
+    const Git beside = GitBeside(repository, tree, scratch.NewFolder("objects"));
+    std::vector<UnmergedFile> files = Answer(ours, theirs).Read(RunMergeTree(beside, tree, ours, theirs));
     if (files.empty()) return files;
     LookUpSizes(beside, files);
-    LookUpAttributes(AttributesSetting(repository, ours, scratch), repository.top.empty(), files);
+    LookUpAttributes(repository, ours, scratch, files);
     return files;
 }
 

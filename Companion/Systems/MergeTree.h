@@ -22,7 +22,12 @@ struct UnmergedFile {
     std::optional<TreeEntry> base, ours, theirs;
     /// git's names of its conflicts other than that of two contents: "modify/delete". Sorted.
     std::vector<std::string> conflicts;
-    bool isByObjects; ///< has the attribute merge=ovrin
+    bool isByObjects = false; ///< has the attribute merge=ovrin
+
+    /// Bytes of all versions.
+    std::uint64_t Size() const {
+        return (base ? base->size : 0) + (ours ? ours->size : 0) + (theirs ? theirs->size : 0);
+    }
 };
 
 /// The files that both commits changed, or in whose way they are else, in the order of their paths: what the
