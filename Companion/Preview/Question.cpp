@@ -56,11 +56,11 @@ std::string HashOf(const Git& git, const PreviewQuestion& question) {
     return hash;
 }
 
+} // namespace
+
 std::uint64_t CostOf(const UnmergedFile& file) {
     return kCostOfScene + (IsMerged(file) ? file.Size() : 0);
 }
-
-} // namespace
 
 PreviewQuestion AskFor(const Repository& repository, const std::string& revision) {
     CheckGit();

@@ -1,5 +1,6 @@
 #include "Preview/ScenePreview.h"
 
+#include "Conflicts/ConflictReport.h"
 #include "Conflicts/SceneMerge.h"
 #include "Names/PrintableText.h"
 #include "Scenes/SceneFile.h"
@@ -14,6 +15,8 @@
 namespace ovrin {
 
 namespace {
+
+constexpr std::size_t kMostReportedConflicts = 100; // of a scene; scripts are told all
 
 Meeting MeetingOf(const UnmergedFile& file) {
     if (file.ours && file.theirs) return file.base ? Meeting::BothChanged : Meeting::BothAdded;
@@ -99,22 +102,26 @@ bool IsMerged(const UnmergedFile& file) {
            (!file.base || file.base->isFile);
 }
 
+void MakeUnknown(PreviewedScene& scene, const std::string& why) {
+    scene.verdict = Verdict::Unknown;
+    scene.problem += (scene.problem.empty() ? "" : "; ") + why;
+}
+
 void LookInto(PreviewedScene& scene, const ThreeTexts& texts, const PreviewAnswer& question,
               const SceneRules& rules, ovrin_yaml::Threads threads) {
-    const auto fail = [&](const std::string& why) {
-        scene.verdict = Verdict::Unknown;
-        scene.problem += (scene.problem.empty() ? "" : "; ") + why;
-    };
     try {
         CheckScenes(scene, texts, question);
         SceneMerge merge(texts, rules.rules, rules.types, threads);
         merge.Merge();
-        if (!merge.Open().empty()) scene.verdict = Verdict::Conflicts;
-        for (std::size_t i = 0; i < merge.Open().size(); ++i) scene.conflicts.push_back(i);
+        if (merge.Open().empty() && !merge.HasBrokenDependencies()) return;
+        scene.verdict = Verdict::Conflicts;
+        scene.conflicts = ConflictsToJson(merge).at("conflicts");
+        scene.report =
+            TellConflicts(merge, {"", question.ours.name, question.theirs.name}, kMostReportedConflicts);
     } catch (const Failure& failure) {
-        fail(failure.what());
+        MakeUnknown(scene, failure.what());
     } catch (const std::bad_alloc&) {
-        fail("there is not enough memory to merge it");
+        MakeUnknown(scene, "there is not enough memory to merge it");
     }
 }
 

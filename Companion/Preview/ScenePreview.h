@@ -17,6 +17,9 @@ PreviewedScene PlaceScene(const UnmergedFile& file, const NamedCommit& ours, con
 /// Whether a look into the scene tells more.
 bool IsMerged(const UnmergedFile& file);
 
+/// Notes why nothing is known of what a merge would make of the scene.
+void MakeUnknown(PreviewedScene& scene, const std::string& why);
+
 /// Merges the texts of a scene to see what becomes of it. Whatever is wrong with them is part of the answer.
 void LookInto(PreviewedScene& scene, const ThreeTexts& texts, const PreviewAnswer& question,
               const SceneRules& rules, ovrin_yaml::Threads threads);
