@@ -1,5 +1,6 @@
 #include "Commands/CommandTable.h"
 
+#include "Commands/PreviewCommand.h"
 #include "Commands/SetupCommand.h"
 
 namespace ovrin {
@@ -7,6 +8,7 @@ namespace ovrin {
 namespace {
 
 constexpr Command kCommands[] = {
+    {"preview", "tell which scenes would conflict if a branch were merged", DescribePreview},
     {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
 };
 

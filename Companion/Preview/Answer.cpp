@@ -13,8 +13,8 @@ using nlohmann::json;
 constexpr int kVersion = 1;
 
 constexpr std::array<const char*, 3> kVerdicts = {"clean", "conflicts", "unknown"};
-constexpr std::array<const char*, 5> kMeetings = {"both-changed", "both-added", "ours-removed", "theirs-removed",
-                                                  "misplaced"};
+constexpr std::array<const char*, 5> kMeetings = {"both-changed", "both-added", "ours-removed",
+                                                  "theirs-removed", "misplaced"};
 
 template <class Value, std::size_t count>
 Value Named(const std::array<const char*, count>& names, const std::string& name) {
@@ -80,15 +80,10 @@ PreviewedScene SceneOfJson(const json& json) {
 std::string ToJson(const PreviewAnswer& answer) {
     json scenes = json::array();
     for (const PreviewedScene& scene : answer.scenes) scenes.push_back(ToJson(scene));
-    const json written = {{"version", kVersion},
-                          {"ours", ToJson(answer.ours)},
-                          {"theirs", ToJson(answer.theirs)},
-                          {"question", answer.question},
-                          {"count", answer.count},
-                          {"part", answer.part.number},
-                          {"parts", answer.part.parts},
-                          {"scenes", std::move(scenes)},
-                          {"sum", ToJson(Sum(answer))}};
+    const json written = {
+        {"version", kVersion},         {"ours", ToJson(answer.ours)}, {"theirs", ToJson(answer.theirs)},
+        {"question", answer.question}, {"count", answer.count},       {"part", answer.part.number},
+        {"parts", answer.part.parts},  {"scenes", std::move(scenes)}, {"sum", ToJson(Sum(answer))}};
     return written.dump(2, ' ', false, json::error_handler_t::replace) + "\n";
 }
 

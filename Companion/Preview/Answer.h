@@ -32,8 +32,9 @@ struct PreviewedScene {
     std::string path;
     Meeting meeting = Meeting::BothChanged;
     Verdict verdict = Verdict::Clean;
-    bool isByObjects = true;               ///< version control lets ovrin merge it, and doesn't merge it by lines
-    std::vector<std::string> gitConflicts; ///< those that aren't of contents, as git calls them: "modify/delete"
+    bool isByObjects = true; ///< version control lets ovrin merge it, and doesn't merge it by lines
+    std::vector<std::string>
+        gitConflicts;    ///< those that aren't of contents, as git calls them: "modify/delete"
     std::string problem; ///< in a person's words: what git can't settle, or why nothing is known
     nlohmann::json conflicts = nlohmann::json::array(); ///< of its contents
     std::string report;                                 ///< the same in lines for people

@@ -70,9 +70,11 @@ std::string Section(const PreviewedScene& scene) {
 
 std::string Heading(const PreviewAnswer& answer) {
     const ScenesInSum sum = Sum(answer);
-    std::string heading = "### Merging " + CodeSpan(answer.theirs.name) + " into " + CodeSpan(answer.ours.name) + ": ";
+    std::string heading =
+        "### Merging " + CodeSpan(answer.theirs.name) + " into " + CodeSpan(answer.ours.name) + ": ";
     if (answer.part.parts > 1)
-        heading += "part " + std::to_string(answer.part.number) + " of " + std::to_string(answer.part.parts) + ", ";
+        heading +=
+            "part " + std::to_string(answer.part.number) + " of " + std::to_string(answer.part.parts) + ", ";
     heading += std::to_string(sum.conflicting) + " of " + Counted(sum.all, "scene") + " would conflict";
     if (sum.unknown) heading += ", of " + std::to_string(sum.unknown) + " that can't be told";
     return heading + "\n\n";

@@ -41,13 +41,14 @@ std::string SummaryLine(const PreviewAnswer& answer) {
     const bool isPart = answer.part.parts > 1;
     std::string line;
     if (isPart)
-        line = "Part " + std::to_string(answer.part.number) + " of " + std::to_string(answer.part.parts) + ": " +
-               std::to_string(sum.all) + " of ";
+        line = "Part " + std::to_string(answer.part.number) + " of " + std::to_string(answer.part.parts) +
+               ": " + std::to_string(sum.all) + " of ";
     line += Counted(isPart ? answer.count : sum.all, "scene") + " changed on both sides, " +
             (sum.conflicting ? std::to_string(sum.conflicting) : "none") + " would conflict" +
             NamesOf(answer, Verdict::Conflicts);
     if (sum.unknown)
-        line += "; of " + std::to_string(sum.unknown) + " that can't be told" + NamesOf(answer, Verdict::Unknown);
+        line +=
+            "; of " + std::to_string(sum.unknown) + " that can't be told" + NamesOf(answer, Verdict::Unknown);
     return line;
 }
 

@@ -40,7 +40,8 @@ void CheckParts(const std::vector<AnswerFile>& files) {
     for (const AnswerFile& file : files) {
         const std::size_t number = file.answer.part.number;
         if (number < next)
-            throw Failure("Part " + std::to_string(number) + " is there more than once, the last time in " + file.name);
+            throw Failure("Part " + std::to_string(number) + " is there more than once, the last time in " +
+                          file.name);
         missUpTo(number);
         next = number + 1;
     }

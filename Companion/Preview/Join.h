@@ -10,8 +10,8 @@ struct AnswerFile {
     PreviewAnswer answer;
 };
 
-/// Puts the parts of an answer together, which may come in any order: the same as if one machine had answered.
-/// Throws Failure unless they are all parts of one question, each once.
+/// Puts the parts of an answer together, which may come in any order: the same as if one machine had
+/// answered. Throws Failure unless they are all parts of one question, each once.
 PreviewAnswer Join(std::vector<AnswerFile> files);
 
 } // namespace ovrin

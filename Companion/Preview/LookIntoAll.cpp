@@ -22,7 +22,8 @@ constexpr std::uint64_t kMostOfProcess = std::uint64_t{64} << 20;
 constexpr std::uint64_t kMemoryOfByte = 8;
 
 WorkLimits Limits() {
-    return {std::max(1u, std::thread::hardware_concurrency()), kMostOfProcess, UsableMemory() / 2 / kMemoryOfByte};
+    return {std::max(1u, std::thread::hardware_concurrency()), kMostOfProcess,
+            UsableMemory() / 2 / kMemoryOfByte};
 }
 
 /// What the processes do. Each has its own git.
@@ -89,7 +90,8 @@ void LookIntoAll(PreviewQuestion& question, const Repository& repository, const 
             MakeUnknown(scene, "the process that merged it was " + answer.end);
         watch(++done, looked.size());
     };
-    WorkInProcesses(sizes, limits, [&](std::size_t piece) { return looker.Look(looked[piece]); }, take);
+    WorkInProcesses(
+        sizes, limits, [&](std::size_t piece) { return looker.Look(looked[piece]); }, take);
 }
 
 } // namespace ovrin

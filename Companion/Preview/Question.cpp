@@ -19,7 +19,8 @@ constexpr std::uint64_t kCostOfScene = 20'000;
 void CheckGit() {
     const GitVersion version = InstalledGit();
     if (version < kOldestGit)
-        throw Failure("A preview needs git " + kOldestGit.Text() + " or later; this is git " + version.Text());
+        throw Failure("A preview needs git " + kOldestGit.Text() + " or later; this is git " +
+                      version.Text());
 }
 
 [[noreturn]] void FailForRevision(const Git& git, const std::string& revision) {
@@ -71,10 +72,12 @@ PreviewQuestion AskFor(const Repository& repository, const std::string& revision
     answer.theirs = Find(git, revision);
     const std::vector<std::string> bases = MergeBases(git, answer.ours, answer.theirs);
     if (bases.empty())
-        throw Failure(answer.ours.name + " and " + revision + " have no common history: git refuses to merge them");
+        throw Failure(answer.ours.name + " and " + revision +
+                      " have no common history: git refuses to merge them");
     question.isMergedAlready = std::ranges::find(bases, answer.theirs.id) != bases.end();
     // Where the one goes on from the other there is nothing to merge, but only git's answer is the proof.
-    if (!question.isMergedAlready) question.files = ListUnmerged(repository, answer.ours.id, answer.theirs.id);
+    if (!question.isMergedAlready)
+        question.files = ListUnmerged(repository, answer.ours.id, answer.theirs.id);
     std::erase_if(question.files, [](const UnmergedFile& file) { return !IsScene(file); });
     for (const UnmergedFile& file : question.files) {
         answer.scenes.push_back(PlaceScene(file, answer.ours, answer.theirs));

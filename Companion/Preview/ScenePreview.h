@@ -10,8 +10,8 @@ namespace ovrin {
 
 struct SceneRules;
 
-/// What can be told of a scene without a look into it: what the two sides did to it, and what git itself would
-/// leave unmerged.
+/// What can be told of a scene without a look into it: what the two sides did to it, and what git itself
+/// would leave unmerged.
 PreviewedScene PlaceScene(const UnmergedFile& file, const NamedCommit& ours, const NamedCommit& theirs);
 
 /// Whether a look into the scene tells more.

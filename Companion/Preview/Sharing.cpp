@@ -41,7 +41,8 @@ Part ParsePart(const std::string& text) {
 std::vector<std::size_t> ShareOut(std::span<const std::uint64_t> costs, std::size_t parts) {
     std::vector<std::size_t> dearest(costs.size());
     std::iota(dearest.begin(), dearest.end(), std::size_t{0});
-    std::ranges::stable_sort(dearest, std::ranges::greater(), [&](std::size_t piece) { return costs[piece]; });
+    std::ranges::stable_sort(dearest, std::ranges::greater(),
+                             [&](std::size_t piece) { return costs[piece]; });
     using Load = std::pair<std::uint64_t, std::size_t>; // of a part: the least is the top
     std::priority_queue<Load, std::vector<Load>, std::greater<>> loads;
     for (std::size_t part = 0; part < parts; ++part) loads.emplace(0, part);

@@ -20,8 +20,8 @@ struct Part {
 /// Reads "2/4", part 2 of 4. Throws Failure.
 Part ParsePart(const std::string& text);
 
-/// The part, from 0, that each piece of work goes to, so that all parts cost about the same: the dearest piece
-/// first, each to the part that has the least so far. Whoever asks the same is told the same.
+/// The part, from 0, that each piece of work goes to, so that all parts cost about the same: the dearest
+/// piece first, each to the part that has the least so far. Whoever asks the same is told the same.
 std::vector<std::size_t> ShareOut(std::span<const std::uint64_t> costs, std::size_t parts);
 
 } // namespace ovrin

@@ -70,8 +70,8 @@ GitVersion InstalledGit() {
 }
 
 std::optional<std::string> FindCommit(const Git& git, const std::string& revision) {
-    const auto found = Ask(
-        git, {"rev-parse", "--verify", "--quiet", "--end-of-options", revision + "^{commit}"});
+    const auto found =
+        Ask(git, {"rev-parse", "--verify", "--quiet", "--end-of-options", revision + "^{commit}"});
     return found ? std::optional(FirstLine(*found)) : std::nullopt;
 }
 
@@ -87,8 +87,7 @@ std::vector<std::string> RevisionNames(const Git& git) {
     return Lines(git.Output({"for-each-ref", "--format=%(refname:short)"}));
 }
 
-std::vector<std::string> MergeBases(const Git& git, const NamedCommit& ours,
-                                    const NamedCommit& theirs) {
+std::vector<std::string> MergeBases(const Git& git, const NamedCommit& ours, const NamedCommit& theirs) {
     const auto found = Ask(git, {"merge-base", "--all", ours.id, theirs.id});
     std::vector<std::string> bases = found ? Lines(*found) : std::vector<std::string>();
     if (IsDecisionCutOff(git, {ours.id, theirs.id}, bases))

@@ -28,15 +28,15 @@ struct NamedCommit {
 /// The commit of any revision, or nothing if there is no such revision. Throws Failure where git can't look.
 std::optional<std::string> FindCommit(const Git& git, const std::string& revision);
 
-/// What is checked out: the name of the branch or, without one, the first digits of the commit. Throws Failure
-/// where there is no commit yet.
+/// What is checked out: the name of the branch or, without one, the first digits of the commit. Throws
+/// Failure where there is no commit yet.
 NamedCommit CheckedOut(const Git& git);
 
 /// The names of all branches and tags, short as people write them.
 std::vector<std::string> RevisionNames(const Git& git);
 
-/// The best common ancestors of two commits, in no order that means anything; none if there aren't any. Throws
-/// Failure, with the cure, where a shallow clone lacks what decides about them.
+/// The best common ancestors of two commits, in no order that means anything; none if there aren't any.
+/// Throws Failure, with the cure, where a shallow clone lacks what decides about them.
 std::vector<std::string> MergeBases(const Git& git, const NamedCommit& ours, const NamedCommit& theirs);
 
 } // namespace ovrin

@@ -53,8 +53,8 @@ std::string RunMergeTree(const Git& git, const std::string& tree, const std::str
                          const std::string& theirs) {
     ProcessResult result =
         git.Run({"-C", tree, "-c", "core.attributesFile=/dev/null", "-c", "merge.default=binary", "-c",
-                 "merge.ovrin.driver=false", "-c", "merge.ovrin.recursive=binary", "merge-tree", "--write-tree",
-                 "-z", ours, theirs});
+                 "merge.ovrin.driver=false", "-c", "merge.ovrin.recursive=binary", "merge-tree",
+                 "--write-tree", "-z", ours, theirs});
     if (result.status > 1) throw Failure("git can't try the merge:\n" + result.errors);
     return std::move(result.output);
 }
@@ -92,7 +92,8 @@ private:
             const std::size_t at = path.rfind(end);
             if (at == std::string_view::npos) continue;
             const std::string_view rest = path.substr(at + end.size());
-            if (rest.find_first_not_of("_0123456789") == std::string_view::npos) return std::string(path.substr(0, at));
+            if (rest.find_first_not_of("_0123456789") == std::string_view::npos)
+                return std::string(path.substr(0, at));
         }
         return std::string(path);
     }

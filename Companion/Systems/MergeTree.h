@@ -32,7 +32,8 @@ struct UnmergedFile {
 
 /// The files that both commits changed, or in whose way they are else, in the order of their paths: what the
 /// merge of git, with its renames and its merged bases, has to merge by contents, and what it would leave
-/// unmerged. No content is merged, and nothing is written into the repository. Needs git 2.38. Throws Failure.
+/// unmerged. No content is merged, and nothing is written into the repository. Needs git 2.38. Throws
+/// Failure.
 std::vector<UnmergedFile> ListUnmerged(const Repository& repository, const std::string& ours,
                                        const std::string& theirs);
 

@@ -4,8 +4,8 @@
 
 namespace ovrin {
 
-/// A new folder in the temporary directory, of this user alone, for as long as this lives. A signal that would
-/// end the program, such as from the keyboard, does so when the folder is gone. One at a time.
+/// A new folder in the temporary directory, of this user alone, for as long as this lives. A signal that
+/// would end the program, such as from the keyboard, does so when the folder is gone. One at a time.
 class ScratchFolder {
 public:
     /// Throws Failure.

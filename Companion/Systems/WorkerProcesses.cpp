@@ -37,11 +37,13 @@ bool SendAll(int socket, const void* bytes, std::size_t count) {
 /// What a process does: takes the number of a piece, and answers with the length of a text and the text.
 [[noreturn]] void Serve(int socket, const Work& work) {
     try {
-        for (std::uint64_t index = 0;
-             Uninterrupted([&] { return recv(socket, &index, sizeof(index), MSG_WAITALL); }) == sizeof(index);) {
+        for (std::uint64_t index = 0; Uninterrupted([&] {
+                                          return recv(socket, &index, sizeof(index), MSG_WAITALL);
+                                      }) == sizeof(index);) {
             const std::string text = work(static_cast<std::size_t>(index));
             const std::uint64_t length = text.size();
-            if (!SendAll(socket, &length, sizeof(length)) || !SendAll(socket, text.data(), text.size())) break;
+            if (!SendAll(socket, &length, sizeof(length)) || !SendAll(socket, text.data(), text.size()))
+                break;
         }
     } catch (const std::exception&) {
         _exit(1); // the piece is told as one that ended its process
@@ -88,8 +90,7 @@ public:
     /// Reads what has come. Returns the answer once it is whole; the process is over if it has no text.
     std::optional<WorkerAnswer> Receive() {
         char buffer[std::size_t{64} * 1024];
-        const ssize_t count =
-            Uninterrupted([&] { return recv(m_Socket.Get(), buffer, sizeof(buffer), 0); });
+        const ssize_t count = Uninterrupted([&] { return recv(m_Socket.Get(), buffer, sizeof(buffer), 0); });
         if (count <= 0) return WorkerAnswer{{}, Wait()};
         m_Received.append(buffer, static_cast<std::size_t>(count));
         std::uint64_t length = 0;
@@ -121,12 +122,14 @@ public:
     Pool(std::span<const std::uint64_t> sizes, const WorkLimits& limits, const Work& work)
         : m_Sizes(sizes), m_Limits(limits), m_Work(work), m_Largest(sizes.size()) {
         std::iota(m_Largest.begin(), m_Largest.end(), std::size_t{0});
-        std::ranges::stable_sort(m_Largest, std::ranges::greater(), [&](std::size_t i) { return m_Sizes[i]; });
+        std::ranges::stable_sort(m_Largest, std::ranges::greater(),
+                                 [&](std::size_t i) { return m_Sizes[i]; });
     }
 
     void Run(const Take& take) {
         while (m_Next < m_Largest.size() || !std::ranges::all_of(m_Workers, &Worker::IsIdle)) {
-            while (m_Next < m_Largest.size() && BeginNext()) {}
+            while (m_Next < m_Largest.size() && BeginNext()) {
+            }
             TakeAnswers(take);
         }
     }
