@@ -53,6 +53,15 @@ ProcessSetting Git::Setting(std::string input) const {
     return {.folder = m_Folder, .input = std::move(input), .environment = m_Environment};
 }
 
+Git Git::With(const std::vector<std::pair<std::string, std::string>>& variables) const {
+    Git other = *this;
+    for (const auto& variable : variables) {
+        std::erase_if(other.m_Environment, [&](const auto& old) { return old.first == variable.first; });
+        other.m_Environment.push_back(variable);
+    }
+    return other;
+}
+
 ProcessResult Git::Run(CommandWords arguments, std::string input) const {
     arguments.insert(arguments.begin(), {"git", "--literal-pathspecs"});
     return RunProcess(arguments, Setting(std::move(input)));
