@@ -23,7 +23,7 @@ GitEntry ParseEntry(const std::string& field) {
 
 std::vector<GitEntry> ParseEntries(std::string_view listing) {
     std::vector<GitEntry> entries;
-    for (const std::string& field : Fields(listing)) entries.push_back(ParseEntry(field));
+    for (const std::string& field : ZeroEndedTexts(listing)) entries.push_back(ParseEntry(field));
     return entries;
 }
 
@@ -51,6 +51,15 @@ Git Git::WithOwnIndex() const {
 
 ProcessSetting Git::Setting(std::string input) const {
     return {.folder = m_Folder, .input = std::move(input), .environment = m_Environment};
+}
+
+Git Git::With(const std::vector<std::pair<std::string, std::string>>& variables) const {
+    Git other = *this;
+    for (const auto& variable : variables) {
+        std::erase_if(other.m_Environment, [&](const auto& old) { return old.first == variable.first; });
+        other.m_Environment.push_back(variable);
+    }
+    return other;
 }
 
 ProcessResult Git::Run(CommandWords arguments, std::string input) const {

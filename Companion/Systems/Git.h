@@ -4,6 +4,7 @@
 
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace ovrin {
@@ -29,6 +30,8 @@ public:
     /// The same with the index of the working tree, whatever the environment says: git gives its hooks
     /// another one, which holds what is to be committed.
     Git WithOwnIndex() const;
+    /// The same with these variables in its environment, in place of others of their names.
+    Git With(const std::vector<std::pair<std::string, std::string>>& variables) const;
 
     /// What a process of git is to be started with, to work here.
     ProcessSetting Setting(std::string input = {}) const;
