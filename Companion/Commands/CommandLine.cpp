@@ -5,6 +5,7 @@
 #include "Words/Failure.h"
 
 #include "Descriptor.h"
+#include "Values/YAMLError.h"
 #include "Values/YAMLScalar.h"
 
 #include <CLI/CLI.hpp>
@@ -63,6 +64,8 @@ Outcome RunAction(const Action& action) {
     } catch (const std::bad_alloc&) {
         std::cerr << "ovrin: out of memory\n";
     } catch (const std::exception& error) {
+        std::cerr << "ovrin: " << error.what() << '\n';
+    } catch (const ovrin_yaml::YAMLError& error) {
         std::cerr << "ovrin: " << error.what() << '\n';
     }
     return Outcome::Failed;

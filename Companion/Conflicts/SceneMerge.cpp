@@ -166,13 +166,15 @@ void SceneMerge::RunMerge(const std::vector<RecordResolve>& decisions, Side take
 
 void SceneMerge::CollectOpen(const ResolveTable& decided) {
     m_Open.clear();
-    for (const MergeSession::Record* record : m_Session.PendingConflicts()) {
-        const ConflictKind kind = KindOf(*record);
-        Path path = kind == ConflictKind::ParentLoop ? ParentPath(*record) : record->path.Elements();
+    for (const MergeSession::Record* pending : m_Session.PendingConflicts()) {
+        MergeSession::Record record = *pending;
+        if (IsOpenLoop(record)) record.path = WalkedPath(ParentPath(record)).Keep();
+        Path path = record.path.Elements();
+        const ConflictKind kind = KindOf(record);
         // That the requirement stays broken is what the decision says.
         if (kind == ConflictKind::BrokenRequirement && decided.Find(path)) continue;
         if (!m_Open.empty() && m_Open.back().path == path) continue;
-        m_Open.push_back({std::move(path), kind, record->right, record->left});
+        m_Open.push_back({std::move(path), kind, record});
     }
 }
 

@@ -21,13 +21,11 @@ enum class ConflictKind {
     KeyOrder,          ///< the order in which the fields of an object are written
 };
 
-/// A conflict of a merge that nothing settles. The operations belong to the merge; null where a side did
-/// nothing.
+/// A conflict of a merge that nothing settles.
 struct OpenConflict {
-    ovrin_yaml::Path path;
+    ovrin_yaml::Path path; ///< what a decision about it names; the record's own
     ConflictKind kind;
-    const ovrin_yaml::Operation* ours;
-    const ovrin_yaml::Operation* theirs;
+    ovrin_yaml::MergeSession::Record record; ///< whose operations stay, whatever else is merged later
 };
 
 /// The merge of the three texts of a scene. They are read and compared once, and merged any number of times:
