@@ -21,9 +21,9 @@ GitEntry ParseEntry(const std::string& field) {
             static_cast<GitEntry::Stage>(field[object + 1] - '0')};
 }
 
-std::vector<GitEntry> ParseEntries(std::string_view listed) {
+std::vector<GitEntry> ParseEntries(std::string_view listing) {
     std::vector<GitEntry> entries;
-    for (const std::string& field : ZeroEndedTexts(listed)) entries.push_back(ParseEntry(field));
+    for (const std::string& field : ZeroEndedTexts(listing)) entries.push_back(ParseEntry(field));
     return entries;
 }
 
@@ -49,23 +49,39 @@ Git Git::WithOwnIndex() const {
     return other;
 }
 
+ProcessSetting Git::Setting(std::string input) const {
+    return {.folder = m_Folder, .input = std::move(input), .environment = m_Environment};
+}
+
+Git Git::With(const std::vector<std::pair<std::string, std::string>>& variables) const {
+    Git other = *this;
+    for (const auto& variable : variables) {
+        std::erase_if(other.m_Environment, [&](const auto& old) { return old.first == variable.first; });
+        other.m_Environment.push_back(variable);
+    }
+    return other;
+}
+
 ProcessResult Git::Run(CommandWords arguments, std::string input) const {
     arguments.insert(arguments.begin(), {"git", "--literal-pathspecs"});
-    return RunProcess(arguments,
-                      {.folder = m_Folder, .input = std::move(input), .environment = m_Environment});
+    return RunProcess(arguments, Setting(std::move(input)));
 }
 
 std::string Git::Output(CommandWords arguments, std::string input) const {
     arguments.insert(arguments.begin(), {"git", "--literal-pathspecs"});
-    return OutputOf(arguments, {.folder = m_Folder, .input = std::move(input), .environment = m_Environment});
+    return OutputOf(arguments, Setting(std::move(input)));
 }
 
 std::vector<GitEntry> Git::Unmerged() const {
     return ParseEntries(Output({"ls-files", "--unmerged", "-z"}));
 }
 
-std::vector<GitEntry> Git::Entries(const std::string& path) const {
-    return ParseEntries(Output({"ls-files", "--stage", "-z", "--", path}));
+std::vector<GitEntry> Git::Entries() const {
+    return ParseEntries(Output({"ls-files", "--stage", "-z"}));
+}
+
+std::vector<std::string> Git::Untracked() const {
+    return ZeroEndedTexts(Output({"ls-files", "--others", "--exclude-standard", "-z"}));
 }
 
 std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& paths,
@@ -78,10 +94,6 @@ std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& 
     command.emplace_back("--");
     command.insert(command.end(), paths.begin(), paths.end());
     return ZeroEndedTexts(Output(std::move(command)));
-}
-
-std::string Git::Blob(const std::string& object) const {
-    return Output({"cat-file", "blob", object});
 }
 
 bool Git::StoresAs(const std::string& path, const std::string& bytes) const {

@@ -40,6 +40,12 @@ void AppendObjectBody(const YAMLMapping& object, std::string& text) {
     YAMLEmitter(text).EmitDocument({keys.data(), values.data(), keys.size()}, object.m_Flow);
 }
 
+void AppendObject(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text) {
+    AppendHeaderLine(rootKey, object, text);
+    AppendObjectBody(object, text);
+    text.push_back('\n');
+}
+
 std::string_view TagAuthority() {
     return kTagAuthority;
 }
@@ -49,13 +55,10 @@ void Output(const OvrinObjects& objects, std::ostream& stream) {
     text.append(kTagAuthority).append(kFileHeaderEnd);
     for (const YAMLMapping::Entry entry : objects.GetMapping()) {
         const YAMLMapping& object = ToMapping(entry.value);
-        if (!object.Source().empty()) {
+        if (!object.Source().empty())
             text += object.Source();
-        } else {
-            AppendHeaderLine(*entry.key, object, text);
-            AppendObjectBody(object, text);
-            text.push_back('\n');
-        }
+        else
+            AppendObject(*entry.key, object, text);
         if (text.size() < kPieceSize) continue;
         stream.write(text.data(), static_cast<std::streamsize>(text.size()));
         text.clear();

@@ -12,6 +12,10 @@ namespace ovrin_yaml {
 /// stands below the object's own keys may repeat keys. Throws the duplicate-keys text if those do.
 void AppendObjectBody(const YAMLMapping& object, std::string& text);
 
+/// Appends an object as it stands in a file, with its header line; its id is that of its header's data, or
+/// else `rootKey`. Throws as Output does.
+void AppendObject(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text);
+
 /// The domain name in the second line of every file that is written; the build decides.
 std::string_view TagAuthority();
 
