@@ -9,6 +9,7 @@
 #include <climits>
 #include <cstdlib>
 #include <fcntl.h>
+#include <sys/auxv.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -69,6 +70,13 @@ bool ReadToEnd(int descriptor, std::string& bytes) {
     return isComplete;
 }
 
+/// Empty if it can't be found. Without /proc there is the name that the program was started by.
+std::string ExecutablePath() {
+    char buffer[PATH_MAX];
+    const char* started = reinterpret_cast<const char*>(getauxval(AT_EXECFN));
+    return realpath("/proc/self/exe", buffer) || (started && realpath(started, buffer)) ? buffer : "";
+}
+
 } // namespace
 
 std::string GetUserHomeDir() {
@@ -81,8 +89,8 @@ std::string OvrinToNativePath(const std::string& path) {
 }
 
 std::string CreateTempFile() {
-    char path[] = "/tmp/MERGEXXXXXX";
-    const int descriptor = mkstemp(path);
+    std::string path = kTempFileTemplate;
+    const int descriptor = mkstemp(path.data());
     if (descriptor < 0) return {};
     close(descriptor);
     return path;
@@ -112,8 +120,7 @@ std::string GetFolder(const std::string& path) {
 }
 
 std::string GetDataFilesDir() {
-    char buffer[PATH_MAX];
-    const std::string path = realpath("/proc/self/exe", buffer) ? buffer : "";
+    const std::string path = ExecutablePath();
     const std::size_t separator = path.find_last_of("/\\");
     if (separator != std::string::npos) return path.substr(0, separator + 1);
     errs << (path.empty() ? "Couldn't locate dir of factory merge spec file\n" : "My path is invalid\n");

@@ -21,16 +21,6 @@ std::string TellValue(const Conflict& conflict, Side side, const std::string& la
     return line + '\n';
 }
 
-std::string TellConflict(const Conflict& conflict, const SideLabels& labels) {
-    std::string text = "  " + (conflict.property.empty() ? "" : conflict.property + ": ");
-    text += std::string(WhatHappened(conflict.kind)) + '\n';
-    std::size_t width = 0;
-    for (const std::string& words : conflict.words) width = std::max(width, CharacterCount(words));
-    for (const Side side : {Side::Base, Side::Ours, Side::Theirs})
-        text += TellValue(conflict, side, labels.Of(side), width);
-    return text;
-}
-
 /// What the sides are in an action beyond their labels.
 struct Roles {
     const char* action;
@@ -53,6 +43,16 @@ std::string TellSide(Side side, const std::string& label, const char* role) {
 }
 
 } // namespace
+
+std::string TellConflict(const Conflict& conflict, const SideLabels& labels) {
+    std::string text = "  " + (conflict.property.empty() ? "" : conflict.property + ": ");
+    text += std::string(WhatHappened(conflict.kind)) + '\n';
+    std::size_t width = 0;
+    for (const std::string& words : conflict.words) width = std::max(width, CharacterCount(words));
+    for (const Side side : {Side::Base, Side::Ours, Side::Theirs})
+        text += TellValue(conflict, side, labels.Of(side), width);
+    return text;
+}
 
 std::string TellSides(const Occasion& occasion) {
     for (const Roles& roles : kRoles)

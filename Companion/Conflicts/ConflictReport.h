@@ -17,6 +17,9 @@ struct SideLabels {
     static SideLabels Of(const Occasion& occasion) { return {occasion.base, occasion.ours, occasion.theirs}; }
 };
 
+/// One conflict, without the heading: what happened, and the values of all sides.
+std::string TellConflict(const Conflict& conflict, const SideLabels& labels);
+
 /// The open conflicts of a scene for people, a line or two each and the values of all sides:
 ///
 ///     Harbour/Pier/Lantern · Light (734813)

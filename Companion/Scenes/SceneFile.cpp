@@ -3,7 +3,7 @@
 #include "FileUtils.h"
 #include "SceneExtensions.h"
 
-#include "Reading/ObjectFile.h"
+#include "Reading/DocumentCut.h"
 
 #include <algorithm>
 #include <cstring>

@@ -1,5 +1,6 @@
 #include "Systems/Process.h"
 
+#include "Descriptor.h"
 #include "Words/Failure.h"
 
 #include <gtest/gtest.h>
@@ -9,6 +10,7 @@ namespace {
 using namespace ovrin;
 
 TEST(Process, TalksWithMoreThanAPipeHolds) {
+    OutliveFailedWrites();
     const std::string text(std::size_t{1} << 20, 'x');
     EXPECT_EQ(OutputOf({"cat"}, {.input = text}), text);
     EXPECT_EQ(OutputOf({"true"}, {.input = text}), "");

@@ -1,6 +1,8 @@
 #include "Reading/ObjectFile.h"
 
 #include "Reading/ChunkWalker.h"
+#include "Reading/DocumentCut.h"
+#include "Reading/Fast/BatchedBuilder.h"
 #include "Reading/Fast/WrittenFormReader.h"
 #include "Values/Arena.h"
 #include "Values/ScalarTable.h"
@@ -25,11 +27,6 @@ std::string_view ObjectFile::FileIDOf(const Document& document) {
     return ovrin_yaml::FileIDOf({document.begin, document.length});
 }
 
-/// A byte order mark may stand in front of it.
-bool HasSignature(std::string_view bytes) {
-    return bytes.substr(0, kFileSignature.size() + 4).find(kFileSignature) != std::string_view::npos;
-}
-
 void ObjectFile::Take(std::string bytes) {
     if (!HasSignature(bytes))
         throw YAMLError(
@@ -42,25 +39,11 @@ void ObjectFile::Take(std::string bytes) {
 
 void ObjectFile::TakeText(std::string text) {
     m_Text = std::make_shared<const std::string>(std::move(text));
-    m_Header = std::string_view(*m_Text).substr(0, m_Text->find(kDocumentMark));
-}
-
-/// "%YAML 1.1" and the %TAG line of the handle "!o!", with nothing in its prefix that isn't plain in every
-/// sense.
-bool ObjectFile::HasWrittenHeader() const {
-    if (!m_Header.starts_with(kFileHeaderStart) || !m_Header.ends_with('\n')) return false;
-    const std::string_view prefix =
-        m_Header.substr(kFileHeaderStart.size(), m_Header.size() - kFileHeaderStart.size() - 1);
-    const auto isPlain = [](char c) {
-        return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') ||
-               std::string_view(".,:-").find(c) != std::string_view::npos;
-    };
-    return std::all_of(prefix.begin(), prefix.end(), isPlain) &&
-           std::string_view(*m_Text).substr(m_Header.size()).starts_with(kDocumentStart);
+    m_Header = FileHeaderOf(*m_Text);
 }
 
 void ObjectFile::Cut(ObjectFile* base) {
-    if (!m_Options.fast || !HasWrittenHeader()) return;
+    if (!m_Options.fast || !HasWrittenHeader(*m_Text)) return;
     if (base && m_Options.share && !base->m_Documents.empty() && m_Header == base->m_Header) {
         m_Base = base;
         CutAlong();
@@ -70,23 +53,6 @@ void ObjectFile::Cut(ObjectFile* base) {
     MakePieces();
 }
 
-/// Looks for the first "!" of "\n--- !o!": a sign that stands in headers and seldom elsewhere is found many
-/// times faster than one that stands in every line.
-const char* ObjectFile::FindDocumentEnd(const char* begin) const {
-    constexpr std::size_t kSignAt = kNextHeader.find('!');
-    const char* position = begin + kDocumentStart.size();
-    while (position < End()) {
-        const auto* sign =
-            static_cast<const char*>(std::memchr(position, '!', static_cast<std::size_t>(End() - position)));
-        if (!sign) break;
-        const char* header = sign - kSignAt;
-        if (std::string_view(header, static_cast<std::size_t>(End() - header)).starts_with(kNextHeader))
-            return header + 1;
-        position = sign + 1;
-    }
-    return End();
-}
-
 void ObjectFile::CutAlone() {
     // A guess that spares the table most of its growing.
     constexpr std::size_t kBytesPerScalar = 56;
@@ -94,7 +60,7 @@ void ObjectFile::CutAlone() {
     constexpr std::size_t kBytesPerDocument = 400;
     ReserveDocuments(m_Text->size() / kBytesPerDocument);
     for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
-        const char* end = FindDocumentEnd(begin);
+        const char* end = FindDocumentEnd(begin, End());
         AddDocument(begin, static_cast<std::size_t>(end - begin), kNone);
         begin = end;
     }
@@ -132,7 +98,7 @@ void ObjectFile::CutAlong() {
             AddDocument(begin, known[expected].length, expected);
             ++expected;
         } else {
-            const char* end = FindDocumentEnd(begin);
+            const char* end = FindDocumentEnd(begin, End());
             AddDocument(begin, static_cast<std::size_t>(end - begin), FindLender(begin, end, expected));
         }
         begin += m_Documents.back().length;
@@ -178,13 +144,13 @@ void ObjectFile::MakePieces() {
 
 void ObjectFile::ReadPiece(std::size_t piece) {
     constexpr std::size_t kAtOnce = 32;
-    WrittenFormReader reader(End());
+    TreeReader reader(End());
     for (std::size_t i = m_Pieces[piece].first; i < m_Pieces[piece].end; i += kAtOnce)
         ReadDocuments(reader, {&m_Documents[i], std::min(kAtOnce, m_Pieces[piece].end - i)});
 }
 
 /// Reads those that no other file lends.
-void ObjectFile::ReadDocuments(WrittenFormReader& reader, std::span<Document> documents) const {
+void ObjectFile::ReadDocuments(TreeReader& reader, std::span<Document> documents) const {
     for (Document& document : documents)
         if (document.lender == kNone) Read(reader, document);
     reader.InternTexts();
@@ -192,7 +158,7 @@ void ObjectFile::ReadDocuments(WrittenFormReader& reader, std::span<Document> do
         if (document.object) Complete(document);
 }
 
-void ObjectFile::Read(WrittenFormReader& reader, Document& document) const {
+void ObjectFile::Read(TreeReader& reader, Document& document) const {
     // The parser counts the lines of the file's header in every document.
     const auto read = reader.Read({document.begin, document.length}, kFileHeaderLines);
     document.object = read.object;
@@ -225,7 +191,7 @@ void ObjectFile::Finish() {
 void ObjectFile::FinishDocuments() {
     YAMLMapping& root = m_Objects.GetMapping();
     root.Reserve(m_Documents.size());
-    WrittenFormReader reader(End());
+    TreeReader reader(End());
     for (Document& document : m_Documents) {
         const Document* lender = document.lender == kNone ? nullptr : &m_Base->m_Documents[document.lender];
         if (lender && lender->isLendable) {

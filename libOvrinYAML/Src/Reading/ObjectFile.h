@@ -16,8 +16,9 @@
 
 namespace ovrin_yaml {
 
+class BatchedBuilder;
 class ChunkWalker;
-class WrittenFormReader;
+template <class Builder> class WrittenFormReader;
 
 /// How object files are read. What they mean doesn't depend on it: tests and benchmarks switch parts off.
 struct ReaderOptions {
@@ -29,9 +30,6 @@ struct ReaderOptions {
     /// Objects with one of these traits are never shared.
     std::uint8_t unshared = 0;
 };
-
-/// Whether the bytes of a file begin as those of object files do.
-bool HasSignature(std::string_view bytes);
 
 /// An object file on its way from text to objects.
 ///
@@ -82,15 +80,14 @@ private:
         bool isMarked = false;   // the object is marked as shared
         bool isAsWritten = false;
     };
+    using TreeReader = WrittenFormReader<BatchedBuilder>;
     struct Piece {
         std::size_t first, end; // documents
     };
     static constexpr std::size_t kNone = SIZE_MAX;
 
     static std::string_view FileIDOf(const Document& document);
-    bool HasWrittenHeader() const;
     const char* End() const { return m_Text->data() + m_Text->size(); }
-    const char* FindDocumentEnd(const char* begin) const;
     bool StandsAt(const Document& document, const char* position, const char* end) const;
     std::size_t FindLender(const char* begin, const char* end, std::size_t& expected) const;
     std::size_t IndexOf(std::string_view fileID) const;
@@ -99,8 +96,8 @@ private:
     void AddDocument(const char* begin, std::size_t length, std::size_t lender);
     void CutAlone();
     void MakePieces();
-    void ReadDocuments(WrittenFormReader& reader, std::span<Document> documents) const;
-    void Read(WrittenFormReader& reader, Document& document) const;
+    void ReadDocuments(TreeReader& reader, std::span<Document> documents) const;
+    void Read(TreeReader& reader, Document& document) const;
     void Complete(Document& document) const;
     void FinishDocuments();
     bool ReadNext(ChunkWalker& walker, std::size_t offset) const;

@@ -1,5 +1,6 @@
 #include "Reading/Fast/BatchedBuilder.h"
 
+#include "Reading/Fast/PlainScan.h"
 #include "Values/Hash.h"
 #include "Values/ScalarTable.h"
 #include "Values/YAMLSequence.h"
@@ -95,6 +96,14 @@ void BatchedBuilder::CloseSequence(std::size_t mark, bool flow, std::uint32_t li
     sequence->m_Line = line;
     m_Stack.resize(mark);
     m_Stack.push_back({sequence, hash, 0});
+}
+
+/// A value may still be missing, so only the key can be asked for.
+YAMLMapping* BatchedBuilder::TakeObject(bool isStripped) {
+    YAMLMapping* object = AsMapping(TakeRoot());
+    const bool hasMark = object->FindKey(YAMLScalar::strippedPrefabPlaceHolderName) != object->end();
+    if (hasMark && !isStripped) throw NotSure();
+    return object;
 }
 
 YAMLNode* BatchedBuilder::TakeRoot() {

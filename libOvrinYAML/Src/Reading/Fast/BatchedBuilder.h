@@ -60,8 +60,12 @@ public:
     bool CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed = 0);
     void CloseSequence(std::size_t mark, bool flow, std::uint32_t line);
 
-    /// Takes the tree that is the only node on the stack. Its late scalars are null until they are interned.
-    YAMLNode* TakeRoot();
+    /// Owned by whoever takes it. Its late scalars are null until they are interned. No mapping in it has a
+    /// key twice.
+    using Object = YAMLMapping*;
+    /// Takes the object that is the only node on the stack. Not sure of one whose body has the entry that
+    /// tells of a stripped header, which would be taken for the header's.
+    Object TakeObject(bool isStripped);
     /// Completes all trees taken so far.
     void InternTexts();
     /// Forgets the tree under way.
@@ -83,6 +87,7 @@ private:
     };
     static constexpr std::size_t kMostLate = 256;
 
+    YAMLNode* TakeRoot();
     void AddNewShort(std::string_view text, const ShortText& packed, ShortTextCache::Entry& entry);
     void AddLong(std::string_view text);
     void AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry& entry);

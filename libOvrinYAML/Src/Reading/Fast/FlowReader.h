@@ -8,10 +8,10 @@ namespace ovrin_yaml {
 ///
 ///     {fileID: 12, guid: ab, list: [1, 2],
 ///       type: 3}                             a line is broken behind the first comma beyond its width
-class FlowReader {
+template <class Builder> class FlowReader {
 public:
     /// Reads what `form` has under way; that must outlive this.
-    explicit FlowReader(FormReading& form) : m_Form(form) {}
+    explicit FlowReader(FormReading<Builder>& form) : m_Form(form) {}
 
     /// Reads the collection whose bracket stands here, and ends behind it. `indent` is that of the line, and
     /// `parent` the key that the collection stands under.
@@ -34,8 +34,137 @@ private:
     bool ReadSeparator(char close);
     void NoteWidth() { m_Form.notes.NoteIf(m_Form.cursor.Column() > kLineWidth); }
 
-    FormReading& m_Form;
+    FormReading<Builder>& m_Form;
     int m_Indent = 0; // where the collection under way goes on in a new line
 };
+
+template <class Builder> void FlowReader<Builder>::ReadCollection(KnownKey& parent) {
+    const Nesting nesting(m_Form.depth);
+    m_Indent += kIndentStep;
+    if (*m_Form.cursor == '{')
+        ReadMapping(parent);
+    else
+        ReadSequence(parent);
+    m_Indent -= kIndentStep;
+}
+
+template <class Builder> void FlowReader<Builder>::ReadMapping(KnownKey& parent) {
+    FormCursor& cursor = m_Form.cursor;
+    const std::size_t mark = m_Form.builder.Mark();
+    const std::uint32_t line = cursor.Line();
+    cursor.Skip();
+    if (*cursor == '}') {
+        cursor.Skip();
+    } else {
+        NoteWidth();
+        KeyGuess* guess = &parent.inside;
+        do {
+            KnownKey& key = ReadKey(parent, *guess);
+            ReadValue(key);
+            guess = &key.next;
+        } while (SkipUsualSeparator() || ReadSeparator('}'));
+    }
+    m_Form.CloseMapping(mark, true, line);
+}
+
+/// Ends at the first character of the value.
+template <class Builder> KnownKey& FlowReader<Builder>::ReadKey(const KnownKey& parent, KeyGuess& guess) {
+    FormCursor& cursor = m_Form.cursor;
+    KnownKey* known = KnownKeys::Find(guess, cursor.Position());
+    if (known && cursor[known->length + 1] == ' ') {
+        m_Form.builder.AddNode(known->scalar, known->hash);
+        cursor.Skip(known->length + 2);
+        return *known;
+    }
+    const char* begin = cursor.Position();
+    KnownKey* key = &m_Form.keys.Unknown();
+    if (*begin == '\'' || *begin == '"') {
+        ReadQuotedKey();
+    } else {
+        const char* end = ScanText();
+        if (*end != ':') throw NotSure();
+        key = &m_Form.AddKey(end, parent, guess);
+    }
+    if (cursor.Position() - begin > m_Form.kLongestKey + 1 || *cursor != ' ') throw NotSure();
+    cursor.Skip();
+    return *key;
+}
+
+/// Ends behind the colon.
+template <class Builder> void FlowReader<Builder>::ReadQuotedKey() {
+    FormCursor& cursor = m_Form.cursor;
+    const char* begin = cursor.Position();
+    const std::uint32_t line = cursor.Line();
+    m_Form.builder.AddScalar(YAMLScalar::Lookup(m_Form.quoted.Read(true)));
+    if (cursor.Line() != line) throw NotSure();
+    m_Form.notes.NoteKey({begin, cursor.Position()});
+    if (*cursor != ':') throw NotSure();
+    cursor.Skip();
+}
+
+template <class Builder> void FlowReader<Builder>::ReadSequence(KnownKey& parent) {
+    FormCursor& cursor = m_Form.cursor;
+    const std::size_t mark = m_Form.builder.Mark();
+    const std::uint32_t line = cursor.Line();
+    cursor.Skip();
+    if (*cursor == ']') {
+        cursor.Skip();
+    } else {
+        NoteWidth();
+        do {
+            ReadValue(parent);
+        } while (SkipUsualSeparator() || ReadSeparator(']'));
+    }
+    m_Form.builder.CloseSequence(mark, true, line);
+}
+
+template <class Builder> void FlowReader<Builder>::ReadValue(KnownKey& parent) {
+    const char first = *m_Form.cursor;
+    if (first == '{' || first == '[') {
+        ReadCollection(parent);
+    } else if (first == '\'' || first == '"') {
+        m_Form.AddQuoted(true);
+    } else {
+        const char* end = ScanText();
+        m_Form.builder.AddText({m_Form.cursor.Position(), end});
+        m_Form.cursor.MoveTo(end);
+    }
+}
+
+/// The end of the plain text here.
+template <class Builder> const char* FlowReader<Builder>::ScanText() {
+    const char* begin = m_Form.cursor.Position();
+    const char* end = ScanPlainInFlow(begin);
+    m_Form.notes.NoteText({begin, end}, m_Form.cursor.LineStart());
+    return end;
+}
+
+/// The same as ReadSeparator for what nearly always stands there.
+template <class Builder> inline bool FlowReader<Builder>::SkipUsualSeparator() {
+    FormCursor& cursor = m_Form.cursor;
+    if (*cursor != ',' || cursor[1] != ' ' || cursor.Column() >= kLineWidth) return false;
+    cursor.Skip(2);
+    return true;
+}
+
+/// Behind an entry: true at the first character of the next, false behind the closing bracket.
+template <class Builder> bool FlowReader<Builder>::ReadSeparator(char close) {
+    FormCursor& cursor = m_Form.cursor;
+    const char sign = *cursor;
+    if (sign != close && sign != ',') throw NotSure();
+    cursor.Skip();
+    if (sign == close) return false;
+    const bool isFull = cursor.Column() > kLineWidth;
+    if (*cursor == ' ') {
+        m_Form.notes.NoteIf(isFull);
+        cursor.Skip();
+        return true;
+    }
+    if (*cursor != '\n') throw NotSure();
+    cursor.NextLine();
+    if (cursor.Indent() < 1) throw NotSure();
+    m_Form.notes.NoteIf(!isFull || cursor.Indent() != m_Indent);
+    return true;
+}
 
 } // namespace ovrin_yaml

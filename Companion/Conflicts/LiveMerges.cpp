@@ -1,0 +1,70 @@
+#include "Conflicts/LiveMerges.h"
+
+#include "Conflicts/OpenMerges.h"
+#include "Scenes/SceneFile.h"
+#include "Systems/Git.h"
+#include "Systems/Operation.h"
+#include "Systems/Repository.h"
+#include "Systems/UnmergedFiles.h"
+
+#include <algorithm>
+
+namespace ovrin {
+
+namespace {
+
+bool Holds(const std::vector<std::string>& sorted, const std::string& path) {
+    return std::ranges::binary_search(sorted, path);
+}
+
+bool LeavesNoTrace(const Occasion& occasion) {
+    return occasion.action.empty() || occasion.action == "stash";
+}
+
+/// What git knows of merged files.
+class GitState {
+public:
+    GitState(const Repository& repository, const std::vector<OpenMerge>& merges)
+        : m_IsUnderWay(!OperationIn(repository).action.empty()) {
+        const Git git = Git(repository).WithOwnIndex();
+        m_Head = git.Commit("HEAD");
+        std::vector<std::string> paths;
+        for (const OpenMerge& merge : merges)
+            if (LeavesNoTrace(merge.occasion)) paths.push_back(merge.path);
+        if (!paths.empty()) m_Differing = git.DifferingFromHead(paths, false);
+        std::ranges::sort(m_Differing);
+    }
+
+    bool IsUnderWay(const OpenMerge& merge, bool isUnmerged) const {
+        const Occasion& occasion = merge.occasion;
+        if (!occasion.head.empty() && occasion.head != m_Head) return false;
+        if (isUnmerged || (m_IsUnderWay && occasion.action != "stash")) return true;
+        return LeavesNoTrace(occasion) && Holds(m_Differing, merge.path);
+    }
+
+private:
+    bool m_IsUnderWay;
+    std::string m_Head;
+    std::vector<std::string> m_Differing;
+};
+
+} // namespace
+
+LiveMerges FindLiveMerges(const Repository& repository, const OpenMerges& store) {
+    LiveMerges found;
+    std::vector<OpenMerge> recorded = store.List();
+    const std::vector<std::string> unmerged = UnmergedFiles(repository);
+    std::optional<GitState> git;
+    if (repository.kind == SystemKind::Git && !recorded.empty()) git.emplace(repository, recorded);
+    for (OpenMerge& merge : recorded) {
+        const bool isUnmerged = Holds(unmerged, merge.path);
+        const bool isLive = git ? git->IsUnderWay(merge, isUnmerged) : isUnmerged;
+        (isLive ? found.live : found.stale).push_back(std::move(merge));
+    }
+    for (const std::string& path : unmerged)
+        if (IsSceneName(path) && !std::ranges::binary_search(found.live, path, {}, &OpenMerge::path))
+            found.unrecorded.push_back(path);
+    return found;
+}
+
+} // namespace ovrin

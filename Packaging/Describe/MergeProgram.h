@@ -1,0 +1,6 @@
+#pragma once
+
+#include "Describe/Program.h"
+
+/// OvrinMerge.
+DescribedProgram DescribeMerge();
