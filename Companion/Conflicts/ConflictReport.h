@@ -35,6 +35,14 @@ std::string TellConflicts(SceneMerge& merge, const SideLabels& labels, std::size
 /// it.
 nlohmann::json ConflictsToJson(SceneMerge& merge);
 
+/// A line that says what the sides are, in an action whose name leaves room for doubt:
+///
+///     ours is main, what you rebase onto; theirs is 3f2a1c9 (Dim the light), your own commit, which is put
+///     on top of it
+///
+/// Empty for a plain merge.
+std::string TellSides(const Occasion& occasion);
+
 /// "1 open conflict", "3 open conflicts".
 std::string CountOpen(std::size_t count);
 

@@ -11,14 +11,6 @@ namespace ovrin {
 
 namespace {
 
-/// Texts that each end in a zero byte.
-std::vector<std::string> Fields(std::string_view bytes) {
-    std::vector<std::string> fields;
-    for (std::size_t end; (end = bytes.find('\0')) != std::string_view::npos; bytes.remove_prefix(end + 1))
-        fields.emplace_back(bytes.substr(0, end));
-    return fields;
-}
-
 /// "MODE OBJECT STAGE\tPATH"
 GitEntry ParseEntry(const std::string& field) {
     const std::size_t mode = field.find(' ');
@@ -27,6 +19,12 @@ GitEntry ParseEntry(const std::string& field) {
     if (tab != object + 2) throw Failure("git lists its index in a form that isn't known: " + field);
     return {field.substr(tab + 1), field.substr(0, mode), field.substr(mode + 1, object - mode - 1),
             static_cast<GitEntry::Stage>(field[object + 1] - '0')};
+}
+
+std::vector<GitEntry> ParseEntries(std::string_view listing) {
+    std::vector<GitEntry> entries;
+    for (const std::string& field : Fields(listing)) entries.push_back(ParseEntry(field));
+    return entries;
 }
 
 std::string WithoutLineEnd(std::string text) {
@@ -51,23 +49,39 @@ Git Git::WithOwnIndex() const {
     return other;
 }
 
+ProcessSetting Git::Setting(std::string input) const {
+    return {.folder = m_Folder, .input = std::move(input), .environment = m_Environment};
+}
+
+Git Git::With(const std::vector<std::pair<std::string, std::string>>& variables) const {
+    Git other = *this;
+    for (const auto& variable : variables) {
+        std::erase_if(other.m_Environment, [&](const auto& old) { return old.first == variable.first; });
+        other.m_Environment.push_back(variable);
+    }
+    return other;
+}
+
 ProcessResult Git::Run(CommandWords arguments, std::string input) const {
     arguments.insert(arguments.begin(), {"git", "--literal-pathspecs"});
-    ProcessSetting setting = Setting();
-    setting.input = std::move(input);
-    return RunProcess(arguments, setting);
+    return RunProcess(arguments, Setting(std::move(input)));
 }
 
 std::string Git::Output(CommandWords arguments, std::string input) const {
     arguments.insert(arguments.begin(), {"git", "--literal-pathspecs"});
-    return OutputOf(arguments, {.folder = m_Folder, .input = std::move(input), .environment = m_Environment});
+    return OutputOf(arguments, Setting(std::move(input)));
 }
 
 std::vector<GitEntry> Git::Unmerged() const {
-    std::vector<GitEntry> entries;
-    for (const std::string& field : Fields(Output({"ls-files", "--unmerged", "-z"})))
-        entries.push_back(ParseEntry(field));
-    return entries;
+    return ParseEntries(Output({"ls-files", "--unmerged", "-z"}));
+}
+
+std::vector<GitEntry> Git::Entries() const {
+    return ParseEntries(Output({"ls-files", "--stage", "-z"}));
+}
+
+std::vector<std::string> Git::Untracked() const {
+    return ZeroEndedTexts(Output({"ls-files", "--others", "--exclude-standard", "-z"}));
 }
 
 std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& paths,
@@ -79,7 +93,7 @@ std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& 
     if (hasCommit) command.emplace_back("HEAD");
     command.emplace_back("--");
     command.insert(command.end(), paths.begin(), paths.end());
-    return Fields(Output(std::move(command)));
+    return ZeroEndedTexts(Output(std::move(command)));
 }
 
 bool Git::StoresAs(const std::string& path, const std::string& bytes) const {
@@ -103,7 +117,7 @@ std::string Git::NameOfCommit(const std::string& commit) const {
 
 std::optional<std::string> Git::ConfigValue(const std::string& name) const {
     const ProcessResult result = Run({"config", "-z", "--get", name});
-    const std::vector<std::string> values = Fields(result.output);
+    const std::vector<std::string> values = ZeroEndedTexts(result.output);
     if (!result.Succeeded() || values.empty()) return {};
     return values.front();
 }

@@ -4,6 +4,7 @@
 
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace ovrin {
@@ -29,14 +30,23 @@ public:
     /// The same with the index of the working tree, whatever the environment says: git gives its hooks
     /// another one, which holds what is to be committed.
     Git WithOwnIndex() const;
+    /// The same with these variables in its environment, in place of others of their names.
+    Git With(const std::vector<std::pair<std::string, std::string>>& variables) const;
 
-    /// What a process that serves this repository is started with.
+    /// How git is started for the repository: for programs of it that are talked with for longer.
     ProcessSetting Setting() const { return {.folder = m_Folder, .environment = m_Environment}; }
+
+    /// What a process of git is to be started with, to work here.
+    ProcessSetting Setting(std::string input = {}) const;
     ProcessResult Run(CommandWords arguments, std::string input = {}) const;
     std::string Output(CommandWords arguments, std::string input = {}) const;
 
     /// The versions of all paths that are unmerged, path by path.
     std::vector<GitEntry> Unmerged() const;
+    /// Those of all paths, path by path.
+    std::vector<GitEntry> Entries() const;
+    /// The files of the working tree that git neither tracks nor is told to ignore.
+    std::vector<std::string> Untracked() const;
     /// Those of the paths that differ from the last commit, in the index or, if wanted, in the working tree.
     /// All that the index has where there is no commit.
     std::vector<std::string> DifferingFromHead(const std::vector<std::string>& paths,
