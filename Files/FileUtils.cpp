@@ -89,8 +89,8 @@ std::string OvrinToNativePath(const std::string& path) {
 }
 
 std::string CreateTempFile() {
-    char path[] = "/tmp/MERGEXXXXXX";
-    const int descriptor = mkstemp(path);
+    std::string path = kTempFileTemplate;
+    const int descriptor = mkstemp(path.data());
     if (descriptor < 0) return {};
     close(descriptor);
     return path;

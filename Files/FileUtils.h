@@ -9,6 +9,9 @@ std::string GetUserHomeDir();
 /// A path of the program in the form of the platform, which is the same here.
 std::string OvrinToNativePath(const std::string& path);
 
+/// The path of every temporary file: six characters stand for each X.
+inline constexpr const char* kTempFileTemplate = "/tmp/MERGEXXXXXX";
+
 /// Makes an empty file in the temporary directory, which nothing removes. Empty on failure.
 std::string CreateTempFile();
 

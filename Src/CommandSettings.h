@@ -1,14 +1,11 @@
 #pragma once
 
+#include "Fallback.h"
 #include "InputFiles.h"
 
 #include "Merge/MergeResolve.h"
 
 #include <string>
-
-/// Defaults of the options that name a file: "auto" stands for the file the program finds by itself.
-inline const std::string kDefaultSpecFile = "auto";
-inline const std::string kNoSpecFile = "none"; // no external tool at all
 
 /// The settings of a command over two files.
 struct TwoFileConfig {

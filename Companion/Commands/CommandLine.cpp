@@ -1,10 +1,12 @@
 #include "Commands/CommandLine.h"
 
 #include "Commands/CommandTable.h"
-#include "Commands/Suggestion.h"
+#include "Commands/Help.h"
+#include "Commands/Misuse.h"
 #include "Words/Failure.h"
 
 #include "Descriptor.h"
+#include "Values/YAMLError.h"
 #include "Values/YAMLScalar.h"
 
 #include <CLI/CLI.hpp>
@@ -25,14 +27,15 @@ struct Described {
 };
 
 Described Describe(CLI::App& program, const Command& command) {
-    CLI::App* app = program.add_subcommand(command.name, command.summary);
+    CLI::App* app = program.add_subcommand(command.name, command.summary)->group("Commands");
     return {app, command.describe(*app)};
 }
 
 /// The version control systems call this program for every file: where the command is named first, as they
 /// do, the others needn't be described.
 std::vector<Described> DescribeWanted(CLI::App& program, const std::vector<std::string>& arguments) {
-    program.set_version_flag("--version", "ovrin " OVRIN_VERSION);
+    FormatHelp(program);
+    program.set_version_flag("--version", "ovrin " OVRIN_VERSION, "print the version");
     program.require_subcommand(1);
     const auto commands = Commands();
     const auto named = std::ranges::find_if(
@@ -45,15 +48,12 @@ std::vector<Described> DescribeWanted(CLI::App& program, const std::vector<std::
     return described;
 }
 
-Outcome TellMisuse(const CLI::App& program, const CLI::ParseError& error) {
+Outcome TellMisuse(const CLI::App& program, const CLI::ParseError& error,
+                   const std::vector<std::string>& arguments) {
     if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) { // --help and --version
         return program.exit(error) == 0 && std::cout.flush() ? Outcome::Done : Outcome::Failed;
     }
-    const auto parsed = program.get_subcommands();
-    const CLI::App& app = parsed.empty() ? program : *parsed.front();
-    std::cerr << "ovrin: " << error.what() << '\n' << Suggestions(app, program.remaining(true));
-    std::cerr << "\"" << (parsed.empty() ? "ovrin" : "ovrin " + app.get_name())
-              << " --help\" tells what there is.\n";
+    std::cerr << DescribeMisuse(program, error, arguments);
     return Outcome::Failed;
 }
 
@@ -63,6 +63,8 @@ Outcome RunAction(const Action& action) {
     } catch (const std::bad_alloc&) {
         std::cerr << "ovrin: out of memory\n";
     } catch (const std::exception& error) {
+        std::cerr << "ovrin: " << error.what() << '\n';
+    } catch (const ovrin_yaml::YAMLError& error) {
         std::cerr << "ovrin: " << error.what() << '\n';
     }
     return Outcome::Failed;
@@ -78,7 +80,7 @@ Outcome RunCommandLine(const std::vector<std::string>& arguments) {
     try {
         program.parse(std::vector<std::string>(arguments.rbegin(), arguments.rend()));
     } catch (const CLI::ParseError& error) {
-        return TellMisuse(program, error);
+        return TellMisuse(program, error, arguments);
     }
     const auto named =
         std::ranges::find_if(commands, [](const Described& command) { return command.app->parsed(); });

@@ -10,7 +10,7 @@
 #include "Scenes/SceneRules.h"
 #include "Systems/Repository.h"
 #include "Words/Failure.h"
-#include "Words/ProgressLine.h"
+#include "Words/ProgressCount.h"
 
 #include <CLI/CLI.hpp>
 #include <iostream>
@@ -46,7 +46,7 @@ PreviewAnswer Preview(const Wish& wish) {
         std::cerr << "Nothing to do: " << wish.revision << " is merged into " << question.answer.ours.name
                   << " already.\n";
     Reduce(question, part);
-    ProgressLine progress;
+    ProgressCount progress;
     LookIntoAll(question, repository, rules, [&](std::size_t done, std::size_t all) {
         progress.Tell("Merging scenes: " + std::to_string(done) + " of " + std::to_string(all));
     });

@@ -21,6 +21,29 @@ std::string TellValue(const Conflict& conflict, Side side, const std::string& la
     return line + '\n';
 }
 
+/// What the sides are in an action beyond their labels.
+struct Roles {
+    const char* action;
+    const char* ours;
+    const char* theirs;
+};
+
+constexpr Roles kRoles[] = {
+    {"rebase", "what you rebase onto", "your own commit, which is put on top of it"},
+    {"cherry-pick", "what you have checked out", "the commit that you pick"},
+    {"revert", "what you have checked out", "what stood there before the commit that you revert"},
+    {"stash", "what you have checked out", "what you had put aside"},
+    {"am", "what you have checked out", "what the patch makes of its base"},
+    {"graft", "what you have checked out", "the changeset that you graft"},
+    {"unshelve", "what you have checked out", "what you had put aside"},
+};
+
+std::string TellSide(Side side, const std::string& label, const char* role) {
+    return SideName(side) + std::string(" is ") + (label.empty() ? "" : Printable(label) + ", ") + role;
+}
+
+} // namespace
+
 std::string TellConflict(const Conflict& conflict, const SideLabels& labels) {
     std::string text = "  " + (conflict.property.empty() ? "" : conflict.property + ": ");
     text += std::string(WhatHappened(conflict.kind)) + '\n';
@@ -31,7 +54,13 @@ std::string TellConflict(const Conflict& conflict, const SideLabels& labels) {
     return text;
 }
 
-} // namespace
+std::string TellSides(const Occasion& occasion) {
+    for (const Roles& roles : kRoles)
+        if (occasion.action == roles.action)
+            return TellSide(Side::Ours, occasion.ours, roles.ours) + "; " +
+                   TellSide(Side::Theirs, occasion.theirs, roles.theirs) + '\n';
+    return {};
+}
 
 std::string TellConflicts(SceneMerge& merge, const SideLabels& labels, std::size_t most) {
     const ConflictWords words(merge, kValueWidth);

@@ -17,6 +17,9 @@ struct SideLabels {
     static SideLabels Of(const Occasion& occasion) { return {occasion.base, occasion.ours, occasion.theirs}; }
 };
 
+/// One conflict, without the heading: what happened, and the values of all sides.
+std::string TellConflict(const Conflict& conflict, const SideLabels& labels);
+
 /// The open conflicts of a scene for people, a line or two each and the values of all sides:
 ///
 ///     Harbour/Pier/Lantern · Light (734813)
@@ -31,6 +34,14 @@ std::string TellConflicts(SceneMerge& merge, const SideLabels& labels, std::size
 /// The same for scripts: {"bothAdded": false, "open": 2, "conflicts": [...]}, each as ToJson(Conflict) has
 /// it.
 nlohmann::json ConflictsToJson(SceneMerge& merge);
+
+/// A line that says what the sides are, in an action whose name leaves room for doubt:
+///
+///     ours is main, what you rebase onto; theirs is 3f2a1c9 (Dim the light), your own commit, which is put
+///     on top of it
+///
+/// Empty for a plain merge.
+std::string TellSides(const Occasion& occasion);
 
 /// "1 open conflict", "3 open conflicts".
 std::string CountOpen(std::size_t count);

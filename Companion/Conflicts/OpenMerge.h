@@ -47,8 +47,9 @@ struct OpenMerge {
 
 /// How far a person has come with an open merge.
 struct Progress {
-    std::vector<Decision> decisions; ///< in the order in which they were made
-    std::size_t open = 0;            ///< conflicts that are left
+    std::vector<Decision> decisions;     ///< in the order in which they were made
+    std::size_t open = 0;                ///< conflicts that are left
+    std::vector<std::size_t> steps = {}; ///< how many decisions each step made, to be undone together
 };
 
 } // namespace ovrin

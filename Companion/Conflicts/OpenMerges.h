@@ -29,6 +29,8 @@ public:
     std::vector<OpenMerge> List() const;
     /// The one of a scene with its texts, or nothing.
     std::optional<OpenMerge> Find(const std::string& path) const;
+    /// Whether there is one of a scene.
+    bool Has(const std::string& path) const { return PlaceOf(path).isTaken; }
     /// How far it has come: nothing settled if nothing is known.
     Progress ProgressOf(const OpenMerge& merge) const;
     void SetProgress(const OpenMerge& merge, const Progress& progress);

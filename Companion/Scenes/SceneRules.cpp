@@ -43,13 +43,14 @@ FormatFiles FormatFiles::OfEnvironment() {
     return files;
 }
 
+ovrin_yaml::YAMLTypeInfoManager ReadTypeInfo(const std::string& file) {
+    if (file == kDefaultTypeInfoFile) return {};
+    return OrFailure("type information", file, [&] { return SetupTypeInfo(file); });
+}
+
 SceneRules ReadSceneRules(const FormatFiles& files) {
-    SceneRules read;
-    read.rules = OrFailure("rules file", files.rules, [&] { return SetupRules(files.rules); });
-    if (files.typeInfo != kDefaultTypeInfoFile)
-        read.types =
-            OrFailure("type information", files.typeInfo, [&] { return SetupTypeInfo(files.typeInfo); });
-    return read;
+    return {OrFailure("rules file", files.rules, [&] { return SetupRules(files.rules); }),
+            ReadTypeInfo(files.typeInfo)};
 }
 
 } // namespace ovrin

@@ -71,16 +71,8 @@ std::string PreCommitHook() {
 }
 
 std::vector<std::string> EntriesOfGitConfig(const std::string& text) {
-    std::vector<std::string> entries;
-    if (text.empty()) return entries;
-    const std::string listed =
-        OutputOf({"git", "config", "--file", "-", "--list", "--null"}, {.input = text});
-    for (std::size_t begin = 0; begin < listed.size();) {
-        const std::size_t end = listed.find('\0', begin);
-        entries.push_back(listed.substr(begin, end - begin));
-        begin = end + 1;
-    }
-    return entries;
+    if (text.empty()) return {};
+    return ZeroEndedTexts(OutputOf({"git", "config", "--file", "-", "--list", "--null"}, {.input = text}));
 }
 
 } // namespace ovrin

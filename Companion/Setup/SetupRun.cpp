@@ -99,7 +99,7 @@ public:
 
     SetupReport All() {
         for (const std::string& system : WantedSystems(m_Wish)) Attempt(system, [&] { SetUp(system); });
-        if (m_Wish.isUndo && m_Report.changes + m_Report.failures == 0)
+        if (m_Wish.isUndo && m_Report.changed.empty() && m_Report.failures == 0)
             m_Report.words += "There is nothing that setup wrote here.\n";
         return std::move(m_Report);
     }
@@ -131,7 +131,7 @@ private:
         if (m_Wish.isUndo && change.kind == Kind::None) return;
         if (!m_Wish.isDryRun) CarryOut(change);
         m_Report.done += file.system + ": " + Told(change);
-        if (change.kind != Kind::None) ++m_Report.changes;
+        if (change.kind != Kind::None) m_Report.changed.push_back(change.path);
         if (!change.kept.empty())
             m_Report.words += file.system + ": " + change.path +
                               " keeps what somebody else wrote among them:\n" + Indented(change.kept);

@@ -11,14 +11,6 @@ namespace ovrin {
 
 namespace {
 
-/// Texts that each end in a zero byte.
-std::vector<std::string> Fields(std::string_view bytes) {
-    std::vector<std::string> fields;
-    for (std::size_t end; (end = bytes.find('\0')) != std::string_view::npos; bytes.remove_prefix(end + 1))
-        fields.emplace_back(bytes.substr(0, end));
-    return fields;
-}
-
 /// "MODE OBJECT STAGE\tPATH"
 GitEntry ParseEntry(const std::string& field) {
     const std::size_t mode = field.find(' ');
@@ -29,9 +21,9 @@ GitEntry ParseEntry(const std::string& field) {
             static_cast<GitEntry::Stage>(field[object + 1] - '0')};
 }
 
-std::vector<GitEntry> ParseEntries(std::string_view listed) {
+std::vector<GitEntry> ParseEntries(std::string_view listing) {
     std::vector<GitEntry> entries;
-    for (const std::string& field : Fields(listed)) entries.push_back(ParseEntry(field));
+    for (const std::string& field : Fields(listing)) entries.push_back(ParseEntry(field));
     return entries;
 }
 
@@ -57,6 +49,10 @@ Git Git::WithOwnIndex() const {
     return other;
 }
 
+ProcessSetting Git::Setting(std::string input) const {
+    return {.folder = m_Folder, .input = std::move(input), .environment = m_Environment};
+}
+
 Git Git::With(const std::vector<std::pair<std::string, std::string>>& variables) const {
     Git other = *this;
     for (const auto& variable : variables) {
@@ -68,21 +64,24 @@ Git Git::With(const std::vector<std::pair<std::string, std::string>>& variables)
 
 ProcessResult Git::Run(CommandWords arguments, std::string input) const {
     arguments.insert(arguments.begin(), {"git", "--literal-pathspecs"});
-    return RunProcess(arguments,
-                      {.folder = m_Folder, .input = std::move(input), .environment = m_Environment});
+    return RunProcess(arguments, Setting(std::move(input)));
 }
 
 std::string Git::Output(CommandWords arguments, std::string input) const {
     arguments.insert(arguments.begin(), {"git", "--literal-pathspecs"});
-    return OutputOf(arguments, {.folder = m_Folder, .input = std::move(input), .environment = m_Environment});
+    return OutputOf(arguments, Setting(std::move(input)));
 }
 
 std::vector<GitEntry> Git::Unmerged() const {
     return ParseEntries(Output({"ls-files", "--unmerged", "-z"}));
 }
 
-std::vector<GitEntry> Git::Entries(const std::string& path) const {
-    return ParseEntries(Output({"ls-files", "--stage", "-z", "--", path}));
+std::vector<GitEntry> Git::Entries() const {
+    return ParseEntries(Output({"ls-files", "--stage", "-z"}));
+}
+
+std::vector<std::string> Git::Untracked() const {
+    return ZeroEndedTexts(Output({"ls-files", "--others", "--exclude-standard", "-z"}));
 }
 
 std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& paths,
@@ -94,11 +93,7 @@ std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& 
     if (hasCommit) command.emplace_back("HEAD");
     command.emplace_back("--");
     command.insert(command.end(), paths.begin(), paths.end());
-    return Fields(Output(std::move(command)));
-}
-
-std::string Git::Blob(const std::string& object) const {
-    return Output({"cat-file", "blob", object});
+    return ZeroEndedTexts(Output(std::move(command)));
 }
 
 bool Git::StoresAs(const std::string& path, const std::string& bytes) const {
@@ -122,7 +117,7 @@ std::string Git::NameOfCommit(const std::string& commit) const {
 
 std::optional<std::string> Git::ConfigValue(const std::string& name) const {
     const ProcessResult result = Run({"config", "-z", "--get", name});
-    const std::vector<std::string> values = Fields(result.output);
+    const std::vector<std::string> values = ZeroEndedTexts(result.output);
     if (!result.Succeeded() || values.empty()) return {};
     return values.front();
 }

@@ -36,18 +36,21 @@ public:
     /// How git is started for the repository: for programs of it that are talked with for longer.
     ProcessSetting Setting() const { return {.folder = m_Folder, .environment = m_Environment}; }
 
+    /// What a process of git is to be started with, to work here.
+    ProcessSetting Setting(std::string input = {}) const;
     ProcessResult Run(CommandWords arguments, std::string input = {}) const;
     std::string Output(CommandWords arguments, std::string input = {}) const;
 
     /// The versions of all paths that are unmerged, path by path.
     std::vector<GitEntry> Unmerged() const;
-    /// Those of one path, merged or not.
-    std::vector<GitEntry> Entries(const std::string& path) const;
+    /// Those of all paths, path by path.
+    std::vector<GitEntry> Entries() const;
+    /// The files of the working tree that git neither tracks nor is told to ignore.
+    std::vector<std::string> Untracked() const;
     /// Those of the paths that differ from the last commit, in the index or, if wanted, in the working tree.
     /// All that the index has where there is no commit.
     std::vector<std::string> DifferingFromHead(const std::vector<std::string>& paths,
                                                bool inIndexAlone) const;
-    std::string Blob(const std::string& object) const;
     /// Whether a file of the working tree, as git would store it, is these bytes.
     bool StoresAs(const std::string& path, const std::string& bytes) const;
     /// The commit that a name stands for; empty if it is none.

@@ -67,6 +67,13 @@ std::string OutputOf(const CommandWords& command, const ProcessSetting& setting)
                   (result.errors.empty() ? "" : ":\n" + result.errors));
 }
 
+std::vector<std::string> ZeroEndedTexts(std::string_view listed) {
+    std::vector<std::string> texts;
+    for (std::size_t end; (end = listed.find('\0')) != std::string_view::npos; listed.remove_prefix(end + 1))
+        texts.emplace_back(listed.substr(0, end));
+    return texts;
+}
+
 std::string FindProgram(const std::string& name) {
     const char* path = std::getenv("PATH");
     std::istringstream folders(path ? path : "/usr/bin:/bin");

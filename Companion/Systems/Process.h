@@ -1,6 +1,7 @@
 #pragma once
 
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -32,6 +33,9 @@ ProcessResult RunProcess(const CommandWords& command, const ProcessSetting& sett
 
 /// The same for a program that must succeed: its output. Throws Failure with what it said on standard error.
 std::string OutputOf(const CommandWords& command, const ProcessSetting& setting = {});
+
+/// The texts that a program lists with a zero byte behind each, as they do with names of any bytes.
+std::vector<std::string> ZeroEndedTexts(std::string_view listed);
 
 /// Where the program of that name stands on the path, as execution would find it; empty if it doesn't.
 std::string FindProgram(const std::string& name);

@@ -1,28 +1,38 @@
 #pragma once
 
-#include <chrono>
+#include "Session/StageWatcher.h"
+
+#include <condition_variable>
+#include <mutex>
 #include <string>
+#include <thread>
 
 namespace ovrin {
 
-/// A line on standard error that says how far a command has come: on a terminal alone, and only where the
-/// command takes longer than a second. It is gone at the end.
-class ProgressLine {
+/// A line on standard error that tells what a long piece of work is at, from its second second on. It is
+/// wiped at the end, and never there unless standard error is a terminal.
+class ProgressLine final : public ovrin_yaml::StageWatcher {
 public:
-    ProgressLine();
+    /// `subject` is what is worked on: "levels/harbour.ovrin", printable.
+    explicit ProgressLine(std::string subject);
     ProgressLine(const ProgressLine&) = delete;
     ProgressLine& operator=(const ProgressLine&) = delete;
-    ~ProgressLine();
+    ~ProgressLine() { Wipe(); }
 
-    /// Printable text, shorter than a line. May be called as often as one likes.
-    void Tell(const std::string& text);
+    /// Ends it ahead of other words.
+    void Wipe();
+
+    void Begin(const char* step) override;
+    void End() override {}
 
 private:
-    using Clock = std::chrono::steady_clock;
+    void Show(const std::stop_token& stop);
 
-    const bool m_IsTerminal;
-    Clock::time_point m_Next; // when the line may change
-    bool m_IsShown = false;
+    const std::string m_Subject;
+    std::mutex m_Lock;
+    std::condition_variable_any m_Changed;
+    const char* m_Step = "";
+    std::jthread m_Thread; // none where there is nothing to show; the last member, whose end is waited for
 };
 
 } // namespace ovrin

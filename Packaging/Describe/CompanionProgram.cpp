@@ -1,5 +1,6 @@
 #include "Describe/CompanionProgram.h"
 
+#include "Commands/Argument.h"
 #include "Commands/CommandLine.h"
 
 #include <CLI/CLI.hpp>
@@ -12,18 +13,10 @@ std::string FirstLine(const std::string& text) {
     return text.substr(0, text.find('\n'));
 }
 
-/// The words between the braces of TEXT:{git,hg,svn}.
-std::vector<std::string> WordsOfCheck(const std::string& typeName) {
-    const std::size_t open = typeName.find('{');
-    const std::size_t close = typeName.find('}', open);
-    if (close == std::string::npos) return {};
-    return CLI::detail::split(typeName.substr(open + 1, close - open - 1), ',');
-}
-
 Values ValuesOf(const CLI::Option& option, const std::string& name) {
     constexpr std::array kRevisions = {"REV", "REVISION", "BRANCH", "COMMIT"};
-    constexpr std::array kNumbers = {"INT", "UINT", "FLOAT", "N", "K/N"};
-    Values values{WordsOfCheck(option.get_type_name()), Values::More::Files};
+    constexpr std::array kNumbers = {"N", "K/N"};
+    Values values{ovrin::AllowedWords(option), Values::More::Files};
     if (!values.words.empty() || std::ranges::find(kNumbers, name) != kNumbers.end())
         values.more = Values::More::None;
     else if (std::ranges::find(kRevisions, name) != kRevisions.end())
@@ -31,25 +24,13 @@ Values ValuesOf(const CLI::Option& option, const std::string& name) {
     return values;
 }
 
-/// What help shows behind the option, without the checks.
-std::string ValueName(const CLI::Option& option) {
-    if (option.get_items_expected_max() == 0) return "";
-    const std::string& text = option.get_option_text();
-    const std::string name = text.empty() ? option.get_type_name() : text;
-    return name.substr(0, name.find(':'));
-}
-
-bool IsRepeated(const CLI::Option& option) {
-    return option.get_items_expected_max() > 1;
-}
-
 DescribedOption Describe(const CLI::Option& option) {
     DescribedOption described;
     for (const std::string& name : option.get_lnames()) described.words.push_back("--" + name);
     for (const std::string& name : option.get_snames()) described.words.push_back("-" + name);
-    described.value = ValueName(option);
+    described.value = ovrin::ValueForm(option);
     described.meaning = FirstLine(option.get_description());
-    described.isRepeated = IsRepeated(option);
+    described.isRepeated = ovrin::IsRepeated(option);
     if (!described.value.empty()) described.values = ValuesOf(option, described.value);
     return described;
 }
@@ -69,7 +50,8 @@ std::vector<Operand> OperandsOf(const CLI::App& app) {
     for (const CLI::Option* option : app.get_options()) {
         if (!option->get_positional()) continue;
         const std::string name = option->get_name(true);
-        operands.push_back({name, option->get_required(), IsRepeated(*option), ValuesOf(*option, name)});
+        operands.push_back(
+            {name, option->get_required(), ovrin::IsRepeated(*option), ValuesOf(*option, name)});
     }
     return operands;
 }

@@ -41,7 +41,8 @@ std::string OperandSpec(const Operand& operand, std::size_t number) {
 
 void WriteCommand(std::ostream& out, const DescribedProgram& program, const DescribedCommand& command) {
     out << command.name << ")\n    _arguments " << (program.isPlain ? "-A '-*'" : "-s -S");
-    for (const DescribedOption& option : command.options) out << " \\\n        " << OptionSpec(option, program.isPlain);
+    for (const DescribedOption& option : command.options)
+        out << " \\\n        " << OptionSpec(option, program.isPlain);
     for (std::size_t i = 0; i < command.operands.size(); ++i)
         out << " \\\n        " << OperandSpec(command.operands[i], i + 1);
     out << "\n    ;;\n";

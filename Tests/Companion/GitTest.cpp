@@ -1,5 +1,6 @@
 #include "Systems/Git.h"
 
+#include "Systems/BlobReader.h"
 #include "Systems/Operation.h"
 #include "Systems/Repository.h"
 #include "Words/Failure.h"
@@ -52,7 +53,7 @@ TEST_F(GitTest, ListsTheVersionsOfAnUnmergedPathWithAnyName) {
     ASSERT_EQ(entries.size(), 3);
     EXPECT_EQ(entries[0].path, kOddName);
     EXPECT_EQ(entries[1].stage, GitEntry::Ours);
-    EXPECT_EQ(git().Blob(entries[2].object), "theirs\n");
+    EXPECT_EQ(BlobReader(git().Setting()).Read(entries[2].object), "theirs\n");
 }
 
 TEST_F(GitTest, TakesAPathForItself) {

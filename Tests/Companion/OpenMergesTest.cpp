@@ -58,7 +58,7 @@ TEST_F(OpenMergesTest, AreListedByPathAndForgotten) {
 
 TEST_F(OpenMergesTest, DecisionsBelongToTheirMergeAlone) {
     const OpenMerge first = Added("a.ovrin");
-    merges().SetProgress(first, {{{"1.Thing.x", Side::Theirs}}, 2});
+    merges().SetProgress(first, {{{"1.Thing.x", Side::Theirs}}, 2, {1}});
     EXPECT_EQ(merges().ProgressOf(first).decisions.at(0).side, Side::Theirs);
     EXPECT_EQ(merges().ProgressOf(first).open, 2);
     const OpenMerge second = Added("a.ovrin");

@@ -50,18 +50,6 @@ void FindMissingGameObjects(const YAMLMapping& merged, const YAMLMapping& left, 
     }
 }
 
-/// The type ids that are required among the components of one GameObject and that none of them is of.
-std::vector<const YAMLScalar*> UnmetRequirements(const Components& components) {
-    std::unordered_set<const YAMLScalar*> settled;
-    for (const GameObjectComponent& component : components)
-        settled.insert({component.typeInfo->m_ID, component.typeInfo->m_BaseID});
-    std::vector<const YAMLScalar*> unmet;
-    for (const GameObjectComponent& component : components)
-        for (const YAMLScalar* required : component.typeInfo->m_Requires)
-            if (settled.insert(required).second) unmet.push_back(required);
-    return unmet;
-}
-
 const YAMLScalar* FindComponentOf(const Components& components, const YAMLScalar* type) {
     for (const GameObjectComponent& component : components)
         if (IsOf(*component.typeInfo, type)) return component.id;
@@ -82,6 +70,17 @@ std::vector<GameObjectComponent> CollectGameObjectComponents(const YAMLMapping& 
         if (component.typeInfo) components.push_back(component);
     }
     return components;
+}
+
+std::vector<const YAMLScalar*> UnmetRequirements(const Components& components) {
+    std::unordered_set<const YAMLScalar*> settled;
+    for (const GameObjectComponent& component : components)
+        settled.insert({component.typeInfo->m_ID, component.typeInfo->m_BaseID});
+    std::vector<const YAMLScalar*> unmet;
+    for (const GameObjectComponent& component : components)
+        for (const YAMLScalar* required : component.typeInfo->m_Requires)
+            if (settled.insert(required).second) unmet.push_back(required);
+    return unmet;
 }
 
 std::vector<ComponentDependencyConflict> FindComponentDependencyConflicts(const YAMLMapping& merged,

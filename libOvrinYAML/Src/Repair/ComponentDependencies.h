@@ -19,6 +19,10 @@ struct GameObjectComponent {
 std::vector<GameObjectComponent> CollectGameObjectComponents(const YAMLMapping& root, const YAMLScalar* id,
                                                              const YAMLTypeInfoManager& types);
 
+/// The type ids that are required among the components of one GameObject and that none of them is of, each
+/// once.
+std::vector<const YAMLScalar*> UnmetRequirements(const std::vector<GameObjectComponent>& components);
+
 /// What the removals of one side took from under the other's feet in the merged file: first the GameObjects
 /// that components still name, then what components of the same GameObject require, both in document order
 /// and each told once. The conflict's id is that of what is missing, on the side that still has it; with

@@ -15,7 +15,7 @@ namespace {
 /// to stay in the cache.
 constexpr std::size_t kPieceSize = std::size_t{1} << 20;
 
-constexpr std::string_view kFileHeaderEnd = OVRIN_TAG_AUTHORITY ",2011:\n";
+constexpr std::string_view kTagAuthority = OVRIN_TAG_AUTHORITY;
 
 void AppendHeaderLine(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text) {
     const YAMLScalar* fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
@@ -40,18 +40,25 @@ void AppendObjectBody(const YAMLMapping& object, std::string& text) {
     YAMLEmitter(text).EmitDocument({keys.data(), values.data(), keys.size()}, object.m_Flow);
 }
 
+void AppendObject(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text) {
+    AppendHeaderLine(rootKey, object, text);
+    AppendObjectBody(object, text);
+    text.push_back('\n');
+}
+
+std::string_view TagAuthority() {
+    return kTagAuthority;
+}
+
 void Output(const OvrinObjects& objects, std::ostream& stream) {
     std::string text(kFileHeaderStart);
-    text += kFileHeaderEnd;
+    text.append(kTagAuthority).append(kFileHeaderEnd);
     for (const YAMLMapping::Entry entry : objects.GetMapping()) {
         const YAMLMapping& object = ToMapping(entry.value);
-        if (!object.Source().empty()) {
+        if (!object.Source().empty())
             text += object.Source();
-        } else {
-            AppendHeaderLine(*entry.key, object, text);
-            AppendObjectBody(object, text);
-            text.push_back('\n');
-        }
+        else
+            AppendObject(*entry.key, object, text);
         if (text.size() < kPieceSize) continue;
         stream.write(text.data(), static_cast<std::streamsize>(text.size()));
         text.clear();

@@ -22,6 +22,7 @@ namespace ovrin_yaml {
 
 /// A file's header up to the authority that its tags belong to.
 inline constexpr std::string_view kFileHeaderStart = "%YAML 1.1\n%TAG !o! tag:";
+inline constexpr std::string_view kFileHeaderEnd = ",2011:\n"; // behind the tag authority
 inline constexpr std::string_view kFileSignature = kFileHeaderStart.substr(0, 5);
 inline constexpr std::uint32_t kFileHeaderLines = 2;
 

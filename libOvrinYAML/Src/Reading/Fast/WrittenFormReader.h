@@ -42,6 +42,7 @@ public:
     /// `text` reaches from the "---" of the document up to that of the next or to the end of the file; it
     /// must stay up to the next InternTexts. `firstLine` is the zero-based line of the "---".
     Document Read(std::string_view text, std::uint32_t firstLine);
+    Builder& TheBuilder() { return m_Form.builder; }
     /// Completes the objects read so far. Better for many of them than for each.
     void InternTexts();
 

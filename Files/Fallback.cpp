@@ -1,6 +1,5 @@
 #include "Fallback.h"
 
-#include "CommandSettings.h"
 #include "ErrMsg.h"
 #include "FileUtils.h"
 

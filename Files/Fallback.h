@@ -6,6 +6,10 @@
 #include <string>
 #include <vector>
 
+/// Names of spec files: that which the program finds by itself, and no external tool at all.
+inline const std::string kDefaultSpecFile = "auto";
+inline const std::string kNoSpecFile = "none";
+
 /// External merge tools: which one serves a file, and its call. A merge spec file lists them, one a line:
 ///
 ///     # a comment

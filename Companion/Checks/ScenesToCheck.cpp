@@ -1,0 +1,147 @@
+#include "Checks/ScenesToCheck.h"
+
+#include "FileUtils.h"
+#include "Scenes/SceneFile.h"
+#include "Systems/BlobReader.h"
+#include "Systems/Git.h"
+#include "Systems/Repository.h"
+#include "Systems/WorkingPath.h"
+#include "Words/Failure.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <memory>
+#include <mutex>
+#include <set>
+#include <string_view>
+#include <sys/stat.h>
+#include <system_error>
+
+namespace ovrin {
+
+namespace {
+
+std::string ReadScene(const std::string& path) {
+    std::string bytes;
+    errno = 0;
+    if (ReadWholeFile(path == "-" ? "/dev/stdin" : path, bytes) == ReadResult::Complete) return bytes;
+    throw Failure("Cannot read it: " + std::system_category().message(errno));
+}
+
+bool IsRegularFile(const std::string& path) {
+    struct stat status;
+    return lstat(path.c_str(), &status) == 0 && S_ISREG(status.st_mode);
+}
+
+/// What stands in the working tree of these, in order; links lead to what has a name of its own.
+std::vector<SceneToCheck> InWorkingTree(const Repository& repository, const std::set<std::string>& paths) {
+    std::vector<SceneToCheck> scenes;
+    for (const std::string& path : paths) {
+        const std::string place = repository.top + '/' + path;
+        if (IsSceneName(path) && IsRegularFile(place))
+            scenes.push_back({path, path, [place] { return ReadScene(place); }});
+    }
+    return scenes;
+}
+
+std::set<std::string> Lines(std::string_view bytes, char end) {
+    std::set<std::string> lines;
+    for (std::size_t at; (at = bytes.find(end)) != std::string_view::npos; bytes.remove_prefix(at + 1))
+        lines.emplace(bytes.substr(0, at));
+    return lines;
+}
+
+std::set<std::string> AskMercurial(const Repository& repository, CommandWords command) {
+    return Lines(OutputOf(command, {.folder = repository.top}), '\0');
+}
+
+[[noreturn]] void RefuseSubversion() {
+    throw Failure("Subversion can't tell which scenes there are without asking its server; name them: "
+                  "ovrin check FILE...");
+}
+
+/// Blobs from one process of git, for several threads.
+class SharedBlobs {
+public:
+    explicit SharedBlobs(ProcessSetting setting) : m_Reader(std::move(setting)) {}
+
+    std::string Read(const std::string& id) {
+        const std::lock_guard lock(m_Lock);
+        return m_Reader.Read(id);
+    }
+
+private:
+    std::mutex m_Lock;
+    BlobReader m_Reader;
+};
+
+} // namespace
+
+std::vector<SceneToCheck> NamedScenes(const std::vector<std::string>& files, const Repository* repository) {
+    const auto pathOf = [&](const std::string& file) -> std::string {
+        if (!repository || repository->top.empty() || file == "-") return "";
+        try {
+            return WorkingPath(*repository, file);
+        } catch (const Failure&) {
+            return ""; // it lies outside
+        }
+    };
+    std::vector<SceneToCheck> scenes;
+    for (const std::string& file : files)
+        scenes.push_back({file, pathOf(file), [file] { return ReadScene(file); }});
+    return scenes;
+}
+
+std::vector<SceneToCheck> StagedScenes(const Repository& repository) {
+    if (repository.kind != SystemKind::Git)
+        throw Failure("Only git has an index to check; \"ovrin check\" alone checks what was changed");
+    const Git git(repository);
+    const std::vector<std::string> changed = git.DifferingFromHead({}, true);
+    const std::set<std::string> isChanged(changed.begin(), changed.end());
+    const auto blobs = std::make_shared<SharedBlobs>(git.Setting());
+    std::vector<SceneToCheck> scenes;
+    for (const GitEntry& entry : git.Entries()) {
+        if (!entry.mode.starts_with("100") || !IsSceneName(entry.path) || !isChanged.contains(entry.path))
+            continue;
+        if (entry.stage == GitEntry::Merged)
+            scenes.push_back(
+                {entry.path, entry.path, [blobs, id = entry.object] { return blobs->Read(id); }});
+        else if (scenes.empty() || scenes.back().path != entry.path)
+            scenes.push_back({entry.path, entry.path, nullptr});
+    }
+    return scenes;
+}
+
+std::vector<SceneToCheck> AllScenes(const Repository& repository) {
+    switch (repository.kind) {
+    case SystemKind::Git: {
+        std::set<std::string> paths;
+        for (const GitEntry& entry : Git(repository).Entries()) paths.insert(entry.path);
+        return InWorkingTree(repository, paths);
+    }
+    case SystemKind::Mercurial:
+        return InWorkingTree(repository, AskMercurial(repository, {"hg", "files", "-0"}));
+    case SystemKind::Subversion:
+        RefuseSubversion();
+    }
+    return {};
+}
+
+std::vector<SceneToCheck> ChangedScenes(const Repository& repository) {
+    switch (repository.kind) {
+    case SystemKind::Git: {
+        const Git git(repository);
+        const std::vector<std::string> changed = git.DifferingFromHead({}, false), added = git.Untracked();
+        std::set<std::string> paths(changed.begin(), changed.end());
+        paths.insert(added.begin(), added.end());
+        return InWorkingTree(repository, paths);
+    }
+    case SystemKind::Mercurial:
+        return InWorkingTree(repository, AskMercurial(repository, {"hg", "status", "-0", "-n", "-mau"}));
+    case SystemKind::Subversion:
+        RefuseSubversion();
+    }
+    return {};
+}
+
+} // namespace ovrin

@@ -1,0 +1,182 @@
+// A merge as version control asks for it. The order of its steps loses nothing at any end of the process:
+//
+//  1. The inputs are read, one of which may be the result.
+//  2. Where nothing is open, a record of an earlier merge of the scene goes, and then the result comes.
+//  3. Where something is open, the record is written first, and then the result. Until the exit status,
+//     which leaves the scene unmerged whatever it is, only 0 would say otherwise; a record without its result
+//     is settled like any other.
+
+#include "Commands/FileMerge.h"
+
+#include "Conflicts/ConflictReport.h"
+#include "Conflicts/OpenMerges.h"
+#include "Conflicts/SceneMerge.h"
+#include "Conflicts/TakeSetting.h"
+#include "Names/PrintableText.h"
+#include "Scenes/SceneFile.h"
+#include "Systems/Caller.h"
+#include "Systems/Repository.h"
+#include "Words/Failure.h"
+#include "Words/ProgressLine.h"
+
+#include "Destination.h"
+#include "FileUtils.h"
+
+#include <cerrno>
+#include <filesystem>
+#include <iostream>
+#include <system_error>
+
+namespace ovrin {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr std::size_t kMostTold = 20; // conflicts of a scene
+
+std::string ReadSide(const char* side, const std::string& file) {
+    std::string text;
+    if (ReadWholeFile(file, text) != ReadResult::Complete)
+        throw Failure("cannot read " + std::string(side) + ", " + Printable(file) + ": " +
+                      std::system_category().message(errno));
+    return text;
+}
+
+/// A base may be empty: there is none, then.
+void CheckKind(const char* side, const std::string& text, bool mayBeEmpty) {
+    const SceneKind kind = ClassifyScene(text);
+    if (kind == SceneKind::Scene || (kind == SceneKind::Empty && mayBeEmpty)) return;
+    throw Failure(TellKind(side, kind));
+}
+
+ThreeTexts ReadTexts(const FileMerge& files) {
+    ThreeTexts texts = {ReadSide("base", files.base), ReadSide("ours", files.ours),
+                        ReadSide("theirs", files.theirs)};
+    CheckKind("ours", texts.ours, false);
+    CheckKind("theirs", texts.theirs, false);
+    CheckKind("base", texts.base, true);
+    return texts;
+}
+
+void DeliverResult(const std::string& file, const std::string& text) {
+    // Version control doesn't sync the files of a merge either, and would have to start again without them.
+    const Content content = {text.size(), [&](OutputStream& stream) { stream << text; },
+                             Durability::Unsynced};
+    if (const int error = Deliver(file, content))
+        throw Failure("cannot write the result, " + Printable(file) + ": " +
+                      std::system_category().message(error));
+}
+
+/// The repository that a scene belongs to. Its folder may not be there yet, in the midst of a merge.
+std::optional<Repository> RepositoryOf(const std::string& path) {
+    const fs::path folder = fs::path(path).parent_path();
+    std::error_code error;
+    return FindRepository(fs::is_directory(folder, error) ? folder.string() : ".");
+}
+
+/// From the top of the working tree.
+std::string PathInTree(const Repository& repository, const std::string& path) {
+    std::error_code error;
+    const fs::path absolute = fs::absolute(path, error);
+    const fs::path folder = fs::weakly_canonical(absolute.parent_path(), error);
+    return error ? path : (folder / absolute.filename()).lexically_relative(repository.top).string();
+}
+
+/// Where open merges of the scene are written down; nothing where no working tree is merged.
+struct Records {
+    explicit Records(const std::string& scenePath) : repository(RepositoryOf(scenePath)) {
+        if (repository && !repository->top.empty()) path = PathInTree(*repository, scenePath);
+    }
+
+    const std::optional<Repository> repository;
+    std::string path; ///< empty: nowhere
+};
+
+/// Most often no merge is open, and there is nothing to ask for.
+void ForgetEarlier(const Records& records) {
+    if (records.path.empty()) return;
+    OpenMerges merges(*records.repository);
+    if (merges.Has(records.path) && !IsWithoutTree(FindCaller())) merges.Remove(records.path);
+}
+
+/// The name of a file of its own for whoever stands elsewhere later.
+std::string Lasting(const std::string& file, const std::string& byDefault) {
+    if (file == byDefault) return {};
+    std::error_code error;
+    const fs::path absolute = fs::absolute(file, error);
+    return error ? file : absolute.string();
+}
+
+/// What is told of an open merge that can't be written down.
+std::string Record(const Records& records, const FileMerge& files, OpenMerge merge, const ThreeTexts& texts) {
+    if (records.path.empty()) return {};
+    try {
+        merge.path = records.path;
+        merge.texts = texts;
+        merge.rules = Lasting(files.format.rules, kDefaultRulesFile);
+        merge.typeInfo = Lasting(files.format.typeInfo, kDefaultTypeInfoFile);
+        OpenMerges(*records.repository).Add(merge);
+        return {};
+    } catch (const std::exception& error) {
+        return std::string("The merge could not be written down: ") + error.what() +
+               "\nNothing is lost: version control keeps all three versions until the file is settled.\n";
+    }
+}
+
+/// The merge as it is to be told and written down, without its texts.
+OpenMerge DescribeOpen(const FileMerge& files, const Records& records, const std::optional<Caller>& caller,
+                       SceneMerge& merge) {
+    OpenMerge open;
+    open.path = files.path;
+    open.occasion = FindOccasion(records.repository, caller, files.labels);
+    open.take = SideToTake(records.repository);
+    if (open.take != Side::Ours) merge.Merge({}, open.take);
+    open.isBothAdded = merge.IsBothAdded();
+    open.conflicts = merge.Open().size();
+    return open;
+}
+
+std::string TellOpen(SceneMerge& merge, const OpenMerge& open) {
+    std::string text = "ovrin: " + Printable(open.path) + ": " + CountOpen(open.conflicts);
+    if (open.conflicts) text += std::string(", where the file has ") + SideName(open.take) + " for now";
+    text += '\n';
+    if (open.isBothAdded)
+        text += "Both sides added the file, so that nothing tells what one of them removed: the file has all "
+                "that either has, and wants to be looked through.\n";
+    return text + TellSides(open.occasion) + TellConflicts(merge, SideLabels::Of(open.occasion), kMostTold);
+}
+
+constexpr const char* kNextStep =
+    "Next: \"ovrin settle --list\" shows what is open; \"ovrin settle --take theirs\" (or ours, or base), or "
+    "\"--set PATH=theirs\" for one conflict, settles it.\n";
+
+} // namespace
+
+Outcome Merge(const FileMerge& files) {
+    const ThreeTexts texts = ReadTexts(files);
+    SceneRules rules = ReadSceneRules(files.format);
+    ProgressLine progress(Printable(files.path));
+    SceneMerge merge(texts, std::move(rules.rules), std::move(rules.types),
+                     ovrin_yaml::Threads::WhereWorthwhile, &progress);
+    merge.Merge();
+    const Records records(files.path);
+    if (merge.Open().empty() && !merge.IsBothAdded()) {
+        const std::string result = merge.Result();
+        ForgetEarlier(records);
+        DeliverResult(files.result, result);
+        return Outcome::Done;
+    }
+    const std::optional<Caller> caller = FindCaller();
+    const bool isRecorded = !IsWithoutTree(caller);
+    const OpenMerge open = DescribeOpen(files, records, caller, merge);
+    const std::string result = merge.Result();
+    const std::string complaint = isRecorded ? Record(records, files, open, texts) : "";
+    DeliverResult(files.result, result);
+    const std::string told = TellOpen(merge, open) + complaint + (isRecorded ? kNextStep : "");
+    progress.Wipe();
+    std::cerr << told;
+    return Outcome::LeftOpen;
+}
+
+} // namespace ovrin

@@ -1,0 +1,179 @@
+#include "Commands/SettleCommand.h"
+
+#include "Commands/Output.h"
+#include "Conflicts/ConflictReport.h"
+#include "Names/PrintableText.h"
+#include "Settle/ExternalTool.h"
+#include "Settle/SceneWords.h"
+#include "Settle/SettleScenes.h"
+#include "Settle/Wanted.h"
+#include "Systems/WorkingPath.h"
+#include "Words/Failure.h"
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <iostream>
+#include <memory>
+#include <nlohmann/json.hpp>
+
+namespace ovrin {
+
+namespace {
+
+using nlohmann::json;
+
+struct SettleOptions {
+    std::vector<std::string> files;
+    std::vector<std::string> set;
+    std::string take, under, decisionFile;
+    bool isList = false, asJson = false, isUndo = false, isAsIs = false, isForget = false;
+    bool overwrites = false, withTool = false;
+};
+
+void Tell(const Remarks& remarks) {
+    for (const std::string& remark : remarks) std::cerr << "ovrin: " << remark << '\n';
+}
+
+Outcome List(const SettleScenes& scenes, bool asJson) {
+    std::string text;
+    json all = json::array();
+    bool isAnyOpen = false;
+    for (const auto& session : scenes.Sessions()) {
+        isAnyOpen = isAnyOpen || !session->IsSettled();
+        if (asJson)
+            all.push_back(ToJson(*session));
+        else
+            text += TellCount(SceneCount::Of(*session)) + "\n\n" + TellConflicts(*session) + '\n';
+    }
+    if (asJson) text = json{{"scenes", all}}.dump(2, ' ', false, json::error_handler_t::replace) + "\n";
+    PrintResult(text.empty() ? "No scene has open conflicts.\n" : text);
+    return isAnyOpen ? Outcome::LeftOpen : Outcome::Done;
+}
+
+/// Makes the steps that are asked for, all of them or none.
+void Decide(const SettleScenes& scenes, const SettleOptions& options) {
+    std::vector<Wanted> wanted;
+    for (const std::string& text : options.set) wanted.push_back(ParseWanted(text));
+    if (!wanted.empty()) DecideWanted(scenes.Sessions(), wanted);
+    if (!options.decisionFile.empty()) DecideByFile(scenes.Sessions(), options.decisionFile);
+    if (!options.take.empty()) TakeSide(scenes.Sessions(), SideNamed(options.take), options.under);
+    if (!options.isUndo) return;
+    std::size_t undone = 0;
+    for (const auto& session : scenes.Sessions()) undone += session->Undo() ? 1 : 0;
+    if (undone == 0) throw Failure("There is no decision to take back");
+}
+
+/// Tells of the sessions that stay, and of what is missing in those that go.
+bool TellOpen(const SettleScenes& scenes, bool wasDecided) {
+    bool isAnyOpen = false;
+    for (const auto& session : scenes.Sessions()) {
+        Tell(TellMissing(*session));
+        if (session->IsSettled()) continue;
+        isAnyOpen = true;
+        std::cerr << TellCount(SceneCount::Of(*session)) << '\n';
+        if (session->Open().empty())
+            std::cerr << "Both sides added the scene: look through the union of the two, and take it with "
+                         "\"ovrin settle --take ours\" or, changed by you, with \"ovrin settle --as-is\".\n";
+    }
+    if (isAnyOpen)
+        std::cerr << (wasDecided ? "The decisions are kept. " : "")
+                  << "\"ovrin settle --list\" shows what is open.\n";
+    return isAnyOpen;
+}
+
+Outcome Settle(SettleScenes& scenes, const SettleOptions& options, bool isAnyUnreadable) {
+    Decide(scenes, options);
+    const bool wasDecided =
+        !options.set.empty() || !options.decisionFile.empty() || !options.take.empty() || options.isUndo;
+    if (wasDecided)
+        for (const auto& session : scenes.Sessions()) scenes.Keep(*session);
+    const bool isAnyOpen = TellOpen(scenes, wasDecided);
+    Remarks refused;
+    const std::vector<std::string> finished = scenes.Finish(options.overwrites, refused);
+    for (const std::string& path : finished) std::cerr << Printable(path) << " is settled.\n";
+    Tell(refused);
+    if (finished.empty() && !isAnyOpen && refused.empty() && !isAnyUnreadable)
+        std::cerr << "No scene has open conflicts.\n";
+    if (!finished.empty())
+        for (const std::string& step : NextSteps(scenes.Where(), "")) std::cerr << step << '\n';
+    return isAnyOpen || isAnyUnreadable || !refused.empty() ? Outcome::LeftOpen : Outcome::Done;
+}
+
+/// Takes files as they stand, or forgets that they had conflicts.
+Outcome SetAside(SettleScenes& scenes, const SettleOptions& options) {
+    if (options.files.empty())
+        throw Failure(std::string(options.isAsIs ? "--as-is" : "--forget") +
+                      " wants the files that are meant");
+    const std::vector<std::string> paths = scenes.Paths();
+    if (options.isAsIs)
+        scenes.TakeAsTheyStand();
+    else
+        scenes.Forget();
+    for (const std::string& path : paths)
+        std::cerr << Printable(path)
+                  << (options.isAsIs ? " is settled as it stands.\n" : " is forgotten, and is as it was.\n");
+    for (const std::string& step : NextSteps(scenes.Where(), "")) std::cerr << step << '\n';
+    return Outcome::Done;
+}
+
+Outcome RunTool(const std::vector<std::string>& files) {
+    if (files.size() != 4) throw Failure("--with-tool wants four files: BASE OURS THEIRS RESULT");
+    MergeWithTool({files[0], files[1], files[2], files[3]});
+    ForgetSettledFile(files[3]);
+    return Outcome::Done;
+}
+
+Outcome RunSettle(const SettleOptions& options) {
+    if (options.withTool) return RunTool(options.files);
+    Remarks remarks;
+    SettleScenes scenes(remarks);
+    Tell(remarks);
+    scenes.LimitTo(options.files);
+    if (options.isAsIs || options.isForget) return SetAside(scenes, options);
+    Remarks unreadable;
+    const bool isAnyUnreadable = scenes.Open(unreadable) > 0;
+    Tell(unreadable);
+    if (options.isList) return List(scenes, options.asJson);
+    return Settle(scenes, options, isAnyUnreadable);
+}
+
+void DescribeDecisions(CLI::App& command, SettleOptions& options) {
+    command
+        .add_option(
+            "--set", options.set,
+            "take a side at a conflict: PATH=ours, PATH=theirs or PATH=base, where PATH is what --list "
+            "shows, a pattern with * for any one element, or the name of the object and the property")
+        ->type_name("PATH=SIDE")
+        ->allow_extra_args(false);
+    auto* take = command.add_option("--take", options.take, "take a side at all open conflicts")
+                     ->check(CLI::IsMember({"ours", "theirs", "base"}))
+                     ->type_name("SIDE");
+    command.add_option("--under", options.under, "only at those of this object and what stands under it")
+        ->needs(take)
+        ->type_name("NAME");
+    command
+        .add_option("-i,--decisions", options.decisionFile,
+                    "make the decisions of a file, in the form that OvrinMerge reads")
+        ->type_name("FILE");
+    command.add_flag("--undo", options.isUndo, "take the last decisions back");
+}
+
+} // namespace
+
+Action DescribeSettle(CLI::App& command) {
+    const auto options = std::make_shared<SettleOptions>();
+    DescribeDecisions(command, *options);
+    auto* list = command.add_flag("--list", options->isList, "show the conflicts, and decide nothing");
+    command.add_flag("--json", options->asJson, "in a form for programs")->needs(list);
+    auto* asIs = command.add_flag("--as-is", options->isAsIs, "take the files as they stand");
+    command.add_flag("--forget", options->isForget, "forget the conflicts of the files, and touch nothing")
+        ->excludes(asIs);
+    command.add_flag("--overwrite", options->overwrites,
+                     "put the settled scene in the place of a file that was changed by hand");
+    command.add_flag("--with-tool", options->withTool,
+                     "let the external merge tool settle BASE OURS THEIRS RESULT, as git mergetool calls it");
+    command.add_option("FILE", options->files, "only these scenes, or those in these folders");
+    return [options] { return RunSettle(*options); };
+}
+
+} // namespace ovrin

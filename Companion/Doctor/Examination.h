@@ -1,0 +1,23 @@
+#pragma once
+
+#include "Doctor/Finding.h"
+
+#include <string>
+#include <vector>
+
+namespace ovrin {
+
+/// A check and what it found.
+struct Result {
+    const char* code; ///< stable, for scripts: "git-driver"
+    Finding finding;
+};
+
+/// Looks at everything, in a fixed order. With `fix` what can be put right safely is, and then looked at once
+/// more.
+std::vector<Result> Examine(bool fix);
+
+/// The stable word for a state: "ok", "note", "problem", "fixed", "skipped", "unknown".
+const char* HealthName(Health health);
+
+} // namespace ovrin

@@ -1,0 +1,95 @@
+#include "Settle/ExternalTool.h"
+
+#include "Destination.h"
+#include "FileUtils.h"
+#include "Names/PrintableText.h"
+#include "Systems/ChildProcess.h"
+#include "Words/Failure.h"
+
+#include <cerrno>
+#include <cstdlib>
+#include <filesystem>
+#include <system_error>
+#include <unistd.h>
+
+namespace ovrin {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+/// A folder that goes with the object.
+class ScratchFolder {
+public:
+    ScratchFolder() {
+        std::error_code error;
+        const fs::path place = fs::temp_directory_path(error);
+        m_Path = (error ? fs::path("/tmp") : place) / "ovrin-XXXXXX";
+        if (!mkdtemp(m_Path.data()))
+            throw Failure("Cannot make a temporary folder " + m_Path + ": " +
+                          std::system_category().message(errno));
+    }
+    ScratchFolder(const ScratchFolder&) = delete;
+    ScratchFolder& operator=(const ScratchFolder&) = delete;
+    ~ScratchFolder() {
+        std::error_code ignored;
+        fs::remove_all(m_Path, ignored);
+    }
+
+    std::string File(const char* name) const { return m_Path + "/" + name; }
+
+private:
+    std::string m_Path;
+};
+
+std::string Read(const std::string& file) {
+    std::string bytes;
+    if (ReadWholeFile(file, bytes) != ReadResult::Complete)
+        throw Failure(Printable(file) + " can't be read: " + std::system_category().message(errno));
+    return bytes;
+}
+
+void Write(const std::string& file, const std::string& bytes, Durability durability) {
+    const Content content{bytes.size(), [&](OutputStream& stream) { stream << bytes; }, durability};
+    if (const int error = Deliver(file, content))
+        throw Failure(Printable(file) + " can't be written: " + std::system_category().message(error));
+}
+
+/// The file, or one that stands for it where it is missing or empty: a scene without objects, with the header
+/// of `other`.
+std::string ObjectsOf(const std::string& file, const std::string& other, const ScratchFolder& scratch) {
+    if (!IsMissing(file) && !IsFileEmpty(file)) return file;
+    const std::string text = Read(other);
+    const std::size_t begin = text.starts_with("--- ") ? 0 : text.find("\n--- ");
+    const std::string standIn = scratch.File("none");
+    Write(standIn, begin == 0 ? "" : text.substr(0, begin == std::string::npos ? begin : begin + 1),
+          Durability::Unsynced);
+    return standIn;
+}
+
+} // namespace
+
+void MergeWithTool(const ToolFiles& files) {
+    const ScratchFolder scratch;
+    const std::string result = scratch.File("result");
+    // A path that looks like an option is none to a program that gets it from here.
+    const auto plain = [](const std::string& path) { return path.starts_with('-') ? "./" + path : path; };
+    const CommandWords command = {GetDataFilesDir() + "OvrinMerge",
+                                  "merge",
+                                  "-p",
+                                  "--force",
+                                  plain(ObjectsOf(files.base, files.theirs, scratch)),
+                                  plain(files.theirs),
+                                  plain(files.ours),
+                                  result,
+                                  scratch.File("base"),
+                                  scratch.File("ours")};
+    const int status =
+        WaitForProcess(StartProcess(command, {}, {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}));
+    // A tool that fails ends with status 0 too, and no result.
+    if (status != 0 || IsMissing(result) || IsFileEmpty(result))
+        throw Failure("The merge tool has left no result, and " + Printable(files.result) + " is as it was");
+    Write(files.result, Read(result), Durability::Synced);
+}
+
+} // namespace ovrin

@@ -1,0 +1,201 @@
+#include "Settle/SettleScenes.h"
+
+#include "Conflicts/IndexMerges.h"
+#include "Destination.h"
+#include "FileUtils.h"
+#include "Names/PrintableText.h"
+#include "Scenes/SceneFile.h"
+#include "Systems/Git.h"
+#include "Systems/UnmergedFiles.h"
+#include "Systems/WorkingPath.h"
+#include "Words/Failure.h"
+
+#include <algorithm>
+#include <filesystem>
+#include <system_error>
+
+namespace ovrin {
+
+namespace {
+
+Repository RepositoryHere() {
+    const std::optional<Repository> found = FindRepository();
+    if (!found || found->top.empty())
+        throw Failure("There is no working tree of git, Mercurial or Subversion here: change to one");
+    return *found;
+}
+
+/// The bytes of a regular file; nothing where it isn't one or can't be read.
+std::optional<std::string> BytesOf(const std::string& file) {
+    std::error_code error;
+    if (std::filesystem::symlink_status(file, error).type() != std::filesystem::file_type::regular) return {};
+    std::string bytes;
+    if (ReadWholeFile(file, bytes) != ReadResult::Complete) return {};
+    return bytes;
+}
+
+void DeliverScene(const std::string& file, const std::string& bytes) {
+    const Content content{bytes.size(), [&](OutputStream& stream) { stream << bytes; }, Durability::Synced};
+    if (const int error = Deliver(file, content))
+        throw Failure("The settled scene can't be written to " + Printable(file) + ": " +
+                      std::system_category().message(error) +
+                      "; the decisions are kept: make room, and run \"ovrin settle\" again");
+}
+
+std::string TellByHand(const std::string& path) {
+    return Printable(path) + " was changed by hand since it was merged, and stays as it is: \"ovrin settle "
+                             "--as-is\" takes the file "
+                             "as it stands, \"ovrin settle --overwrite\" puts the settled scene in its place";
+}
+
+} // namespace
+
+SettleScenes::SettleScenes(Remarks& remarks)
+    : m_Repository(RepositoryHere()), m_Store(m_Repository), m_Live(FindLiveMerges(m_Repository, m_Store)) {
+    for (const OpenMerge& merge : m_Live.stale) {
+        m_Store.Remove(merge.path);
+        remarks.push_back(Printable(merge.path) +
+                          " is forgotten: its merge was committed, given up or made again without ovrin");
+    }
+    m_Live.stale.clear();
+}
+
+void SettleScenes::LimitTo(std::span<const std::string> places) {
+    if (places.empty()) return;
+    std::vector<std::string> meant;
+    const std::vector<std::string> all = Paths();
+    for (const std::string& given : places) {
+        const std::string place = WorkingPath(m_Repository, given);
+        const std::size_t before = meant.size();
+        for (const std::string& path : all)
+            if (IsAtOrBelow(path, place)) meant.push_back(path);
+        if (meant.size() == before)
+            throw Failure("No scene with open conflicts is at " + Printable(given) +
+                          ": \"ovrin status\" lists them");
+    }
+    const auto isMeant = [&](const std::string& path) {
+        return std::ranges::find(meant, path) != meant.end();
+    };
+    std::erase_if(m_Live.live, [&](const OpenMerge& merge) { return !isMeant(merge.path); });
+    std::erase_if(m_Live.unrecorded, [&](const std::string& path) { return !isMeant(path); });
+}
+
+std::vector<std::string> SettleScenes::Paths() const {
+    std::vector<std::string> paths = m_Live.unrecorded;
+    for (const OpenMerge& merge : m_Live.live) paths.push_back(merge.path);
+    std::ranges::sort(paths);
+    return paths;
+}
+
+SceneCount SettleScenes::CountUnrecorded(IndexMerges& index, const std::string& path) const {
+    Remarks none;
+    try {
+        return SceneCount::Of(*Load(index, path, none));
+    } catch (const Failure& failure) {
+        return {.path = path, .problem = failure.what()};
+    }
+}
+
+std::vector<SceneCount> SettleScenes::Count() const {
+    std::vector<SceneCount> counts;
+    for (const OpenMerge& merge : m_Live.live)
+        counts.push_back(SceneCount::Of(merge, m_Store.ProgressOf(merge)));
+    IndexMerges index(m_Repository);
+    for (const std::string& path : m_Live.unrecorded) counts.push_back(CountUnrecorded(index, path));
+    std::ranges::sort(counts, {}, &SceneCount::path);
+    return counts;
+}
+
+bool SettleScenes::IsRecorded(const std::string& path) const {
+    return std::ranges::binary_search(m_Live.live, path, {}, &OpenMerge::path);
+}
+
+std::unique_ptr<SettleSession> SettleScenes::Load(IndexMerges& index, const std::string& path,
+                                                  Remarks& remarks) const {
+    std::optional<OpenMerge> merge = IsRecorded(path) ? m_Store.Find(path) : std::nullopt;
+    if (merge && !index.Confirm(*merge)) {
+        remarks.push_back(Printable(path) + " was merged again without ovrin: earlier decisions don't count");
+        merge.reset();
+    }
+    if (!merge) return std::make_unique<SettleSession>(index.Read(path));
+    Progress progress = m_Store.ProgressOf(*merge);
+    return std::make_unique<SettleSession>(std::move(*merge), std::move(progress));
+}
+
+std::size_t SettleScenes::Open(Remarks& remarks) {
+    IndexMerges index(m_Repository);
+    std::size_t failed = 0;
+    for (const std::string& path : Paths()) {
+        try {
+            m_Sessions.push_back(Load(index, path, remarks));
+        } catch (const Failure& failure) {
+            remarks.push_back(Printable(path) + " can't be settled by objects: " + failure.what() +
+                              "; once you have settled it in another way: \"ovrin settle --as-is\"");
+            ++failed;
+        }
+    }
+    return failed;
+}
+
+bool SettleScenes::Holds(const std::string& path, const std::string& file, const std::string& bytes) const {
+    if (file == bytes) return true;
+    // Where git converts line ends the file has other bytes than the versions that were merged.
+    return m_Repository.kind == SystemKind::Git && Git(m_Repository).StoresAs(path, bytes);
+}
+
+bool SettleScenes::IsUntouched(SettleSession& session, const std::string& result) const {
+    const OpenMerge& merge = session.Source();
+    const std::optional<std::string> file = BytesOf(FileOf(merge.path));
+    if (!file) return false;
+    // Ours is what a program that can't merge a file leaves; it is safe with version control.
+    return Holds(merge.path, *file, result) || Holds(merge.path, *file, session.Left()) ||
+           Holds(merge.path, *file, merge.texts.ours);
+}
+
+std::vector<std::string> SettleScenes::Finish(bool overwrite, Remarks& remarks) {
+    std::vector<std::string> finished;
+    for (const auto& session : m_Sessions) {
+        if (!session->IsSettled()) continue;
+        const std::string& path = session->Source().path;
+        const std::string result = session->Result();
+        if (!overwrite && !IsUntouched(*session, result)) {
+            remarks.push_back(TellByHand(path));
+            continue;
+        }
+        DeliverScene(FileOf(path), result);
+        finished.push_back(path);
+    }
+    Conclude(finished);
+    return finished;
+}
+
+void SettleScenes::Conclude(const std::vector<std::string>& paths) {
+    if (!paths.empty()) MarkMerged(m_Repository, paths);
+    for (const std::string& path : paths) m_Store.Remove(path);
+}
+
+void SettleScenes::TakeAsTheyStand() {
+    const std::vector<std::string> paths = Paths();
+    for (const std::string& path : paths) {
+        const std::optional<std::string> bytes = BytesOf(FileOf(path));
+        if (!bytes)
+            throw Failure(Printable(path) + " can't be taken as it stands: it is no file that can be read");
+        if (ClassifyScene(*bytes) == SceneKind::Markers)
+            throw Failure(Printable(path) + " can't be taken as it stands: it holds conflict markers");
+    }
+    Conclude(paths);
+}
+
+void SettleScenes::Forget() {
+    for (const OpenMerge& merge : m_Live.live) m_Store.Remove(merge.path);
+}
+
+void ForgetSettledFile(const std::string& given) {
+    const std::optional<Repository> repository = FindRepository();
+    if (!repository || repository->top.empty()) return;
+    const std::string file = std::filesystem::weakly_canonical(given).string();
+    if (!file.starts_with(repository->top + "/")) return;
+    OpenMerges(*repository).Remove(WorkingPath(*repository, given));
+}
+
+} // namespace ovrin

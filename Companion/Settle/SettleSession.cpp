@@ -1,0 +1,153 @@
+#include "Settle/SettleSession.h"
+
+#include "Conflicts/DecisionPath.h"
+#include "Conflicts/OpenMerges.h"
+#include "Scenes/SceneRules.h"
+
+#include <algorithm>
+#include <set>
+#include <utility>
+
+namespace ovrin {
+
+using namespace ovrin_yaml;
+
+namespace {
+
+SceneMerge MergeOf(const OpenMerge& merge) {
+    FormatFiles files;
+    if (!merge.rules.empty()) files.rules = merge.rules;
+    if (!merge.typeInfo.empty()) files.typeInfo = merge.typeInfo;
+    SceneRules rules = ReadSceneRules(files);
+    return SceneMerge(merge.texts, std::move(rules.rules), std::move(rules.types));
+}
+
+/// The sides of `decisions` as a table of which the last one that matches counts.
+ResolveTable TableOf(const std::vector<Decision>& decisions) {
+    constexpr MergeResolve kResolves[] = {ResolveBase, ResolveRight, ResolveLeft};
+    std::vector<RecordResolve> resolves;
+    for (auto decision = decisions.rbegin(); decision != decisions.rend(); ++decision)
+        resolves.push_back(
+            {PathOfDecision(decision->path), kResolves[static_cast<std::size_t>(decision->side)]});
+    ResolveTable table;
+    table.Set(resolves);
+    return table;
+}
+
+std::optional<Side> SideOf(std::optional<MergeResolve> resolve) {
+    if (!resolve) return {};
+    return *resolve == ResolveBase ? Side::Base : *resolve == ResolveRight ? Side::Ours : Side::Theirs;
+}
+
+} // namespace
+
+SettleSession::SettleSession(OpenMerge merge, Progress progress)
+    : m_Source(std::move(merge)), m_Merge(MergeOf(m_Source)), m_Names(m_Merge.Session()),
+      m_Decisions(std::move(progress.decisions)), m_Steps(std::move(progress.steps)) {
+    MergeBy({});
+    if (m_Source.identity.empty()) m_Source.conflicts = Open().size();
+    if (!m_Decisions.empty()) MergeBy(m_Decisions);
+}
+
+void SettleSession::MergeBy(const std::vector<Decision>& decisions) {
+    // The engine goes by the first decision that matches.
+    m_Merge.Merge(std::vector<Decision>(decisions.rbegin(), decisions.rend()), m_Source.take);
+    for (const OpenConflict& conflict : Open())
+        m_Conflicts.try_emplace(DecisionPath(conflict.path), conflict);
+}
+
+std::vector<SettleSession::Met> SettleSession::Conflicts() const {
+    std::set<Path> open;
+    for (const OpenConflict& conflict : Open()) open.insert(conflict.path);
+    const ResolveTable decided = TableOf(m_Decisions);
+    std::vector<MergeNames::ID> ids;
+    for (const auto& [path, conflict] : m_Conflicts) ids.push_back(conflict.path.front());
+    const std::vector<std::uint32_t> ranks = m_Names.Ranks(ids);
+    std::vector<std::pair<std::uint32_t, Met>> ranked;
+    for (const auto& [path, conflict] : m_Conflicts) {
+        const bool isOpen = open.contains(conflict.path);
+        const auto side = isOpen ? std::nullopt : SideOf(decided.Find(conflict.path));
+        ranked.push_back({ranks[ranked.size()], {conflict, isOpen, side}});
+    }
+    std::ranges::stable_sort(ranked, {}, &std::pair<std::uint32_t, Met>::first);
+    std::vector<Met> conflicts;
+    for (auto& [rank, conflict] : ranked) conflicts.push_back(std::move(conflict));
+    return conflicts;
+}
+
+bool SettleSession::Touches(const std::string& path) {
+    const ResolveTable table = TableOf({{path, Side::Ours}});
+    return std::ranges::any_of(
+        m_Merge.Session().Resolver().Records(),
+        [&](const MergeSession::Record& record) { return table.Find(record.path.Elements()).has_value(); });
+}
+
+/// What `step` returns. If it throws, the decisions and the merge are as before.
+template <class Step> auto SettleSession::OrBack(const Step& step) {
+    const std::vector<Decision> decisions = m_Decisions;
+    const std::vector<std::size_t> steps = m_Steps;
+    try {
+        return step();
+    } catch (...) {
+        m_Decisions = decisions;
+        m_Steps = steps;
+        MergeBy(m_Decisions);
+        throw;
+    }
+}
+
+std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisions) {
+    return OrBack([&] {
+        m_Decisions.insert(m_Decisions.end(), decisions.begin(), decisions.end());
+        m_Steps.push_back(decisions.size());
+        MergeBy(m_Decisions);
+        std::vector<Decision> unmatched;
+        for (const Decision& lost : m_Merge.Unmatched())
+            if (std::ranges::find(decisions, lost.path, &Decision::path) != decisions.end())
+                unmatched.push_back(lost);
+        if (!unmatched.empty()) Undo();
+        return unmatched;
+    });
+}
+
+std::size_t SettleSession::TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant) {
+    return OrBack([&] {
+        std::set<Path> tried;
+        const std::size_t before = m_Decisions.size();
+        for (;;) {
+            std::vector<Decision> round;
+            for (const OpenConflict& conflict : Open())
+                if (isMeant(conflict) && tried.insert(conflict.path).second)
+                    round.push_back({DecisionPath(conflict.path), side});
+            if (round.empty()) break;
+            m_Decisions.insert(m_Decisions.end(), round.begin(), round.end());
+            MergeBy(m_Decisions);
+        }
+        m_Steps.push_back(m_Decisions.size() - before);
+        std::size_t settled = tried.size();
+        for (const OpenConflict& conflict : Open()) settled -= tried.count(conflict.path);
+        return settled;
+    });
+}
+
+bool SettleSession::Undo() {
+    if (m_Steps.empty()) return false;
+    m_Decisions.resize(m_Decisions.size() - m_Steps.back());
+    m_Steps.pop_back();
+    MergeBy(m_Decisions);
+    return true;
+}
+
+void SettleSession::Keep(OpenMerges& store) {
+    if (m_Source.identity.empty()) store.Add(m_Source);
+    store.SetProgress(m_Source, {m_Decisions, Open().size(), m_Steps});
+}
+
+std::string SettleSession::Left() {
+    MergeBy({});
+    std::string left = m_Merge.Result();
+    MergeBy(m_Decisions);
+    return left;
+}
+
+} // namespace ovrin

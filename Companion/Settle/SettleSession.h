@@ -1,0 +1,83 @@
+#pragma once
+
+#include "Conflicts/OpenMerge.h"
+#include "Conflicts/SceneMerge.h"
+#include "Names/MergeNames.h"
+
+#include <cstddef>
+#include <functional>
+#include <map>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace ovrin {
+
+class OpenMerges;
+
+/// A scene's open merge while a person settles it: the three texts, all conflicts that were met, the
+/// decisions so far, and what follows from them. It is what every way to settle is built on, and keeps
+/// nothing on the disk by itself:
+///
+///     SettleSession session(merge, store.ProgressOf(merge));
+///     session.Decide({{"734813.MonoBehaviour.m_Brightness", Side::Theirs}});
+///     store.SetProgress(session.Source(), session.GetProgress());
+///
+/// After each step the scene is merged again; it is read and compared once. A later decision counts more than
+/// an earlier one. All functions throw Failure, worded for people, for texts that can't be merged, and leave
+/// the session as it was then. It belongs to one thread at a time.
+class SettleSession {
+public:
+    /// `merge` comes with its texts.
+    explicit SettleSession(OpenMerge merge, Progress progress = {});
+
+    const OpenMerge& Source() const { return m_Source; }
+    const std::vector<Decision>& Decisions() const { return m_Decisions; }
+    /// Nothing is open, and a scene that both sides added was looked through, which a step shows.
+    bool IsSettled() const { return Open().empty() && !(m_Merge.IsBothAdded() && m_Steps.empty()); }
+
+    struct Met {
+        OpenConflict conflict;
+        bool isOpen;
+        std::optional<Side> decided; ///< by the decision that counts there, of a settled one
+    };
+    /// The conflicts of the merge as it began and those that decisions led to, in the order of the hierarchy.
+    std::vector<Met> Conflicts() const;
+    std::size_t CountMet() const { return m_Conflicts.size(); }
+    const std::vector<OpenConflict>& Open() const { return m_Merge.Open(); }
+    /// Whether a path or pattern matches anything that either side changed, as far as the decisions let that
+    /// through.
+    bool Touches(const std::string& path);
+
+    /// Makes these decisions, as one step. Returns those that match nothing; if there are any, nothing is
+    /// decided.
+    std::vector<Decision> Decide(const std::vector<Decision>& decisions);
+    /// Decides all open conflicts that `isMeant` accepts, and those of them that follow, for a side, as one
+    /// step. What can't be settled by a side stays open. Returns how many conflicts were settled.
+    std::size_t TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant);
+    /// Takes the last step back. False if there is none.
+    bool Undo();
+
+    /// Writes the decisions down, and the merge itself if nobody has.
+    void Keep(OpenMerges& store);
+
+    /// The scene as it is merged by the decisions.
+    std::string Result() const { return m_Merge.Result(); }
+    /// The scene as the merge left it before anything was decided.
+    std::string Left();
+    SceneMerge& Merge() { return m_Merge; }
+    const MergeNames& Names() const { return m_Names; }
+
+private:
+    void MergeBy(const std::vector<Decision>& decisions);
+    template <class Step> auto OrBack(const Step& step);
+
+    OpenMerge m_Source;
+    SceneMerge m_Merge;
+    MergeNames m_Names;
+    std::vector<Decision> m_Decisions;
+    std::vector<std::size_t> m_Steps;                // how many decisions each made
+    std::map<std::string, OpenConflict> m_Conflicts; // by the texts of their paths
+};
+
+} // namespace ovrin
