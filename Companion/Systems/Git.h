@@ -33,9 +33,6 @@ public:
     /// The same with these variables in its environment, in place of others of their names.
     Git With(const std::vector<std::pair<std::string, std::string>>& variables) const;
 
-    /// How git is started for the repository: for programs of it that are talked with for longer.
-    ProcessSetting Setting() const { return {.folder = m_Folder, .environment = m_Environment}; }
-
     /// What a process of git is to be started with, to work here.
     ProcessSetting Setting(std::string input = {}) const;
     ProcessResult Run(CommandWords arguments, std::string input = {}) const;
