@@ -117,7 +117,7 @@ void LookInto(PreviewedScene& scene, const ThreeTexts& texts, const PreviewAnswe
         CheckScenes(scene, texts, question);
         SceneMerge merge(texts, rules.rules, rules.types, threads);
         merge.Merge();
-        if (merge.Open().empty() && !merge.HasBrokenDependencies()) return;
+        if (merge.Open().empty()) return;
         scene.verdict = Verdict::Conflicts;
         scene.conflicts = ConflictsToJson(merge).at("conflicts");
         scene.report =

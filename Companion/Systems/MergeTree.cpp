@@ -79,8 +79,8 @@ public:
         for (auto& [path, file] : m_Files) {
             file.path = path;
             std::ranges::sort(file.conflicts);
-            const auto repeated = std::ranges::unique(file.conflicts);
-            file.conflicts.erase(repeated.begin(), repeated.end());
+            file.conflicts.erase(std::unique(file.conflicts.begin(), file.conflicts.end()),
+                                 file.conflicts.end());
             list.push_back(std::move(file));
         }
         return list;
