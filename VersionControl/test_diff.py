@@ -78,11 +78,11 @@ def test_git_new_deleted_and_renamed_scenes(git):
     git.run("git", "mv", "old.ovrin", "new.ovrin")
     git.write(scene("1 Lamp 1 5 6"), "new.ovrin")
     git.run("git", "rm", "-q", "gone.ovrin")
-    git.write(HEADER + game_object(7, 1, "Other", 1), "added.ovrin")
+    git.write(HEADER + "".join(game_object(number, 7, "Other", 1) for number in range(70, 90)), "added.ovrin")
     git.write("other text\n", "notes.txt")
     git.run("git", "add", "--all")
     expected = {"new.ovrin": ("renamed", 0, 0, 1), "gone.ovrin": ("removed", 0, 1, 0),
-                "added.ovrin": ("added", 1, 0, 0), "notes.txt": ("changed", None, None, None)}
+                "added.ovrin": ("added", 20, 0, 0), "notes.txt": ("changed", None, None, None)}
     assert as_json(git, "HEAD") == as_json(git, "--staged") == expected
     told = diff(git, "HEAD")
     assert "new.ovrin, renamed from old.ovrin\n" in told and "+other text\n" in told

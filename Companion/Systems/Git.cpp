@@ -23,7 +23,7 @@ GitEntry ParseEntry(const std::string& field) {
 
 std::vector<GitEntry> ParseEntries(std::string_view listing) {
     std::vector<GitEntry> entries;
-    for (const std::string& field : Fields(listing)) entries.push_back(ParseEntry(field));
+    for (const std::string& field : ZeroEndedTexts(listing)) entries.push_back(ParseEntry(field));
     return entries;
 }
 
