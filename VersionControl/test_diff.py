@@ -125,7 +125,9 @@ def test_git_unmerged_scenes_are_told(git):
     git.run("git", "checkout", "-q", "main")
     git.commit(scene("3 Lantern 1"), "a.ovrin")
     git.run("git", "merge", "theirs", fails=True)
-    assert diff(git) == "a.ovrin, not merged yet: \"ovrin status\" tells what is open\n\n" == git.run("git", "diff")
+    told = "a.ovrin, not merged yet: \"ovrin status\" tells what is open\n"
+    assert diff(git) == told + "\n" and told in git.run("git", "diff", "--cached")
+    assert as_json(git) == {"a.ovrin": ("unmerged", None, None, None)}
 
 
 def test_git_unreadable_scenes_are_shown_by_lines(git):
@@ -153,7 +155,7 @@ def test_git_bare_repositories_and_folders(git):
 def test_git_what_matches_nothing_is_told(git):
     git.commit(scene("1 Lantern 1"), "main.ovrin")
     git.write("a branch's name", "main")
-    for words in (["nowhere"], ["--", "nowhere"], ["main", "nowhere"], ["main"], ["--unknown"]):
+    for words in (["nowhere"], ["--", "nowhere"], ["HEAD", "nowhere"], ["main"], ["--unknown"]):
         diff(git, *words, fails=True)
         assert words[-1] in words_on_errors(git)
     git.run("git", "add", "main")
