@@ -12,13 +12,17 @@ from test_systems import HEADER, ONE_CONFLICT, scene
 BROKEN = HEADER + "--- !o!9 &1\nNote:\n  m_Link: {fileID: 7}\n"
 
 
-@pytest.fixture(name="user")
-def fixture_user(request):
+@pytest.fixture(name="stranger")
+def fixture_stranger(request):
     installed = pathlib.Path(request.config.getoption("--installed")).resolve()
     with tempfile.TemporaryDirectory() as folder:
-        user = Git(installed, pathlib.Path(folder))
-        user.start()
-        yield user
+        yield Git(installed, pathlib.Path(folder))
+
+
+@pytest.fixture(name="user")
+def fixture_user(stranger):
+    stranger.start()
+    return stranger
 
 
 def check(user, *options, status):
@@ -60,14 +64,19 @@ def test_new_and_changed_scenes_are_looked_at_without_arguments(user):
     assert check(user, "--all", status=0) == []
 
 
-def test_open_conflict_is_a_finding_until_it_is_settled(user):
-    user.sides(*ONE_CONFLICT)
-    user.merge(fails=True)
-    assert ("open-conflict" in [code for _, code in check(user, status=1)])
-    assert ("open-conflict" in [code for _, code in check(user, "--staged", status=1)])
-    user.run("git", "checkout", "--ours", "--", user.name)
-    user.run("git", "merge", "--abort")
-    assert check(user, status=0) == []
+def test_open_conflict_is_a_finding_until_it_is_settled(stranger):
+    stranger.sides(*ONE_CONFLICT)
+    stranger.merge(fails=True)
+    for options in ([], ["--staged"], [stranger.name]):
+        assert (stranger.name, "open-conflict") in check(stranger, *options, status=1)
+    stranger.abort()
+    assert check(stranger, status=0) == []
+
+
+def test_without_a_working_tree_scenes_must_be_named(stranger):
+    stranger.write(BROKEN)
+    check(stranger, status=2)
+    assert check(stranger, stranger.name, status=1) == [(stranger.name, "dangling-reference")]
 
 
 def test_what_cannot_be_checked_fails_and_the_rest_is_told(user):
