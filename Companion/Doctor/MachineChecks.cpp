@@ -89,7 +89,7 @@ Finding LookAtSubversion(Patient& patient) {
     if (tool.ends_with("ovrinmerge-vcs"))
         return {Health::Problem, path + " names " + tool + ", which is of an earlier version",
                 "ovrin setup svn", FixBySetup("svn", Scope::Global)};
-    if (!tool.ends_with("-svn"))
+    if (!IsOurToolOfSubversion(tool))
         return {patient.IsIn(SystemKind::Subversion) ? Health::Problem : Health::Note,
                 path + " has another merge tool: " + tool,
                 "take its merge-tool-cmd out, then \"ovrin setup svn\""};

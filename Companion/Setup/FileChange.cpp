@@ -134,14 +134,6 @@ std::string ForeignLines(const Configuration& configuration, const MarkedBlock& 
     return ForeignLines(block.lines, configuration.lines);
 }
 
-std::optional<MarkedBlock> BlockOf(const Configuration& configuration, const std::string& text) {
-    try {
-        return FindBlock(text);
-    } catch (const Failure& failure) {
-        throw Failure(configuration.path + ": " + failure.what());
-    }
-}
-
 void MakeFolders(const FileChange& change) {
     std::error_code error;
     fs::create_directories(fs::path(change.path).parent_path(), error);
@@ -175,7 +167,7 @@ FileChange PlanLines(const Configuration& configuration) {
     const auto text = TextOf(configuration.path);
     if (!text) return PlanNewFile(configuration);
     const FirstMark mark = MarkOf(configuration.kind);
-    const auto block = BlockOf(configuration, *text);
+    const auto block = FindBlock(*text, configuration.path);
     if (!block) {
         const bool isScript = configuration.kind == FileKind::Script;
         const std::size_t place = isScript ? PlaceInScript(configuration.path, *text) : text->size();
@@ -193,7 +185,7 @@ FileChange PlanLines(const Configuration& configuration) {
 
 FileChange PlanRemoval(const Configuration& configuration) {
     const auto text = TextOf(configuration.path);
-    const auto block = text ? BlockOf(configuration, *text) : std::nullopt;
+    const auto block = text ? FindBlock(*text, configuration.path) : std::nullopt;
     if (!block) return {.kind = Kind::None, .path = configuration.path};
     const std::string foreign = ForeignLines(configuration, *block);
     const std::string after = RemoveBlock(*text, *block, foreign);

@@ -114,16 +114,20 @@ private:
         }
     }
 
+    void Say(const std::string& system, const std::string& words) {
+        m_Report.words.append(system).append(": ").append(words) += '\n';
+    }
+
     void Refuse(const std::string& system, const std::string& reason) {
         ++m_Report.failures;
-        m_Report.words += system + ": " + reason + '\n';
+        Say(system, reason);
     }
 
     void SetUp(const std::string& system) {
         const SystemSetup setup = SetupFor(system, m_Wish, m_Program);
         for (const Configuration& file : setup.files) Attempt(system, [&] { Change(file); });
         for (const std::string& reason : setup.refused) Refuse(system, reason);
-        for (const std::string& notice : setup.notices) m_Report.words += system + ": " + notice + '\n';
+        for (const std::string& notice : setup.notices) Say(system, notice);
     }
 
     void Change(const Configuration& file) {
