@@ -1,13 +1,9 @@
 #include "Commands/CommandLine.h"
 
 #include "Commands/CommandTable.h"
-<<<<<<< HEAD
 #include "Commands/Help.h"
 #include "Commands/Misuse.h"
-=======
 #include "Commands/PathArguments.h"
-#include "Commands/Suggestion.h"
->>>>>>> names
 #include "Words/Failure.h"
 
 #include "Descriptor.h"

@@ -1,14 +1,11 @@
 #include "Commands/CommandTable.h"
 
-<<<<<<< HEAD
 #include "Commands/CheckCommand.h"
+#include "Commands/DiffCommand.h"
 #include "Commands/DoctorCommand.h"
 #include "Commands/MergeCommand.h"
 #include "Commands/PreviewCommand.h"
 #include "Commands/SettleCommand.h"
-=======
-#include "Commands/DiffCommand.h"
->>>>>>> names
 #include "Commands/SetupCommand.h"
 #include "Commands/StatusCommand.h"
 
@@ -17,15 +14,12 @@ namespace ovrin {
 namespace {
 
 constexpr Command kCommands[] = {
-<<<<<<< HEAD
     {"merge", "merge a scene, as version control has it done", DescribeMerge},
     {"status", "tell which scenes have open conflicts", DescribeStatus},
     {"settle", "settle the open conflicts of scenes", DescribeSettle},
     {"check", "tell what is wrong in scenes", DescribeCheck},
     {"preview", "tell which scenes would conflict if a branch were merged", DescribePreview},
-=======
     {"diff", "tell what changed, object by object", DescribeDiff},
->>>>>>> names
     {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
     {"doctor", "tell what keeps version control from merging scenes, and the cure", DescribeDoctor},
 };
