@@ -19,7 +19,7 @@ constexpr Command kCommands[] = {
     {"settle", "settle the open conflicts of scenes", DescribeSettle},
     {"check", "tell what is wrong in scenes", DescribeCheck},
     {"preview", "tell which scenes would conflict if a branch were merged", DescribePreview},
-    {"diff", "tell what changed, object by object", DescribeDiff},
+    {"diff", "tell what changed in scenes, by the names of objects", DescribeDiff},
     {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
     {"doctor", "tell what keeps version control from merging scenes, and the cure", DescribeDoctor},
 };

@@ -99,7 +99,7 @@ std::string ToMarkdown(const PreviewAnswer& answer) {
     std::string text = Heading(answer);
     std::vector<const PreviewedScene*> rest;
     for (const PreviewedScene& scene : answer.scenes) {
-        if (scene.verdict == Verdict::Clean) continue;
+        if (!IsTold(scene)) continue;
         const std::string section = Section(scene);
         if (rest.empty() && text.size() + section.size() <= kMostMarkdown - kRoomForEnd)
             text += section;

@@ -52,19 +52,26 @@ std::string SummaryLine(const PreviewAnswer& answer) {
     return line;
 }
 
+bool IsTold(const PreviewedScene& scene) {
+    return scene.verdict != Verdict::Clean || !scene.isByObjects;
+}
+
 std::string SceneWords(const PreviewedScene& scene) {
     std::string words = scene.problem;
-    if (!scene.conflicts.empty())
-        words += (words.empty() ? "" : "; ") + Counted(scene.conflicts.size(), "conflict");
+    const auto add = [&](const std::string& more) { words += (words.empty() ? "" : "; ") + more; };
+    if (!scene.conflicts.empty()) add(Counted(scene.conflicts.size(), "conflict"));
+    if (!scene.isByObjects) add("git would merge it by lines");
     return words;
 }
 
 std::string ToText(const PreviewAnswer& answer) {
     std::string text;
     for (const PreviewedScene& scene : answer.scenes) {
-        if (scene.verdict == Verdict::Clean) continue;
-        text += Printable(scene.path) + ": " + SceneWords(scene) + "\n" + Indented(scene.report) + "\n";
+        if (!IsTold(scene)) continue;
+        text += Printable(scene.path) + ": " + SceneWords(scene) + "\n";
+        if (!scene.report.empty()) text += Indented(scene.report) + "\n";
     }
+    if (!text.empty() && !text.ends_with("\n\n")) text += "\n";
     return text + SummaryLine(answer) + "\n";
 }
 
@@ -72,8 +79,8 @@ std::string ByLinesWords(const PreviewAnswer& answer) {
     const std::size_t count = Sum(answer).byLines;
     if (!count) return {};
     return Counted(count, "scene") + (count == 1 ? " has" : " have") +
-           " no attribute `merge=ovrin`: git would merge by lines what is told here by objects. "
-           "`ovrin setup` is the cure";
+           " no attribute merge=ovrin: git would merge by lines what is told here by objects. "
+           "\"ovrin setup\" is the cure";
 }
 
 } // namespace ovrin

@@ -12,8 +12,10 @@ std::string Counted(std::size_t count, const std::string& thing);
 /// One line without its end: "12 scenes changed on both sides, 3 would conflict: Pier.ovrin, ...".
 std::string SummaryLine(const PreviewAnswer& answer);
 
-/// What a scene's heading says behind its name: "2 conflicts", or what git can't settle. Empty if there is
-/// nothing to tell.
+/// Whether a person is to be told of the scene.
+bool IsTold(const PreviewedScene& scene);
+
+/// What is told of it on one line: "2 conflicts", or what git can't settle.
 std::string SceneWords(const PreviewedScene& scene);
 
 /// The answer for a terminal: each scene that a person must look at with its conflicts, and the summary.

@@ -66,7 +66,11 @@ std::string ProblemOf(const UnmergedFile& file, Meeting meeting, const NamedComm
     if (meeting == Meeting::BothAdded) add("both sides added it");
     if (meeting == Meeting::OursRemoved) add(RemovalWords(file, ours, theirs));
     if (meeting == Meeting::TheirsRemoved) add(RemovalWords(file, theirs, ours));
-    for (const std::string& conflict : file.conflicts) add(WordsOf(conflict));
+    if (!file.pathInTheirs.empty())
+        add(Printable(ours.name) + " gave it this name, " + Printable(theirs.name) + " renamed it to " +
+            Printable(file.pathInTheirs));
+    else
+        for (const std::string& conflict : file.conflicts) add(WordsOf(conflict));
     if (problem.empty() && !IsMerged(file)) add("git leaves it unmerged");
     return problem;
 }
@@ -98,8 +102,8 @@ PreviewedScene PlaceScene(const UnmergedFile& file, const NamedCommit& ours, con
 }
 
 bool IsMerged(const UnmergedFile& file) {
-    return file.ours && file.theirs && file.ours->isFile && file.theirs->isFile &&
-           (!file.base || file.base->isFile);
+    return file.pathInTheirs.empty() && file.ours && file.theirs && file.ours->isFile &&
+           file.theirs->isFile && (!file.base || file.base->isFile);
 }
 
 void MakeUnknown(PreviewedScene& scene, const std::string& why) {
@@ -113,7 +117,7 @@ void LookInto(PreviewedScene& scene, const ThreeTexts& texts, const PreviewAnswe
         CheckScenes(scene, texts, question);
         SceneMerge merge(texts, rules.rules, rules.types, threads);
         merge.Merge();
-        if (merge.Open().empty() && !merge.HasBrokenDependencies()) return;
+        if (merge.Open().empty()) return;
         scene.verdict = Verdict::Conflicts;
         scene.conflicts = ConflictsToJson(merge).at("conflicts");
         scene.report =

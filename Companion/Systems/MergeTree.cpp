@@ -74,12 +74,13 @@ public:
         for (std::string_view stage = TakeUntil(text, '\0'); !stage.empty(); stage = TakeUntil(text, '\0'))
             TakeStage(stage);
         while (!text.empty()) TakeMessage(text);
+        for (const std::vector<std::string>& names : m_Renames) Unite(names);
         std::vector<UnmergedFile> list;
         for (auto& [path, file] : m_Files) {
             file.path = path;
             std::ranges::sort(file.conflicts);
-            const auto repeated = std::ranges::unique(file.conflicts);
-            file.conflicts.erase(repeated.begin(), repeated.end());
+            file.conflicts.erase(std::unique(file.conflicts.begin(), file.conflicts.end()),
+                                 file.conflicts.end());
             list.push_back(std::move(file));
         }
         return list;
@@ -117,13 +118,31 @@ private:
         if (!kind.starts_with("CONFLICT") || open == std::string_view::npos) return;
         const std::string_view name = kind.substr(open + 1, kind.rfind(')') - open - 1);
         if (name == "contents" || name == "binary") return;
+        if (name == "rename/rename" && paths.size() == 3) m_Renames.push_back(paths);
         for (const std::string& path : paths)
             if (const auto file = m_Files.find(path); file != m_Files.end())
                 file->second.conflicts.emplace_back(name);
     }
 
+    /// A file that has different names in base, ours and theirs is listed under each of them.
+    void Unite(const std::vector<std::string>& names) {
+        const auto base = m_Files.find(names[0]), ours = m_Files.find(names[1]),
+                   theirs = m_Files.find(names[2]);
+        for (const auto& file : {base, ours, theirs})
+            if (file == m_Files.end()) return;
+        const bool isAlone = !base->second.ours && !base->second.theirs && !ours->second.base &&
+                             !ours->second.theirs && !theirs->second.base && !theirs->second.ours;
+        if (!isAlone) return; // each has to do with other files, too
+        ours->second.base = base->second.base;
+        ours->second.theirs = theirs->second.theirs;
+        ours->second.pathInTheirs = names[2];
+        m_Files.erase(base);
+        m_Files.erase(theirs);
+    }
+
     const std::string m_Ends[2];
     std::map<std::string, UnmergedFile> m_Files;
+    std::vector<std::vector<std::string>> m_Renames; // names in base, ours and theirs
 };
 
 std::vector<TreeEntry*> BlobsOf(std::vector<UnmergedFile>& files) {

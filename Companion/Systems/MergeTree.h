@@ -22,6 +22,9 @@ struct UnmergedFile {
     std::optional<TreeEntry> base, ours, theirs;
     /// git's names of its conflicts other than that of two contents: "modify/delete". Sorted.
     std::vector<std::string> conflicts;
+    /// The name in theirs where the sides renamed it differently, and `path` is that of ours; else empty.
+    /// What ours and theirs have then is what git made of them.
+    std::string pathInTheirs;
     bool isByObjects = false; ///< has the attribute merge=ovrin
 
     /// Bytes of all versions.

@@ -54,11 +54,19 @@ std::optional<Repository> RepositoryAt(const fs::path& folder) {
     return {};
 }
 
+/// Whether a repository of git is one without a working tree, as git itself writes it down.
+bool SaysBare(const fs::path& data) {
+    std::string config;
+    return ReadWholeFile((data / "config").string(), config) == ReadResult::Complete &&
+           config.find("\n\tbare = true\n") != std::string::npos;
+}
+
 /// As git tells its hooks and drivers.
 std::optional<Repository> RepositoryOfEnvironment() {
     const char* data = std::getenv("GIT_DIR");
     if (!data || !IsFolder(data)) return {};
     const char* tree = std::getenv("GIT_WORK_TREE");
+    if (!tree && SaysBare(data)) return Repository{SystemKind::Git, "", Resolved(data)};
     return Repository{SystemKind::Git, Resolved(tree ? tree : "."), Resolved(data)};
 }
 
