@@ -23,6 +23,7 @@ struct CheckedScene {
     std::string file;
     std::vector<Finding> findings = {};
     std::string failure = {}; ///< why it couldn't be checked; empty if it could
+    bool isOther = false;     ///< it is no scene, and need not be one
 };
 
 } // namespace ovrin

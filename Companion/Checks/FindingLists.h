@@ -12,6 +12,7 @@ namespace ovrin {
 struct CheckResult {
     std::vector<CheckedScene> scenes; ///< those with findings or a failure
     std::size_t checked = 0;          ///< all scenes that could be checked
+    std::size_t others = 0;           ///< files that are no scenes and need not be
     std::size_t accepted = 0;         ///< findings that a baseline accepts
 };
 

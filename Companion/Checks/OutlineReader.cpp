@@ -172,8 +172,11 @@ Outlines ReadByTrees(const std::string& text, const Documents& documents) {
 
 Outlines ReadOutlines(const std::string& text) {
     const Documents documents = Cut(text);
-    std::optional<Outlines> outlines = ReadFast(text, documents);
-    return outlines ? std::move(*outlines) : ReadByTrees(text, documents);
+    std::optional<Outlines> fast = ReadFast(text, documents);
+    Outlines outlines = fast ? std::move(*fast) : ReadByTrees(text, documents);
+    // The header of the file goes with its first object.
+    if (!HasWrittenHeader(text) && !outlines.objects.empty()) outlines.objects.front().isAsWritten = false;
+    return outlines;
 }
 
 } // namespace ovrin

@@ -28,6 +28,12 @@ std::string ReadScene(const std::string& path) {
     throw Failure("Cannot read it: " + std::system_category().message(errno));
 }
 
+/// Most of these describe other files, in a form of their own.
+bool MayBeOther(const std::string& path) {
+    const std::string extension = GetFileExtension(path);
+    return extension == "meta" || extension == "MET";
+}
+
 bool IsRegularFile(const std::string& path) {
     struct stat status;
     return lstat(path.c_str(), &status) == 0 && S_ISREG(status.st_mode);
@@ -39,7 +45,7 @@ std::vector<SceneToCheck> InWorkingTree(const Repository& repository, const std:
     for (const std::string& path : paths) {
         const std::string place = repository.top + '/' + path;
         if (IsSceneName(path) && IsRegularFile(place))
-            scenes.push_back({path, path, [place] { return ReadScene(place); }});
+            scenes.push_back({path, path, [place] { return ReadScene(place); }, MayBeOther(path)});
     }
     return scenes;
 }
@@ -104,8 +110,8 @@ std::vector<SceneToCheck> StagedScenes(const Repository& repository) {
         if (!entry.mode.starts_with("100") || !IsSceneName(entry.path) || !isChanged.contains(entry.path))
             continue;
         if (entry.stage == GitEntry::Merged)
-            scenes.push_back(
-                {entry.path, entry.path, [blobs, id = entry.object] { return blobs->Read(id); }});
+            scenes.push_back({entry.path, entry.path, [blobs, id = entry.object] { return blobs->Read(id); },
+                              MayBeOther(entry.path)});
         else if (scenes.empty() || scenes.back().path != entry.path)
             scenes.push_back({entry.path, entry.path, nullptr});
     }

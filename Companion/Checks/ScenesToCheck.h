@@ -15,6 +15,8 @@ struct SceneToCheck {
     /// Its bytes; on any thread. Throws Failure. Null for a scene that is unmerged in the index and has none
     /// there.
     std::function<std::string()> take;
+    /// Nobody named it, and the ending of its name is also that of files that are no scenes.
+    bool mayBeOther = false;
 };
 
 /// The named files; "-" is standard input. `repository` is the one around, or null.

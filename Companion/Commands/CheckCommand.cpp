@@ -63,6 +63,8 @@ CheckedScene Check(const SceneToCheck& scene, const YAMLTypeInfoManager& types,
     } catch (const Failure& failure) {
         checked.failure = failure.what();
     }
+    const bool isNoScene = checked.findings.size() == 1 && checked.findings[0].code == Code::NoScene;
+    if (isNoScene && scene.mayBeOther) checked = {scene.name, {}, {}, true};
     if (auto open = conflicts.Find(scene.path)) checked.findings.insert(checked.findings.begin(), *open);
     return checked;
 }
@@ -74,7 +76,9 @@ CheckResult CheckAll(const std::vector<SceneToCheck>& scenes, const YAMLTypeInfo
         scenes.size(), [&](std::size_t index) { return Check(scenes[index], types, conflicts); },
         [&](std::size_t, CheckedScene scene) {
             baseline.Accept(scene);
-            if (scene.failure.empty())
+            if (scene.isOther)
+                ++result.others;
+            else if (scene.failure.empty())
                 ++result.checked;
             else
                 std::cerr << "ovrin: " << Printable(scene.file) << ": " << Printable(scene.failure) << '\n';
@@ -94,11 +98,13 @@ Outcome TellResult(const CheckResult& result, const Baseline& baseline, std::siz
     std::cerr << "Checked " << Count(result.checked, "scene") << ": " << Count(findings, "finding");
     if (result.accepted) std::cerr << ", and " << result.accepted << " that the baseline accepts";
     std::cerr << ".\n";
+    if (result.others)
+        std::cerr << "Passed over " << Count(result.others, ".meta file") << " of another form.\n";
     if (baseline.Left())
         std::cerr << "Of the baseline " << Count(baseline.Left(), "finding")
                   << " didn't come up again: it may be made anew.\n";
     if (findings) std::cerr << "\"ovrin check --explain CODE\" tells what a finding means and its cure.\n";
-    if (result.checked < scenes) return Outcome::Failed;
+    if (result.checked + result.others < scenes) return Outcome::Failed;
     return findings ? Outcome::LeftOpen : Outcome::Done;
 }
 

@@ -3,6 +3,7 @@
 #include "Commands/CommandTable.h"
 #include "Commands/Help.h"
 #include "Commands/Misuse.h"
+#include "Commands/PathArguments.h"
 #include "Words/Failure.h"
 
 #include "Descriptor.h"
@@ -78,7 +79,8 @@ Outcome RunCommandLine(const std::vector<std::string>& arguments) {
     CLI::App program(kDescription, "ovrin");
     const std::vector<Described> commands = DescribeWanted(program, arguments);
     try {
-        program.parse(std::vector<std::string>(arguments.rbegin(), arguments.rend()));
+        const std::vector<std::string> words = WithPathOptions(program, arguments);
+        program.parse(std::vector<std::string>(words.rbegin(), words.rend()));
     } catch (const CLI::ParseError& error) {
         return TellMisuse(program, error, arguments);
     }

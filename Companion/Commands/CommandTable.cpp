@@ -1,6 +1,7 @@
 #include "Commands/CommandTable.h"
 
 #include "Commands/CheckCommand.h"
+#include "Commands/DiffCommand.h"
 #include "Commands/DoctorCommand.h"
 #include "Commands/MergeCommand.h"
 #include "Commands/PreviewCommand.h"
@@ -18,6 +19,7 @@ constexpr Command kCommands[] = {
     {"settle", "settle the open conflicts of scenes", DescribeSettle},
     {"check", "tell what is wrong in scenes", DescribeCheck},
     {"preview", "tell which scenes would conflict if a branch were merged", DescribePreview},
+    {"diff", "tell what changed in scenes, by the names of objects", DescribeDiff},
     {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
     {"doctor", "tell what keeps version control from merging scenes, and the cure", DescribeDoctor},
 };

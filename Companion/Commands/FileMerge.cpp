@@ -25,6 +25,7 @@
 #include <cerrno>
 #include <filesystem>
 #include <iostream>
+#include <memory>
 #include <system_error>
 
 namespace ovrin {
@@ -43,20 +44,35 @@ std::string ReadSide(const char* side, const std::string& file) {
     return text;
 }
 
-/// A base may be empty: there is none, then.
-void CheckKind(const char* side, const std::string& text, bool mayBeEmpty) {
-    const SceneKind kind = ClassifyScene(text);
-    if (kind == SceneKind::Scene || (kind == SceneKind::Empty && mayBeEmpty)) return;
-    throw Failure(TellKind(side, kind));
+ThreeTexts ReadTexts(const FileMerge& files) {
+    return {ReadSide("base", files.base), ReadSide("ours", files.ours), ReadSide("theirs", files.theirs)};
 }
 
-ThreeTexts ReadTexts(const FileMerge& files) {
-    ThreeTexts texts = {ReadSide("base", files.base), ReadSide("ours", files.ours),
-                        ReadSide("theirs", files.theirs)};
-    CheckKind("ours", texts.ours, false);
-    CheckKind("theirs", texts.theirs, false);
-    CheckKind("base", texts.base, true);
-    return texts;
+/// Throws Failure for the first text that is no scene. A base may be empty: there is none, then.
+void CheckKinds(const ThreeTexts& texts) {
+    const auto check = [](const char* side, const std::string& text, bool mayBeEmpty) {
+        const SceneKind kind = ClassifyScene(text);
+        const bool isFine = kind == SceneKind::Scene || (kind == SceneKind::Empty && mayBeEmpty);
+        if (!isFine) throw Failure(TellKind(side, kind));
+    };
+    check("ours", texts.ours, false);
+    check("theirs", texts.theirs, false);
+    check("base", texts.base, true);
+}
+
+/// Reads and compares. What the engine refuses may be no scene at all, which is said better in other words;
+/// to look for that beforehand would take a tenth of the whole time.
+std::unique_ptr<SceneMerge> Compare(const FileMerge& files, ovrin_yaml::StageWatcher& watcher) {
+    SceneRules rules = ReadSceneRules(files.format);
+    ThreeTexts texts = ReadTexts(files);
+    if (texts.ours.empty() || texts.theirs.empty()) CheckKinds(texts);
+    try {
+        return std::make_unique<SceneMerge>(std::move(texts), std::move(rules.rules), std::move(rules.types),
+                                            ovrin_yaml::Threads::WhereWorthwhile, &watcher);
+    } catch (const Failure&) {
+        CheckKinds(ReadTexts(files));
+        throw;
+    }
 }
 
 void DeliverResult(const std::string& file, const std::string& text) {
@@ -109,11 +125,11 @@ std::string Lasting(const std::string& file, const std::string& byDefault) {
 }
 
 /// What is told of an open merge that can't be written down.
-std::string Record(const Records& records, const FileMerge& files, OpenMerge merge, const ThreeTexts& texts) {
+std::string Record(const Records& records, const FileMerge& files, OpenMerge merge) {
     if (records.path.empty()) return {};
     try {
         merge.path = records.path;
-        merge.texts = texts;
+        merge.texts = ReadTexts(files); // as they still are: the result comes later
         merge.rules = Lasting(files.format.rules, kDefaultRulesFile);
         merge.typeInfo = Lasting(files.format.typeInfo, kDefaultTypeInfoFile);
         OpenMerges(*records.repository).Add(merge);
@@ -154,11 +170,9 @@ constexpr const char* kNextStep =
 } // namespace
 
 Outcome Merge(const FileMerge& files) {
-    const ThreeTexts texts = ReadTexts(files);
-    SceneRules rules = ReadSceneRules(files.format);
     ProgressLine progress(Printable(files.path));
-    SceneMerge merge(texts, std::move(rules.rules), std::move(rules.types),
-                     ovrin_yaml::Threads::WhereWorthwhile, &progress);
+    const std::unique_ptr<SceneMerge> compared = Compare(files, progress);
+    SceneMerge& merge = *compared;
     merge.Merge();
     const Records records(files.path);
     if (merge.Open().empty() && !merge.IsBothAdded()) {
@@ -171,7 +185,7 @@ Outcome Merge(const FileMerge& files) {
     const bool isRecorded = !IsWithoutTree(caller);
     const OpenMerge open = DescribeOpen(files, records, caller, merge);
     const std::string result = merge.Result();
-    const std::string complaint = isRecorded ? Record(records, files, open, texts) : "";
+    const std::string complaint = isRecorded ? Record(records, files, open) : "";
     DeliverResult(files.result, result);
     const std::string told = TellOpen(merge, open) + complaint + (isRecorded ? kNextStep : "");
     progress.Wipe();

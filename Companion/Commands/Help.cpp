@@ -11,18 +11,18 @@ namespace ovrin {
 namespace {
 
 constexpr std::size_t kNameWidth = 28;
-constexpr std::size_t kTextWidth = 52;
+constexpr std::size_t kLineWidth = 80;
 
 constexpr const char* kExitStatuses =
     "Exit status: 0 done, 1 something is open or was found, 2 could not be done.\n";
 
-/// A line of text in lines of kTextWidth characters.
-std::string Wrapped(const std::string& text) {
+/// A paragraph in lines of `width` characters.
+std::string Wrapped(const std::string& text, std::size_t width = kLineWidth - kNameWidth) {
     std::istringstream words(text);
     std::string wrapped;
     std::size_t length = 0; // of the last line
     for (std::string word; words >> word; length += word.size()) {
-        if (length > 0 && length + 1 + word.size() > kTextWidth) {
+        if (length > 0 && length + 1 + word.size() > width) {
             wrapped += '\n';
             length = 0;
         } else if (length > 0) {
@@ -71,8 +71,17 @@ public:
         return "\n" + CLI::Formatter::make_usage(app, std::move(name));
     }
 
+    std::string make_subcommand(const CLI::App* command) const override {
+        std::ostringstream line;
+        CLI::detail::format_help(line, command->get_name(), Wrapped(command->get_description()), kNameWidth);
+        return line.str();
+    }
+
     std::string make_footer(const CLI::App* app) const override {
-        return CLI::Formatter::make_footer(app) + kExitStatuses;
+        std::istringstream footer(CLI::Formatter::make_footer(app));
+        std::string text;
+        for (std::string line; std::getline(footer, line);) text += Wrapped(line, kLineWidth) + '\n';
+        return (text.empty() ? "" : text + '\n') + kExitStatuses;
     }
 };
 

@@ -59,9 +59,9 @@ std::string WithoutObjects(const std::string& text) {
     return end == std::string::npos ? text : text.substr(0, end + 1);
 }
 
-/// A text that stays where it is until a thread wants it.
-InputFile Input(const char* name, const std::string& text) {
-    return {name, text.size(), [&text] { return text; }};
+/// A text that stays where it is until a thread takes it.
+InputFile Input(const char* name, std::string& text) {
+    return {name, text.size(), [&text] { return std::move(text); }};
 }
 
 MergeResolve ResolveOf(Side side) {
@@ -124,20 +124,20 @@ std::vector<Decision> FindUnmatched(std::span<const Decision> decisions,
         if (!path.empty()) std::erase_if(left, [&](const auto& one) { return Matches(one.first, path); });
     }
     std::vector<Decision> unmatched;
+    unmatched.reserve(left.size());
     for (const auto& [path, decision] : left) unmatched.push_back(*decision);
     return unmatched;
 }
 
 } // namespace
 
-SceneMerge::SceneMerge(const ThreeTexts& texts, MergeRules rules, YAMLTypeInfoManager types, Threads threads,
+SceneMerge::SceneMerge(ThreeTexts texts, MergeRules rules, YAMLTypeInfoManager types, Threads threads,
                        StageWatcher* watcher)
     : m_IsBothAdded(texts.base.empty()), m_Watcher(watcher), m_Session(threads) {
-    const std::string nothing = m_IsBothAdded ? WithoutObjects(texts.ours) : "";
+    if (m_IsBothAdded) texts.base = WithoutObjects(texts.ours);
     m_Session.SetRules(std::move(rules), std::move(types));
     WithFailures([&] {
-        m_Session.Read({Input("base", m_IsBothAdded ? nothing : texts.base), Input("theirs", texts.theirs),
-                        Input("ours", texts.ours)},
+        m_Session.Read({Input("base", texts.base), Input("theirs", texts.theirs), Input("ours", texts.ours)},
                        watcher);
         m_Session.Prepare();
         m_Session.Diff(watcher);

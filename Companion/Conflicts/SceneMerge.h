@@ -41,7 +41,7 @@ class SceneMerge {
 public:
     /// Reads and compares. Where the base is empty both sides added the scene: it stands for an object file
     /// of the same header without objects. `watcher` is told of all steps, of later merges too.
-    explicit SceneMerge(const ThreeTexts& texts, ovrin_yaml::MergeRules rules,
+    explicit SceneMerge(ThreeTexts texts, ovrin_yaml::MergeRules rules,
                         ovrin_yaml::YAMLTypeInfoManager types = {},
                         ovrin_yaml::Threads threads = ovrin_yaml::Threads::WhereWorthwhile,
                         ovrin_yaml::StageWatcher* watcher = nullptr);

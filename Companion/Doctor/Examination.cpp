@@ -13,7 +13,7 @@ namespace {
 
 struct Check {
     const char* code;
-    Finding (*look)(Patient& patient);
+    Diagnosis (*look)(Patient& patient);
 };
 
 /// What one fix puts right others may build upon: old lines go before the driver is looked at.
@@ -34,7 +34,7 @@ constexpr Check kChecks[] = {
     {"open-conflicts", LookAtOpenConflicts},
 };
 
-Finding Look(const Check& check, Patient& patient) {
+Diagnosis Look(const Check& check, Patient& patient) {
     try {
         return check.look(patient);
     } catch (const std::exception& failure) {
@@ -43,11 +43,11 @@ Finding Look(const Check& check, Patient& patient) {
 }
 
 /// The finding after the fix, or the old one with the reason why it can't be fixed.
-Finding Fixed(const Check& check, const Finding& problem, Patient& patient) {
+Diagnosis Fixed(const Check& check, const Diagnosis& problem, Patient& patient) {
     try {
         const std::string done = problem.fix();
         patient.Forget();
-        Finding after = Look(check, patient);
+        Diagnosis after = Look(check, patient);
         if (after.health != Health::Fine && after.health != Health::Note && after.health != Health::Skipped)
             return after;
         return {Health::Fixed, done + ". Before: " + problem.text};
@@ -62,7 +62,7 @@ std::vector<Result> Examine(bool fix) {
     Patient patient;
     std::vector<Result> results;
     for (const Check& check : kChecks) {
-        Finding finding = Look(check, patient);
+        Diagnosis finding = Look(check, patient);
         if (fix && finding.health == Health::Problem && finding.fix) finding = Fixed(check, finding, patient);
         results.push_back({check.code, std::move(finding)});
     }

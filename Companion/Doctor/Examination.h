@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Doctor/Finding.h"
+#include "Doctor/Diagnosis.h"
 
 #include <string>
 #include <vector>
@@ -10,7 +10,7 @@ namespace ovrin {
 /// A check and what it found.
 struct Result {
     const char* code; ///< stable, for scripts: "git-driver"
-    Finding finding;
+    Diagnosis finding;
 };
 
 /// Looks at everything, in a fixed order. With `fix` what can be put right safely is, and then looked at once

@@ -3,6 +3,7 @@
 #include "Conflicts/DecisionPath.h"
 #include "Conflicts/OpenMerges.h"
 #include "Scenes/SceneRules.h"
+#include "Settle/ChildLists.h"
 
 #include <algorithm>
 #include <set>
@@ -37,6 +38,15 @@ ResolveTable TableOf(const std::vector<Decision>& decisions) {
 std::optional<Side> SideOf(std::optional<MergeResolve> resolve) {
     if (!resolve) return {};
     return *resolve == ResolveBase ? Side::Base : *resolve == ResolveRight ? Side::Ours : Side::Theirs;
+}
+
+/// The decision for a side, and what follows from it.
+void AddDecisions(SceneMerge& merge, const OpenConflict& conflict, Side side,
+                  std::vector<Decision>& decisions) {
+    decisions.push_back({DecisionPath(conflict.path), side});
+    if (conflict.kind != ConflictKind::ParentLoop) return;
+    for (Decision& list : DecideChildLists(merge, conflict.path.front(), side))
+        decisions.push_back(std::move(list));
 }
 
 } // namespace
@@ -118,7 +128,7 @@ std::size_t SettleSession::TakeAll(Side side, const std::function<bool(const Ope
             std::vector<Decision> round;
             for (const OpenConflict& conflict : Open())
                 if (isMeant(conflict) && tried.insert(conflict.path).second)
-                    round.push_back({DecisionPath(conflict.path), side});
+                    AddDecisions(m_Merge, conflict, side, round);
             if (round.empty()) break;
             m_Decisions.insert(m_Decisions.end(), round.begin(), round.end());
             MergeBy(m_Decisions);

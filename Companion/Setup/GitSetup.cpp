@@ -7,14 +7,19 @@
 #include "FileUtils.h"
 
 #include <algorithm>
+#include <filesystem>
+#include <iterator>
 #include <sstream>
+#include <string_view>
 #include <vector>
 
 namespace ovrin {
 
 namespace {
 
-constexpr const char* kPatterns[] = {"*.ovrin", "*.prefab", "*.meta"};
+namespace fs = std::filesystem;
+
+constexpr std::string_view kPatterns[] = {"*.ovrin", "*.prefab", "*.meta"};
 constexpr const char* kNames[] = {"merge.ovrin.", "diff.ovrin.", "difftool.ovrin.", "mergetool.ovrin."};
 
 /// A value as a configuration of git holds it.
@@ -94,7 +99,7 @@ Configuration AttributesOf(const std::string& path) {
 std::string TextWithoutBlock(const std::string& path) {
     std::string text;
     if (ReadWholeFile(path, text) != ReadResult::Complete) return {};
-    const auto block = FindBlock(text);
+    const auto block = FindBlock(text, path);
     return block ? RemoveBlock(text, *block) : text;
 }
 
@@ -106,23 +111,30 @@ void NoticeOthers(const std::string& config, const std::string& attributes, Syst
                                     "; that of setup wins if it stands behind it");
     std::istringstream lines(TextWithoutBlock(attributes));
     for (std::string line; std::getline(lines, line);) {
-        const bool isAboutScenes = std::ranges::any_of(
-            kPatterns, [&](const char* pattern) { return line.starts_with(std::string(pattern) + ' '); });
+        const std::string pattern = line.substr(0, line.find_first_of(" \t"));
+        const bool isAboutScenes = std::ranges::find(kPatterns, pattern) != std::end(kPatterns);
         if (isAboutScenes && line.find(" merge=ovrin") == std::string::npos)
-            setup.notices.push_back(attributes + " also says \"" + line + "\"; the lines of setup win");
+            setup.notices.push_back((attributes + " also says \"").append(line) +
+                                    "\"; the lines of setup win");
     }
 }
 
 void AddGuard(const ProgramCall& program, SystemSetup& setup) {
     const std::string hook = PreCommitHook();
-    if (!hook.empty()) setup.files.push_back({"git", hook, GuardLines(program), FileKind::Script, {}});
+    if (hook.empty()) return;
+    setup.files.push_back({"git", hook, GuardLines(program), FileKind::Script, {}});
+    const fs::path data = fs::path(GitConfigs(Scope::Local).front()).parent_path();
+    if (fs::path(hook).parent_path() != data / "hooks")
+        setup.notices.push_back(
+            hook + " is where core.hooksPath leads: it serves every repository that it is set for");
 }
 
 } // namespace
 
 std::string AttributeLines() {
     std::string lines;
-    for (const char* pattern : kPatterns) lines += std::string(pattern) + " -text merge=ovrin diff=ovrin\n";
+    for (const std::string_view pattern : kPatterns)
+        lines += std::string(pattern) + " -text merge=ovrin diff=ovrin\n";
     return lines;
 }
 

@@ -77,7 +77,7 @@ std::string WithLineEndsOf(std::string_view text, const std::string& lines) {
 
 } // namespace
 
-std::optional<MarkedBlock> FindBlock(std::string_view text) {
+std::optional<MarkedBlock> FindBlock(std::string_view text, const std::string& path) {
     const std::size_t mark = text.find(kFirstMark);
     if (mark == std::string_view::npos) return {};
     const std::size_t begin = text.rfind('\n', mark) + 1; // npos + 1 is 0
@@ -86,8 +86,8 @@ std::optional<MarkedBlock> FindBlock(std::string_view text) {
     while (last < text.size() && !text.substr(last).starts_with(kLastMark)) last = LineEnd(text, last);
     if (last == text.size()) {
         const auto number = std::ranges::count(text.substr(0, mark), '\n') + 1;
-        throw Failure("somebody took out the end of what setup wrote, which begins in line " +
-                      std::to_string(number) + ": take out the rest by hand");
+        throw Failure("somebody took the end out of what setup wrote into " + path + ", from line " +
+                      std::to_string(number) + " on: take out the rest by hand");
     }
     const std::string_view markText = text.substr(mark, linesBegin - mark);
     std::string lines = FirstLine(text.substr(begin, mark - begin));

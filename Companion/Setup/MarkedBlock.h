@@ -36,8 +36,8 @@ struct MarkedBlock {
 /// Whether the first of the marks stands behind a line or on a line of its own.
 enum class FirstMark { OnItsOwnLine, BehindTheFirstLine };
 
-/// The first block of the text. Throws Failure where its last mark is missing.
-std::optional<MarkedBlock> FindBlock(std::string_view text);
+/// The first block of the text, which is that of `path`. Throws Failure where its last mark is missing.
+std::optional<MarkedBlock> FindBlock(std::string_view text, const std::string& path);
 
 /// `lines`, each with its line end, between their marks.
 std::string MarkLines(const std::string& lines, const BlockOrigin& origin, FirstMark mark);

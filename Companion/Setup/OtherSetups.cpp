@@ -60,7 +60,7 @@ Configuration SubversionConfig(const ProgramCall& program) {
 std::string OthersTool(const std::string& path) {
     std::string text;
     if (ReadWholeFile(path, text) != ReadResult::Complete) return {};
-    const auto block = FindBlock(text);
+    const auto block = FindBlock(text, path);
     return MergeToolOfSubversion(block ? RemoveBlock(text, *block) : text);
 }
 
@@ -105,7 +105,7 @@ SystemSetup SetupOfSubversion(const ProgramCall& program) {
     const std::string tool = program.ForSubversion(), path = setup.files.front().path;
     const std::string others = OthersTool(path);
     const bool isOfOldSetup = others.ends_with("ovrinmerge-vcs"); // the program's name of earlier versions
-    if (!others.empty() && others != tool && !isOfOldSetup)
+    if (!others.empty() && !IsOurToolOfSubversion(others) && !isOfOldSetup)
         setup.refused.push_back(path + " has merge-tool-cmd = " + others +
                                 " already, and Subversion knows one tool only. Take that line out and set up "
                                 "again, or call " +
@@ -135,6 +135,10 @@ std::string MergeToolOfSubversion(const std::string& text) {
             tool = Trimmed(line.substr(sign + 1));
     }
     return tool;
+}
+
+bool IsOurToolOfSubversion(const std::string& tool) {
+    return tool.substr(tool.rfind('/') + 1) == "ovrin-svn"; // npos + 1 is 0
 }
 
 } // namespace ovrin

@@ -21,4 +21,7 @@ SystemSetup RemovalFromSubversion(const ProgramCall& program);
 /// The merge tool that a configuration of Subversion names, with blanks around it taken off; empty if none.
 std::string MergeToolOfSubversion(const std::string& text);
 
+/// Whether such a tool is this program, in whatever folder.
+bool IsOurToolOfSubversion(const std::string& tool);
+
 } // namespace ovrin

@@ -1,6 +1,6 @@
 #include "Setup/SetupRun.h"
 
-#include "Setup/FileChange.h"
+#include "Setup/FileEdit.h"
 #include "Setup/GitSetup.h"
 #include "Setup/OtherSetups.h"
 #include "Systems/Process.h"
@@ -14,7 +14,7 @@ namespace ovrin {
 
 namespace {
 
-using Kind = FileChange::Kind;
+using Kind = FileEdit::Kind;
 
 std::string NameOf(SystemKind kind) {
     switch (kind) {
@@ -74,7 +74,7 @@ std::string Indented(const std::string& lines) {
     return text;
 }
 
-std::string Told(const FileChange& change) {
+std::string Told(const FileEdit& change) {
     switch (change.kind) {
     case Kind::None:
         return change.path + " has its lines already\n";
@@ -114,20 +114,24 @@ private:
         }
     }
 
+    void Say(const std::string& system, const std::string& words) {
+        m_Report.words.append(system).append(": ").append(words) += '\n';
+    }
+
     void Refuse(const std::string& system, const std::string& reason) {
         ++m_Report.failures;
-        m_Report.words += system + ": " + reason + '\n';
+        Say(system, reason);
     }
 
     void SetUp(const std::string& system) {
         const SystemSetup setup = SetupFor(system, m_Wish, m_Program);
         for (const Configuration& file : setup.files) Attempt(system, [&] { Change(file); });
         for (const std::string& reason : setup.refused) Refuse(system, reason);
-        for (const std::string& notice : setup.notices) m_Report.words += system + ": " + notice + '\n';
+        for (const std::string& notice : setup.notices) Say(system, notice);
     }
 
     void Change(const Configuration& file) {
-        const FileChange change = m_Wish.isUndo ? PlanRemoval(file) : PlanLines(file);
+        const FileEdit change = m_Wish.isUndo ? PlanRemoval(file) : PlanLines(file);
         if (m_Wish.isUndo && change.kind == Kind::None) return;
         if (!m_Wish.isDryRun) CarryOut(change);
         m_Report.done += file.system + ": " + Told(change);

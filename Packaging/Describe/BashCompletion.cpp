@@ -18,8 +18,9 @@ std::string Offer(const Values& values) {
 
 /// In the case statement over the command and the option or the number of the operand.
 void WriteOffer(std::ostream& out, const std::string& pattern, const Values& values) {
-    if (values.words.empty() && values.more == Values::More::Files) return;
-    out << "    " << pattern << ")\n        " << Offer(values) << "\n        ;;\n";
+    const bool areFiles = values.words.empty() && values.more == Values::More::Files;
+    out << "    " << pattern << ")" << (areFiles ? "" : "\n        " + Offer(values) + "\n       ")
+        << " ;;\n";
 }
 
 void WriteCommand(std::ostream& out, const DescribedCommand& command) {
@@ -31,11 +32,13 @@ void WriteValues(std::ostream& out, const DescribedCommand& command) {
     for (const DescribedOption& option : command.options)
         for (const std::string& word : option.words)
             if (!option.value.empty()) WriteOffer(out, "'" + command.name + " " + word + "'", option.values);
-    for (std::size_t i = 0; i < command.operands.size(); ++i) {
-        const Operand& operand = command.operands[i];
-        const std::string position = operand.isRepeated ? "'*" : std::to_string(i + 1) + "'";
+    std::size_t number = 0;
+    for (const Operand& operand : command.operands) {
+        const std::string position = operand.isRepeated ? "'*" : std::to_string(++number) + "'";
         WriteOffer(out, "'" + command.name + " " + position, operand.values);
     }
+    const bool endless = !command.operands.empty() && command.operands.back().isRepeated;
+    if (!endless) WriteOffer(out, "'" + command.name + " '[0-9]*", {});
 }
 
 /// $option is the option whose value comes next, $operands counts what is no option up to $word.

@@ -13,14 +13,19 @@ std::string FirstLine(const std::string& text) {
     return text.substr(0, text.find('\n'));
 }
 
+template <std::size_t N> bool IsOneOf(const std::array<const char*, N>& names, const std::string& name) {
+    return std::ranges::find(names, name) != names.end();
+}
+
 Values ValuesOf(const CLI::Option& option, const std::string& name) {
     constexpr std::array kRevisions = {"REV", "REVISION", "BRANCH", "COMMIT"};
-    constexpr std::array kNumbers = {"N", "K/N"};
-    Values values{ovrin::AllowedWords(option), Values::More::Files};
-    if (!values.words.empty() || std::ranges::find(kNumbers, name) != kNumbers.end())
-        values.more = Values::More::None;
-    else if (std::ranges::find(kRevisions, name) != kRevisions.end())
+    constexpr std::array kFiles = {"FILE", "TEXT"};
+    Values values{ovrin::AllowedWords(option)};
+    if (!values.words.empty()) return values;
+    if (IsOneOf(kRevisions, name))
         values.more = Values::More::Revisions;
+    else if (option.get_positional() || IsOneOf(kFiles, name))
+        values.more = Values::More::Files;
     return values;
 }
 

@@ -2,6 +2,6 @@
 
 #include "Describe/Program.h"
 
-/// ovrin. Of an argument the checks of its option tell which words there are, and its name whether it is a
-/// revision; anything else may be a file.
+/// ovrin. Of a value the checks of its option tell which words there are, and its name whether it is a
+/// revision or a file. Other operands are files.
 DescribedProgram DescribeCompanion();

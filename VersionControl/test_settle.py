@@ -1,0 +1,392 @@
+"""Settles the conflicts of real merges with ovrin settle, and sees what ovrin status keeps from commits.
+
+    pytest-3 VersionControl/test_settle.py --installed build/release/installed
+"""
+
+import json
+import pathlib
+import shutil
+import subprocess
+import tempfile
+
+import pytest
+
+from systems import System
+from test_script import can_mount
+from test_systems import (CONFLICT_AND_MORE, CONFLICT_AND_OBJECTS, HEADER, ONE_CONFLICT, components,
+                          game_object, scene)
+
+NAMES = ["a b.ovrin", "'quoted\" $x.ovrin", "tab\there.ovrin", "line\nfeed.ovrin", "-dash.ovrin", "Hafen \u2693=1.ovrin",
+         "*[a].ovrin", ":(top)a.ovrin"]
+MANY = [HEADER + "".join(game_object(number, layer, "Boat", 1) for number in range(1, 51)) for layer in (1, 2, 5)]
+DONE, LEFT_OPEN, FAILED = 0, 1, 2
+
+
+class User(System):
+    """Somebody who has called "ovrin setup", and works in git unless told otherwise."""
+
+    name = "scene.ovrin"
+
+    def git(self, *arguments, fails=False, **environment):
+        return self.run("git", *arguments, fails=fails, **environment)
+
+    def start(self):
+        self.git("init", "-qb", "main", ".")
+        self.git("config", "--global", "user.name", "Tester")
+        self.git("config", "--global", "user.email", "tester@example.org")
+        self.run("ovrin", "setup")
+        self.run("ovrin", "setup", "--local")
+        self.commit("words\n", "readme")
+
+    def commit(self, text, name=None):
+        self.write(text, name)
+        self.git("add", "--", "./" + (name or self.name))
+        self.git("commit", "-qm", "change")
+
+    def sides(self, base, theirs, ours, name=None):
+        self.start()
+        if base is not None:
+            self.commit(base, name)
+        self.git("checkout", "-qb", "topic")
+        self.commit(theirs, name)
+        self.git("checkout", "-q", "main")
+        self.commit(ours, name)
+
+    def conflict(self, base, theirs, ours, name=None):
+        self.sides(base, theirs, ours, name)
+        self.git("merge", "topic", fails=True)
+
+    def ovrin(self, *arguments, status=DONE, **environment):
+        """What it prints; what it says besides is in `words`."""
+        with self.log.open("w", encoding="utf-8") as errors:
+            done = subprocess.run(["ovrin", *arguments], cwd=self.here, env=self.environment | environment,
+                                  stdin=subprocess.DEVNULL, stdout=subprocess.PIPE, stderr=errors, check=False)
+        assert done.returncode == status, f"{arguments}\n{done.stdout.decode()}\n{self.words()}"
+        return done.stdout.decode()
+
+    def words(self):
+        return self.log.read_text(encoding="utf-8")
+
+    def committed(self, name=None):
+        return self.git("show", f"HEAD:{name or self.name}")
+
+    def records(self):
+        return sorted(path.suffix for path in (self.here / ".git/ovrin").glob("*"))
+
+
+@pytest.fixture(name="user")
+def fixture_user(request):
+    installed = pathlib.Path(request.config.getoption("--installed")).resolve()
+    with tempfile.TemporaryDirectory(prefix="a user's ") as folder:
+        yield User(installed, pathlib.Path(folder))
+
+
+def test_commit_is_refused_until_the_conflict_is_settled(user):
+    user.conflict(*CONFLICT_AND_MORE)
+    user.git("commit", "-qam", "too early", fails=True)
+    assert "scene.ovrin: 1 open conflict" in user.words()
+    assert "settle --list" in user.words() and "--no-verify" in user.words()
+    user.ovrin("settle", "--take", "theirs")
+    assert user.words() == "scene.ovrin is settled.\nNext: git commit\n"
+    user.git("commit", "-qm", "merged")
+    assert user.committed() == scene("2 Lamp 3")
+    assert user.records() == [] and user.git("status", "--porcelain") == ""
+    assert user.ovrin("status") == "No scene has open conflicts.\n"
+
+
+def test_fifty_conflicts_take_three_commands(user):
+    user.sides(*MANY)
+    user.git("merge", "topic", fails=True)
+    user.ovrin("settle", "--take", "theirs")
+    user.git("commit", "-qm", "merged")
+    assert user.committed() == MANY[1]
+
+
+@pytest.mark.parametrize("name", NAMES)
+def test_any_name_is_settled(user, name):
+    user.conflict(*ONE_CONFLICT, name)
+    assert json.loads(user.ovrin("status", "--json", status=LEFT_OPEN))["scenes"][0]["path"] == name
+    user.ovrin("settle", "--take", "theirs", "--", name)
+    user.git("commit", "-qm", "merged")
+    assert user.committed(name) == ONE_CONFLICT[1]
+
+
+@pytest.mark.parametrize("command", ["rebase", "cherry-pick"])
+def test_next_step_is_that_of_the_operation(user, command):
+    user.sides(*ONE_CONFLICT)
+    user.git(command, "topic", fails=True)
+    user.ovrin("settle", "--take", "theirs")
+    assert user.words().endswith(f"Next: git {command} --continue\n")
+    user.git(command, "--continue", GIT_EDITOR="true")
+    # In a rebase ours is what the commits are brought onto.
+    assert user.committed() == ONE_CONFLICT[2 if command == "rebase" else 1]
+
+
+def test_stash_is_guarded_without_an_operation_under_way(user):
+    user.sides(scene("1 Lantern 1"), scene("1 Lantern 1 20"), scene("5 Lantern 1"))
+    user.write(scene("5 Lantern 4"))
+    user.git("stash", "-q")
+    user.commit(scene("5 Lantern 6"))
+    user.git("stash", "pop", fails=True)
+    user.git("commit", "-qam", "too early", fails=True)
+    user.git("add", user.name)
+    user.git("commit", "-qm", "too early", fails=True)
+    user.write("other words\n", "readme")
+    user.git("commit", "-qm", "another file", "--", "readme")
+    # The head has moved on: what is there now is no longer this merge.
+    user.git("checkout", "-q", "HEAD", "--", user.name)
+    assert user.ovrin("status") == "No scene has open conflicts.\n"
+    assert "scene.ovrin is forgotten" in user.words()
+
+
+def test_added_file_is_not_taken_for_a_settled_one(user):
+    user.conflict(*ONE_CONFLICT)
+    user.git("add", user.name)
+    user.git("commit", "-qm", "too early", fails=True)
+    user.ovrin("settle", "--as-is", user.name)
+    user.git("commit", "-qm", "merged")
+    assert user.committed() == ONE_CONFLICT[2]
+
+
+def test_forgotten_conflict_leaves_the_file_to_the_user(user):
+    user.conflict(*ONE_CONFLICT)
+    user.ovrin("settle", "--forget", status=FAILED)
+    user.ovrin("settle", "--forget", user.name)
+    assert user.records() == [] and user.git("ls-files", "--unmerged") != ""
+    user.git("commit", "-qam", "merged")
+
+
+def test_file_that_was_changed_by_hand_is_not_replaced_unasked(user):
+    user.conflict(*ONE_CONFLICT)
+    by_hand = scene("7 Lantern 1")
+    user.write(by_hand)
+    user.ovrin("settle", "--take", "theirs", status=LEFT_OPEN)
+    assert user.read() == by_hand
+    assert "--as-is" in user.words() and "--overwrite" in user.words()
+    user.ovrin("settle", "--overwrite")
+    assert user.read() == ONE_CONFLICT[1]
+    user.git("commit", "-qm", "merged")
+
+
+def test_hand_made_result_is_taken_unless_it_holds_markers(user):
+    user.conflict(*ONE_CONFLICT)
+    user.write(scene("7 Lantern 1") + "<<<<<<< ours\n")
+    user.ovrin("settle", "--as-is", user.name, status=FAILED)
+    assert user.records() != []
+    user.write(scene("7 Lantern 1"))
+    user.ovrin("settle", "--as-is", user.name)
+    user.git("commit", "-qm", "merged")
+    assert user.committed() == scene("7 Lantern 1")
+
+
+def test_merge_that_was_given_up_is_forgotten_with_a_word(user):
+    user.conflict(*ONE_CONFLICT)
+    user.git("merge", "--abort")
+    user.write(scene("9 Lantern 1"))
+    user.git("commit", "-qam", "another change")
+    assert user.ovrin("status") == "No scene has open conflicts.\n"
+    assert "scene.ovrin is forgotten" in user.words()
+
+
+def test_decision_that_matches_nothing_changes_nothing(user):
+    user.conflict(*CONFLICT_AND_MORE)
+    for wrong in (["--set", "10.GameObject.m_Layer=theirs", "--set", "10.GameObject.m_None=ours"],
+                  ["--set", "Lamp.m_Layer"], ["--set", "Lamp.m_Layer=mine"], ["--take", "ours", "--under", "Nothing"],
+                  ["--take", "ours", "nothing.ovrin"], ["--take", "ours", "/"], ["-i", "nothing"], ["--undo"]):
+        user.ovrin("settle", *wrong, status=FAILED)
+        assert user.words().startswith("ovrin: ")
+    assert user.records() == [".merge"]
+    assert user.read() == scene("5 Lamp 3")
+
+
+def test_decisions_are_kept_and_taken_back(user):
+    base, theirs, ours = (components(name, 1).replace("m_Layer: 0", f"m_Layer: {name[0]}")
+                          for name in ("1 Lantern", "2 Lamp", "5 Light"))
+    user.conflict(base, theirs, ours)
+    user.ovrin("settle", "--set", "5 Light.m_Layer=theirs", status=LEFT_OPEN)
+    listed = json.loads(user.ovrin("settle", "--list", "--json", status=LEFT_OPEN))["scenes"][0]
+    assert {conflict["property"]: (conflict["state"], conflict["decided"]) for conflict in listed["conflicts"]} == {
+        "m_Layer": ("settled", "theirs"), "m_Name": ("open", None)}
+    assert listed["open"] == 1 and listed["ours"] == "main" and listed["theirs"] == "topic"
+    assert user.read() == ours
+    user.ovrin("settle", "--undo", status=LEFT_OPEN)
+    assert ": 2 open conflicts (" in user.words()
+    user.ovrin("settle", "--set", "*.GameObject.m_Layer=theirs", "--take", "base")
+    assert user.read() == base.replace("m_Layer: 1", "m_Layer: 2")
+
+
+def test_file_of_decisions_gives_what_the_engine_gives(user):
+    user.conflict(*CONFLICT_AND_OBJECTS)
+    for text, name in zip(CONFLICT_AND_OBJECTS, ("base", "theirs", "ours")):
+        user.write(text, name)
+    user.write("Conflict handling:\nLeft *.GameObject.m_Layer\nRight 10.GameObject.m_Layer\n"
+               "Base 10.GameObject.m_Name\n", "decisions")
+    user.run("OvrinMerge", "merge", "--force", "--fallback", "none", "-i", "decisions", "base", "theirs", "ours",
+             "expected")
+    user.ovrin("settle", "-i", "decisions")
+    assert user.read() == user.read("expected")
+
+
+def test_only_the_named_files_are_settled_from_where_the_user_is(user):
+    user.start()
+    (user.here / "inner").mkdir()
+    files = ("one.ovrin", "inner/two.ovrin", "inner/three.ovrin")
+    for branch, text in zip(("main", "topic", "main"), ONE_CONFLICT):
+        user.git("checkout", "-q", *(("-b", branch) if branch == "topic" else (branch,)))
+        for name in files:
+            user.write(text, name)
+        user.git("add", ".")
+        user.git("commit", "-qm", "change")
+    user.git("merge", "topic", fails=True)
+    top, user.here = user.here, user.here / "inner"
+    user.ovrin("settle", "--take", "theirs", "two.ovrin")
+    assert "Still unmerged: inner/three.ovrin and 1 more" in user.words()
+    user.ovrin("settle", "--take", "base", ".")
+    user.here = top
+    user.ovrin("settle", "--take", "ours", str(top / "one.ovrin"))
+    assert [user.read(name) for name in files] == [ONE_CONFLICT[2], ONE_CONFLICT[1], ONE_CONFLICT[0]]
+    user.git("commit", "-qm", "merged")
+
+
+def test_merge_without_the_driver_is_settled_as_well(user):
+    user.sides(*CONFLICT_AND_MORE)
+    user.git("-c", "merge.ovrin.driver=false", "merge", "topic", fails=True)
+    assert user.records() == []
+    assert "scene.ovrin: 1 open conflict" in user.ovrin("status", status=LEFT_OPEN)
+    user.ovrin("settle", "--take", "theirs")
+    user.git("commit", "-qm", "merged")
+    assert user.committed() == scene("2 Lamp 3")
+
+
+def test_another_merge_of_the_file_makes_earlier_decisions_void(user):
+    user.sides(*CONFLICT_AND_MORE)
+    user.git("checkout", "-qb", "other", "topic")
+    user.commit(scene("8 Lantern 3"))
+    user.git("checkout", "-q", "main")
+    user.git("merge", "topic", fails=True)
+    user.git("merge", "--abort")
+    user.git("-c", "merge.ovrin.driver=false", "merge", "other", fails=True)
+    user.ovrin("settle", "--take", "theirs")
+    assert "was merged again without ovrin" in user.words()
+    assert user.read() == scene("8 Lamp 3")
+
+
+def test_scene_that_one_side_removed_is_told_with_the_way_out(user):
+    user.sides(*ONE_CONFLICT)
+    user.git("rm", "-q", user.name)
+    user.git("commit", "-qm", "removed")
+    user.git("merge", "topic", fails=True)
+    assert "git rm" in user.ovrin("status", status=LEFT_OPEN)
+    user.ovrin("settle", "--take", "ours", status=LEFT_OPEN)
+
+
+def test_scene_that_both_added_waits_for_a_look(user):
+    user.conflict(None, scene("1 Lantern 1"), HEADER + game_object(20, 7, "Boat", 1))
+    user.ovrin("settle", status=LEFT_OPEN)
+    assert "Both sides added the scene" in user.words()
+    user.git("commit", "-qam", "too early", fails=True)
+    user.ovrin("settle", "--take", "ours")
+    user.git("commit", "-qm", "merged")
+    assert "Lantern" in user.committed() and "Boat" in user.committed()
+
+
+# At the call of git that would take the result into the index, before or after it.
+@pytest.mark.parametrize("moment", ["kill -9 $PPID; exit", 'GIT "$@"; kill -9 $PPID; exit'])
+def test_settling_that_was_killed_is_completed_by_the_next(user, moment):
+    user.conflict(*CONFLICT_AND_MORE)
+    git = shutil.which("git")
+    user.fake("git", f'case "$*" in *update-index*) {moment.replace("GIT", git)};; esac\nexec {git} "$@"')
+    user.ovrin("settle", "--take", "theirs", status=-9)
+    (user.fakes / "git").unlink()
+    user.git("commit", "-qam", "too early", fails=True)
+    user.ovrin("settle")
+    user.git("commit", "-qm", "merged")
+    assert user.committed() == scene("2 Lamp 3") and user.records() == []
+
+
+ON_FULL_DISK = """
+    mount -t tmpfs -o size=600k none .
+    cd "$PWD"
+    cp -R "$1/." .
+    cat /dev/zero >rest 2>/dev/null || true
+    before=$(cat scene.ovrin)
+    ! ovrin settle --take theirs
+    [ "$(cat scene.ovrin)" = "$before" ]
+    [ -n "$(git ls-files --unmerged)" ]
+    rm rest
+    ovrin settle --take theirs
+    grep -q "m_Layer: 2" scene.ovrin"""
+
+
+@pytest.mark.skipif(not can_mount(), reason="disks can't be mounted here")
+def test_full_disk_loses_nothing(user):
+    user.conflict(*MANY)
+    for sample in (user.here / ".git/hooks").glob("*.sample"):
+        sample.unlink()
+    full = user.home / "full"
+    full.mkdir()
+    copied, user.here = user.here, full
+    user.run("unshare", "-rm", "sh", "-ec", ON_FULL_DISK, "sh", str(copied))
+
+
+def test_merge_tool_settles_what_it_is_shown(user):
+    user.use_tool('cp "$1" shown; cp "$3" "$4"')
+    user.conflict(*CONFLICT_AND_MORE)
+    user.git("mergetool", "--no-prompt", "--tool", "ovrin")
+    assert user.read("shown") == scene("1 Lamp 3")
+    assert user.read() == scene("5 Lamp 3") and user.records() == []
+    user.git("commit", "-qm", "merged")
+
+
+@pytest.mark.parametrize("script", ["exit 1", "true", "kill -9 $$", None])
+def test_merge_tool_that_fails_leaves_the_conflict(user, script):
+    user.use_tool(script)
+    user.conflict(*CONFLICT_AND_MORE)
+    before = user.read()
+    scratch = user.home / "scratch"
+    scratch.mkdir()
+    user.git("mergetool", "--no-prompt", "--tool", "ovrin", fails=True, TMPDIR=str(scratch))
+    assert user.read() == before and user.records() == [".merge"]
+    assert not any(scratch.iterdir())
+
+
+@pytest.mark.skipif(not shutil.which("hg"), reason="hg is not installed")
+def test_mercurial_is_told_of_the_settled_scene(user):
+    user.run("hg", "init", ".")
+    user.run("ovrin", "setup")
+    with open(user.home / ".hgrc", "a", encoding="utf-8") as settings:
+        settings.write("\n[ui]\nusername = Tester\n")
+    for text, back in zip(ONE_CONFLICT, ("", "0", "")):
+        user.write(text)
+        user.run("hg", "commit", "-qA", "-m", "change", user.name)
+        if text == ONE_CONFLICT[1]:
+            user.run("hg", "update", "-q", "0")
+    user.run("hg", "merge", fails=True)
+    assert "scene.ovrin: 1 open conflict" in user.ovrin("status", status=LEFT_OPEN)
+    user.ovrin("settle", "--take", "theirs")
+    assert user.words().endswith("Next: hg commit\n")
+    user.run("hg", "commit", "-m", "merged")
+    assert user.run("hg", "cat", user.name) == ONE_CONFLICT[1]
+    assert not user.exists(".hg/ovrin")
+
+
+@pytest.mark.skipif(not shutil.which("svnadmin"), reason="svn is not installed")
+def test_subversion_is_told_of_the_settled_scene(user):
+    repository = f"file://{user.home}/repository".replace(" ", "%20")
+    user.run("svnadmin", "create", f"{user.home}/repository")
+    user.run("svn", "checkout", "-q", repository, ".")
+    user.run("ovrin", "setup")
+    base, theirs, ours = CONFLICT_AND_OBJECTS
+    user.write(base)
+    user.run("svn", "add", "-q", user.name)
+    for text in (base, theirs):
+        user.write(text)
+        user.run("svn", "commit", "-qm", "change")
+    user.run("svn", "update", "-qr", "1")
+    user.write(ours)
+    user.run("svn", "update", "--force-interactive", "--accept", "launch", fails=None)
+    assert "scene.ovrin: 1 open conflict" in user.ovrin("status", status=LEFT_OPEN)
+    user.ovrin("settle", "--take", "theirs")
+    assert user.run("svn", "status") == f"M       {user.name}\n"
+    user.run("svn", "commit", "-qm", "merged")
+    assert "m_Layer: 2" in user.read() and "&30" in user.read()
