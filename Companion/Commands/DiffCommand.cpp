@@ -38,15 +38,16 @@ Outcome RunDiff(const DiffWish& wish) {
 
 void DescribeLook(CLI::App& command, const std::shared_ptr<DiffWish>& wish) {
     DiffLook& look = wish->look;
-    auto* forms = command.add_option_group("form")->require_option(0, 1);
     const auto form = [&](const char* name, DiffForm value, const char* text) {
-        forms->add_flag_callback(
+        return command.add_flag_callback(
             name, [wish, value] { wish->look.form = value; }, text);
     };
-    form("--stat", DiffForm::Stat, "only count the objects of each scene");
-    form("--markdown", DiffForm::Markdown, "write Markdown, for a pull request");
-    form("--json", DiffForm::Json, "write JSON, for a script");
-    command.add_option("--color", look.colour, "whether to colour: auto, always or never")
+    auto* stat = form("--stat", DiffForm::Stat, "only count the objects of each scene");
+    auto* markdown = form("--markdown", DiffForm::Markdown, "write Markdown, for a pull request");
+    auto* json = form("--json", DiffForm::Json, "write JSON, for a script");
+    markdown->excludes(stat);
+    json->excludes(stat)->excludes(markdown);
+    command.add_option("--color", look.colour, "whether to colour; auto: on a terminal")
         ->check(CLI::IsMember({"auto", "always", "never"}))
         ->capture_default_str();
     command.add_flag("--no-pager{false}", look.mayPage, "write to the terminal itself");
