@@ -32,6 +32,7 @@ struct ObjectOutline {
     const ovrin_yaml::YAMLScalar* father = nullptr;     ///< of m_Father in the same way
     bool isStripped = false;
     bool hasChildren = false;                       ///< has the field m_Children
+    bool hasRepeatedTransitions = false;            ///< transitions with a key twice, as usual
     bool hasComponents = false;                     ///< has the field m_Component
     bool isAsWritten = true;                        ///< the writer would write the same bytes
     std::uint32_t references = 0, repeatedKeys = 0; ///< how many of them, in the lists of their outlines
