@@ -133,10 +133,28 @@ def test_stash_is_guarded_without_an_operation_under_way(user):
     user.git("commit", "-qm", "too early", fails=True)
     user.write("other words\n", "readme")
     user.git("commit", "-qm", "another file", "--", "readme")
-    # The head has moved on: what is there now is no longer this merge.
+    user.git("commit", "-qam", "too early", fails=True)
     user.git("checkout", "-q", "HEAD", "--", user.name)
     assert user.ovrin("status") == "No scene has open conflicts.\n"
     assert "scene.ovrin is forgotten" in user.words()
+
+
+@pytest.mark.parametrize("command", ["stash pop", "cherry-pick -n topic", "checkout -m topic", "merge --squash topic"])
+def test_what_leaves_no_trace_of_itself_is_guarded_and_settled(user, command):
+    user.sides(*ONE_CONFLICT)
+    if "topic" not in command or "checkout" in command:
+        user.write(scene("7 Lantern 1"))
+    if "stash" in command:
+        user.git("stash", "-q")
+        user.commit(scene("6 Lantern 1"))
+    user.git(*command.split(), fails=None)
+    user.git("add", user.name)
+    user.git("commit", "-qm", "too early", fails=True)
+    user.ovrin("settle", "--take", "theirs")
+    assert ("git stash drop" in user.words()) == ("stash" in command)
+    user.git("commit", "-qam", "settled")
+    assert user.committed() == scene("2 Lantern 1" if "topic" in command and "-m" not in command else "7 Lantern 1")
+    assert user.records() == []
 
 
 def test_added_file_is_not_taken_for_a_settled_one(user):
