@@ -61,12 +61,17 @@ void CheckKinds(const ThreeTexts& texts) {
     check("base", texts.base, true);
 }
 
+/// Whether the engine might take a text for a scene that is none: it reads nothing behind a NUL.
+bool IsSuspicious(const std::string& text) {
+    return text.empty() || text.find('\0') != std::string::npos;
+}
+
 /// Reads and compares. What the engine refuses may be no scene at all, which is said better in other words;
-/// to look for that beforehand would take a tenth of the whole time.
+/// to look for all that beforehand would take a tenth of the whole time.
 std::unique_ptr<SceneMerge> Compare(const FileMerge& files, ovrin_yaml::StageWatcher& watcher) {
     SceneRules rules = ReadSceneRules(files.format);
     ThreeTexts texts = ReadTexts(files);
-    if (texts.ours.empty() || texts.theirs.empty()) CheckKinds(texts);
+    if (IsSuspicious(texts.base) || IsSuspicious(texts.ours) || IsSuspicious(texts.theirs)) CheckKinds(texts);
     try {
         return std::make_unique<SceneMerge>(std::move(texts), std::move(rules.rules), std::move(rules.types),
                                             ovrin_yaml::Threads::WhereWorthwhile, &watcher);
