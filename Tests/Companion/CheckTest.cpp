@@ -119,7 +119,7 @@ TEST(Check, GeneratedScenesAreClean) {
 TEST(Check, SameFindingsWhereTheFastReaderIsNotSure) {
     const std::string objects = Transform(2, 8, Child(3) + Child(7), 0) + Transform(3, 0, " []", 9);
     const std::string found =
-        "dangling-reference@5 child-of-another@7 dangling-reference@8 dangling-reference@13";
+        "dangling-reference@5 child-of-another@7 dangling-reference@8 dangling-reference@14";
     EXPECT_EQ(Findings(kHeader + objects), found);
     EXPECT_EQ(Findings(kHeader + objects + Object(9, 1, "\nNote:\n  'a: b': 1\n")), found);
 }

@@ -54,8 +54,8 @@ TEST(ValueLines, TellTheWholeValue) {
     Scene scene(kScene);
     const auto lines = ValueLines(*Node("a: 1\nb:\n- c: {fileID: 1}\n  d: \"x\\ny\"\ne: {f: [1, 2]}"),
                                   ObjectNames(scene.Root()));
-    EXPECT_EQ(lines, (std::vector<std::string>{"a: 1", "b:", "  -", "    c: → Gate (1)", "    d: |",
-                                               "      x", "      y", "e: {f: [1, 2]}"}));
+    EXPECT_EQ(lines, (std::vector<std::string>{"a: 1", "b:", "  - c: → Gate (1)", "    d: |", "      x",
+                                               "      y", "e: {f: [1, 2]}"}));
 }
 
 std::string Property(const std::string& path) {
