@@ -76,6 +76,7 @@ std::vector<SceneToCheck> NamedScenes(const std::vector<std::string>& files, con
         }
     };
     std::vector<SceneToCheck> scenes;
+    scenes.reserve(files.size());
     for (const std::string& file : files)
         scenes.push_back({file, pathOf(file), [file] { return ReadScene(file); }});
     return scenes;
