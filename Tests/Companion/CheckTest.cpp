@@ -138,6 +138,10 @@ TEST(Check, HostileHierarchiesTakeLinearTime) {
     for (int id = 2; id <= kCount; ++id) fan += Transform(id, 0, " []", 1);
     EXPECT_EQ(Findings(loop), "parent-loop@8");
     EXPECT_EQ(Findings(fan), "");
+    std::string keys = "\nNote:\n";
+    for (int i = 0; i < 2 * kCount; ++i)
+        keys += "  k" + std::to_string(i % kCount) + ": " + std::to_string(i) + '\n';
+    EXPECT_EQ(CheckScene(kHeader + Object(9, 1, keys), {}).size(), std::size_t{kCount});
     std::string deep = "\nNote: ";
     for (int i = 0; i < 100000; ++i) deep += "[";
     EXPECT_EQ(Findings(kHeader + Object(9, 1, deep + "\n")), "unreadable@3");
