@@ -133,10 +133,32 @@ def test_stash_is_guarded_without_an_operation_under_way(user):
     user.git("commit", "-qm", "too early", fails=True)
     user.write("other words\n", "readme")
     user.git("commit", "-qm", "another file", "--", "readme")
-    # The head has moved on: what is there now is no longer this merge.
+    user.git("commit", "-qam", "too early", fails=True)
     user.git("checkout", "-q", "HEAD", "--", user.name)
     assert user.ovrin("status") == "No scene has open conflicts.\n"
     assert "scene.ovrin is forgotten" in user.words()
+
+
+@pytest.mark.parametrize("command,settled", [
+    ("stash pop", "7 Lamp 3"), ("checkout -m topic", "7 Lantern 3"), ("cherry-pick -n topic", "2 Lamp 3"),
+    ("merge --squash topic", "2 Lamp 3")])
+def test_what_leaves_no_trace_of_itself_is_guarded_and_settled(user, command, settled):
+    user.sides(*CONFLICT_AND_MORE)
+    if command == "stash pop":
+        user.write(scene("7 Lamp 3"))
+        user.git("stash", "-q")
+        user.commit(scene("6 Lamp 1"))
+    if command == "checkout -m topic":
+        user.write(scene("7 Lamp 1 20"))
+        settled += " 20"
+    user.git(*command.split(), fails=None)
+    user.git("add", user.name)
+    user.git("commit", "-qm", "too early", fails=True)
+    user.ovrin("settle", "--take", "theirs")
+    assert ("git stash drop" in user.words()) == (command == "stash pop")
+    user.git("commit", "-qm", "settled")
+    assert user.committed() == scene(settled)
+    assert user.records() == []
 
 
 def test_added_file_is_not_taken_for_a_settled_one(user):

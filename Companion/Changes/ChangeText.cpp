@@ -102,7 +102,7 @@ std::string StatusText(const FilePair& file) {
     case FileStatus::Unmerged:
         return "not merged yet: \"ovrin status\" tells what is open";
     default:
-        return "";
+        return file.oldPath == file.newPath ? "" : "compared with " + Printable(file.oldPath);
     }
 }
 

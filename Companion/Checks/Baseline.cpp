@@ -14,7 +14,8 @@ Baseline::Baseline(const std::string& path) {
         throw Failure("Cannot read the baseline " + path + "; \"ovrin check --json > " + path +
                       "\" makes one");
     try {
-        for (const auto& finding : nlohmann::json::parse(text).at("findings")) {
+        const auto read = nlohmann::json::parse(text);
+        for (const auto& finding : read.at("findings")) {
             const auto field = [&](const char* name) { return finding.at(name).get<std::string>(); };
             ++m_Known[{field("code"), field("file"), field("object"), field("detail")}];
             ++m_Left;

@@ -76,7 +76,8 @@ ComparisonWish Sorted(const DiffOperands& operands, const Repository& repository
     for (const std::string& word : operands.words) {
         const bool areMarked = !operands.paths.empty();
         areRevisions = areMarked || (areRevisions && MayBeRevision(repository, word));
-        if (areRevisions && !areMarked && IsThere(word))
+        const bool mayBeFile = !repository.top.empty() && IsThere(word);
+        if (areRevisions && !areMarked && mayBeFile)
             throw Failure("\"" + word + "\" is a revision and a file: write \"-- " + word +
                           "\" for the file");
         (areRevisions ? wish.revisions : wish.paths).push_back(word);

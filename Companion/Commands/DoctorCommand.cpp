@@ -12,40 +12,40 @@ namespace ovrin {
 
 namespace {
 
-std::string LineOf(const Result& result) {
+std::string LineOf(const Examined& result) {
     constexpr std::size_t kWidth = 8; // of the longest state and a blank
-    std::string line = HealthName(result.finding.health);
+    std::string line = HealthName(result.diagnosis.health);
     line.resize(kWidth, ' ');
-    line += std::string(result.code) + ": " + result.finding.text;
-    if (!result.finding.cure.empty()) line += ". Cure: " + result.finding.cure;
+    line += std::string(result.code) + ": " + result.diagnosis.text;
+    if (!result.diagnosis.cure.empty()) line += ". Cure: " + result.diagnosis.cure;
     // One check is one line, whatever a program had to say.
     std::ranges::replace(line, '\n', ' ');
     return line + '\n';
 }
 
-std::string JsonOf(const std::vector<Result>& results) {
+std::string JsonOf(const std::vector<Examined>& results) {
     nlohmann::ordered_json checks = nlohmann::ordered_json::array();
-    for (const auto& [code, finding] : results)
+    for (const auto& [code, diagnosis] : results)
         checks.push_back({{"code", code},
-                          {"state", HealthName(finding.health)},
-                          {"text", finding.text},
-                          {"cure", finding.cure}});
+                          {"state", HealthName(diagnosis.health)},
+                          {"text", diagnosis.text},
+                          {"cure", diagnosis.cure}});
     const nlohmann::ordered_json report = {{"checks", checks}};
     return report.dump(2, ' ', false, nlohmann::json::error_handler_t::replace) + '\n';
 }
 
-bool Has(const std::vector<Result>& results, Health health) {
+bool Has(const std::vector<Examined>& results, Health health) {
     return std::ranges::any_of(results,
-                               [&](const Result& result) { return result.finding.health == health; });
+                               [&](const Examined& result) { return result.diagnosis.health == health; });
 }
 
 Outcome Run(bool fix, bool asJson) {
-    const std::vector<Result> results = Examine(fix);
+    const std::vector<Examined> results = Examine(fix);
     std::string text;
     if (asJson)
         text = JsonOf(results);
     else
-        for (const Result& result : results) text += LineOf(result);
+        for (const Examined& result : results) text += LineOf(result);
     PrintResult(text);
     if (Has(results, Health::Unknown)) return Outcome::Failed;
     return Has(results, Health::Problem) ? Outcome::LeftOpen : Outcome::Done;

@@ -34,6 +34,10 @@ void Tell(const Remarks& remarks) {
     for (const std::string& remark : remarks) std::cerr << "ovrin: " << remark << '\n';
 }
 
+void TellNext(const SettleScenes& scenes, const std::string& action) {
+    for (const std::string& step : NextSteps(scenes.Where(), action)) std::cerr << step << '\n';
+}
+
 Outcome List(const SettleScenes& scenes, bool asJson) {
     std::string text;
     json all = json::array();
@@ -94,8 +98,7 @@ Outcome Settle(SettleScenes& scenes, const SettleOptions& options, bool isAnyUnr
     Tell(refused);
     if (finished.empty() && !isAnyOpen && refused.empty() && !isAnyUnreadable)
         std::cerr << "No scene has open conflicts.\n";
-    if (!finished.empty())
-        for (const std::string& step : NextSteps(scenes.Where(), "")) std::cerr << step << '\n';
+    if (!finished.empty()) TellNext(scenes, scenes.Sessions().front()->Source().occasion.action);
     return isAnyOpen || isAnyUnreadable || !refused.empty() ? Outcome::LeftOpen : Outcome::Done;
 }
 
@@ -112,7 +115,7 @@ Outcome SetAside(SettleScenes& scenes, const SettleOptions& options) {
     for (const std::string& path : paths)
         std::cerr << Printable(path)
                   << (options.isAsIs ? " is settled as it stands.\n" : " is forgotten, and is as it was.\n");
-    for (const std::string& step : NextSteps(scenes.Where(), "")) std::cerr << step << '\n';
+    TellNext(scenes, "");
     return Outcome::Done;
 }
 

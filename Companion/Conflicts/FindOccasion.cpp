@@ -55,6 +55,13 @@ std::string PickedCommit(const Repository& repository, const Caller& caller) {
     return atHand.empty() ? OnlyOperand(caller) : atHand;
 }
 
+/// Whether a commit is picked or reverted in the working tree alone.
+bool IsWithoutCommit(const Caller& caller) {
+    return (caller.command == "cherry-pick" || caller.command == "revert") &&
+           std::ranges::any_of(caller.words,
+                               [](const std::string& word) { return word == "-n" || word == "--no-commit"; });
+}
+
 Occasion OfGit(const Repository& repository, const Caller& caller) {
     const GitHead head = ReadGitHead(repository);
     Occasion occasion;
@@ -80,6 +87,8 @@ Occasion OfGit(const Repository& repository, const Caller& caller) {
         occasion.ours = operands.size() == 2 ? ShortCommit(operands[0]) : "";
         occasion.theirs = operands.size() == 2 ? ShortCommit(operands[1]) : "";
     }
+    // Nothing is left that would tell later that it is under way.
+    if (IsWithoutCommit(caller)) occasion.action.clear();
     // Local changes are taken along to another branch, which becomes the head afterwards.
     if (caller.command == "checkout" || caller.command == "switch")
         occasion = {"", "", OnlyOperand(caller), "your changes", ""};

@@ -25,27 +25,29 @@ bool LeavesNoTrace(const Occasion& occasion) {
 class GitState {
 public:
     GitState(const Repository& repository, const std::vector<OpenMerge>& merges)
-        : m_IsUnderWay(!OperationIn(repository).action.empty()) {
-        const Git git = Git(repository).WithOwnIndex();
-        m_Head = git.Commit("HEAD");
+        : m_Git(Git(repository).WithOwnIndex()), m_IsUnderWay(!OperationIn(repository).action.empty()),
+          m_Head(m_Git.Commit("HEAD")) {
         std::vector<std::string> paths;
         for (const OpenMerge& merge : merges)
             if (LeavesNoTrace(merge.occasion)) paths.push_back(merge.path);
-        if (!paths.empty()) m_Differing = git.DifferingFromHead(paths, false);
+        if (!paths.empty()) m_Differing = m_Git.DifferingFromHead(paths, false);
         std::ranges::sort(m_Differing);
     }
 
     bool IsUnderWay(const OpenMerge& merge, bool isUnmerged) const {
         const Occasion& occasion = merge.occasion;
-        if (!occasion.head.empty() && occasion.head != m_Head) return false;
-        if (isUnmerged || (m_IsUnderWay && occasion.action != "stash")) return true;
-        return LeavesNoTrace(occasion) && Holds(m_Differing, merge.path);
+        const bool hasMoved = !occasion.head.empty() && occasion.head != m_Head;
+        if (LeavesNoTrace(occasion) &&
+            Holds(m_Differing, merge.path)) // other files may be committed meanwhile
+            return !hasMoved || m_Git.IsSameIn(occasion.head, m_Head, merge.path);
+        return !hasMoved && (isUnmerged || (m_IsUnderWay && occasion.action != "stash"));
     }
 
 private:
-    bool m_IsUnderWay;
-    std::string m_Head;
-    std::vector<std::string> m_Differing;
+    const Git m_Git;
+    const bool m_IsUnderWay;
+    const std::string m_Head;
+    std::vector<std::string> m_Differing; // of the merges that leave no trace
 };
 
 } // namespace

@@ -13,7 +13,7 @@ namespace {
 
 struct Check {
     const char* code;
-    Finding (*look)(Patient& patient);
+    Diagnosis (*look)(Patient& patient);
 };
 
 /// What one fix puts right others may build upon: old lines go before the driver is looked at.
@@ -34,7 +34,7 @@ constexpr Check kChecks[] = {
     {"open-conflicts", LookAtOpenConflicts},
 };
 
-Finding Look(const Check& check, Patient& patient) {
+Diagnosis Look(const Check& check, Patient& patient) {
     try {
         return check.look(patient);
     } catch (const std::exception& failure) {
@@ -42,12 +42,12 @@ Finding Look(const Check& check, Patient& patient) {
     }
 }
 
-/// The finding after the fix, or the old one with the reason why it can't be fixed.
-Finding Fixed(const Check& check, const Finding& problem, Patient& patient) {
+/// The diagnosis after the fix, or the old one with the reason why it can't be fixed.
+Diagnosis Fixed(const Check& check, const Diagnosis& problem, Patient& patient) {
     try {
         const std::string done = problem.fix();
         patient.Forget();
-        Finding after = Look(check, patient);
+        Diagnosis after = Look(check, patient);
         if (after.health != Health::Fine && after.health != Health::Note && after.health != Health::Skipped)
             return after;
         return {Health::Fixed, done + ". Before: " + problem.text};
@@ -58,13 +58,14 @@ Finding Fixed(const Check& check, const Finding& problem, Patient& patient) {
 
 } // namespace
 
-std::vector<Result> Examine(bool fix) {
+std::vector<Examined> Examine(bool fix) {
     Patient patient;
-    std::vector<Result> results;
+    std::vector<Examined> results;
     for (const Check& check : kChecks) {
-        Finding finding = Look(check, patient);
-        if (fix && finding.health == Health::Problem && finding.fix) finding = Fixed(check, finding, patient);
-        results.push_back({check.code, std::move(finding)});
+        Diagnosis diagnosis = Look(check, patient);
+        if (fix && diagnosis.health == Health::Problem && diagnosis.fix)
+            diagnosis = Fixed(check, diagnosis, patient);
+        results.push_back({check.code, std::move(diagnosis)});
     }
     return results;
 }

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Doctor/Finding.h"
+#include "Doctor/Diagnosis.h"
 
 #include <string>
 #include <vector>
@@ -8,14 +8,14 @@
 namespace ovrin {
 
 /// A check and what it found.
-struct Result {
+struct Examined {
     const char* code; ///< stable, for scripts: "git-driver"
-    Finding finding;
+    Diagnosis diagnosis;
 };
 
 /// Looks at everything, in a fixed order. With `fix` what can be put right safely is, and then looked at once
 /// more.
-std::vector<Result> Examine(bool fix);
+std::vector<Examined> Examine(bool fix);
 
 /// The stable word for a state: "ok", "note", "problem", "fixed", "skipped", "unknown".
 const char* HealthName(Health health);

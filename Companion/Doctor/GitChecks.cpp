@@ -130,7 +130,7 @@ std::string RemoveAll(const std::vector<OldLine>& lines, const ProcessSetting& s
 
 } // namespace
 
-Finding LookAtGitVersion(Patient&) {
+Diagnosis LookAtGitVersion(Patient&) {
     if (!HasGit()) return {Health::Skipped, kNoGit};
     const std::string told = OutputOf({"git", "--version"});
     std::array<int, 2> version = {0, 0};
@@ -149,7 +149,7 @@ Finding LookAtGitVersion(Patient&) {
     return {Health::Fine, "git " + name + " can do all that is asked of it"};
 }
 
-Finding LookAtGitDriver(Patient& patient) {
+Diagnosis LookAtGitDriver(Patient& patient) {
     if (!HasGit()) return {Health::Skipped, kNoGit};
     const bool isLocal = IsSetLocally(patient);
     const std::string driver = DriverIn({});
@@ -172,7 +172,7 @@ Finding LookAtGitDriver(Patient& patient) {
             SetupAdvice(false), FixBySetup("git", Scope::Global)};
 }
 
-Finding LookAtGitAttributes(Patient& patient) {
+Diagnosis LookAtGitAttributes(Patient& patient) {
     if (!HasGit()) return {Health::Skipped, kNoGit};
     if (!patient.IsIn(SystemKind::Git))
         return {Health::Skipped, "there is no git repository around this folder"};
@@ -191,7 +191,7 @@ Finding LookAtGitAttributes(Patient& patient) {
         "change the line in .gitattributes, or \"ovrin setup git --local\" to overrule it for this clone"};
 }
 
-Finding LookAtGitPath(Patient& patient) {
+Diagnosis LookAtGitPath(Patient& patient) {
     if (!HasGit()) return {Health::Skipped, kNoGit};
     const bool isLocal = IsSetLocally(patient);
     std::string call = CallIn(DriverIn({}));
@@ -208,7 +208,7 @@ Finding LookAtGitPath(Patient& patient) {
     return {Health::Fine, "git finds " + call};
 }
 
-Finding LookAtGuard(Patient& patient) {
+Diagnosis LookAtGuard(Patient& patient) {
     if (!patient.IsIn(SystemKind::Git) || !HasGit())
         return {Health::Skipped, "there is no git repository around this folder"};
     const std::string hook = PreCommitHook();
@@ -224,7 +224,7 @@ Finding LookAtGuard(Patient& patient) {
     return {Health::Fine, "a hook keeps unsettled scenes from being committed"};
 }
 
-Finding LookAtOldSetup(Patient& patient) {
+Diagnosis LookAtOldSetup(Patient& patient) {
     if (!HasGit()) return {Health::Skipped, kNoGit};
     // git tells the file of a repository from there.
     const ProcessSetting setting = {.folder = patient.IsIn(SystemKind::Git) ? patient.Around()->top : ""};

@@ -20,15 +20,15 @@ namespace ovrin {
 namespace {
 
 /// What a system that nobody set up is: a problem only where its repository has scenes.
-Finding NotSetUp(Patient& patient, SystemKind kind, const std::string& system, const std::string& name) {
+Diagnosis NotSetUp(Patient& patient, SystemKind kind, const std::string& system, const std::string& name) {
     const bool isNeeded = patient.IsIn(kind) && !patient.Scenes().empty();
-    Finding finding = {isNeeded ? Health::Problem : Health::Note, name + " is not set up to merge scenes",
-                       "ovrin setup " + system};
-    if (isNeeded) finding.fix = FixBySetup(system, Scope::Global);
-    return finding;
+    Diagnosis diagnosis = {isNeeded ? Health::Problem : Health::Note, name + " is not set up to merge scenes",
+                           "ovrin setup " + system};
+    if (isNeeded) diagnosis.fix = FixBySetup(system, Scope::Global);
+    return diagnosis;
 }
 
-Finding MissingProgram(const std::string& system, const std::string& name, const std::string& call) {
+Diagnosis MissingProgram(const std::string& system, const std::string& name, const std::string& call) {
     return {Health::Problem, name + " is to call " + call + ", which is not there", "ovrin setup " + system,
             FixBySetup(system, Scope::Global)};
 }
@@ -61,7 +61,7 @@ std::string RemoveAll(const std::vector<std::string>& files) {
 
 } // namespace
 
-Finding LookAtMercurial(Patient& patient) {
+Diagnosis LookAtMercurial(Patient& patient) {
     if (FindProgram("hg").empty()) return {Health::Skipped, "Mercurial is not installed"};
     std::string arguments = RunProcess({"hg", "config", "merge-tools.ovrin.args"}).output;
     if (arguments.ends_with('\n')) arguments.pop_back();
@@ -79,7 +79,7 @@ Finding LookAtMercurial(Patient& patient) {
     return {Health::Fine, "Mercurial merges scenes with " + call};
 }
 
-Finding LookAtSubversion(Patient& patient) {
+Diagnosis LookAtSubversion(Patient& patient) {
     if (FindProgram("svn").empty()) return {Health::Skipped, "Subversion is not installed"};
     const std::string path = HomeFor("Subversion") + "/.subversion/config";
     std::string text;
@@ -103,7 +103,7 @@ Finding LookAtSubversion(Patient& patient) {
     return {Health::Fine, "Subversion merges with " + tool};
 }
 
-Finding LookAtMergeTools(Patient&) {
+Diagnosis LookAtMergeTools(Patient&) {
     const std::string file = GetSpecFilename(kDefaultSpecFile);
     const bool isOfProgram = GetFolder(file) == GetDataFilesDir();
     const FallbackCommandMap tools = PopulateFallbacks(file);
@@ -120,7 +120,7 @@ Finding LookAtMergeTools(Patient&) {
     return {Health::Fine, file + " names tools that are there"};
 }
 
-Finding LookAtTemporaryFiles(Patient&) {
+Diagnosis LookAtTemporaryFiles(Patient&) {
     const std::vector<std::string> files = ForgottenTemporaryFiles();
     if (files.empty()) return {Health::Fine, "no merge left anything in the temporary directory"};
     return {Health::Problem,

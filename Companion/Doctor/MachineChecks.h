@@ -1,18 +1,18 @@
 #pragma once
 
-#include "Doctor/Finding.h"
+#include "Doctor/Diagnosis.h"
 
 namespace ovrin {
 
 class Patient;
 
 /// Whether Mercurial gives scenes to the program.
-Finding LookAtMercurial(Patient& patient);
+Diagnosis LookAtMercurial(Patient& patient);
 /// Whether Subversion has the program as its merge tool.
-Finding LookAtSubversion(Patient& patient);
+Diagnosis LookAtSubversion(Patient& patient);
 /// Whether the tools are there that the merge spec file names.
-Finding LookAtMergeTools(Patient& patient);
+Diagnosis LookAtMergeTools(Patient& patient);
 /// Whether merges left files in the temporary directory.
-Finding LookAtTemporaryFiles(Patient& patient);
+Diagnosis LookAtTemporaryFiles(Patient& patient);
 
 } // namespace ovrin

@@ -68,21 +68,21 @@ bool HasLongLineEnds(const SceneLook& scene) {
 
 } // namespace
 
-Finding LookAtLineEnds(Patient& patient) {
+Diagnosis LookAtLineEnds(Patient& patient) {
     if (!patient.Around()) return {Health::Skipped, kNoRepository};
     if (patient.IsIn(SystemKind::Git)) {
         const LineEndConfig config = ReadLineEndConfig(*patient.Around());
         const auto converted =
             ScenesThat(patient, [&](const SceneLook& scene) { return config.Converts(scene); });
         if (!converted.empty()) {
-            Finding finding = {
+            Diagnosis diagnosis = {
                 Health::Problem, "git changes the line ends of " + NameScenes(converted),
                 "add -text to the lines of scenes in .gitattributes, such as \"*.prefab -text\""};
             if (AttributeOf(*converted.front(), "text") == "unspecified") {
-                finding.cure += ", or \"ovrin setup git\" for all repositories";
-                finding.fix = FixBySetup("git", Scope::Global);
+                diagnosis.cure += ", or \"ovrin setup git\" for all repositories";
+                diagnosis.fix = FixBySetup("git", Scope::Global);
             }
-            return finding;
+            return diagnosis;
         }
     }
     const auto changed = ScenesThat(patient, HasLongLineEnds);
@@ -92,7 +92,7 @@ Finding LookAtLineEnds(Patient& patient) {
     return {Health::Fine, "nothing changes the line ends of scenes"};
 }
 
-Finding LookAtLfs(Patient& patient) {
+Diagnosis LookAtLfs(Patient& patient) {
     if (!patient.Around()) return {Health::Skipped, kNoRepository};
     const auto tracked = ScenesThat(patient, [](const SceneLook& scene) {
         return AttributeOf(scene, "filter") == "lfs" || ClassifyScene(scene.start) == SceneKind::LfsPointer;
@@ -103,7 +103,7 @@ Finding LookAtLfs(Patient& patient) {
         "take the lines of scenes out of those of LFS in .gitattributes, then \"git add --renormalize .\""};
 }
 
-Finding LookAtTagAuthority(Patient& patient) {
+Diagnosis LookAtTagAuthority(Patient& patient) {
     if (!patient.Around()) return {Health::Skipped, kNoRepository};
     const std::string ours(ovrin_yaml::TagAuthority());
     const auto others = ScenesThat(patient, [&](const SceneLook& scene) {
@@ -118,7 +118,7 @@ Finding LookAtTagAuthority(Patient& patient) {
             "use a build for your editor, by cmake -DOVRIN_TAG_AUTHORITY=" + authority};
 }
 
-Finding LookAtOpenConflicts(Patient& patient) {
+Diagnosis LookAtOpenConflicts(Patient& patient) {
     if (!patient.Around()) return {Health::Skipped, kNoRepository};
     const OpenMerges store(*patient.Around());
     const LiveMerges merges = FindLiveMerges(*patient.Around(), store);

@@ -45,10 +45,10 @@ public:
         std::uint32_t next = 0;
         std::vector<std::uint32_t> waiting; // positions in `sorted`, the next one last
         const auto wait = [&](std::uint32_t parent) {
-            const auto children = std::ranges::equal_range(
-                sorted, parent, {}, [&](std::uint32_t i) { return m_Nodes[i].parent; });
-            waiting.insert(waiting.end(), std::make_reverse_iterator(children.end()),
-                           std::make_reverse_iterator(children.begin()));
+            const auto parentOf = [&](std::uint32_t i) { return m_Nodes[i].parent; };
+            const auto begin = std::ranges::lower_bound(sorted, parent, {}, parentOf);
+            const auto end = std::ranges::upper_bound(sorted, parent, {}, parentOf);
+            waiting.insert(waiting.end(), std::make_reverse_iterator(end), std::make_reverse_iterator(begin));
         };
         for (wait(kNone); !waiting.empty();) {
             const std::uint32_t node = waiting.back();

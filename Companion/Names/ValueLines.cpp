@@ -60,7 +60,16 @@ private:
                 if (entry.key && !IsPlaceHolderKey(entry.key))
                     Write(entry.value, indent, blanks + Printable(entry.key->Value()) + ": ");
         }
-        for (const YAMLNode* item : ItemsOf(&value)) Write(item, indent, blanks + "- ");
+        for (const YAMLNode* item : ItemsOf(&value)) WriteItem(item, indent);
+    }
+
+    /// The first entry of a mapping or list stands behind the dash.
+    void WriteItem(const YAMLNode* item, std::size_t indent) {
+        const std::string dash = std::string(indent, ' ') + "- ";
+        if (!item || AsScalar(item) || IsOnOneLine(*item)) return Write(item, indent, dash);
+        const std::size_t first = m_Lines.size();
+        WriteEntries(*item, indent + kStep);
+        if (m_Lines.size() > first) m_Lines[first].replace(0, dash.size(), dash);
     }
 
     const ObjectNames& m_Names;

@@ -18,9 +18,11 @@ namespace {
 /// Texts of this many bytes and what the engine makes of them stay in a process until it ends.
 constexpr std::uint64_t kMostOfProcess = std::uint64_t{64} << 20;
 
-/// Memory that a byte of the three texts takes, at most: ??? was measured.
-constexpr std::uint64_t kMemoryOfByte = 8;
+/// Memory that the merge takes for a byte of the three texts. Measured: 3 where a hundredth of the objects is
+/// edited, 4 at half of them, 7 where nearly all are and every second one is a conflict.
+constexpr std::uint64_t kMemoryOfByte = 7;
 
+/// Half of the machine is left to others, and to what else git needs.
 WorkLimits Limits() {
     return {std::max(1u, std::thread::hardware_concurrency()), kMostOfProcess,
             UsableMemory() / 2 / kMemoryOfByte};

@@ -51,9 +51,9 @@ std::string ConfigLines(const ProgramCall& program) {
     return "[merge \"ovrin\"]\n" + line("name", "structural merge of scenes") +
            line("driver", ForDriver(call) + " merge --base-label %S --our-label %X --their-label %Y"
                                             " -- %O %A %B %A %P") +
-           line("recursive", "binary") + "[diff \"ovrin\"]\n" + line("command", call + " diff --external") +
-           "[difftool \"ovrin\"]\n" + line("cmd", call + " diff -- \"$LOCAL\" \"$REMOTE\"") +
-           "[mergetool \"ovrin\"]\n" +
+           line("recursive", "binary") + "[diff \"ovrin\"]\n" +
+           line("command", call + " diff --external --") + "[difftool \"ovrin\"]\n" +
+           line("cmd", call + " diff -- \"$LOCAL\" \"$REMOTE\"") + "[mergetool \"ovrin\"]\n" +
            line("cmd", call + " settle --with-tool -- \"$BASE\" \"$LOCAL\" \"$REMOTE\" \"$MERGED\"") +
            line("trustExitCode", "true");
 }

@@ -1,6 +1,6 @@
 #include "Setup/SetupRun.h"
 
-#include "Setup/FileChange.h"
+#include "Setup/ConfigChange.h"
 #include "Setup/GitSetup.h"
 #include "Setup/OtherSetups.h"
 #include "Systems/Process.h"
@@ -14,7 +14,7 @@ namespace ovrin {
 
 namespace {
 
-using Kind = FileChange::Kind;
+using Kind = ConfigChange::Kind;
 
 std::string NameOf(SystemKind kind) {
     switch (kind) {
@@ -74,7 +74,7 @@ std::string Indented(const std::string& lines) {
     return text;
 }
 
-std::string Told(const FileChange& change) {
+std::string Told(const ConfigChange& change) {
     switch (change.kind) {
     case Kind::None:
         return change.path + " has its lines already\n";
@@ -131,7 +131,7 @@ private:
     }
 
     void Change(const Configuration& file) {
-        const FileChange change = m_Wish.isUndo ? PlanRemoval(file) : PlanLines(file);
+        const ConfigChange change = m_Wish.isUndo ? PlanRemoval(file) : PlanLines(file);
         if (m_Wish.isUndo && change.kind == Kind::None) return;
         if (!m_Wish.isDryRun) CarryOut(change);
         m_Report.done += file.system + ": " + Told(change);

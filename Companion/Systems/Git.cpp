@@ -96,6 +96,10 @@ std::vector<std::string> Git::DifferingFromHead(const std::vector<std::string>& 
     return ZeroEndedTexts(Output(std::move(command)));
 }
 
+bool Git::IsSameIn(const std::string& commit, const std::string& other, const std::string& path) const {
+    return Run({"diff-tree", "--quiet", commit, other, "--", path}).Succeeded();
+}
+
 bool Git::StoresAs(const std::string& path, const std::string& bytes) const {
     return Output({"hash-object", "--", path}) == Output({"hash-object", "--stdin"}, bytes);
 }

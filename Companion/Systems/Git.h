@@ -48,6 +48,8 @@ public:
     /// All that the index has where there is no commit.
     std::vector<std::string> DifferingFromHead(const std::vector<std::string>& paths,
                                                bool inIndexAlone) const;
+    /// Whether two commits have the same at a path.
+    bool IsSameIn(const std::string& commit, const std::string& other, const std::string& path) const;
     /// Whether a file of the working tree, as git would store it, is these bytes.
     bool StoresAs(const std::string& path, const std::string& bytes) const;
     /// The commit that a name stands for; empty if it is none.

@@ -91,8 +91,8 @@ std::vector<std::string> MergeBases(const Git& git, const NamedCommit& ours, con
     const auto found = Ask(git, {"merge-base", "--all", ours.id, theirs.id});
     std::vector<std::string> bases = found ? Lines(*found) : std::vector<std::string>();
     if (IsDecisionCutOff(git, {ours.id, theirs.id}, bases))
-        throw Failure("This clone is shallow: it lacks the history that says where " + ours.name + " and " +
-                      theirs.name + " come from.\nGet it with \"git fetch --unshallow\"; a CI job that " +
+        throw Failure("This clone is shallow: it lacks the history that tells where " + ours.name + " and " +
+                      theirs.name + " parted.\nGet it with \"git fetch --unshallow\"; a CI job that " +
                       "checks out with a depth needs the whole history, such as by \"fetch-depth: 0\"");
     return bases;
 }

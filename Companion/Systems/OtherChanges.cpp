@@ -92,7 +92,7 @@ public:
         return entries;
     }
     CommandWords Cat(const std::string& revision, const std::string& path) const override {
-        if (revision == Parent()) return {"svn", "cat", "-r", revision, "--", Operand(path)};
+        if (revision == Parent()) return {"svn", "cat", "-r", revision, "--", path + "@"};
         // By its address, since the working copy may have lost the file.
         std::string folder = OutputOf({"svn", "info", "--show-item", "url", "."}, kPlain);
         while (folder.ends_with('\n')) folder.pop_back();
@@ -105,8 +105,10 @@ public:
         if (!range.empty()) call.insert(call.end(), {"-r", range});
         return call;
     }
-    /// What stands behind the last @ would be a revision.
-    std::string Operand(const std::string& path) const override { return path + "@"; }
+    /// What stands behind the last @ would be a revision, but where only the working copy is looked at.
+    std::string Operand(const std::string& path) const override {
+        return m_Wish.revisions.empty() ? path : path + "@";
+    }
     std::string OnDisk(const std::string& path) const override { return path; }
     const char* Parent() const override { return "BASE"; }
 

@@ -1,4 +1,4 @@
-#include "Setup/FileChange.h"
+#include "Setup/ConfigChange.h"
 
 #include "Setup/MarkedBlock.h"
 #include "Words/Failure.h"
@@ -23,7 +23,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-using Kind = FileChange::Kind;
+using Kind = ConfigChange::Kind;
 
 constexpr std::string_view kShellLine = "#!/bin/sh\n";
 
@@ -104,8 +104,8 @@ std::string ForeignLines(const std::string& found, const std::string& written) {
     return foreign;
 }
 
-FileChange Planned(const Configuration& configuration, Kind kind, const std::string& before,
-                   const std::string& after) {
+ConfigChange Planned(const Configuration& configuration, Kind kind, const std::string& before,
+                     const std::string& after) {
     if (configuration.check) configuration.check(before, after);
     return {.kind = kind,
             .path = configuration.path,
@@ -115,10 +115,10 @@ FileChange Planned(const Configuration& configuration, Kind kind, const std::str
             .after = after};
 }
 
-FileChange PlanNewFile(const Configuration& configuration) {
+ConfigChange PlanNewFile(const Configuration& configuration) {
     const unsigned folders = MissingFolders(configuration.path);
     const std::string text(configuration.kind == FileKind::Script ? kShellLine : std::string_view());
-    FileChange change = Planned(
+    ConfigChange change = Planned(
         configuration, Kind::Make, {},
         AddBlock(text, text.size(), configuration.lines, {true, folders}, MarkOf(configuration.kind)));
     change.folders = folders;
@@ -134,7 +134,7 @@ std::string ForeignLines(const Configuration& configuration, const MarkedBlock& 
     return ForeignLines(block.lines, configuration.lines);
 }
 
-void MakeFolders(const FileChange& change) {
+void MakeFolders(const ConfigChange& change) {
     std::error_code error;
     fs::create_directories(fs::path(change.path).parent_path(), error);
     if (error) FailWith("Cannot make the folder of " + change.path, error.value());
@@ -145,14 +145,14 @@ void RemoveEmptyFolders(const fs::path& file, unsigned count) {
     for (; count > 0 && rmdir(folder.c_str()) == 0; --count) folder = folder.parent_path();
 }
 
-void Delete(const FileChange& change) {
+void Delete(const ConfigChange& change) {
     std::error_code error;
     const fs::path place = fs::canonical(change.path, error); // a link to it was there before
     if (error || !fs::remove(place, error)) FailWith("Cannot remove " + change.path, error.value());
     RemoveEmptyFolders(place, change.folders);
 }
 
-void Write(const FileChange& change) {
+void Write(const ConfigChange& change) {
     if (change.folders > 0) MakeFolders(change);
     const int error =
         Deliver(change.path, {change.after.size(), [&](OutputStream& stream) { stream << change.after; }});
@@ -163,7 +163,7 @@ void Write(const FileChange& change) {
 
 } // namespace
 
-FileChange PlanLines(const Configuration& configuration) {
+ConfigChange PlanLines(const Configuration& configuration) {
     const auto text = TextOf(configuration.path);
     if (!text) return PlanNewFile(configuration);
     const FirstMark mark = MarkOf(configuration.kind);
@@ -178,19 +178,19 @@ FileChange PlanLines(const Configuration& configuration) {
     std::string after = ReplaceBlock(*text, *block, configuration.lines, mark);
     after.insert(block->begin, foreign);
     if (after == *text) return {.kind = Kind::None, .path = configuration.path};
-    FileChange change = Planned(configuration, Kind::Replace, *text, after);
+    ConfigChange change = Planned(configuration, Kind::Replace, *text, after);
     change.kept = foreign;
     return change;
 }
 
-FileChange PlanRemoval(const Configuration& configuration) {
+ConfigChange PlanRemoval(const Configuration& configuration) {
     const auto text = TextOf(configuration.path);
     const auto block = text ? FindBlock(*text, configuration.path) : std::nullopt;
     if (!block) return {.kind = Kind::None, .path = configuration.path};
     const std::string foreign = ForeignLines(configuration, *block);
     const std::string after = RemoveBlock(*text, *block, foreign);
     const bool isRest = configuration.kind == FileKind::Script ? after == kShellLine : after.empty();
-    FileChange change =
+    ConfigChange change =
         Planned(configuration, block->origin.madeFile && isRest ? Kind::Delete : Kind::Remove, *text, after);
     change.lines = block->lines;
     change.kept = foreign;
@@ -198,7 +198,7 @@ FileChange PlanRemoval(const Configuration& configuration) {
     return change;
 }
 
-void CarryOut(const FileChange& change) {
+void CarryOut(const ConfigChange& change) {
     if (change.kind == Kind::None) return;
     if (TextOf(change.path).value_or("") != change.before)
         throw Failure(change.path + " was changed by somebody else at this moment: nothing is written to it");

@@ -8,7 +8,7 @@
 namespace ovrin {
 
 /// What is to become of a file that takes lines of the program.
-struct FileChange {
+struct ConfigChange {
     enum class Kind {
         None,    ///< the lines are as they should be: there, or gone
         Make,    ///< a file is made of them
@@ -27,12 +27,12 @@ struct FileChange {
 
 /// What has to be done so that the file has its lines. Throws Failure where that can't be: a file that can't
 /// be read, a script of another language.
-FileChange PlanLines(const Configuration& configuration);
+ConfigChange PlanLines(const Configuration& configuration);
 
 /// What has to be done so that it hasn't.
-FileChange PlanRemoval(const Configuration& configuration);
+ConfigChange PlanRemoval(const Configuration& configuration);
 
 /// Does it. Throws Failure if it can't be done or the file was changed since; nothing has happened then.
-void CarryOut(const FileChange& change);
+void CarryOut(const ConfigChange& change);
 
 } // namespace ovrin

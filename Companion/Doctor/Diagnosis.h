@@ -16,7 +16,7 @@ enum class Health {
 };
 
 /// What a check found, for people.
-struct Finding {
+struct Diagnosis {
     Health health = Health::Fine;
     std::string text;      ///< what is so, of what
     std::string cure = {}; ///< what to do; empty where nothing is to be done
