@@ -11,8 +11,7 @@ import tempfile
 
 import pytest
 
-from systems import System
-from test_script import can_mount
+from systems import System, can_mount
 from test_systems import (CONFLICT_AND_MORE, CONFLICT_AND_OBJECTS, HEADER, ONE_CONFLICT, components,
                           game_object, scene)
 
@@ -139,21 +138,25 @@ def test_stash_is_guarded_without_an_operation_under_way(user):
     assert "scene.ovrin is forgotten" in user.words()
 
 
-@pytest.mark.parametrize("command", ["stash pop", "cherry-pick -n topic", "checkout -m topic", "merge --squash topic"])
-def test_what_leaves_no_trace_of_itself_is_guarded_and_settled(user, command):
-    user.sides(*ONE_CONFLICT)
-    if "topic" not in command or "checkout" in command:
-        user.write(scene("7 Lantern 1"))
-    if "stash" in command:
+@pytest.mark.parametrize("command,settled", [
+    ("stash pop", "7 Lamp 3"), ("checkout -m topic", "7 Lantern 3"), ("cherry-pick -n topic", "2 Lamp 3"),
+    ("merge --squash topic", "2 Lamp 3")])
+def test_what_leaves_no_trace_of_itself_is_guarded_and_settled(user, command, settled):
+    user.sides(*CONFLICT_AND_MORE)
+    if command == "stash pop":
+        user.write(scene("7 Lamp 3"))
         user.git("stash", "-q")
-        user.commit(scene("6 Lantern 1"))
+        user.commit(scene("6 Lamp 1"))
+    if command == "checkout -m topic":
+        user.write(scene("7 Lamp 1 20"))
+        settled += " 20"
     user.git(*command.split(), fails=None)
     user.git("add", user.name)
     user.git("commit", "-qm", "too early", fails=True)
     user.ovrin("settle", "--take", "theirs")
-    assert ("git stash drop" in user.words()) == ("stash" in command)
-    user.git("commit", "-qam", "settled")
-    assert user.committed() == scene("2 Lantern 1" if "topic" in command and "-m" not in command else "7 Lantern 1")
+    assert ("git stash drop" in user.words()) == (command == "stash pop")
+    user.git("commit", "-qm", "settled")
+    assert user.committed() == scene(settled)
     assert user.records() == []
 
 
