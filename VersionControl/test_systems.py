@@ -105,6 +105,20 @@ def test_other_files_are_merged_by_lines(system):
     assert system.read("numbers.txt") == NUMBERS.replace("1", "one").replace("9", "nine")
 
 
+@holds_for(Mercurial, Subversion)
+@pytest.mark.parametrize("name", ["a b.ovrin", "'quoted\" $x.ovrin", "-dash.ovrin", "Hafen \u2693=1.ovrin", "*[a].ovrin"])
+def test_any_name_is_merged_recorded_and_settled(system, name):
+    system.name = name
+    system.sides(*CONFLICT_AND_OBJECTS)
+    system.merge(fails=True)
+    assert system.is_open()
+    assert system.read() == scene("5 Lamp 3 20") + game_object(30, 0, "Boat", 1)
+    system.run("ovrin", "settle", "--take", "theirs")
+    assert not system.is_open()
+    assert system.read() == scene("2 Lamp 3 20") + game_object(30, 0, "Boat", 1)
+    system.conclude()
+
+
 # What is set up for all repositories of a user meets files of other programs, too.
 @holds_for(Git, Mercurial)
 def test_what_is_no_scene_but_for_its_name_is_merged_by_lines(system):
