@@ -11,7 +11,7 @@ import tempfile
 
 import pytest
 
-from test_script import can_mount
+from systems import can_mount
 from test_settle import LEFT_OPEN, User
 from test_systems import CONFLICT_AND_MORE, HEADER, ONE_CONFLICT, OTHER_FIELDS, game_object, scene
 

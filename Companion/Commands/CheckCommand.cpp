@@ -82,9 +82,9 @@ CheckedScene Check(const SceneToCheck& scene, const YAMLTypeInfoManager& types,
     return checked;
 }
 
-CheckResult CheckAll(const std::vector<SceneToCheck>& scenes, const YAMLTypeInfoManager& types,
-                     const OpenConflicts& conflicts, Baseline& baseline) {
-    CheckResult result;
+CheckedScenes CheckAll(const std::vector<SceneToCheck>& scenes, const YAMLTypeInfoManager& types,
+                       const OpenConflicts& conflicts, Baseline& baseline) {
+    CheckedScenes result;
     ForEachInOrder(
         scenes.size(), [&](std::size_t index) { return Check(scenes[index], types, conflicts); },
         [&](std::size_t, CheckedScene scene) {
@@ -106,7 +106,7 @@ std::string Count(std::size_t count, const std::string& what) {
 }
 
 /// `left`: findings of the baseline that are gone.
-Outcome TellResult(const CheckResult& result, std::size_t left, std::size_t scenes) {
+Outcome TellResult(const CheckedScenes& result, std::size_t left, std::size_t scenes) {
     std::size_t findings = 0;
     for (const CheckedScene& scene : result.scenes) findings += scene.findings.size();
     std::cerr << "Checked " << Count(result.checked, "scene") << ": " << Count(findings, "finding");
@@ -129,7 +129,7 @@ Outcome RunCheck(const CheckWish& wish) {
     const YAMLTypeInfoManager types = ReadTypeInfo(wish.typeInfo);
     Baseline baseline = wish.baseline.empty() ? Baseline() : Baseline(wish.baseline);
     const OpenConflicts conflicts = ConflictsOf(wish, repository);
-    const CheckResult result = CheckAll(scenes, types, conflicts, baseline);
+    const CheckedScenes result = CheckAll(scenes, types, conflicts, baseline);
     PrintResult(wish.sarif ? ToSarif(result) : wish.json ? ToJson(result) : ToLines(result));
     // Of a part of the scenes nobody knows.
     return TellResult(result, wish.all ? baseline.Left() : 0, scenes.size());

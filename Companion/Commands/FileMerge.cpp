@@ -8,6 +8,7 @@
 
 #include "Commands/FileMerge.h"
 
+#include "Commands/Output.h"
 #include "Conflicts/ConflictReport.h"
 #include "Conflicts/OpenMerges.h"
 #include "Conflicts/SceneMerge.h"
@@ -26,7 +27,6 @@
 
 #include <cerrno>
 #include <filesystem>
-#include <iostream>
 #include <memory>
 #include <system_error>
 
@@ -144,7 +144,7 @@ std::string Lasting(const std::string& file, const std::string& byDefault) {
 
 /// What is told of an open merge that can't be written down.
 std::string Record(const Records& records, const FileMerge& files, OpenMerge merge) {
-    if (records.path.empty()) return {};
+    if (records.path.empty()) return "Nothing is written down: there is no working tree around the file.\n";
     try {
         merge.path = records.path;
         merge.texts = ReadTexts(files); // as they still are: the result comes later
@@ -208,7 +208,7 @@ Outcome Merge(const FileMerge& files) {
     DeliverResult(files.result, result);
     const std::string told = TellOpen(merge, open) + complaint + (isRecorded ? kNextStep : "");
     progress.Wipe();
-    std::cerr << told;
+    Tell(told);
     return Outcome::LeftOpen;
 }
 

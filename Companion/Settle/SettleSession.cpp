@@ -3,7 +3,7 @@
 #include "Conflicts/DecisionPath.h"
 #include "Conflicts/OpenMerges.h"
 #include "Scenes/SceneRules.h"
-#include "Settle/ChildLists.h"
+#include "Settle/Consequences.h"
 
 #include <algorithm>
 #include <set>
@@ -38,15 +38,6 @@ ResolveTable TableOf(const std::vector<Decision>& decisions) {
 std::optional<Side> SideOf(std::optional<MergeResolve> resolve) {
     if (!resolve) return {};
     return *resolve == ResolveBase ? Side::Base : *resolve == ResolveRight ? Side::Ours : Side::Theirs;
-}
-
-/// The decision for a side, and what follows from it.
-void AddDecisions(SceneMerge& merge, const OpenConflict& conflict, Side side,
-                  std::vector<Decision>& decisions) {
-    decisions.push_back({DecisionPath(conflict.path), side});
-    if (conflict.kind != ConflictKind::ParentLoop) return;
-    for (Decision& list : DecideChildLists(merge, conflict.path.front(), side))
-        decisions.push_back(std::move(list));
 }
 
 } // namespace
@@ -106,10 +97,16 @@ template <class Step> auto SettleSession::OrBack(const Step& step) {
     }
 }
 
-std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisions) {
+std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisions, Follow follow) {
     return OrBack([&] {
-        m_Decisions.insert(m_Decisions.end(), decisions.begin(), decisions.end());
-        m_Steps.push_back(decisions.size());
+        const std::size_t before = m_Decisions.size();
+        for (const Decision& decision : decisions) {
+            m_Decisions.push_back(decision);
+            const Path path = PathOfDecision(decision.path);
+            const auto open = std::ranges::find(Open(), path, &OpenConflict::path);
+            if (follow == Follow::Yes && open != Open().end()) AddConsequences({*open}, decision.side);
+        }
+        m_Steps.push_back(m_Decisions.size() - before);
         MergeBy(m_Decisions);
         std::vector<Decision> unmatched;
         for (const Decision& lost : m_Merge.Unmatched())
@@ -120,17 +117,23 @@ std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisio
     });
 }
 
+void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, Side side) {
+    const std::vector<Decision> more = Consequences(m_Merge, m_Names, conflicts, side);
+    m_Decisions.insert(m_Decisions.end(), more.begin(), more.end());
+}
+
 std::size_t SettleSession::TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant) {
     return OrBack([&] {
         std::set<Path> tried;
         const std::size_t before = m_Decisions.size();
         for (;;) {
-            std::vector<Decision> round;
+            std::vector<OpenConflict> round;
             for (const OpenConflict& conflict : Open())
-                if (isMeant(conflict) && tried.insert(conflict.path).second)
-                    AddDecisions(m_Merge, conflict, side, round);
+                if (isMeant(conflict) && tried.insert(conflict.path).second) round.push_back(conflict);
             if (round.empty()) break;
-            m_Decisions.insert(m_Decisions.end(), round.begin(), round.end());
+            for (const OpenConflict& conflict : round)
+                m_Decisions.push_back({DecisionPath(conflict.path), side});
+            AddConsequences(round, side);
             MergeBy(m_Decisions);
         }
         m_Steps.push_back(m_Decisions.size() - before);

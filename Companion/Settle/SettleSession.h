@@ -49,9 +49,11 @@ public:
     /// through.
     bool Touches(const std::string& path);
 
+    /// Whether what follows from decisions about open conflicts (Settle/Consequences.h) is decided with them.
+    enum class Follow { No, Yes };
     /// Makes these decisions, as one step. Returns those that match nothing; if there are any, nothing is
     /// decided.
-    std::vector<Decision> Decide(const std::vector<Decision>& decisions);
+    std::vector<Decision> Decide(const std::vector<Decision>& decisions, Follow follow = Follow::Yes);
     /// Decides all open conflicts that `isMeant` accepts, and those of them that follow, for a side, as one
     /// step. What can't be settled by a side stays open. Returns how many conflicts were settled.
     std::size_t TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant);
@@ -69,6 +71,7 @@ public:
     const MergeNames& Names() const { return m_Names; }
 
 private:
+    void AddConsequences(const std::vector<OpenConflict>& conflicts, Side side);
     void MergeBy(const std::vector<Decision>& decisions);
     template <class Step> auto OrBack(const Step& step);
 

@@ -57,8 +57,8 @@ std::vector<Meant> FindMeant(Sessions sessions, const std::string& what) {
     throw Failure(text + "\nGive the path, and the file where there are several");
 }
 
-void MakeStep(SettleSession& session, const std::vector<Decision>& decisions) {
-    const std::vector<Decision> unmatched = session.Decide(decisions);
+void MakeStep(SettleSession& session, const std::vector<Decision>& decisions, SettleSession::Follow follow) {
+    const std::vector<Decision> unmatched = session.Decide(decisions, follow);
     if (!unmatched.empty()) FailWithNothing(unmatched.front().path);
 }
 
@@ -115,14 +115,15 @@ void DecideWanted(Sessions sessions, std::span<const Wanted> wanted) {
         if (meant.size() > 1 && !IsPattern(one.what)) FailWithSeveral(one.what, meant);
         for (const Meant& place : meant) decisions[place.session].push_back({place.path, one.side});
     }
-    for (const auto& [session, made] : decisions) MakeStep(*session, made);
+    for (const auto& [session, made] : decisions) MakeStep(*session, made, SettleSession::Follow::Yes);
 }
 
 void DecideByFile(Sessions sessions, const std::string& file) {
     if (sessions.size() != 1)
         throw Failure("A file of decisions is for one scene, and there are " +
                       std::to_string(sessions.size()) + ": name the one that is meant behind the options");
-    MakeStep(*sessions.front(), ReadDecisionFile(file));
+    // Nothing is added to it, so that the engine by itself would give the same.
+    MakeStep(*sessions.front(), ReadDecisionFile(file), SettleSession::Follow::No);
 }
 
 std::size_t TakeSide(Sessions sessions, Side side, const std::string& under) {

@@ -148,7 +148,7 @@ TEST(Check, HostileHierarchiesTakeLinearTime) {
 }
 
 TEST(Check, ListsAreValidWhateverTheBytes) {
-    CheckResult result;
+    CheckedScenes result;
     result.scenes.push_back(
         {"a b/\xff\"#.ovrin", CheckScene(kHeader + Object(9, 1, "\nNote:\n  a: {fileID: \xff}\n"), {})});
     ASSERT_EQ(result.scenes[0].findings.size(), 1u);

@@ -133,17 +133,24 @@ TEST_F(SettleSessionTest, LoopOfParentsIsSettledWithItsListsOfChildren) {
     EXPECT_EQ(loop->Result(), kHeader + Transform(10, 0, none, 1) + Transform(20, 0, none, 1));
 }
 
-// Theirs removes the object that ours changes, and the other way round.
-TEST_F(SettleSessionTest, RemovalAgainstChangeIsSettledByEitherSide) {
-    const std::string three = Transform(1, 0, " []"), two = Transform(2, 0, " []", 3);
-    const auto removed =
-        SessionOf({kHeader + three + Transform(2, 0, " []"), kHeader + three + two, kHeader + three});
-    EXPECT_EQ(removed->Open().size(), 1);
-    removed->TakeAll(Side::Theirs, [](const OpenConflict&) { return true; });
-    EXPECT_EQ(removed->Result(), kHeader + three);
+// Theirs removes the lantern, 10 and 11, with its place below 21; ours changes 10 alone.
+TEST_F(SettleSessionTest, ObjectIsKeptWithAllThatWasRemovedWithIt) {
+    std::string theirs = texts.base;
+    const std::size_t begin = theirs.find("--- !o!1 &10"), end = theirs.find("--- !o!1 &20");
+    theirs.erase(begin, end - begin).replace(theirs.find("\n  - {fileID: 11}"), 17, " []");
+    std::string ours = texts.base;
+    ours.replace(ours.find("m_Range: 1"), 10, "m_Range: 2");
+    const auto removed = SessionOf({texts.base, ours, theirs});
+    ASSERT_EQ(removed->Open().size(), 1);
+    const auto all = [](const OpenConflict&) { return true; };
+    removed->TakeAll(Side::Ours, all);
+    EXPECT_EQ(removed->Result(), ours);
     removed->Undo();
-    removed->TakeAll(Side::Ours, [](const OpenConflict&) { return true; });
-    EXPECT_EQ(removed->Result(), kHeader + three + two);
+    removed->Decide({{"10", Side::Base}});
+    EXPECT_EQ(removed->Result(), texts.base);
+    removed->Undo();
+    removed->TakeAll(Side::Theirs, all);
+    EXPECT_EQ(removed->Result(), theirs);
 }
 
 } // namespace

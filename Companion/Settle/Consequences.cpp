@@ -1,0 +1,140 @@
+#include "Settle/Consequences.h"
+
+#include "Conflicts/DecisionPath.h"
+#include "Names/ObjectBody.h"
+
+#include <algorithm>
+#include <iterator>
+#include <set>
+
+namespace ovrin {
+
+using namespace ovrin_yaml;
+
+namespace {
+
+using ID = MergeNames::ID;
+using IDs = std::set<ID>; // only looked into: its order is that of addresses
+
+Version VersionOf(Side side) {
+    return side == Side::Base ? Version::Base : side == Side::Ours ? Version::Ours : Version::Theirs;
+}
+
+Side OtherThan(Side side) {
+    return side == Side::Ours ? Side::Theirs : Side::Ours;
+}
+
+/// Finds decisions in the trees of a merge.
+class Search {
+public:
+    Search(SceneMerge& merge, const MergeNames& names) : m_Merge(merge), m_Names(names) {
+        for (const OpenConflict& conflict : merge.Open())
+            if (conflict.path.size() == 1) m_Open.insert(conflict.path.front());
+    }
+
+    /// For a Transform in a loop, at which `side` is taken.
+    void EndLoop(ID transform, Side side) {
+        for (const Side dropped : {Side::Ours, Side::Theirs}) {
+            const ID before = ParentIn(Side::Base, transform), after = ParentIn(dropped, transform);
+            if (dropped == side || before == after) continue;
+            for (const ID parent : {before, after}) DropChange(dropped, parent, "m_Children", transform);
+        }
+    }
+
+    /// For objects that are kept although `remover` removed them.
+    void Keep(const std::vector<ID>& kept, Side remover) {
+        IDs tops;
+        for (const ID id : kept) {
+            const ID top = TopOfRemoval(id, remover);
+            if (!tops.insert(top).second) continue;
+            DropChange(remover, OwnerOf(top, remover), "m_Component", top);
+            if (const ID transform = TransformOf(top, remover))
+                DropChange(remover, ParentIn(OtherThan(remover), transform), "m_Children", transform);
+        }
+        for (const auto& [id, object] : m_Merge.Session().BaseObjects().GetMapping())
+            if (IsRemoved(id, remover) && !m_Open.contains(id) && tops.contains(TopOfRemoval(id, remover)))
+                m_Decisions.push_back({DecisionPath(Path{id}), OtherThan(remover)});
+    }
+
+    std::vector<Decision> Decisions() && { return std::move(m_Decisions); }
+
+private:
+    ObjectBody Body(Side side, ID id) const { return BodyOf(m_Names.In(VersionOf(side)).Find(id)); }
+
+    ID ParentIn(Side side, ID transform) const {
+        return LocalReference(Body(side, transform).Field(YAMLScalar::mFather));
+    }
+
+    /// By one side alone.
+    bool IsRemoved(ID id, Side remover) const {
+        return m_Names.Has(Version::Base, id) && !m_Names.Has(VersionOf(remover), id) &&
+               m_Names.Has(VersionOf(OtherThan(remover)), id);
+    }
+
+    /// The highest object of those that were removed with this one.
+    ID TopOfRemoval(ID id, Side remover) const {
+        const ObjectNames& names = m_Names.In(VersionOf(OtherThan(remover)));
+        ID top = id;
+        for (ID above = names.Above(id); above && IsRemoved(above, remover); above = names.Above(above))
+            top = above;
+        return top;
+    }
+
+    /// The GameObject of a component.
+    ID OwnerOf(ID id, Side remover) const {
+        return LocalReference(Body(OtherThan(remover), id).Field(YAMLScalar::Lookup("m_GameObject")));
+    }
+
+    /// That of a GameObject.
+    ID TransformOf(ID id, Side remover) const {
+        const Side keeper = OtherThan(remover);
+        for (const YAMLNode* entry : ItemsOf(Body(keeper, id).Field(YAMLScalar::mComponent)))
+            if (const ID component = ComponentOf(entry); component && Body(keeper, component).IsTransform())
+                return component;
+        return nullptr;
+    }
+
+    IDs Listed(Side side, ID owner, const YAMLScalar* list) const {
+        IDs ids;
+        for (const YAMLNode* entry : ItemsOf(Body(side, owner).Field(list)))
+            ids.insert(list == YAMLScalar::mComponent ? ComponentOf(entry) : LocalReference(entry));
+        return ids;
+    }
+
+    /// Takes the other side's list where all that the side changed in it is this entry.
+    void DropChange(Side dropped, ID owner, const char* name, ID entry) {
+        if (!owner) return;
+        const YAMLScalar* list = YAMLScalar::Lookup(name);
+        const IDs before = Listed(Side::Base, owner, list), after = Listed(dropped, owner, list);
+        std::vector<ID> changed;
+        std::ranges::set_symmetric_difference(before, after, std::back_inserter(changed));
+        const ObjectBody body = Body(dropped, owner);
+        if (changed == std::vector{entry} && body.className)
+            m_Decisions.push_back({DecisionPath(Path{owner, body.className, list}), OtherThan(dropped)});
+    }
+
+    SceneMerge& m_Merge;
+    const MergeNames& m_Names;
+    IDs m_Open;
+    std::vector<Decision> m_Decisions;
+};
+
+} // namespace
+
+std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
+                                   std::span<const OpenConflict> conflicts, Side side) {
+    Search search(merge, names);
+    for (const OpenConflict& conflict : conflicts)
+        if (conflict.kind == ConflictKind::ParentLoop) search.EndLoop(conflict.path.front(), side);
+    for (const Side remover : {Side::Ours, Side::Theirs}) {
+        std::vector<ID> kept;
+        for (const OpenConflict& conflict : conflicts)
+            if (conflict.path.size() == 1 && !names.Has(VersionOf(remover), conflict.path.front()) &&
+                names.Has(VersionOf(side), conflict.path.front()))
+                kept.push_back(conflict.path.front());
+        if (!kept.empty()) search.Keep(kept, remover);
+    }
+    return std::move(search).Decisions();
+}
+
+} // namespace ovrin

@@ -1,0 +1,24 @@
+#pragma once
+
+#include "Conflicts/OpenMerge.h"
+#include "Conflicts/SceneMerge.h"
+#include "Names/MergeNames.h"
+
+#include <span>
+#include <vector>
+
+namespace ovrin {
+
+/// What follows when `side` is taken for these conflicts: decisions without which the scene would lack what
+/// it refers to, or the other way round.
+///
+///     an object is kept            so are the parts of the removal that it belongs to: the GameObject, its
+///     that a side removed          components, all that stands under it, and the entry in the owner's list
+///     a loop of parents is ended   the lists of children follow
+///
+/// A list is left to the merge where the side whose change is dropped changed other entries of it, too. What
+/// is open by itself is left to its own decision.
+std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
+                                   std::span<const OpenConflict> conflicts, Side side);
+
+} // namespace ovrin
