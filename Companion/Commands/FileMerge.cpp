@@ -104,9 +104,8 @@ Outcome MergeByLines(const FileMerge& files) {
     const auto merged = MergeLines(files.base, files.ours, files.theirs);
     if (!merged) throw Failure(TellKind("ours", SceneKind::NoScene));
     DeliverResult(files.result, merged->text);
-    std::cerr << "ovrin: " << Printable(files.path) << " is no scene in any version, and was merged by lines";
-    if (merged->conflicts > 0) std::cerr << ": conflicts stand between markers";
-    std::cerr << '\n';
+    Tell("ovrin: " + Printable(files.path) + " is no scene in any version, and was merged by lines" +
+         (merged->conflicts > 0 ? ": conflicts stand between markers\n" : "\n"));
     return merged->conflicts > 0 ? Outcome::LeftOpen : Outcome::Done;
 }
 
