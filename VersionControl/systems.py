@@ -28,7 +28,7 @@ class System:
         foreign = ("XDG_CONFIG_HOME", "GIT_DIR", "GIT_WORK_TREE", "GIT_EXTERNAL_DIFF", "HGMERGE", "SVN_MERGE")
         self.environment = {name: value for name, value in os.environ.items() if name not in foreign}
         self.bare_path = self.environment["PATH"]
-        self.environment |= {"HOME": str(self.home), "GIT_CONFIG_NOSYSTEM": "1", "EDITOR": "false",
+        self.environment |= {"HOME": str(self.home), "GIT_CONFIG_NOSYSTEM": "1", "EDITOR": "false", "LC_ALL": "C.UTF-8",
                              "PATH": f"{self.fakes}:{installed}/bin:{self.bare_path}"}
 
     @property
@@ -155,7 +155,7 @@ class Mercurial(System):
 
     def commit(self, text, name=None):
         self.write(text, name)
-        self.run("hg", "commit", "-qA", "-m", "change", name or self.name)
+        self.run("hg", "commit", "-qA", "-m", "change", "--", f"path:{name or self.name}")
 
     def sides(self, base, theirs, ours, name=None):
         self.start()
@@ -177,7 +177,7 @@ class Mercurial(System):
         return listed.startswith("U")
 
     def versions(self):
-        committed = (self.run("hg", "cat", "-r", revision, self.name) for revision in self.revisions)
+        committed = (self.run("hg", "cat", "-r", revision, "--", f"path:{self.name}") for revision in self.revisions)
         return (*committed, self.read(f"{self.name}.orig"))
 
     def conclude(self, fails=False):
@@ -212,7 +212,7 @@ class Subversion(System):
         """Theirs is committed, ours stands in the working copy."""
         self.start()
         self.write(base)
-        self.run("svn", "add", "-q", self.name)
+        self.run("svn", "add", "-q", "--", self.name)
         self.commit(base)
         self.commit(theirs)
         self.run("svn", "update", "-qr", "1")
@@ -226,7 +226,7 @@ class Subversion(System):
         return self.run(*command, fails=None, **environment)
 
     def is_open(self):
-        return self.run("svn", "status", self.name).startswith("C ")
+        return self.run("svn", "status", "--", self.name).startswith("C ")
 
     def versions(self):
         return tuple(self.read(f"{self.name}.{name}") for name in ("r1", "r2", "mine"))

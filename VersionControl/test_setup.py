@@ -51,11 +51,6 @@ def put(path, content, mode=0o644):
     path.chmod(mode)
 
 
-def words(user):
-    """What the last command had to say besides its results."""
-    return user.log.read_text(encoding="utf-8")
-
-
 def driver(user, *scope):
     return user.run("git", "config", *scope, "--get", "merge.ovrin.driver", fails=None)
 
@@ -80,7 +75,7 @@ def test_undo_leaves_nothing_where_nothing_was(user):
     user.run("ovrin", "setup", "--undo")
     assert tree(user.home) == {}
     user.run("ovrin", "setup", "--undo")
-    assert "nothing that setup wrote" in words(user)
+    assert "nothing that setup wrote" in user.report
 
 
 def test_dry_run_tells_the_same_and_writes_nothing(user):
@@ -108,7 +103,7 @@ def test_undo_keeps_what_git_wrote_among_our_lines(user):
     user.run("git", "config", "--global", "diff.ovrin.textconv", "mine")
     user.run("git", "config", "--global", "user.name", "Tester")
     user.run("ovrin", "setup", "git", "--undo")
-    assert "textconv = mine" in words(user)
+    assert "textconv = mine" in user.report
     assert user.run("git", "config", "--global", "--list") == "diff.ovrin.textconv=mine\nuser.name=Tester\n"
 
 
@@ -135,7 +130,7 @@ def test_a_torn_block_is_told_and_left(user):
     user.run("git", "config", "--global", "--remove-section", "mergetool.ovrin")
     torn = (user.home / ".gitconfig").read_bytes()
     user.run("ovrin", "setup", "git", "--undo", fails=True)
-    assert "take out the rest by hand" in words(user)
+    assert "take out the rest by hand" in user.report
     assert (user.home / ".gitconfig").read_bytes() == torn
 
 
@@ -143,7 +138,7 @@ def test_a_torn_block_is_told_and_left(user):
 def test_a_configuration_that_would_be_read_differently_is_left(user, broken):
     put(user.home / ".gitconfig", broken)
     user.run("ovrin", "setup", "git", fails=True)
-    assert ".gitconfig" in words(user) or "config" in words(user)
+    assert ".gitconfig" in user.report or "config" in user.report
     assert (user.home / ".gitconfig").read_bytes() == broken
 
 
@@ -167,13 +162,13 @@ def test_git_is_set_up_where_git_looks(user):
     user.run("ovrin", "setup", "git", fails=True, GIT_CONFIG_GLOBAL="/dev/null")
     for home in ("", "relative"):
         user.run("ovrin", "setup", fails=True, HOME=home)
-        assert "HOME" in words(user)
+        assert "HOME" in user.report
 
 
 def test_a_file_that_refuses_is_told_and_the_others_are_done(user):
     (user.home / ".config/git/attributes").mkdir(parents=True)
     user.run("ovrin", "setup", fails=True)
-    assert "attributes: Is a directory" in words(user)
+    assert "attributes: Is a directory" in user.report
     assert driver(user) and (user.home / ".hgrc").exists()
 
 
@@ -182,9 +177,9 @@ def test_what_is_not_installed_is_told_only_where_it_is_named(user):
         (user.fakes / program).symlink_to(shutil.which(program, path=user.environment["PATH"]))
     alone = {"PATH": str(user.fakes)}
     assert {line.split(":")[0] for line in user.run("ovrin", "setup", **alone).splitlines() if line[0] != " "} == {"git"}
-    assert words(user) == ""
+    assert user.report == ""
     user.run("ovrin", "setup", "hg", fails=True, **alone)
-    assert "hg is not installed" in words(user)
+    assert "hg is not installed" in user.report
     (user.fakes / "git").unlink()
     user.run("ovrin", "setup", fails=True, **alone)
 
@@ -194,7 +189,7 @@ def test_the_subversion_tool_of_somebody_else_stays(user, line):
     put(user.home / ".subversion/config", f"[Helpers]\n{line}\n[auth]\n".encode())
     before = tree(user.home)
     user.run("ovrin", "setup", "svn", fails=True)
-    assert "merge-tool-cmd = theirs" in words(user) and tree(user.home) == before
+    assert "merge-tool-cmd = theirs" in user.report and tree(user.home) == before
     put(user.home / ".subversion/config", b"[helpers]\nmerge-tool-cmd = ovrinmerge-vcs\n")
     user.run("ovrin", "setup", "svn")
 
@@ -217,7 +212,7 @@ def test_local_setup_adds_a_guard_and_undo_takes_it_back(user, script):
         put(data / "hooks/pre-commit", SCRIPTS[script], 0o755)
     before = tree(data)
     user.run("ovrin", "setup", "--local", "--program", "ovrin")
-    assert "*.prefab -text merge=ovrin" in words(user)
+    assert "*.prefab -text merge=ovrin" in user.report
     assert user.run("git", "check-attr", "merge", "a.ovrin") == "a.ovrin: merge: ovrin\n"
     user.fake("ovrin", '[ "$*" = "status --guard" ] && exit 1')
     commit(user, fails=True)
@@ -236,7 +231,7 @@ def test_the_guard_lets_those_commit_who_lack_the_program(user):
     repository(user)
     user.run("ovrin", "setup", "--local", "--program", "ovrin")
     user.run("git", "commit", "--allow-empty", "-qm", "change", PATH=user.bare_path)
-    assert "not installed" in words(user)
+    assert "not installed" in user.report
 
 
 @pytest.mark.parametrize("content,mode,told", [
@@ -246,7 +241,7 @@ def test_the_hook_of_somebody_else_stays(user, content, mode, told):
     hook = repository(user) / "hooks/pre-commit"
     put(hook, content, mode)
     user.run("ovrin", "setup", "--local", fails=True)
-    assert told in words(user) and hook.read_bytes() == content
+    assert told in user.report and hook.read_bytes() == content
     assert driver(user, "--local")
 
 
@@ -256,7 +251,7 @@ def test_a_changed_guard_is_told_and_left(user):
     hook.write_text(hook.read_text().replace("exit 1", "exit 0"))
     for arguments in ([], ["--undo"]):
         user.run("ovrin", "setup", "--local", *arguments, fails=True)
-        assert "somebody changed" in words(user) and "exit 0" in hook.read_text()
+        assert "somebody changed" in user.report and "exit 0" in hook.read_text()
 
 
 @pytest.mark.parametrize("hooks,place", [("my hooks", "here/my hooks"), ("~/hooks", "home/hooks")])
@@ -272,6 +267,14 @@ def test_the_guard_goes_where_git_looks_for_hooks(user, hooks, place):
     (user.fakes / "ovrin").unlink()
     user.run("ovrin", "setup", "--local", "--undo")
     assert not hook.parent.exists()
+
+
+def test_hooks_that_are_switched_off_are_told(user):
+    repository(user)
+    user.run("git", "config", "core.hooksPath", "/dev/null")
+    user.run("ovrin", "setup", "--local")
+    assert "hooks are switched off" in user.report
+    user.run("ovrin", "setup", "--local", "--undo")
 
 
 def test_a_linked_working_tree_shares_the_setup(user):

@@ -105,6 +105,37 @@ def test_other_files_are_merged_by_lines(system):
     assert system.read("numbers.txt") == NUMBERS.replace("1", "one").replace("9", "nine")
 
 
+@holds_for(Mercurial, Subversion)
+@pytest.mark.parametrize("name", ["a b.ovrin", "'quoted\" $x.ovrin", "-dash.ovrin", "Hafen \u2693=1.ovrin", "*[a].ovrin"])
+def test_any_name_is_merged_recorded_and_settled(system, name):
+    system.name = name
+    system.sides(*CONFLICT_AND_OBJECTS)
+    system.merge(fails=True)
+    assert system.is_open()
+    assert system.read() == scene("5 Lamp 3 20") + game_object(30, 0, "Boat", 1)
+    system.run("ovrin", "settle", "--take", "theirs")
+    assert not system.is_open()
+    assert system.read() == scene("2 Lamp 3 20") + game_object(30, 0, "Boat", 1)
+    system.conclude()
+
+
+# What is set up for all repositories of a user meets files of other programs, too.
+@holds_for(Git, Mercurial)
+def test_what_is_no_scene_but_for_its_name_is_merged_by_lines(system):
+    system.sides(NUMBERS, NUMBERS.replace("1", "one"), NUMBERS.replace("9", "nine"), "numbers.meta")
+    system.merge()
+    assert "numbers.meta is no scene" in system.report
+    assert system.read("numbers.meta") == NUMBERS.replace("1", "one").replace("9", "nine")
+
+
+@holds_for(Git, Mercurial)
+def test_what_is_no_scene_keeps_its_conflicts_between_markers(system):
+    system.sides("1\n", "2\n", "3\n", "number.meta")
+    system.merge(fails=True)
+    assert system.read("number.meta") == "<<<<<<< ours\n3\n=======\n2\n>>>>>>> theirs\n"
+    system.abort()
+
+
 @holds_for(Git, Mercurial)
 def test_conflict_stays_open_with_its_report(system):
     system.sides(*CONFLICT_AND_MORE)

@@ -16,6 +16,7 @@
 #include "Names/PrintableText.h"
 #include "Scenes/SceneFile.h"
 #include "Systems/Caller.h"
+#include "Systems/LineMerge.h"
 #include "Systems/Repository.h"
 #include "Systems/WorkingPath.h"
 #include "Words/Failure.h"
@@ -66,8 +67,14 @@ bool IsSuspicious(const std::string& text) {
     return text.empty() || text.find('\0') != std::string::npos;
 }
 
-/// Reads and compares. What the engine refuses may be no scene at all, which is said better in other words;
-/// to look for all that beforehand would take a tenth of the whole time.
+/// Files of other programs may have names as scenes have them, and set-up is for all repositories of a user.
+bool IsNobodysScene(const ThreeTexts& texts) {
+    const auto isText = [](const std::string& text) { return ClassifyScene(text) == SceneKind::NoScene; };
+    return isText(texts.ours) && isText(texts.theirs) && (texts.base.empty() || isText(texts.base));
+}
+
+/// Reads and compares; null where no version is a scene. What the engine refuses may be no scene at all,
+/// which is said better in other words; to look for all that beforehand would take a tenth of the whole time.
 std::unique_ptr<SceneMerge> Compare(const FileMerge& files, ovrin_yaml::StageWatcher& watcher) {
     SceneRules rules = ReadSceneRules(files.format);
     ThreeTexts texts = ReadTexts(files);
@@ -76,7 +83,9 @@ std::unique_ptr<SceneMerge> Compare(const FileMerge& files, ovrin_yaml::StageWat
         return std::make_unique<SceneMerge>(std::move(texts), std::move(rules.rules), std::move(rules.types),
                                             ovrin_yaml::Threads::WhereWorthwhile, &watcher);
     } catch (const Failure&) {
-        CheckKinds(ReadTexts(files));
+        const ThreeTexts again = ReadTexts(files);
+        if (IsNobodysScene(again)) return nullptr;
+        CheckKinds(again);
         throw;
     }
 }
@@ -88,6 +97,16 @@ void DeliverResult(const std::string& file, const std::string& text) {
     if (const int error = Deliver(file, content))
         throw Failure("cannot write the result, " + Printable(file) + ": " +
                       std::system_category().message(error));
+}
+
+/// As version control would have done it if the file had another name.
+Outcome MergeByLines(const FileMerge& files) {
+    const auto merged = MergeLines(files.base, files.ours, files.theirs);
+    if (!merged) throw Failure(TellKind("ours", SceneKind::NoScene));
+    DeliverResult(files.result, merged->text);
+    Tell("ovrin: " + Printable(files.path) + " is no scene in any version, and was merged by lines" +
+         (merged->conflicts > 0 ? ": conflicts stand between markers\n" : "\n"));
+    return merged->conflicts > 0 ? Outcome::LeftOpen : Outcome::Done;
 }
 
 /// The repository that a scene belongs to. Its folder may not be there yet, in the midst of a merge.
@@ -170,6 +189,7 @@ constexpr const char* kNextStep = "Next: \"ovrin settle --list\" shows the open 
 Outcome Merge(const FileMerge& files) {
     ProgressLine progress(Printable(files.path));
     const std::unique_ptr<SceneMerge> compared = Compare(files, progress);
+    if (!compared) return MergeByLines(files);
     SceneMerge& merge = *compared;
     merge.Merge();
     const Records records(files.path);

@@ -120,13 +120,19 @@ void NoticeOthers(const std::string& config, const std::string& attributes, Syst
 }
 
 void AddGuard(const ProgramCall& program, SystemSetup& setup) {
-    const std::string hook = PreCommitHook();
+    const fs::path hook = PreCommitHook();
     if (hook.empty()) return;
-    setup.files.push_back({"git", hook, GuardLines(program), FileKind::Script, {}});
-    const fs::path data = fs::path(GitConfigs(Scope::Local).front()).parent_path();
-    if (fs::path(hook).parent_path() != data / "hooks")
-        setup.notices.push_back(
-            hook + " is where core.hooksPath leads: it serves every repository that it is set for");
+    std::error_code error;
+    if (fs::exists(hook.parent_path(), error) && !fs::is_directory(hook.parent_path(), error)) {
+        setup.notices.push_back("core.hooksPath leads to " + hook.parent_path().string() +
+                                ", which is no folder: hooks are switched off here, and the guard with them");
+        return;
+    }
+    setup.files.push_back({"git", hook.string(), GuardLines(program), FileKind::Script, {}});
+    if (hook.parent_path() != fs::path(GitConfigs(Scope::Local).front()).parent_path() / "hooks")
+        setup.notices.push_back(hook.string() +
+                                " is where core.hooksPath leads: it may be committed, or serve other "
+                                "repositories as well");
 }
 
 } // namespace
