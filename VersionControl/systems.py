@@ -1,18 +1,24 @@
 """Version control systems as the facts in this folder need them, all through the same few methods."""
 
 import os
+import shutil
 import subprocess
 
 SECONDS_TO_END = 60
+
+
+def can_mount():
+    return shutil.which("unshare") and subprocess.run(
+        ["unshare", "-rm", "mount", "-t", "tmpfs", "none", "/mnt"], stderr=subprocess.DEVNULL, check=False).returncode == 0
 
 
 class System:
     """A repository in a folder, and the user who works on a scene in it."""
 
     name = "the scene's $x.ovrin"
+    driver = "ovrin"
 
     def __init__(self, installed, folder):
-        self.share = installed / "share/ovrinmerge"
         self.home = folder / "home"
         self.here = folder / "here"
         self.fakes = folder / "fakes"
@@ -40,6 +46,11 @@ class System:
         assert fails in (None, failed), f"{command}\n{done.stdout}\n{self.log.read_text(encoding='utf-8')}"
         return done.stdout
 
+    @property
+    def report(self):
+        """What the last command said besides its results."""
+        return self.log.read_text(encoding="utf-8")
+
     def write(self, text, name=None):
         (self.here / (name or self.name)).write_text(text, encoding="utf-8")
 
@@ -60,25 +71,29 @@ class System:
         line = f'* use {command} "%b" "%l" "%r" "%d"\n'
         (self.home / ".mergespecfile.txt").write_text(line, encoding="utf-8")
 
+    def set_up(self):
+        """As a user does it; the program is called by a name that may be that of a fake."""
+        self.run("ovrin", "setup", self.command, "--program", "ovrin")
+
     def merge_with(self, failure):
-        """Merges where OvrinMerge is what the failure tells."""
+        """Merges where the program that version control calls is what the failure tells."""
         if failure is None:
             self.merge(fails=True, PATH=self.bare_path)
         else:
-            self.fake("OvrinMerge", failure)
+            self.fake(self.driver, failure)
             self.merge(fails=True)
-            (self.fakes / "OvrinMerge").unlink()
+            (self.fakes / self.driver).unlink()
 
 
 class Git(System):
-    program = "git"
+    program = command = "git"
 
     def start(self):
         self.run("git", "init", "-qb", "main", ".")
-        for name, value in (("user.name", "Tester"), ("user.email", "tester@example.org"),
-                            ("include.path", f"{self.share}/gitconfig")):
+        for name, value in (("user.name", "Tester"), ("user.email", "tester@example.org")):
             self.run("git", "config", "--global", "--add", name, value)
-        self.commit((self.share / "gitattributes").read_text(encoding="utf-8"), ".gitattributes")
+        self.set_up()
+        self.commit("empty", "readme")
 
     def commit(self, text, name=None):
         self.write(text, name)
@@ -107,9 +122,6 @@ class Git(System):
         stages = [stage for stage in (1, 3, 2) if f" {stage}\t" in listed]
         return tuple(self.run("git", "show", f":{stage}:{self.name}") for stage in stages)
 
-    def settle(self, fails=False):
-        self.mergetool("ovrinsettle", fails)
-
     def merge_with_tool(self, fails=False):
         self.merge(fails=True)
         self.mergetool("ovrin", fails)
@@ -129,7 +141,7 @@ class Git(System):
 
 
 class Mercurial(System):
-    program = "hg"
+    program = command = "hg"
 
     @property
     def shown_name(self):
@@ -137,8 +149,8 @@ class Mercurial(System):
 
     def start(self):
         self.run("hg", "init", ".")
-        settings = f"[ui]\nusername = Tester\n%include {self.share}/hgrc\n"
-        (self.home / ".hgrc").write_text(settings, encoding="utf-8")
+        (self.home / ".hgrc").write_text("[ui]\nusername = Tester\n", encoding="utf-8")
+        self.set_up()
         self.commit("empty", "readme")
 
     def commit(self, text, name=None):
@@ -168,9 +180,6 @@ class Mercurial(System):
         committed = (self.run("hg", "cat", "-r", revision, self.name) for revision in self.revisions)
         return (*committed, self.read(f"{self.name}.orig"))
 
-    def settle(self, fails=False):
-        self.run("hg", "resolve", "--tool", "ovrinsettle", self.name, fails=fails)
-
     def conclude(self, fails=False):
         self.run("hg", "commit", "-m", "merged", fails=fails)
 
@@ -182,16 +191,18 @@ class Subversion(System):
     """Merges by lines and comes to us with what is left. Objects that both sides add at the end are that."""
 
     program = "svnadmin"
-    # Its files go to merge tools by their own names, through a shell that would take "$x" for a variable.
-    name = "the scene's.ovrin"
+    command = "svn"
+    driver = "ovrin-svn"
+
+    @property
+    def shown_name(self):
+        return f"{self.here}/{self.name}"
 
     def start(self):
         self.repository = f"file://{self.home}/repository"
         self.run("svnadmin", "create", f"{self.home}/repository")
         self.run("svn", "checkout", "-q", self.repository, ".")
-        # The checkout wrote a configuration of the usual sections.
-        with open(self.home / ".subversion/config", "a", encoding="utf-8") as config:
-            config.write((self.share / "subversion").read_text(encoding="utf-8"))
+        self.set_up()  # the checkout wrote a configuration of the usual sections
 
     def commit(self, text):
         self.write(text)
@@ -213,8 +224,6 @@ class Subversion(System):
         # Without a terminal no tool is called, unless Subversion is told to act as if at one.
         command = "svn", "update", "--force-interactive", "--accept", "launch"
         return self.run(*command, fails=None, **environment)
-
-    merge_with_tool = merge
 
     def is_open(self):
         return self.run("svn", "status", self.name).startswith("C ")

@@ -164,9 +164,14 @@ def test_the_guard_is_missed_and_told_where_git_passes_it_over(user):
     assert user.state("guard") == "note"
     user.run("ovrin", "setup", "--local")
     assert user.state("guard") == "ok"
-    (user.here / ".git/hooks/pre-commit").chmod(0o644)
+    hook = user.here / ".git/hooks/pre-commit"
+    hook.chmod(0o644)
     found = user.doctor(status=1)["guard"]
     user.run("sh", "-c", found["cure"])
+    assert user.state("guard") == "ok"
+    hook.write_text("#!/bin/sh\nexec pre-commit hook-impl\n")
+    assert user.state("guard") == "note"
+    user.write("- id: ovrin-guard\n", ".pre-commit-config.yaml")
     assert user.state("guard") == "ok"
 
 

@@ -11,8 +11,7 @@ import tempfile
 
 import pytest
 
-from systems import System
-from test_script import can_mount
+from systems import System, can_mount
 from test_systems import (CONFLICT_AND_MORE, CONFLICT_AND_OBJECTS, HEADER, ONE_CONFLICT, components,
                           game_object, scene)
 

@@ -11,6 +11,7 @@ import tempfile
 import pytest
 
 from systems import System
+from test_systems import scene
 
 # What a person may have had in a configuration of sections. The names mean nothing to any system.
 SECTIONS = {
@@ -314,3 +315,13 @@ def test_any_path_of_the_program_can_be_called(user, name):
     user.run("git", "merge", "theirs", fails=True)
     assert (user.home / "called").read_text().startswith("merge --base-label ")
     assert user.run("hg", "config", "merge-tools.ovrin.executable") == "env\n"
+
+
+def test_the_hooks_of_the_framework_can_be_called(user):
+    repository(user)
+    put(user.here / "a.ovrin", scene("1 Lantern 1").encode())
+    listed = (pathlib.Path(__file__).parent.parent / ".pre-commit-hooks.yaml").read_text(encoding="utf-8")
+    entries = [line.split()[1:] for line in listed.splitlines() if line.startswith("  entry: ovrin ")]
+    assert len(entries) == listed.count("- id: ") == 2
+    for entry in entries:
+        user.run(*entry, *(["a.ovrin"] if "check" in entry else []))

@@ -28,6 +28,7 @@ struct ChangeWish {
 
 /// Compares the versions of a file by objects, if it is a scene in both. Throws Failure for versions that
 /// can't be had.
-FileChange CompareFile(const ChangedFile& file, const ovrin_yaml::MergeRules& rules, const ChangeWish& wish);
+FileChange CompareFile(const ChangedFile& changed, const ovrin_yaml::MergeRules& rules,
+                       const ChangeWish& wish);
 
 } // namespace ovrin

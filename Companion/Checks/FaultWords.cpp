@@ -51,7 +51,7 @@ FaultWords::FaultWords(const std::string& text, const Outlines& outlines, const 
     : m_Text(text), m_Types(types), m_Table(outlines), m_Names(ReadTrees(text, m_Objects)) {}
 
 /// Faults come in the order of their objects, and so in that of the text.
-std::vector<Finding> FaultWords::Tell(std::span<const ObjectFault> faults) const {
+std::vector<Finding> FaultWords::Tell(std::span<const ObjectFault> faults) {
     std::vector<Finding> findings;
     findings.reserve(faults.size());
     LineCounter lines(m_Text);
@@ -62,22 +62,22 @@ std::vector<Finding> FaultWords::Tell(std::span<const ObjectFault> faults) const
     return findings;
 }
 
-Finding FaultWords::TellOne(const ObjectFault& fault) const {
+Finding FaultWords::TellOne(const ObjectFault& fault) {
     Finding finding{fault.code};
     finding.message = MessageOf(fault);
     // It is about the file, and its first object may be another one after the next change.
     if (fault.code == Code::NotAsWritten) return finding;
     const ID id = m_Table.At(fault.object).id;
     finding.object = Word(id);
-    finding.name = m_Names.Name(id);
+    finding.name = NameOf(id);
     finding.detail = Word(fault.field);
     if (fault.other) finding.detail += (fault.field ? " " : "") + Word(fault.other);
     return finding;
 }
 
-std::string FaultWords::MessageOf(const ObjectFault& fault) const {
+std::string FaultWords::MessageOf(const ObjectFault& fault) {
     const std::string field = Word(fault.field);
-    const auto other = [&] { return NameOf(fault.other); };
+    const auto other = [&] { return TargetName(fault.other); };
     switch (fault.code) {
     case Code::RepeatedId:
         return "has the id of an earlier object, " + Word(fault.other);
@@ -91,10 +91,11 @@ std::string FaultWords::MessageOf(const ObjectFault& fault) const {
     case Code::FatherIsNoTransform:
         return field + " is " + other() + ", which is no Transform";
     case Code::ChildOfAnother:
-        return field + " have " + other() + ", whose m_Father is " + NameOf(m_Table.Get(fault.other)->father);
+        return field + " have " + other() + ", whose m_Father is " +
+               TargetName(m_Table.Get(fault.other)->father);
     case Code::ComponentOfAnother:
         return field + " has " + other() + ", whose m_GameObject is " +
-               NameOf(m_Table.Get(fault.other)->gameObject);
+               TargetName(m_Table.Get(fault.other)->gameObject);
     case Code::RepeatedChild:
         return field + " have " + other() + " more than once";
     case Code::RepeatedComponent:
@@ -113,8 +114,15 @@ std::string FaultWords::MessageOf(const ObjectFault& fault) const {
     }
 }
 
-std::string FaultWords::NameOf(ID id) const {
-    return RefersToSomething(id) ? m_Names.NameWithID(id) : "none";
+/// Objects of odd shapes take long to name.
+const std::string& FaultWords::NameOf(ID id) {
+    const auto [known, isNew] = m_Known.try_emplace(id);
+    if (isNew) known->second = m_Names.Name(id);
+    return known->second;
+}
+
+std::string FaultWords::TargetName(ID id) {
+    return RefersToSomething(id) ? NameOf(id) + " (" + Word(id) + ')' : "none";
 }
 
 std::string FaultWords::TypeName(ID classID) const {

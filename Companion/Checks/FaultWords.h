@@ -10,6 +10,7 @@
 
 #include <span>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 namespace ovrin {
@@ -23,14 +24,15 @@ public:
                const ovrin_yaml::YAMLTypeInfoManager& types);
 
     /// The findings, by lines.
-    std::vector<Finding> Tell(std::span<const ObjectFault> faults) const;
+    std::vector<Finding> Tell(std::span<const ObjectFault> faults);
 
 private:
     using ID = const ovrin_yaml::YAMLScalar*;
 
-    Finding TellOne(const ObjectFault& fault) const;
-    std::string MessageOf(const ObjectFault& fault) const;
-    std::string NameOf(ID id) const;
+    Finding TellOne(const ObjectFault& fault);
+    std::string MessageOf(const ObjectFault& fault);
+    const std::string& NameOf(ID id);
+    std::string TargetName(ID id);
     std::string TypeName(ID classID) const;
 
     const std::string& m_Text;
@@ -38,6 +40,7 @@ private:
     const ObjectTable m_Table;
     ovrin_yaml::OvrinObjects m_Objects;
     const ObjectNames m_Names;
+    std::unordered_map<ID, std::string> m_Known; // names that were made
 };
 
 } // namespace ovrin

@@ -95,7 +95,7 @@ std::string AsUtf8(const std::string& text) {
     }
 }
 
-std::string ToLines(const CheckResult& result) {
+std::string ToLines(const CheckedScenes& result) {
     std::string lines;
     for (const CheckedScene& scene : result.scenes) {
         for (const Finding& finding : scene.findings) {
@@ -109,7 +109,7 @@ std::string ToLines(const CheckResult& result) {
     return lines;
 }
 
-std::string ToJson(const CheckResult& result) {
+std::string ToJson(const CheckedScenes& result) {
     json findings = json::array(), failures = json::array();
     for (const CheckedScene& scene : result.scenes) {
         for (const Finding& finding : scene.findings) findings.push_back(FindingJson(scene, finding));
@@ -123,7 +123,7 @@ std::string ToJson(const CheckResult& result) {
                  {"failures", failures}});
 }
 
-std::string ToSarif(const CheckResult& result) {
+std::string ToSarif(const CheckedScenes& result) {
     json rules = json::array(), results = json::array(), notifications = json::array();
     for (const CodeInfo& info : CodeTable()) rules.push_back(SarifRule(info));
     for (const CheckedScene& scene : result.scenes) {

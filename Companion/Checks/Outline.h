@@ -31,9 +31,10 @@ struct ObjectOutline {
     const ovrin_yaml::YAMLScalar* gameObject = nullptr; ///< of m_GameObject, 0 included; null without one
     const ovrin_yaml::YAMLScalar* father = nullptr;     ///< of m_Father in the same way
     bool isStripped = false;
-    bool hasChildren = false;                       ///< has the field m_Children
-    bool hasComponents = false;                     ///< has the field m_Component
-    bool isAsWritten = true;                        ///< the writer would write the same bytes
+    bool hasChildren = false;            ///< has the field m_Children
+    bool hasRepeatedTransitions = false; ///< transitions with a key twice, as usual
+    bool hasComponents = false;          ///< has the field m_Component
+    bool isAsWritten = true; ///< false for the first, at least, that would be written in another way
     std::uint32_t references = 0, repeatedKeys = 0; ///< how many of them, in the lists of their outlines
     std::size_t firstReference = 0;                 ///< where they begin there
     std::size_t begin = 0;                          ///< of its document, in the text

@@ -76,12 +76,10 @@ void OutlineBuilder::NoteHeader(std::size_t mark, std::size_t pairs, std::size_t
     for (std::size_t i = 0; i < pairs; ++i) {
         const YAMLScalar* key = m_Stack[mark + 2 * i].scalar;
         const std::string_view value = m_Stack[mark + 2 * i + 1].text;
-        if (i < body)
-            m_HasMark |= key == YAMLScalar::strippedPrefabPlaceHolderName;
-        else if (key == YAMLScalar::fileIDPlaceHolderName)
-            m_Object.id = YAMLScalar::Lookup(value);
-        else if (key == YAMLScalar::classIDPlaceHolderName)
-            m_Object.classID = YAMLScalar::Lookup(value);
+        if (i < body) m_HasMark |= key == YAMLScalar::strippedPrefabPlaceHolderName;
+        // Of a body's own entry that says the same a tree has no other.
+        if (key == YAMLScalar::fileIDPlaceHolderName) m_Object.id = YAMLScalar::Lookup(value);
+        if (key == YAMLScalar::classIDPlaceHolderName) m_Object.classID = YAMLScalar::Lookup(value);
     }
 }
 
@@ -89,8 +87,10 @@ bool OutlineBuilder::CloseMapping(std::size_t mark, bool /*flow*/, std::uint32_t
                                   std::size_t headerPairs) {
     const std::size_t pairs = (m_Stack.size() - mark) / 2;
     const auto keyAt = [&](std::size_t i) { return m_Stack[mark + 2 * i].scalar; };
-    if (pairs > 1 && !m_KeyLists.Get(pairs, keyAt) && !IsOfTransitions(mark))
-        NoteRepeatedKeys(mark, pairs, line);
+    const bool repeatsKey = pairs > 1 && !m_KeyLists.Get(pairs, keyAt);
+    const bool isUsual = !repeatsKey || IsOfTransitions(mark);
+    m_Object.hasRepeatedTransitions |= repeatsKey && isUsual;
+    if (!isUsual) NoteRepeatedKeys(mark, pairs, line);
     if (m_Open.empty()) {
         NoteHeader(mark, pairs, headerPairs);
         m_Stack.clear();
@@ -102,7 +102,7 @@ bool OutlineBuilder::CloseMapping(std::size_t mark, bool /*flow*/, std::uint32_t
         if (m_Open.size() == 1) NoteFields(mark, pairs);
         Collapse(mark, {nullptr, {}, Kind::Container});
     }
-    return true;
+    return isUsual;
 }
 
 void OutlineBuilder::CloseSequence(std::size_t mark, bool /*flow*/, std::uint32_t /*line*/) {
@@ -116,7 +116,7 @@ OutlineBuilder::Object OutlineBuilder::TakeObject(bool isStripped) {
     m_Object.firstReference = m_Outlines.references.size() - m_Object.references;
     m_Outlines.objects.push_back(std::exchange(m_Object, {}));
     m_HasMark = false;
-    return true;
+    return &m_Outlines.objects.back();
 }
 
 void OutlineBuilder::Clear() {

@@ -37,13 +37,13 @@ public:
         return m_Stack.size();
     }
     /// Closes a mapping. The object itself, which nobody opened, is closed last; its last `headerPairs` pairs
-    /// hold data of its header. A repeated key is noted, unless it is one of transitions, where that is
-    /// usual.
+    /// hold data of its header. A repeated key is noted, and false returned, unless it is one of transitions,
+    /// where that is usual: only a tree tells whether its values differ.
     bool CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t headerPairs = 0);
     void CloseSequence(std::size_t mark, bool flow, std::uint32_t line);
 
-    /// Whether there is one; TakeOutlines has it.
-    using Object = bool;
+    /// Valid up to the next one; TakeOutlines has it, too.
+    using Object = const ObjectOutline*;
     Object TakeObject(bool isStripped);
     void InternTexts() {}
     /// Forgets the object under way.

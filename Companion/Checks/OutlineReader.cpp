@@ -58,7 +58,8 @@ std::optional<Outlines> ReadPiece(const std::string& text, std::span<const std::
     for (const std::string_view document : documents) {
         const auto read = reader.Read(document, 0);
         if (!read.object) return std::nullopt;
-        areFirst.push_back(search.IsFirst(document, read.isAsWritten));
+        areFirst.push_back(
+            search.IsFirst(document, read.isAsWritten && !read.object->hasRepeatedTransitions));
     }
     Outlines outlines = reader.TheBuilder().TakeOutlines();
     for (std::size_t i = 0; i < documents.size(); ++i) {

@@ -12,6 +12,7 @@
 namespace ovrin {
 
 using ovrin_yaml::MergeError;
+using ovrin_yaml::YAMLError;
 
 namespace {
 
@@ -40,10 +41,10 @@ Finding TellNoScene(const std::string& bytes, SceneKind kind) {
     return finding;
 }
 
-Finding TellUnreadable(const MergeError& error) {
+Finding TellUnreadable(const YAMLError& error, const std::string& reason) {
     Finding finding{Code::Unreadable, error.Line(), error.Object()};
-    finding.detail = error.reason;
-    finding.message = "can't be read: " + error.reason;
+    finding.detail = reason;
+    finding.message = "can't be read: " + reason;
     return finding;
 }
 
@@ -58,7 +59,9 @@ std::vector<Finding> CheckScene(const std::string& bytes, const ovrin_yaml::YAML
         if (faults.empty()) return {};
         return FaultWords(bytes, outlines, types).Tell(faults);
     } catch (const MergeError& error) {
-        return {TellUnreadable(error)};
+        return {TellUnreadable(error, error.reason)};
+    } catch (const YAMLError& error) {
+        return {TellUnreadable(error, error.what())};
     }
 }
 

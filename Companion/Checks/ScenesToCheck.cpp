@@ -5,15 +5,14 @@
 #include "Systems/BlobReader.h"
 #include "Systems/Git.h"
 #include "Systems/Repository.h"
+#include "Systems/WorkingFiles.h"
 #include "Systems/WorkingPath.h"
 #include "Words/Failure.h"
 
-#include <algorithm>
 #include <cerrno>
 #include <memory>
 #include <mutex>
 #include <set>
-#include <string_view>
 #include <sys/stat.h>
 #include <system_error>
 
@@ -40,7 +39,7 @@ bool IsRegularFile(const std::string& path) {
 }
 
 /// What stands in the working tree of these, in order; links lead to what has a name of its own.
-std::vector<SceneToCheck> InWorkingTree(const Repository& repository, const std::set<std::string>& paths) {
+std::vector<SceneToCheck> InWorkingTree(const Repository& repository, const std::vector<std::string>& paths) {
     std::vector<SceneToCheck> scenes;
     for (const std::string& path : paths) {
         const std::string place = repository.top + '/' + path;
@@ -48,22 +47,6 @@ std::vector<SceneToCheck> InWorkingTree(const Repository& repository, const std:
             scenes.push_back({path, path, [place] { return ReadScene(place); }, MayBeOther(path)});
     }
     return scenes;
-}
-
-std::set<std::string> Lines(std::string_view bytes, char end) {
-    std::set<std::string> lines;
-    for (std::size_t at; (at = bytes.find(end)) != std::string_view::npos; bytes.remove_prefix(at + 1))
-        lines.emplace(bytes.substr(0, at));
-    return lines;
-}
-
-std::set<std::string> AskMercurial(const Repository& repository, CommandWords command) {
-    return Lines(OutputOf(command, {.folder = repository.top}), '\0');
-}
-
-[[noreturn]] void RefuseSubversion() {
-    throw Failure("Subversion can't tell which scenes there are without asking its server; name them: "
-                  "ovrin check FILE...");
 }
 
 /// Blobs from one process of git, for several threads.
@@ -93,6 +76,7 @@ std::vector<SceneToCheck> NamedScenes(const std::vector<std::string>& files, con
         }
     };
     std::vector<SceneToCheck> scenes;
+    scenes.reserve(files.size());
     for (const std::string& file : files)
         scenes.push_back({file, pathOf(file), [file] { return ReadScene(file); }});
     return scenes;
@@ -119,35 +103,11 @@ std::vector<SceneToCheck> StagedScenes(const Repository& repository) {
 }
 
 std::vector<SceneToCheck> AllScenes(const Repository& repository) {
-    switch (repository.kind) {
-    case SystemKind::Git: {
-        std::set<std::string> paths;
-        for (const GitEntry& entry : Git(repository).Entries()) paths.insert(entry.path);
-        return InWorkingTree(repository, paths);
-    }
-    case SystemKind::Mercurial:
-        return InWorkingTree(repository, AskMercurial(repository, {"hg", "files", "-0"}));
-    case SystemKind::Subversion:
-        RefuseSubversion();
-    }
-    return {};
+    return InWorkingTree(repository, TrackedFiles(repository));
 }
 
 std::vector<SceneToCheck> ChangedScenes(const Repository& repository) {
-    switch (repository.kind) {
-    case SystemKind::Git: {
-        const Git git(repository);
-        const std::vector<std::string> changed = git.DifferingFromHead({}, false), added = git.Untracked();
-        std::set<std::string> paths(changed.begin(), changed.end());
-        paths.insert(added.begin(), added.end());
-        return InWorkingTree(repository, paths);
-    }
-    case SystemKind::Mercurial:
-        return InWorkingTree(repository, AskMercurial(repository, {"hg", "status", "-0", "-n", "-mau"}));
-    case SystemKind::Subversion:
-        RefuseSubversion();
-    }
-    return {};
+    return InWorkingTree(repository, ChangedFiles(repository));
 }
 
 } // namespace ovrin

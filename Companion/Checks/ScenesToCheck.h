@@ -26,9 +26,9 @@ std::vector<SceneToCheck> NamedScenes(const std::vector<std::string>& files, con
 
 /// The scenes that the next commit changes, with the bytes that it will have.
 std::vector<SceneToCheck> StagedScenes(const Repository& repository);
-/// Those that version control keeps, as they stand in the working tree, as far as they stand there.
+/// Those that version control keeps, as they stand in the working tree.
 std::vector<SceneToCheck> AllScenes(const Repository& repository);
-/// Those that are new or changed since the last commit, as they stand in the working tree.
+/// Those that are new or changed since the last commit, likewise.
 std::vector<SceneToCheck> ChangedScenes(const Repository& repository);
 
 } // namespace ovrin

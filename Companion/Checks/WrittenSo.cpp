@@ -22,7 +22,7 @@ bool FormSearch::IsFirst(std::string_view document, bool isSure) {
     const YAMLMapping* object = m_Reader->Read(document, 0).object;
     m_Reader->InternTexts();
     OvrinObjects objects;
-    if (!object) { // repeated keys
+    if (!object) { // transitions with repeated keys
         ParseYAMLString(std::string(FileHeaderOf(m_Text)).append(document), objects);
         object = AsMapping(objects.GetMapping().First());
     }

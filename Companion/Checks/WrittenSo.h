@@ -21,8 +21,7 @@ public:
     /// Of documents in `text`, which must stay.
     explicit FormSearch(std::string_view text) : m_Text(text) {}
 
-    /// Whether this is the one; never again after it was found. `isSure`: the reader is sure that it is in
-    /// the form.
+    /// Whether this is the one; never again after it was found. `isSure`: it is known to be in the form.
     bool IsFirst(std::string_view document, bool isSure);
 
 private:

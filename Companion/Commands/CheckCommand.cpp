@@ -16,6 +16,7 @@
 #include <CLI/CLI.hpp>
 #include <iostream>
 #include <memory>
+#include <optional>
 
 namespace ovrin {
 
@@ -54,6 +55,18 @@ std::vector<SceneToCheck> ScenesOf(const CheckWish& wish, const std::optional<Re
     return wish.all ? AllScenes(*repository) : ChangedScenes(*repository);
 }
 
+/// Scenes that are named can be checked without version control, which may not even be installed.
+OpenConflicts ConflictsOf(const CheckWish& wish, const std::optional<Repository>& repository) {
+    if (!repository || repository->top.empty()) return {};
+    try {
+        return OpenConflicts(*repository);
+    } catch (const Failure& failure) {
+        if (wish.files.empty()) throw;
+        std::cerr << "ovrin: Open conflicts are not looked for: " << failure.what() << '\n';
+        return {};
+    }
+}
+
 /// Throws std::bad_alloc only.
 CheckedScene Check(const SceneToCheck& scene, const YAMLTypeInfoManager& types,
                    const OpenConflicts& conflicts) {
@@ -69,9 +82,9 @@ CheckedScene Check(const SceneToCheck& scene, const YAMLTypeInfoManager& types,
     return checked;
 }
 
-CheckResult CheckAll(const std::vector<SceneToCheck>& scenes, const YAMLTypeInfoManager& types,
-                     const OpenConflicts& conflicts, Baseline& baseline) {
-    CheckResult result;
+CheckedScenes CheckAll(const std::vector<SceneToCheck>& scenes, const YAMLTypeInfoManager& types,
+                       const OpenConflicts& conflicts, Baseline& baseline) {
+    CheckedScenes result;
     ForEachInOrder(
         scenes.size(), [&](std::size_t index) { return Check(scenes[index], types, conflicts); },
         [&](std::size_t, CheckedScene scene) {
@@ -92,7 +105,8 @@ std::string Count(std::size_t count, const std::string& what) {
     return std::to_string(count) + ' ' + what + (count == 1 ? "" : "s");
 }
 
-Outcome TellResult(const CheckResult& result, const Baseline& baseline, std::size_t scenes) {
+/// `left`: findings of the baseline that are gone.
+Outcome TellResult(const CheckedScenes& result, std::size_t left, std::size_t scenes) {
     std::size_t findings = 0;
     for (const CheckedScene& scene : result.scenes) findings += scene.findings.size();
     std::cerr << "Checked " << Count(result.checked, "scene") << ": " << Count(findings, "finding");
@@ -100,8 +114,8 @@ Outcome TellResult(const CheckResult& result, const Baseline& baseline, std::siz
     std::cerr << ".\n";
     if (result.others)
         std::cerr << "Passed over " << Count(result.others, ".meta file") << " of another form.\n";
-    if (baseline.Left())
-        std::cerr << "Of the baseline " << Count(baseline.Left(), "finding")
+    if (left)
+        std::cerr << "Of the baseline " << Count(left, "finding")
                   << " didn't come up again: it may be made anew.\n";
     if (findings) std::cerr << "\"ovrin check --explain CODE\" tells what a finding means and its cure.\n";
     if (result.checked + result.others < scenes) return Outcome::Failed;
@@ -114,11 +128,11 @@ Outcome RunCheck(const CheckWish& wish) {
     const std::vector<SceneToCheck> scenes = ScenesOf(wish, repository);
     const YAMLTypeInfoManager types = ReadTypeInfo(wish.typeInfo);
     Baseline baseline = wish.baseline.empty() ? Baseline() : Baseline(wish.baseline);
-    const bool hasTree = repository && !repository->top.empty();
-    const OpenConflicts conflicts = hasTree ? OpenConflicts(*repository) : OpenConflicts();
-    const CheckResult result = CheckAll(scenes, types, conflicts, baseline);
+    const OpenConflicts conflicts = ConflictsOf(wish, repository);
+    const CheckedScenes result = CheckAll(scenes, types, conflicts, baseline);
     PrintResult(wish.sarif ? ToSarif(result) : wish.json ? ToJson(result) : ToLines(result));
-    return TellResult(result, baseline, scenes.size());
+    // Of a part of the scenes nobody knows.
+    return TellResult(result, wish.all ? baseline.Left() : 0, scenes.size());
 }
 
 } // namespace

@@ -3,6 +3,7 @@
 #include "Commands/CommandTable.h"
 #include "Commands/Help.h"
 #include "Commands/Misuse.h"
+#include "Commands/Output.h"
 #include "Commands/PathArguments.h"
 #include "Words/Failure.h"
 
@@ -62,11 +63,11 @@ Outcome RunAction(const Action& action) {
     try {
         return action();
     } catch (const std::bad_alloc&) {
-        std::cerr << "ovrin: out of memory\n";
+        Tell("ovrin: out of memory\n");
     } catch (const std::exception& error) {
-        std::cerr << "ovrin: " << error.what() << '\n';
+        Tell(std::string("ovrin: ") + error.what() + '\n');
     } catch (const ovrin_yaml::YAMLError& error) {
-        std::cerr << "ovrin: " << error.what() << '\n';
+        Tell(std::string("ovrin: ") + error.what() + '\n');
     }
     return Outcome::Failed;
 }

@@ -69,6 +69,10 @@ ChangedFiles CompareTwoFiles(const std::string& before, const std::string& after
     return TwoFiles({FileStatus::Changed, before == kNothing ? name : before, name}, before, after);
 }
 
+[[noreturn]] void FailForBoth(const std::string& word) {
+    throw Failure("\"" + word + "\" is a revision and a file: write \"-- " + word + "\" for the file");
+}
+
 /// Revisions go in front of paths. What may be either must be marked.
 ComparisonWish Sorted(const DiffOperands& operands, const Repository& repository) {
     ComparisonWish wish{{}, operands.paths, operands.isStaged};
@@ -77,9 +81,7 @@ ComparisonWish Sorted(const DiffOperands& operands, const Repository& repository
         const bool areMarked = !operands.paths.empty();
         areRevisions = areMarked || (areRevisions && MayBeRevision(repository, word));
         const bool mayBeFile = !repository.top.empty() && IsThere(word);
-        if (areRevisions && !areMarked && mayBeFile)
-            throw Failure("\"" + word + "\" is a revision and a file: write \"-- " + word +
-                          "\" for the file");
+        if (areRevisions && !areMarked && mayBeFile) FailForBoth(word);
         (areRevisions ? wish.revisions : wish.paths).push_back(word);
     }
     return wish;

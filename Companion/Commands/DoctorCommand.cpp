@@ -12,7 +12,7 @@ namespace ovrin {
 
 namespace {
 
-std::string LineOf(const CheckResult& result) {
+std::string LineOf(const Examined& result) {
     constexpr std::size_t kWidth = 8; // of the longest state and a blank
     std::string line = HealthName(result.diagnosis.health);
     line.resize(kWidth, ' ');
@@ -23,7 +23,7 @@ std::string LineOf(const CheckResult& result) {
     return line + '\n';
 }
 
-std::string JsonOf(const std::vector<CheckResult>& results) {
+std::string JsonOf(const std::vector<Examined>& results) {
     nlohmann::ordered_json checks = nlohmann::ordered_json::array();
     for (const auto& [code, diagnosis] : results)
         checks.push_back({{"code", code},
@@ -34,18 +34,18 @@ std::string JsonOf(const std::vector<CheckResult>& results) {
     return report.dump(2, ' ', false, nlohmann::json::error_handler_t::replace) + '\n';
 }
 
-bool Has(const std::vector<CheckResult>& results, Health health) {
+bool Has(const std::vector<Examined>& results, Health health) {
     return std::ranges::any_of(results,
-                               [&](const CheckResult& result) { return result.diagnosis.health == health; });
+                               [&](const Examined& result) { return result.diagnosis.health == health; });
 }
 
 Outcome Run(bool fix, bool asJson) {
-    const std::vector<CheckResult> results = Examine(fix);
+    const std::vector<Examined> results = Examine(fix);
     std::string text;
     if (asJson)
         text = JsonOf(results);
     else
-        for (const CheckResult& result : results) text += LineOf(result);
+        for (const Examined& result : results) text += LineOf(result);
     PrintResult(text);
     if (Has(results, Health::Unknown)) return Outcome::Failed;
     return Has(results, Health::Problem) ? Outcome::LeftOpen : Outcome::Done;

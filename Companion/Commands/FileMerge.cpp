@@ -8,6 +8,7 @@
 
 #include "Commands/FileMerge.h"
 
+#include "Commands/Output.h"
 #include "Conflicts/ConflictReport.h"
 #include "Conflicts/OpenMerges.h"
 #include "Conflicts/SceneMerge.h"
@@ -16,6 +17,7 @@
 #include "Scenes/SceneFile.h"
 #include "Systems/Caller.h"
 #include "Systems/Repository.h"
+#include "Systems/WorkingPath.h"
 #include "Words/Failure.h"
 #include "Words/ProgressLine.h"
 
@@ -24,7 +26,6 @@
 
 #include <cerrno>
 #include <filesystem>
-#include <iostream>
 #include <memory>
 #include <system_error>
 
@@ -60,12 +61,17 @@ void CheckKinds(const ThreeTexts& texts) {
     check("base", texts.base, true);
 }
 
+/// Whether the engine might take a text for a scene that is none: it reads nothing behind a NUL.
+bool IsSuspicious(const std::string& text) {
+    return text.empty() || text.find('\0') != std::string::npos;
+}
+
 /// Reads and compares. What the engine refuses may be no scene at all, which is said better in other words;
-/// to look for that beforehand would take a tenth of the whole time.
+/// to look for all that beforehand would take a tenth of the whole time.
 std::unique_ptr<SceneMerge> Compare(const FileMerge& files, ovrin_yaml::StageWatcher& watcher) {
     SceneRules rules = ReadSceneRules(files.format);
     ThreeTexts texts = ReadTexts(files);
-    if (texts.ours.empty() || texts.theirs.empty()) CheckKinds(texts);
+    if (IsSuspicious(texts.base) || IsSuspicious(texts.ours) || IsSuspicious(texts.theirs)) CheckKinds(texts);
     try {
         return std::make_unique<SceneMerge>(std::move(texts), std::move(rules.rules), std::move(rules.types),
                                             ovrin_yaml::Threads::WhereWorthwhile, &watcher);
@@ -91,18 +97,10 @@ std::optional<Repository> RepositoryOf(const std::string& path) {
     return FindRepository(fs::is_directory(folder, error) ? folder.string() : ".");
 }
 
-/// From the top of the working tree.
-std::string PathInTree(const Repository& repository, const std::string& path) {
-    std::error_code error;
-    const fs::path absolute = fs::absolute(path, error);
-    const fs::path folder = fs::weakly_canonical(absolute.parent_path(), error);
-    return error ? path : (folder / absolute.filename()).lexically_relative(repository.top).string();
-}
-
 /// Where open merges of the scene are written down; nothing where no working tree is merged.
 struct Records {
     explicit Records(const std::string& scenePath) : repository(RepositoryOf(scenePath)) {
-        if (repository && !repository->top.empty()) path = PathInTree(*repository, scenePath);
+        if (repository && !repository->top.empty()) path = WorkingPath(*repository, scenePath);
     }
 
     const std::optional<Repository> repository;
@@ -126,7 +124,7 @@ std::string Lasting(const std::string& file, const std::string& byDefault) {
 
 /// What is told of an open merge that can't be written down.
 std::string Record(const Records& records, const FileMerge& files, OpenMerge merge) {
-    if (records.path.empty()) return {};
+    if (records.path.empty()) return "Nothing is written down: there is no working tree around the file.\n";
     try {
         merge.path = records.path;
         merge.texts = ReadTexts(files); // as they still are: the result comes later
@@ -163,9 +161,9 @@ std::string TellOpen(SceneMerge& merge, const OpenMerge& open) {
     return text + TellSides(open.occasion) + TellConflicts(merge, SideLabels::Of(open.occasion), kMostTold);
 }
 
-constexpr const char* kNextStep =
-    "Next: \"ovrin settle --list\" shows what is open; \"ovrin settle --take theirs\" (or ours, or base), or "
-    "\"--set PATH=theirs\" for one conflict, settles it.\n";
+constexpr const char* kNextStep = "Next: \"ovrin settle --list\" shows the open conflicts of all scenes; "
+                                  "\"ovrin settle --take theirs\" takes "
+                                  "a side at them, \"ovrin settle --set PATH=theirs\" at one.\n";
 
 } // namespace
 
@@ -189,7 +187,7 @@ Outcome Merge(const FileMerge& files) {
     DeliverResult(files.result, result);
     const std::string told = TellOpen(merge, open) + complaint + (isRecorded ? kNextStep : "");
     progress.Wipe();
-    std::cerr << told;
+    Tell(told);
     return Outcome::LeftOpen;
 }
 

@@ -34,21 +34,23 @@ Outcome MergeOrTell(const FileMerge& files) {
 Action DescribeMerge(CLI::App& command) {
     auto files = std::make_shared<FileMerge>();
     files->format = FormatFiles::OfEnvironment();
-    command.add_option("--base-label", files->labels.base, "What the base is, for messages: a commit");
-    command.add_option("--our-label", files->labels.ours, "What ours is: a branch or commit");
-    command.add_option("--their-label", files->labels.theirs, "What theirs is: a branch or commit");
+    command.add_option("--base-label", files->labels.base, "what the base is called, in messages")
+        ->type_name("LABEL");
+    command.add_option("--our-label", files->labels.ours, "what ours is called: a branch or commit")
+        ->type_name("LABEL");
+    command.add_option("--their-label", files->labels.theirs, "what theirs is called")->type_name("LABEL");
     command.add_option("--rules", files->format.rules,
-                       "The merge rules, instead of those beside the program");
-    command.add_option("--typeInfo", files->format.typeInfo, "What is known of the types of components");
-    command.add_option("BASE", files->base, "The common ancestor; empty if there is none")->required();
-    command.add_option("OURS", files->ours, "The scene as it is here")->required();
-    command.add_option("THEIRS", files->theirs, "The scene as it comes in")->required();
-    command.add_option("RESULT", files->result, "Where the merged scene goes; may be one of the others")
+                       "the merge rules, in place of those beside the program");
+    command.add_option("--typeInfo", files->format.typeInfo, "the types of components and what they require");
+    command.add_option("BASE", files->base, "the common ancestor; empty if both sides added the scene")
         ->required();
-    command.add_option("PATH", files->path, "The scene's path in the working tree")->required();
+    command.add_option("OURS", files->ours, "the scene as it is here")->required();
+    command.add_option("THEIRS", files->theirs, "the scene as it comes in")->required();
+    command.add_option("RESULT", files->result, "where the merged scene goes; may be one of the others")
+        ->required();
+    command.add_option("PATH", files->path, "the scene's path in the working tree")->required();
     command.footer(
-        "Open conflicts take ours, or what OVRIN_TAKE or the setting ovrin.take says. The status is "
-        "0 once all is settled, 1 if conflicts are open, 2 if the scene could not be merged.");
+        "At open conflicts the result has ours, or what OVRIN_TAKE or the setting ovrin.take says.");
     return [files] { return MergeOrTell(*files); };
 }
 

@@ -1,10 +1,12 @@
 #include "Commands/Output.h"
 
+#include "Descriptor.h"
 #include "OutputFile.h"
 #include "Words/Failure.h"
 
 #include <cerrno>
 #include <system_error>
+#include <unistd.h>
 
 namespace ovrin {
 
@@ -12,6 +14,11 @@ void PrintResult(std::string_view text) {
     const int error = WriteOutput({}, [&](OutputStream& stream) { stream << text; });
     if (error && error != EPIPE)
         throw Failure("Cannot write to standard output: " + std::system_category().message(error));
+}
+
+void Tell(std::string_view text) {
+    // Where it can't be said there is nobody left to tell that to.
+    WriteFully(STDERR_FILENO, text.data(), text.size());
 }
 
 } // namespace ovrin

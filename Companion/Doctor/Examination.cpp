@@ -58,9 +58,9 @@ Diagnosis Fixed(const Check& check, const Diagnosis& problem, Patient& patient) 
 
 } // namespace
 
-std::vector<CheckResult> Examine(bool fix) {
+std::vector<Examined> Examine(bool fix) {
     Patient patient;
-    std::vector<CheckResult> results;
+    std::vector<Examined> results;
     for (const Check& check : kChecks) {
         Diagnosis diagnosis = Look(check, patient);
         if (fix && diagnosis.health == Health::Problem && diagnosis.fix)

@@ -128,6 +128,21 @@ std::string RemoveAll(const std::vector<OldLine>& lines, const ProcessSetting& s
     return words;
 }
 
+std::string TextOf(const std::string& path) {
+    std::string text;
+    return ReadWholeFile(path, text) == ReadResult::Complete ? text : std::string();
+}
+
+/// Whether a hook calls the guard, by itself or through the framework that .pre-commit-config.yaml is for.
+bool CallsGuard(const std::string& hook, const std::string& top) {
+    const auto holds = [](const std::string& text, const char* words) {
+        return text.find(words) != std::string::npos;
+    };
+    const std::string text = TextOf(hook);
+    return holds(text, "ovrin status --guard") ||
+           (holds(text, "pre-commit") && holds(TextOf(top + "/.pre-commit-config.yaml"), "ovrin-guard"));
+}
+
 } // namespace
 
 Diagnosis LookAtGitVersion(Patient&) {
@@ -213,9 +228,7 @@ Diagnosis LookAtGuard(Patient& patient) {
         return {Health::Skipped, "there is no git repository around this folder"};
     const std::string hook = PreCommitHook();
     if (hook.empty()) return {Health::Skipped, "nobody commits in a repository without a working tree"};
-    std::string text;
-    const bool isThere = ReadWholeFile(hook, text) == ReadResult::Complete;
-    if (!isThere || text.find("ovrin status --guard") == std::string::npos)
+    if (!CallsGuard(hook, patient.Around()->top))
         return {Health::Note, "nothing keeps unsettled scenes from being committed here",
                 "ovrin setup git --local"};
     if (access(hook.c_str(), X_OK) != 0)

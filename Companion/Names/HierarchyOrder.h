@@ -13,8 +13,8 @@ namespace ovrin {
 /// m_Children. What stands under nothing goes by its place in the file. Equal ids have equal ranks.
 ///
 /// Of several trees the first that has an object says where it stands; what none has comes last, in the order
-/// of `ids`. The time goes by the number of ids, of what stands above them and of the children there; the list
-/// of objects of each file is gone through once.
+/// of `ids`. The time goes by the number of ids, of what stands above them and of the children there; the
+/// list of objects of each file is gone through once.
 std::vector<std::uint32_t> HierarchyRanks(std::span<const ObjectNames* const> trees,
                                           std::span<const ovrin_yaml::YAMLScalar* const> ids);
 

@@ -59,8 +59,10 @@ MergeNames::Together MergeNames::NamesOf(ID id, Version leading) const {
             same->first += " and " + word;
     }
     Together names{first.Text(), ""};
-    for (const auto& [versions, name] : others)
-        names.others += (names.others.empty() ? "" : ", ") + versions + ": " + name;
+    for (const auto& [versions, name] : others) {
+        if (!names.others.empty()) names.others += ", ";
+        names.others.append(versions).append(": ").append(name);
+    }
     return names;
 }
 

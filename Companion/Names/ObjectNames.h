@@ -58,7 +58,7 @@ public:
     const Hierarchy& Places() const { return m_Hierarchy; }
 
 private:
-    std::string PathOf(ID place) const;
+    std::string PathOf(ID id) const;
 
     Hierarchy m_Hierarchy;
 };

@@ -4,6 +4,7 @@
 #include "Names/PrintableText.h"
 
 #include <charconv>
+#include <utility>
 
 namespace ovrin {
 
@@ -78,7 +79,7 @@ std::string PropertyNames::ElementName(std::span<const ID> listPath, const YAMLN
     const ListRule& rule = m_Rules.SelectKeyPaths(Path(listPath.begin(), listPath.end()));
     std::string name;
     for (const Path& key : rule.keys) {
-        const std::string part = KeyName(list, item, key);
+        const std::string part = KeyName(listPath.front(), list, item, key);
         if (part.empty()) return Printable(index->Value());
         name += (name.empty() ? "" : " · ") + part;
     }
@@ -86,16 +87,18 @@ std::string PropertyNames::ElementName(std::span<const ID> listPath, const YAMLN
 }
 
 /// The value of one of an item's keys; empty if it has none.
-std::string PropertyNames::KeyName(const YAMLNode* list, const YAMLNode* item, const Path& key) const {
+std::string PropertyNames::KeyName(ID owner, const YAMLNode* list, const YAMLNode* item,
+                                   const Path& key) const {
     const YAMLScalar* value = AsScalar(FieldAt(item, key));
     if (!value) return {};
     if (key.empty() || key.back() != YAMLScalar::fileID)
         return ShortenedInMiddle(Printable(value->Value()), kElementWidth);
-    return ReferenceName(list, ReferenceOf(FieldAt(item, Path(key.begin(), key.end() - 1))));
+    return ReferenceName(owner, list, ReferenceOf(FieldAt(item, Path(key.begin(), key.end() - 1))));
 }
 
-/// Transforms are told by the GameObject alone: lists of children and components are read as lists of these.
-std::string PropertyNames::ReferenceName(const YAMLNode* list, const Reference& reference) const {
+/// Transforms are told by the GameObject alone, since lists of children are read as lists of these; what
+/// belongs to the owner of the list by what it is.
+std::string PropertyNames::ReferenceName(ID owner, const YAMLNode* list, const Reference& reference) const {
     const std::string id = Printable(reference.fileID->Value());
     if (reference.guid) {
         const TargetNames& targets = NamesWithin(list);
@@ -104,8 +107,11 @@ std::string PropertyNames::ReferenceName(const YAMLNode* list, const Reference& 
     }
     if (reference.IsNone()) return "none";
     if (!m_Names.Has(reference.fileID)) return MissingLabel(reference.fileID);
-    const ObjectNames::Parts parts = m_Names.NameOf(reference.fileID);
-    return BodyOf(m_Names.Find(reference.fileID)).IsTransform() ? parts.place : parts.Text();
+    ObjectNames::Parts parts = m_Names.NameOf(reference.fileID);
+    if (!parts.part.empty() && m_Names.Above(reference.fileID) == owner)
+        parts.place = std::exchange(parts.part, "");
+    const bool isTransform = BodyOf(m_Names.Find(reference.fileID)).IsTransform();
+    return isTransform ? parts.place : parts.Text();
 }
 
 const PropertyNames::TargetNames& PropertyNames::NamesWithin(const YAMLNode* list) const {

@@ -21,6 +21,7 @@ void AddElement(std::string& place, const std::string& element);
 ///     m_LocalPosition.x
 ///     m_Materials[2]                       an element without a key, by its index, counted from 0
 ///     m_Children[Harbour/Lantern]          by the object that its key names
+///     m_Component[Light 2]                 in short where that belongs to the object itself
 ///     m_Modifications[Lantern · m_Name]    an override, by the object in the prefab and the property
 ///     m_Slots[left hand].item              by the values of its keys
 ///
@@ -42,9 +43,9 @@ public:
                             const ovrin_yaml::YAMLNode* item, ID index) const;
 
 private:
-    std::string KeyName(const ovrin_yaml::YAMLNode* list, const ovrin_yaml::YAMLNode* item,
+    std::string KeyName(ID owner, const ovrin_yaml::YAMLNode* list, const ovrin_yaml::YAMLNode* item,
                         const ovrin_yaml::Path& key) const;
-    std::string ReferenceName(const ovrin_yaml::YAMLNode* list, const Reference& reference) const;
+    std::string ReferenceName(ID owner, const ovrin_yaml::YAMLNode* list, const Reference& reference) const;
 
     using Target = std::pair<ID, ID>; // file id and guid
     struct TargetHash {

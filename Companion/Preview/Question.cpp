@@ -18,16 +18,20 @@ constexpr std::uint64_t kCostOfScene = 20'000;
 
 void CheckGit() {
     const GitVersion version = InstalledGit();
-    if (version < kOldestGit)
+    if (version.IsOlderThan(kOldestGit))
         throw Failure("A preview needs git " + kOldestGit.Text() + " or later; this is git " +
                       version.Text());
 }
 
 [[noreturn]] void FailForRevision(const Git& git, const std::string& revision) {
-    std::string text = "There is no revision \"" + revision + "\" here";
-    for (const std::string& name : RevisionNames(git))
-        if (name.ends_with("/" + revision)) throw Failure(text + "\nDid you mean " + name + "?");
-    throw Failure(text + ": \"git fetch\" gets what others have published, \"git branch -a\" lists branches");
+    const std::vector<std::string> names = RevisionNames(git);
+    const auto near =
+        std::ranges::find_if(names, [&](const std::string& name) { return name.ends_with("/" + revision); });
+    const std::string cure =
+        near != names.end()
+            ? "\nDid you mean " + *near + "?"
+            : ": \"git fetch\" gets what others have published, \"git branch -a\" lists branches";
+    throw Failure("There is no revision \"" + revision + "\" here" + cure);
 }
 
 NamedCommit Find(const Git& git, const std::string& revision) {

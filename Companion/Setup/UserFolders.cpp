@@ -13,6 +13,7 @@ std::string VariableOf(const char* name) {
 
 std::string HomeFor(const std::string& system) {
     std::string home = VariableOf("HOME");
+    while (home.size() > 1 && home.ends_with('/')) home.pop_back();
     if (home.starts_with('/')) return home;
     throw Failure("HOME is " + (home.empty() ? "not set" : "\"" + home + "\", which is no absolute path") +
                   ", so that " + system + " has no settings of the user: set HOME");

@@ -19,6 +19,7 @@ namespace {
 /// A list of texts as the system wants it.
 std::vector<char*> Pointers(const std::vector<std::string>& texts) {
     std::vector<char*> pointers;
+    pointers.reserve(texts.size() + 1);
     for (const std::string& text : texts) pointers.push_back(const_cast<char*>(text.c_str()));
     pointers.push_back(nullptr);
     return pointers;
@@ -26,7 +27,8 @@ std::vector<char*> Pointers(const std::vector<std::string>& texts) {
 
 std::vector<std::string> Environment(const ProcessSetting& setting) {
     std::vector<std::string> variables;
-    for (const auto& [name, value] : setting.environment) variables.push_back(name + "=" + value);
+    for (const auto& [name, value] : setting.environment)
+        variables.emplace_back(name).append("=").append(value);
     for (char** variable = environ; *variable; ++variable) {
         const std::string_view text = *variable;
         const bool isReplaced = std::ranges::any_of(

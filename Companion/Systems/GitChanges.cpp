@@ -31,7 +31,7 @@ public:
     std::string Next(char end) {
         const std::size_t at = m_Text.find(end);
         if (at == std::string_view::npos) throw Failure("git lists changes in a form that isn't known");
-        const std::string piece(m_Text.substr(0, at));
+        std::string piece(m_Text.substr(0, at));
         m_Text.remove_prefix(at + 1);
         return piece;
     }

@@ -1,8 +1,8 @@
 #pragma once
 
-#include <compare>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace ovrin {
@@ -13,7 +13,9 @@ class Git;
 struct GitVersion {
     int major, minor;
 
-    auto operator<=>(const GitVersion&) const = default;
+    bool IsOlderThan(const GitVersion& other) const {
+        return std::pair(major, minor) < std::pair(other.major, other.minor);
+    }
     std::string Text() const { return std::to_string(major) + "." + std::to_string(minor); }
 };
 

@@ -62,7 +62,7 @@ ScratchFolder::~ScratchFolder() {
 }
 
 std::string ScratchFolder::NewFolder(const std::string& name) const {
-    const std::string path = m_Path + "/" + name;
+    std::string path = File(name);
     if (mkdir(path.c_str(), S_IRWXU) != 0) Fail(m_Path);
     return path;
 }

@@ -1,8 +1,8 @@
 #include "Systems/UnmergedFiles.h"
 
 #include "Systems/Git.h"
-#include "Systems/Process.h"
 #include "Systems/Repository.h"
+#include "Systems/WorkingFiles.h"
 
 #include <algorithm>
 #include <sstream>
@@ -17,14 +17,9 @@ std::vector<std::string> OfGit(const Repository& repository) {
     return paths;
 }
 
-/// Mercurial without what its user likes to see, Subversion with all letters in paths.
-ProcessSetting SettingFor(const Repository& repository) {
-    return {.folder = repository.top, .environment = {{"HGPLAIN", "1"}, {"LC_ALL", "C.UTF-8"}}};
-}
-
 std::vector<std::string> OfMercurial(const Repository& repository) {
-    const std::string listed =
-        OutputOf({"hg", "resolve", "--list", "--template", "{mergestatus}{path}\\0"}, SettingFor(repository));
+    const std::string listed = OutputOf({"hg", "resolve", "--list", "--template", "{mergestatus}{path}\\0"},
+                                        PlainSetting(repository));
     std::vector<std::string> paths;
     std::istringstream entries(listed);
     for (std::string entry; std::getline(entries, entry, '\0');)
@@ -34,7 +29,7 @@ std::vector<std::string> OfMercurial(const Repository& repository) {
 
 std::vector<std::string> OfSubversion(const Repository& repository) {
     constexpr std::size_t kColumns = 8; // in front of the path, which has no line feed here
-    std::istringstream lines(OutputOf({"svn", "status", "--quiet"}, SettingFor(repository)));
+    std::istringstream lines(OutputOf({"svn", "status", "--quiet"}, PlainSetting(repository)));
     std::vector<std::string> paths;
     for (std::string line; std::getline(lines, line);)
         if (line.starts_with('C') && line.size() > kColumns) paths.push_back(line.substr(kColumns));
@@ -60,7 +55,7 @@ void MarkMerged(const Repository& repository, const std::vector<std::string>& pa
                                : CommandWords{"svn", "resolve", "--quiet", "--accept", "working", "--"};
     // Both would read more into a bare path: a pattern, and a revision behind an "@".
     for (const std::string& path : paths) command.push_back(isMercurial ? "path:" + path : path + "@");
-    OutputOf(command, SettingFor(repository));
+    OutputOf(command, PlainSetting(repository));
 }
 
 } // namespace ovrin

@@ -7,8 +7,9 @@ namespace {
 std::string Offer(const Values& values) {
     const std::string noFiles = "compopt +o default +o bashdefault 2>/dev/null";
     const std::string take = "mapfile -t COMPREPLY < <(compgen ";
-    if (values.more == Values::More::Revisions)
-        return noFiles + "\n        " + take + "-W \"$(" + std::string(kListRevisions) + ")\" -- \"$word\")";
+    const std::string takeRevisions = take + "-W \"$(" + std::string(kListRevisions) + ")\" -- \"$word\")";
+    if (values.more == Values::More::RevisionsAndFiles) return takeRevisions;
+    if (values.more == Values::More::Revisions) return noFiles + "\n        " + takeRevisions;
     if (values.words.empty()) return noFiles;
     const std::string words = "-W '" + Joined(values.words, " ") + "' -- \"$word\")";
     if (values.more == Values::More::Files)

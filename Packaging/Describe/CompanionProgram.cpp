@@ -23,7 +23,8 @@ Values ValuesOf(const CLI::Option& option, const std::string& name) {
     Values values{ovrin::AllowedWords(option)};
     if (!values.words.empty()) return values;
     if (IsOneOf(kRevisions, name))
-        values.more = Values::More::Revisions;
+        values.more =
+            option.get_expected_max() > 1 ? Values::More::RevisionsAndFiles : Values::More::Revisions;
     else if (option.get_positional() || IsOneOf(kFiles, name))
         values.more = Values::More::Files;
     return values;

@@ -42,6 +42,9 @@ void WriteWords(std::ostream& out, const DescribedProgram& program) {
     for (const DescribedCommand& command : program.commands) {
         for (const DescribedOption& option : command.options)
             for (const std::string& word : option.words) out << command.name << ' ' << word << '\n';
-        for (const Operand& operand : command.operands) out << command.name << ' ' << operand.name << '\n';
+        for (const Operand& operand : command.operands) {
+            if (operand.values.words.empty()) out << command.name << ' ' << operand.name << '\n';
+            for (const std::string& word : operand.values.words) out << command.name << ' ' << word << '\n';
+        }
     }
 }

@@ -16,5 +16,5 @@ void WriteReadmeTable(std::ostream& out, const DescribedProgram& program);
 /// The names of the commands.
 void WriteCommands(std::ostream& out, const DescribedProgram& program);
 
-/// For each command and each option or operand of it "name word".
+/// For each command "name word" with each option and operand of it, or the words that the operand may be.
 void WriteWords(std::ostream& out, const DescribedProgram& program);

@@ -12,9 +12,17 @@ std::string Line(const DescribedProgram& program, const std::string& command) {
            (command.empty() ? "\"\"" : command) + "'";
 }
 
+bool AreFiles(const Values& values) {
+    return values.more == Values::More::Files || values.more == Values::More::RevisionsAndFiles;
+}
+
+bool AreRevisions(const Values& values) {
+    return values.more == Values::More::Revisions || values.more == Values::More::RevisionsAndFiles;
+}
+
 std::string ValueFlags(const Values& values) {
-    std::string flags = values.more == Values::More::Files ? " -F" : " -f";
-    if (values.more == Values::More::Revisions)
+    std::string flags = AreFiles(values) ? " -F" : " -f";
+    if (AreRevisions(values))
         flags += " -a " + InQuotes("(" + std::string(kListRevisions) + ")");
     else if (!values.words.empty())
         flags += " -a " + InQuotes(Joined(values.words, " "));
@@ -33,8 +41,8 @@ std::string OptionFlags(const DescribedOption& option) {
 void WriteOperands(std::ostream& out, const DescribedProgram& program, const DescribedCommand& command) {
     bool areFiles = false;
     for (const Operand& operand : command.operands) {
-        areFiles |= operand.values.more == Values::More::Files;
-        if (!operand.values.words.empty() || operand.values.more == Values::More::Revisions)
+        areFiles |= AreFiles(operand.values);
+        if (!operand.values.words.empty() || AreRevisions(operand.values))
             out << Line(program, command.name) << ValueFlags(operand.values) << '\n';
     }
     if (!areFiles) out << Line(program, command.name) << " -f\n";

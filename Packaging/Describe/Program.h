@@ -6,7 +6,7 @@
 
 /// What an argument may be, for completion.
 struct Values {
-    enum class More { None, Files, Revisions };
+    enum class More { None, Files, Revisions, RevisionsAndFiles };
 
     std::vector<std::string> words; // some, or all there are
     More more = More::None;         // what else there is

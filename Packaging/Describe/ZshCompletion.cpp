@@ -9,11 +9,14 @@ std::string InQuotes(const std::string& text) {
 /// What may stand behind the second colon of an argument of _arguments.
 std::string Action(const Values& values) {
     const std::string words = Joined(values.words, " ");
+    const std::string addRevisions = "compadd -- ${(f)\"$(" + Escaped(kListRevisions, ":", "\\&") + ")\"}";
     switch (values.more) {
     case Values::More::None:
         return words.empty() ? " " : "(" + words + ")";
     case Values::More::Revisions:
-        return "{compadd -- ${(f)\"$(" + Escaped(kListRevisions, ":", "\\&") + ")\"}}";
+        return "{" + addRevisions + "}";
+    case Values::More::RevisionsAndFiles:
+        return "{" + addRevisions + "; _files}";
     case Values::More::Files:
         return words.empty() ? "_files" : "{compadd " + words + "; _files}";
     }

@@ -57,6 +57,10 @@ TEST(Check, TellsWhatIsWrongAndWhere) {
         {note + note, "repeated-id@6"},
         {Object(9, 1, "\nNote:\n  a: 1\n  b: 2\n  a: 3\n"), "repeated-key@5"},
         {Object(9, 1, "\nAnimatorStateMachine:\n  m_StateMachineTransitions:\n    a: 1\n    a: 2\n"), ""},
+        {Object(9, 1, "\nAnimatorStateMachine:\n  m_StateMachineTransitions:\n    a: 1\n    a: 1\n"),
+         "not-as-written@3"},
+        {Object(9, 1, "\nNote:\n  a: 1\n  a: 1\n"), "not-as-written@3"},
+        {Object(9, 1, "\nNote:\n  a: 1\nMERGE_FileID: 1\nMERGE_ClassID: 7\n"), "repeated-key@3"},
         {Object(9, 1, "\nNote:\n  m_A: {fileID: 7}\n  m_B: {fileID: 7, guid: ab}\n  m_C: {fileID: 0}\n"),
          "dangling-reference@5"},
         {Transform(2, 0, " []", 0) + Transform(3, 0, " []", 2), "father-lacks-child@12"},
@@ -134,13 +138,17 @@ TEST(Check, HostileHierarchiesTakeLinearTime) {
     for (int id = 2; id <= kCount; ++id) fan += Transform(id, 0, " []", 1);
     EXPECT_EQ(Findings(loop), "parent-loop@8");
     EXPECT_EQ(Findings(fan), "");
+    std::string keys = "\nNote:\n";
+    for (int i = 0; i < 2 * kCount; ++i)
+        keys += "  k" + std::to_string(i % kCount) + ": " + std::to_string(i) + '\n';
+    EXPECT_EQ(CheckScene(kHeader + Object(9, 1, keys), {}).size(), std::size_t{kCount});
     std::string deep = "\nNote: ";
     for (int i = 0; i < 100000; ++i) deep += "[";
     EXPECT_EQ(Findings(kHeader + Object(9, 1, deep + "\n")), "unreadable@3");
 }
 
 TEST(Check, ListsAreValidWhateverTheBytes) {
-    CheckResult result;
+    CheckedScenes result;
     result.scenes.push_back(
         {"a b/\xff\"#.ovrin", CheckScene(kHeader + Object(9, 1, "\nNote:\n  a: {fileID: \xff}\n"), {})});
     ASSERT_EQ(result.scenes[0].findings.size(), 1u);

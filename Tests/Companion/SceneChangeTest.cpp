@@ -24,7 +24,7 @@ FileVersion Version(const std::string& text) {
 
 /// A file of these objects; other texts as they are.
 std::string File(const std::string& lines) {
-    if (lines.empty() || lines.find('&') == std::string::npos) return lines;
+    if (lines.starts_with('%') || lines.find('&') == std::string::npos) return lines;
     Scene scene(lines);
     std::ostringstream stream;
     Output(scene.Objects(), stream);
@@ -89,7 +89,7 @@ TEST(SceneChange, ListsTellWhatCameWentAndMoved) {
                    "114 &1 MonoBehaviour: {l: [{fileID: 7}, {fileID: 5, v: 2}, {fileID: 8}]}\n"),
               "  changed  MonoBehaviour (1)\n"
               "             l[(missing 6)]: removed (missing 6)\n"
-              "             l[(missing 7)]: moved from index 2 to 0\n"
+              "             l[(missing 5)]: moved from index 0 to 1\n"
               "             l[(missing 5)].v: 1 → 2\n"
               "             l[(missing 8)]: added (missing 8)\n");
     EXPECT_EQ(FindMoved({3, 0, -1, 1, 2}), std::vector<std::size_t>{0});
@@ -97,8 +97,9 @@ TEST(SceneChange, ListsTellWhatCameWentAndMoved) {
 }
 
 TEST(SceneChange, OtherOrderAndFormAreNoSilence) {
-    EXPECT_EQ(Told("114 &1 MonoBehaviour: {a: 1, b: 2}\n", "114 &1 MonoBehaviour: {b: 2, a: 1}\n"),
-              "  changed  MonoBehaviour (1)\n             (order of the fields): changed\n");
+    EXPECT_EQ(
+        Told("114 &1 MonoBehaviour: {a: 1, b: 2}\n", "114 &1 MonoBehaviour: {b: 3, a: 1}\n"),
+        "  changed  MonoBehaviour (1)\n             b: 2 → 3\n             (order of the fields): changed\n");
     EXPECT_EQ(Told("1 &1 A: {}\n2 &2 B: {}\n", "2 &2 B: {}\n1 &1 A: {}\n"), "  no object differs\n");
 }
 

@@ -73,7 +73,7 @@ TEST(PropertyNames, ElementsAreToldByTheirKeys) {
     EXPECT_EQ(Property("2.Transform.m_Pair.x"), "m_Pair.x");
     EXPECT_EQ(Property("2.Transform.m_Children.0"), "m_Children[Gate]");
     EXPECT_EQ(Property("2.Transform.m_Children.1"), "m_Children[(missing 9)]");
-    EXPECT_EQ(Property("1.GameObject.m_Component.1"), "m_Component[Gate · MonoBehaviour]");
+    EXPECT_EQ(Property("1.GameObject.m_Component.1"), "m_Component[MonoBehaviour]");
     EXPECT_EQ(Property("3.MonoBehaviour.m_Slots.0.item.deep.0"), "m_Slots[left hand].item.deep[0]");
     EXPECT_EQ(Property("3.MonoBehaviour.m_List.1"), "m_List[1]");
     EXPECT_EQ(Property("4.PrefabInstance.m_Modification.m_Modifications.1.value"),
