@@ -86,6 +86,7 @@ bool TellOpen(const SettleScenes& scenes, bool wasDecided) {
 }
 
 Outcome Settle(SettleScenes& scenes, const SettleOptions& options, bool isAnyUnreadable) {
+    if (isAnyUnreadable && scenes.Sessions().empty()) return Outcome::LeftOpen;
     Decide(scenes, options);
     const bool wasDecided =
         !options.set.empty() || !options.decisionFile.empty() || !options.take.empty() || options.isUndo;

@@ -3,6 +3,8 @@
 #include "Conflicts/DecisionPath.h"
 #include "Names/ObjectBody.h"
 
+#include "Diff/YAMLMappingDiff.h"
+
 #include <algorithm>
 #include <iterator>
 #include <set>
@@ -108,9 +110,26 @@ private:
         const IDs before = Listed(Side::Base, owner, list), after = Listed(dropped, owner, list);
         std::vector<ID> changed;
         std::ranges::set_symmetric_difference(before, after, std::back_inserter(changed));
+        if (changed != std::vector{entry}) return;
+        const Path path = PathOfChange(dropped, owner, list);
+        if (!path.empty()) m_Decisions.push_back({DecisionPath(path), OtherThan(dropped)});
+    }
+
+    const YAMLMappingDiff& Diff(Side side) const {
+        const MergeSession& session = m_Merge.Session();
+        return side == Side::Ours ? session.RightDiff() : session.LeftDiff();
+    }
+
+    /// Where the change of a list can be decided on: an object that one side alone changed is merged as a
+    /// whole. Empty if other changes of the object would go with it.
+    Path PathOfChange(Side dropped, ID owner, const YAMLScalar* list) const {
         const ObjectBody body = Body(dropped, owner);
-        if (changed == std::vector{entry} && body.className)
-            m_Decisions.push_back({DecisionPath(Path{owner, body.className, list}), OtherThan(dropped)});
+        if (!body.className) return {};
+        if (Diff(OtherThan(dropped)).HasKey(owner)) return {owner, body.className, list};
+        const auto* object = As<ChangeMappingOperation>(Diff(dropped).Find(owner));
+        if (!object || object->m_Diff->Entries().size() != 1) return {};
+        const auto* fields = As<ChangeMappingOperation>(object->m_Diff->Entries()[0].operation);
+        return fields && fields->m_Diff->Entries().size() == 1 ? Path{owner} : Path{};
     }
 
     SceneMerge& m_Merge;

@@ -16,8 +16,8 @@ namespace ovrin {
 ///     that a side removed          components, all that stands under it, and the entry in the owner's list
 ///     a loop of parents is ended   the lists of children follow
 ///
-/// A list is left to the merge where the side whose change is dropped changed other entries of it, too. What
-/// is open by itself is left to its own decision.
+/// A list is left to the merge where the side whose change is dropped changed other entries of it, too, or
+/// alone changed other fields of the owner. What is open by itself is left to its own decision.
 std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
                                    std::span<const OpenConflict> conflicts, Side side);
 

@@ -6,6 +6,7 @@
 #include "Names/PrintableText.h"
 #include "Scenes/SceneFile.h"
 #include "Systems/Git.h"
+#include "Systems/Operation.h"
 #include "Systems/UnmergedFiles.h"
 #include "Systems/WorkingPath.h"
 #include "Words/Failure.h"
@@ -52,6 +53,7 @@ std::string TellByHand(const std::string& path) {
 
 SettleScenes::SettleScenes(Remarks& remarks)
     : m_Repository(RepositoryHere()), m_Store(m_Repository), m_Live(FindLiveMerges(m_Repository, m_Store)) {
+    if (IsAtWork(m_Repository)) m_Live.stale.clear();
     for (const OpenMerge& merge : m_Live.stale) {
         m_Store.Remove(merge.path);
         remarks.push_back(Printable(merge.path) +

@@ -3,7 +3,9 @@
 #include "FileUtils.h"
 #include "Systems/Repository.h"
 
+#include <filesystem>
 #include <span>
+#include <system_error>
 
 namespace ovrin {
 
@@ -57,6 +59,13 @@ Operation OperationIn(const Repository& repository) {
         break;
     }
     return {"", "svn commit", "svn revert", ""};
+}
+
+bool IsAtWork(const Repository& repository) {
+    const char* lock = repository.kind == SystemKind::Git ? "/index.lock" : "/wlock";
+    std::error_code error;
+    // Mercurial's is a link to nothing.
+    return std::filesystem::exists(std::filesystem::symlink_status(repository.data + lock, error));
 }
 
 } // namespace ovrin

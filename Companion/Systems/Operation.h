@@ -17,4 +17,8 @@ struct Operation {
 /// Looks at the files that the system keeps of it; no program is started.
 Operation OperationIn(const Repository& repository);
 
+/// Whether a process of git or Mercurial is changing the working tree: what it has done so far isn't known
+/// from its files yet.
+bool IsAtWork(const Repository& repository);
+
 } // namespace ovrin
