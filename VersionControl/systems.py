@@ -31,10 +31,6 @@ class System:
         self.environment |= {"HOME": str(self.home), "GIT_CONFIG_NOSYSTEM": "1", "EDITOR": "false", "LC_ALL": "C.UTF-8",
                              "PATH": f"{self.fakes}:{installed}/bin:{self.bare_path}"}
 
-    @property
-    def shown_name(self):
-        return self.name
-
     def run(self, *command, fails=False, answer="", **environment):
         """What the command prints. It must fail or succeed as told; with "fails" as None it may do either."""
         # A tool that wants to talk to a person finds no terminal, and nothing that it could take for one.
@@ -143,10 +139,6 @@ class Git(System):
 class Mercurial(System):
     program = command = "hg"
 
-    @property
-    def shown_name(self):
-        return f"{self.here}/{self.name}"
-
     def start(self):
         self.run("hg", "init", ".")
         (self.home / ".hgrc").write_text("[ui]\nusername = Tester\n", encoding="utf-8")
@@ -193,10 +185,6 @@ class Subversion(System):
     program = "svnadmin"
     command = "svn"
     driver = "ovrin-svn"
-
-    @property
-    def shown_name(self):
-        return f"{self.here}/{self.name}"
 
     def start(self):
         self.repository = f"file://{self.home}/repository"

@@ -140,7 +140,7 @@ def test_what_is_no_scene_keeps_its_conflicts_between_markers(system):
 def test_conflict_stays_open_with_its_report(system):
     system.sides(*CONFLICT_AND_MORE)
     system.merge(fails=True)
-    assert f"{system.shown_name}: 1 open conflict" in system.report
+    assert f"ovrin: {system.name}: 1 open conflict" in system.report
     assert re.search(r"\nLamp \(10, .*\n  m_Layer: .*\n +base +1.*\n +ours +5.*\n +theirs +2.*\n", system.report)
     assert system.is_open()
     # What isn't open is merged; at what is open stands ours.
@@ -165,7 +165,7 @@ def test_taking_theirs_settles_a_conflict_and_keeps_the_rest(system):
 def test_what_subversion_leaves_is_merged_and_settled_in_the_same_way(system):
     system.sides(*CONFLICT_AND_OBJECTS)
     system.merge()
-    assert f"{system.shown_name}: 1 open conflict" in system.report
+    assert f"ovrin: {system.name}: 1 open conflict" in system.report
     assert system.is_open()
     assert system.versions() == CONFLICT_AND_OBJECTS
     assert system.read() == scene("5 Lamp 3 20") + game_object(30, 0, "Boat", 1)

@@ -145,7 +145,6 @@ std::string Lasting(const std::string& file, const std::string& byDefault) {
 std::string Record(const Records& records, const FileMerge& files, OpenMerge merge) {
     if (records.path.empty()) return "Nothing is written down: there is no working tree around the file.\n";
     try {
-        merge.path = records.path;
         merge.texts = ReadTexts(files); // as they still are: the result comes later
         merge.rules = Lasting(files.format.rules, kDefaultRulesFile);
         merge.typeInfo = Lasting(files.format.typeInfo, kDefaultTypeInfoFile);
@@ -161,7 +160,7 @@ std::string Record(const Records& records, const FileMerge& files, OpenMerge mer
 OpenMerge DescribeOpen(const FileMerge& files, const Records& records, const std::optional<Caller>& caller,
                        SceneMerge& merge) {
     OpenMerge open;
-    open.path = files.path;
+    open.path = records.path.empty() ? files.path : records.path;
     open.occasion = FindOccasion(records.repository, caller, files.labels);
     open.take = SideToTake(records.repository);
     if (open.take != Side::Ours) merge.Merge({}, open.take);
