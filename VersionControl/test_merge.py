@@ -68,6 +68,15 @@ def test_sides_are_called_by_what_they_are(user, command, sides):
     assert user.read() == ONE_CONFLICT[1 if swapped else 2]
 
 
+@pytest.mark.parametrize("command", [["checkout", "-m", "scene.ovrin"], ["restore", "--merge", "scene.ovrin"]])
+def test_a_conflict_that_is_made_again_is_of_the_same_sides(user, command):
+    user.sides(*ONE_CONFLICT)
+    sides = f"ours is topic, what you rebase onto; theirs is {short(user, 'main')} (change)"
+    user.git("rebase", "topic", fails=True)
+    user.git(*command)
+    assert sides in user.words()
+
+
 def test_revert_and_stash_tell_what_comes_back(user):
     user.sides(*ONE_CONFLICT)
     user.commit(scene("7 Lantern 1"))

@@ -189,6 +189,26 @@ def test_file_that_was_changed_by_hand_is_not_replaced_unasked(user):
     user.git("commit", "-qm", "merged")
 
 
+@pytest.mark.parametrize("link", ["scene.ovrin", "folder"])
+def test_nothing_is_written_through_a_link(user, link):
+    name = user.name if link == user.name else "folder/scene.ovrin"
+    (user.here / "folder").mkdir()
+    user.conflict(*ONE_CONFLICT, name)
+    outside = user.home / "outside"
+    (user.here / link).rename(outside)
+    (user.here / link).symlink_to(outside)
+    user.ovrin("settle", "--take", "theirs", "--overwrite", status=LEFT_OPEN)
+    assert user.read(name) == ONE_CONFLICT[2] and "link" in user.words() and user.records() != []
+
+
+def test_status_in_the_midst_of_a_merge_forgets_nothing(user):
+    user.sides(*ONE_CONFLICT)
+    user.git("config", "merge.ovrin.driver", "ovrin merge -- %O %A %B %A %P; code=$?; ovrin status; exit $code")
+    user.git("merge", "topic", fails=True)
+    user.git("commit", "-qam", "too early", fails=True)
+    assert "1 open conflict" in user.words()
+
+
 def test_hand_made_result_is_taken_unless_it_holds_markers(user):
     user.conflict(*ONE_CONFLICT)
     user.write(scene("7 Lantern 1") + "<<<<<<< ours\n")

@@ -10,10 +10,10 @@ OpenConflicts::OpenConflicts(const Repository& repository) {
     const LiveMerges merges = FindLiveMerges(repository, store);
     for (const OpenMerge& merge : merges.live) {
         const std::size_t open = store.ProgressOf(merge).open;
-        if (open == 0) continue;
-        m_Messages[merge.path] = "has " + std::to_string(open) +
-                                 (open == 1 ? " open conflict" : " open conflicts") +
-                                 "; \"ovrin settle\" settles them";
+        m_Messages[merge.path] = open ? "has " + std::to_string(open) +
+                                            (open == 1 ? " open conflict" : " open conflicts") +
+                                            "; \"ovrin settle\" settles them"
+                                      : "isn't settled yet; \"ovrin settle\" completes it";
     }
     for (const std::string& path : merges.unrecorded)
         m_Messages[path] = "is unmerged: settle it, and tell version control that it is";

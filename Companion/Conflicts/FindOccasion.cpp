@@ -2,6 +2,7 @@
 
 #include "Systems/Caller.h"
 #include "Systems/GitFiles.h"
+#include "Systems/Operation.h"
 #include "Systems/Repository.h"
 
 #include <algorithm>
@@ -60,6 +61,15 @@ bool IsWithoutCommit(const Caller& caller) {
     return (caller.command == "cherry-pick" || caller.command == "revert") &&
            std::ranges::any_of(caller.words,
                                [](const std::string& word) { return word == "-n" || word == "--no-commit"; });
+}
+
+/// "git checkout --merge FILE" makes a conflict again, of whatever is under way: that is as good as its
+/// command, of which the words aren't known. Of branches the same command takes local changes along.
+Caller WhoMadeIt(const Repository& repository, const Caller& caller) {
+    if (caller.command != "checkout" && caller.command != "restore") return caller;
+    const std::string action = OperationIn(repository).action;
+    const bool namesFiles = std::ranges::find(caller.words, "--") != caller.words.end();
+    return action.empty() && !namesFiles ? caller : Caller{caller.program, action, {}};
 }
 
 Occasion OfGit(const Repository& repository, const Caller& caller) {
@@ -121,7 +131,8 @@ Occasion FindOccasion(const std::optional<Repository>& repository, const std::op
                       const GivenLabels& given) {
     Occasion occasion;
     const Caller known = caller.value_or(Caller());
-    if (repository && repository->kind == SystemKind::Git) occasion = OfGit(*repository, known);
+    if (repository && repository->kind == SystemKind::Git)
+        occasion = OfGit(*repository, WhoMadeIt(*repository, known));
     if (repository && repository->kind == SystemKind::Mercurial) occasion = OfMercurial(known);
     if (repository && repository->kind == SystemKind::Subversion)
         occasion = {known.command, "", "the working copy", "the repository", ""};

@@ -149,7 +149,19 @@ OpenMerge ReadMerge(const std::string& file, Extent extent) {
             throw Failure(std::system_category().message(errno));
         return Parse(bytes, extent);
     } catch (const std::exception& error) {
-        throw Failure("Cannot read the open merge in " + file + ": " + error.what());
+        throw Failure("Cannot read the open merge in " + file + ": " + error.what() +
+                      ".\nRemove that file: conflicts that version control still knows of are found without "
+                      "it; a scene that was added meanwhile must be looked through");
+    }
+}
+
+/// Whether the file is the record of another scene. One that can't be made out is taken for the scene's whose
+/// place it has, so that the next merge of that scene puts it right.
+bool IsOfAnother(const std::string& file, const std::string& path) {
+    try {
+        return ReadMerge(file, Extent::WithoutTexts).path != path;
+    } catch (const Failure&) {
+        return false;
     }
 }
 
@@ -161,7 +173,7 @@ OpenMerges::Place OpenMerges::PlaceOf(const std::string& path) const {
     for (std::uint64_t attempt = 0;; ++attempt) {
         const std::string file = m_Folder + NumberOf(path, attempt);
         if (IsMissing(file + kMergeExtension)) return {file, false};
-        if (ReadMerge(file + kMergeExtension, Extent::WithoutTexts).path == path) return {file, true};
+        if (!IsOfAnother(file + kMergeExtension, path)) return {file, true};
     }
 }
 
@@ -211,7 +223,8 @@ Progress OpenMerges::ProgressOf(const OpenMerge& merge) const {
             progress.decisions.size())
             throw Failure("its steps don't add up");
     } catch (const std::exception& error) {
-        throw Failure("Cannot read the decisions in " + file + ": " + error.what());
+        throw Failure("Cannot read the decisions in " + file + ": " + error.what() +
+                      ".\nRemove that file to decide anew");
     }
     return progress;
 }

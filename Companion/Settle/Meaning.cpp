@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <span>
+#include <unordered_set>
 
 namespace ovrin {
 
@@ -23,15 +24,6 @@ bool IsCalled(const MergeNames& names, ID id, const std::string& name) {
     });
 }
 
-/// Visits the object and all that it stands under, in each version; ends where that returns true.
-template <class Visit> bool AnyAbove(const MergeNames& names, ID object, const Visit& visit) {
-    return std::ranges::any_of(kVersions, [&](Version version) {
-        for (ID id = object; id && names.Has(version, id); id = names.In(version).Above(id))
-            if (visit(id)) return true;
-        return false;
-    });
-}
-
 /// What may stand behind an object's name.
 std::vector<std::string> PropertiesOf(const Conflict& conflict, const Path& path) {
     if (path.size() < 3) return {""};
@@ -40,19 +32,37 @@ std::vector<std::string> PropertiesOf(const Conflict& conflict, const Path& path
 
 } // namespace
 
+/// Goes up from each object until something is known of all above, which may be as many as the scene has.
 std::vector<ID> ObjectsCalled(const SettleSession& session, const std::string& name) {
+    const MergeNames& names = session.Names();
     std::vector<ID> called;
-    for (const OpenConflict& conflict : session.Open())
-        AnyAbove(session.Names(), conflict.path.front(), [&](ID id) {
-            if (IsCalled(session.Names(), id, name) && std::ranges::find(called, id) == called.end())
-                called.push_back(id);
-            return false;
-        });
+    std::unordered_set<ID> asked;
+    for (const Version version : kVersions) {
+        std::unordered_set<ID> seen;
+        for (const OpenConflict& conflict : session.Open())
+            for (ID id = conflict.path.front(); id && names.Has(version, id) && seen.insert(id).second;
+                 id = names.In(version).Above(id))
+                if (asked.insert(id).second && IsCalled(names, id, name)) called.push_back(id);
+    }
     return called;
 }
 
-bool IsUnder(const MergeNames& names, const OpenConflict& conflict, ID above) {
-    return AnyAbove(names, conflict.path.front(), [&](ID id) { return id == above; });
+bool UnderObject::IsMeant(const OpenConflict& conflict) {
+    return std::ranges::any_of(kVersions,
+                               [&](Version version) { return IsIn(version, conflict.path.front()); });
+}
+
+bool UnderObject::IsIn(Version version, ID id) {
+    std::unordered_map<ID, bool>& known = m_Known[static_cast<std::size_t>(version)];
+    std::vector<ID> way;
+    while (id && id != m_Above && m_Names.Has(version, id) && !known.contains(id)) {
+        way.push_back(id);
+        id = m_Names.In(version).Above(id);
+    }
+    const auto found = known.find(id);
+    const bool isUnder = found == known.end() ? id == m_Above && m_Names.Has(version, id) : found->second;
+    for (const ID below : way) known.emplace(below, isUnder);
+    return isUnder;
 }
 
 std::vector<std::string> ConflictsCalled(SettleSession& session, const std::string& name) {

@@ -26,6 +26,22 @@ Repository RepositoryHere() {
     return *found;
 }
 
+/// What version control is in the midst of looks like what is over: nothing is stale that it was at work on
+/// before or after.
+LiveMerges LookAtMerges(const Repository& repository, const OpenMerges& store) {
+    const bool wasAtWork = IsAtWork(repository);
+    LiveMerges found = FindLiveMerges(repository, store);
+    if (wasAtWork || IsAtWork(repository)) found.stale.clear();
+    return found;
+}
+
+/// Whether the file, or a folder above it, is a link, which may lead out of the working tree.
+bool IsBehindLink(const std::string& file) {
+    std::error_code error;
+    return std::filesystem::is_symlink(std::filesystem::symlink_status(file, error)) ||
+           std::filesystem::weakly_canonical(file, error) != file;
+}
+
 /// The bytes of a regular file; nothing where it isn't one or can't be read.
 std::optional<std::string> BytesOf(const std::string& file) {
     std::error_code error;
@@ -43,6 +59,11 @@ void DeliverScene(const std::string& file, const std::string& bytes) {
                       "; the decisions are kept: make room, and run \"ovrin settle\" again");
 }
 
+std::string TellLink(const std::string& path) {
+    return Printable(path) + " is a link or stands behind one, and nothing is written through it: take the "
+                             "link away, and run \"ovrin settle --overwrite\"";
+}
+
 std::string TellByHand(const std::string& path) {
     return Printable(path) + " was changed by hand since it was merged, and stays as it is: \"ovrin settle "
                              "--as-is\" takes the file "
@@ -52,8 +73,7 @@ std::string TellByHand(const std::string& path) {
 } // namespace
 
 SettleScenes::SettleScenes(Remarks& remarks)
-    : m_Repository(RepositoryHere()), m_Store(m_Repository), m_Live(FindLiveMerges(m_Repository, m_Store)) {
-    if (IsAtWork(m_Repository)) m_Live.stale.clear();
+    : m_Repository(RepositoryHere()), m_Store(m_Repository), m_Live(LookAtMerges(m_Repository, m_Store)) {
     for (const OpenMerge& merge : m_Live.stale) {
         m_Store.Remove(merge.path);
         remarks.push_back(Printable(merge.path) +
@@ -160,6 +180,10 @@ std::vector<std::string> SettleScenes::Finish(bool overwrite, Remarks& remarks) 
         if (!session->IsSettled()) continue;
         const std::string& path = session->Source().path;
         const std::string result = session->Result();
+        if (IsBehindLink(FileOf(path))) {
+            remarks.push_back(TellLink(path));
+            continue;
+        }
         if (!overwrite && !IsUntouched(*session, result)) {
             remarks.push_back(TellByHand(path));
             continue;

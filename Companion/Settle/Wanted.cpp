@@ -137,10 +137,11 @@ std::size_t TakeSide(Sessions sessions, Side side, const std::string& under) {
                       "\" or what stands under it, so nothing was decided: \"ovrin settle --list\" shows the "
                       "conflicts");
     std::size_t settled = 0;
-    for (const auto& [session, above] : meant)
-        settled += session->TakeAll(side, [&, above = above, session = session](const OpenConflict& open) {
-            return !above || IsUnder(session->Names(), open, above);
-        });
+    for (const auto& [session, above] : meant) {
+        UnderObject under(session->Names(), above);
+        settled += session->TakeAll(
+            side, [&, above = above](const OpenConflict& open) { return !above || under.IsMeant(open); });
+    }
     return settled;
 }
 

@@ -37,10 +37,10 @@ TEST_F(ConflictTest, ReportNamesObjectsAndTellsAllThreeValues) {
                                                            "    ours    5    main\n"
                                                            "    theirs  2    topic\n"
                                                            "Lantern · Light (20)\n"
-              "  theirs removed it and ours changed it\n"
-              "    base    there\n"
-              "    ours    changed m_Brightness    main\n"
-              "    theirs  removed                 topic\n");
+                                                           "  theirs removed it and ours changed it\n"
+                                                           "    base    there\n"
+                                                           "    ours    changed m_Brightness    main\n"
+                                                           "    theirs  removed                 topic\n");
     EXPECT_TRUE(TellConflicts(merge, {}, 1).ends_with("    theirs  2\nand 1 more\n"));
 }
 

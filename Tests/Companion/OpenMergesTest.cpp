@@ -72,6 +72,8 @@ TEST_F(OpenMergesTest, WhatIsBrokenIsToldAndNotTakenForNothing) {
         std::filesystem::resize_file(entry.path(), 60);
     EXPECT_THROW(merges().List(), Failure);
     EXPECT_THROW(merges().Find("a.ovrin"), Failure);
+    Added("a.ovrin"); // the scene is merged again
+    EXPECT_EQ(merges().List().at(0).path, "a.ovrin");
 }
 
 } // namespace
