@@ -1,96 +1,21 @@
-"""Settles the conflicts of real merges with ovrin settle, and sees what ovrin status keeps from commits.
+"""Settles the conflicts of real merges with ovrin settle, from a script.
 
     pytest-3 VersionControl/test_settle.py --installed build/release/installed
 """
 
 import json
-import pathlib
 import shutil
-import subprocess
-import tempfile
 
 import pytest
 
-from systems import System, can_mount
+from systems import can_mount
 from test_systems import (CONFLICT_AND_MORE, CONFLICT_AND_OBJECTS, HEADER, ONE_CONFLICT, components,
                           game_object, scene)
+from user import FAILED, LEFT_OPEN
 
 NAMES = ["a b.ovrin", "'quoted\" $x.ovrin", "tab\there.ovrin", "line\nfeed.ovrin", "-dash.ovrin", "Hafen \u2693=1.ovrin",
          "*[a].ovrin", ":(top)a.ovrin"]
 MANY = [HEADER + "".join(game_object(number, layer, "Boat", 1) for number in range(1, 51)) for layer in (1, 2, 5)]
-DONE, LEFT_OPEN, FAILED = 0, 1, 2
-
-
-class User(System):
-    """Somebody who has called "ovrin setup", and works in git unless told otherwise."""
-
-    name = "scene.ovrin"
-
-    def git(self, *arguments, fails=False, **environment):
-        return self.run("git", *arguments, fails=fails, **environment)
-
-    def start(self):
-        self.git("init", "-qb", "main", ".")
-        self.git("config", "--global", "user.name", "Tester")
-        self.git("config", "--global", "user.email", "tester@example.org")
-        self.run("ovrin", "setup")
-        self.run("ovrin", "setup", "--local")
-        self.commit("words\n", "readme")
-
-    def commit(self, text, name=None):
-        self.write(text, name)
-        self.git("add", "--", "./" + (name or self.name))
-        self.git("commit", "-qm", "change")
-
-    def sides(self, base, theirs, ours, name=None):
-        self.start()
-        if base is not None:
-            self.commit(base, name)
-        self.git("checkout", "-qb", "topic")
-        self.commit(theirs, name)
-        self.git("checkout", "-q", "main")
-        self.commit(ours, name)
-
-    def conflict(self, base, theirs, ours, name=None):
-        self.sides(base, theirs, ours, name)
-        self.git("merge", "topic", fails=True)
-
-    def ovrin(self, *arguments, status=DONE, **environment):
-        """What it prints; what it says besides is in `words`."""
-        with self.log.open("w", encoding="utf-8") as errors:
-            done = subprocess.run(["ovrin", *arguments], cwd=self.here, env=self.environment | environment,
-                                  stdin=subprocess.DEVNULL, stdout=subprocess.PIPE, stderr=errors, check=False)
-        assert done.returncode == status, f"{arguments}\n{done.stdout.decode()}\n{self.words()}"
-        return done.stdout.decode()
-
-    def words(self):
-        return self.log.read_text(encoding="utf-8")
-
-    def committed(self, name=None):
-        return self.git("show", f"HEAD:{name or self.name}")
-
-    def records(self):
-        return sorted(path.suffix for path in (self.here / ".git/ovrin").glob("*"))
-
-
-@pytest.fixture(name="user")
-def fixture_user(request):
-    installed = pathlib.Path(request.config.getoption("--installed")).resolve()
-    with tempfile.TemporaryDirectory(prefix="a user's ") as folder:
-        yield User(installed, pathlib.Path(folder))
-
-
-def test_commit_is_refused_until_the_conflict_is_settled(user):
-    user.conflict(*CONFLICT_AND_MORE)
-    user.git("commit", "-qam", "too early", fails=True)
-    assert "scene.ovrin: 1 open conflict" in user.words()
-    assert "settle --list" in user.words() and "--no-verify" in user.words()
-    user.ovrin("settle", "--take", "theirs")
-    assert user.words() == "scene.ovrin is settled.\nNext: git commit\n"
-    user.git("commit", "-qm", "merged")
-    assert user.committed() == scene("2 Lamp 3")
-    assert user.records() == [] and user.git("status", "--porcelain") == ""
-    assert user.ovrin("status") == "No scene has open conflicts.\n"
 
 
 def test_fifty_conflicts_take_three_commands(user):
@@ -119,62 +44,6 @@ def test_next_step_is_that_of_the_operation(user, command):
     user.git(command, "--continue", GIT_EDITOR="true")
     # In a rebase ours is what the commits are brought onto.
     assert user.committed() == ONE_CONFLICT[2 if command == "rebase" else 1]
-
-
-def test_stash_is_guarded_without_an_operation_under_way(user):
-    user.sides(scene("1 Lantern 1"), scene("1 Lantern 1 20"), scene("5 Lantern 1"))
-    user.write(scene("5 Lantern 4"))
-    user.git("stash", "-q")
-    user.commit(scene("5 Lantern 6"))
-    user.git("stash", "pop", fails=True)
-    user.git("commit", "-qam", "too early", fails=True)
-    user.git("add", user.name)
-    user.git("commit", "-qm", "too early", fails=True)
-    user.write("other words\n", "readme")
-    user.git("commit", "-qm", "another file", "--", "readme")
-    user.git("commit", "-qam", "too early", fails=True)
-    user.git("checkout", "-q", "HEAD", "--", user.name)
-    assert user.ovrin("status") == "No scene has open conflicts.\n"
-    assert "scene.ovrin is forgotten" in user.words()
-
-
-@pytest.mark.parametrize("command,settled", [
-    ("stash pop", "7 Lamp 3"), ("checkout -m topic", "7 Lantern 3"), ("cherry-pick -n topic", "2 Lamp 3"),
-    ("merge --squash topic", "2 Lamp 3")])
-def test_what_leaves_no_trace_of_itself_is_guarded_and_settled(user, command, settled):
-    user.sides(*CONFLICT_AND_MORE)
-    if command == "stash pop":
-        user.write(scene("7 Lamp 3"))
-        user.git("stash", "-q")
-        user.commit(scene("6 Lamp 1"))
-    if command == "checkout -m topic":
-        user.write(scene("7 Lamp 1 20"))
-        settled += " 20"
-    user.git(*command.split(), fails=None)
-    user.git("add", user.name)
-    user.git("commit", "-qm", "too early", fails=True)
-    user.ovrin("settle", "--take", "theirs")
-    assert ("git stash drop" in user.words()) == (command == "stash pop")
-    user.git("commit", "-qm", "settled")
-    assert user.committed() == scene(settled)
-    assert user.records() == []
-
-
-def test_added_file_is_not_taken_for_a_settled_one(user):
-    user.conflict(*ONE_CONFLICT)
-    user.git("add", user.name)
-    user.git("commit", "-qm", "too early", fails=True)
-    user.ovrin("settle", "--as-is", user.name)
-    user.git("commit", "-qm", "merged")
-    assert user.committed() == ONE_CONFLICT[2]
-
-
-def test_forgotten_conflict_leaves_the_file_to_the_user(user):
-    user.conflict(*ONE_CONFLICT)
-    user.ovrin("settle", "--forget", status=FAILED)
-    user.ovrin("settle", "--forget", user.name)
-    assert user.records() == [] and user.git("ls-files", "--unmerged") != ""
-    user.git("commit", "-qam", "merged")
 
 
 def test_file_that_was_changed_by_hand_is_not_replaced_unasked(user):
