@@ -5,27 +5,18 @@
 
 import concurrent.futures
 import os
-import pathlib
 import subprocess
-import tempfile
 
 import pytest
 
 from systems import can_mount
-from test_settle import LEFT_OPEN, User
 from test_systems import CONFLICT_AND_MORE, HEADER, ONE_CONFLICT, OTHER_FIELDS, game_object, scene
+from user import LEFT_OPEN
 
 BASE, THEIRS, OURS = CONFLICT_AND_MORE
 MERGED = scene("5 Lamp 3")  # with ours where both changed it
 LAYER_LINES = "    base    1\n    ours    5    main\n    theirs  2    topic\n"
 SECONDS_OF_LIFE = (0.001, 0.002, 0.003, 0.004, 0.006, 0.01, 0.02)
-
-
-@pytest.fixture(name="user")
-def fixture_user(request):
-    installed = pathlib.Path(request.config.getoption("--installed")).resolve()
-    with tempfile.TemporaryDirectory(prefix="a user's ") as folder:
-        yield User(installed, pathlib.Path(folder))
 
 
 def unmerged(user):
