@@ -76,3 +76,24 @@ def test_forgotten_conflict_leaves_the_file_to_the_user(user):
     user.ovrin("settle", "--forget", user.name)
     assert user.records() == [] and user.git("ls-files", "--unmerged") != ""
     user.git("commit", "-qam", "merged")
+
+
+@pytest.mark.parametrize("backend", ["--merge", "--apply"])
+def test_rebase_that_goes_on_by_itself_is_guarded_too(user, backend):
+    user.sides(*CONFLICT_AND_MORE)
+    user.git("rebase", backend, "topic", fails=True)
+    user.git("add", user.name)
+    user.git("rebase", "--continue", fails=True, GIT_EDITOR="true")
+    assert "scene.ovrin: 1 open conflict" in user.words() and "--no-verify" not in user.words()
+    user.ovrin("settle", "--take", "theirs")
+    user.git("rebase", "--continue", GIT_EDITOR="true")
+    assert user.committed() == scene("5 Lamp 3") and user.records() == []
+
+
+@pytest.mark.parametrize("backend", ["--merge", "--apply"])
+def test_commit_that_a_rebase_skips_holds_up_no_other(user, backend):
+    user.sides(*ONE_CONFLICT)
+    user.commit("other words\n", "readme")
+    user.git("rebase", backend, "topic", fails=True)
+    user.git("rebase", "--skip", GIT_EDITOR="true")
+    assert user.git("show", "HEAD:readme") == "other words\n" and user.committed() == ONE_CONFLICT[1]

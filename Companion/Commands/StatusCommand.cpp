@@ -24,6 +24,7 @@ using nlohmann::json;
 struct StatusOptions {
     bool asJson = false;
     bool isGuard = false;
+    bool inRebaseAlone = false;
 };
 
 constexpr const char* kWaysOut =
@@ -31,8 +32,8 @@ constexpr const char* kWaysOut =
     "  ovrin settle --list            shows the conflicts, by the names of objects\n"
     "  ovrin settle --take ours       settles all that are open; or theirs, or base\n"
     "  ovrin settle --as-is FILE      you settled it in the editor: takes the file as it stands\n"
-    "  ovrin settle --forget FILE     forgets that there were conflicts, and touches nothing\n"
-    "  git commit --no-verify         commits it as it is\n";
+    "  ovrin settle --forget FILE     forgets that there were conflicts, and touches nothing\n";
+constexpr const char* kWayPastTheHook = "  git commit --no-verify         commits it as it is\n";
 
 /// Of the live merges those that the commit would take along without their being settled.
 std::vector<OpenMerge> FindUnsettled(const Repository& repository, std::vector<OpenMerge> live) {
@@ -48,9 +49,16 @@ std::vector<OpenMerge> FindUnsettled(const Repository& repository, std::vector<O
     return live;
 }
 
-Outcome Guard() {
+/// Whether git is in what it commits for by itself, without the hook that other commits pass.
+bool CommitsByItself(const Repository& repository) {
+    const std::string action = OperationIn(repository).action;
+    return action == "rebase" || action == "am";
+}
+
+Outcome Guard(bool inRebaseAlone) {
     const std::optional<Repository> repository = FindRepository();
     if (!repository || repository->top.empty()) return Outcome::Done;
+    if (inRebaseAlone && !CommitsByItself(*repository)) return Outcome::Done;
     const OpenMerges store(*repository);
     if (store.List().empty()) return Outcome::Done; // nearly always, and without starting git
     const std::vector<OpenMerge> unsettled =
@@ -59,7 +67,7 @@ Outcome Guard() {
     std::string text = "ovrin: this commit would hold scenes whose conflicts aren't settled:\n";
     for (const OpenMerge& merge : unsettled)
         text += "  " + TellCount(SceneCount::Of(merge, store.ProgressOf(merge))) + '\n';
-    std::cerr << text << kWaysOut;
+    std::cerr << text << kWaysOut << (inRebaseAlone ? "" : kWayPastTheHook);
     return Outcome::LeftOpen;
 }
 
@@ -89,11 +97,15 @@ Outcome Status(bool asJson) {
 Action DescribeStatus(CLI::App& command) {
     const auto options = std::make_shared<StatusOptions>();
     auto* json = command.add_flag("--json", options->asJson, "tell it in a form for programs");
+    auto* guard = command
+                      .add_flag("--guard", options->isGuard,
+                                "for git's hooks: refuse a commit of scenes whose conflicts aren't settled")
+                      ->excludes(json);
     command
-        .add_flag("--guard", options->isGuard,
-                  "for git's pre-commit hook: refuse a commit of scenes whose conflicts aren't settled")
-        ->excludes(json);
-    return [options] { return options->isGuard ? Guard() : Status(options->asJson); };
+        .add_flag("--in-rebase", options->inRebaseAlone,
+                  "with --guard: only where git commits by itself, in a rebase or an application of patches")
+        ->needs(guard);
+    return [options] { return options->isGuard ? Guard(options->inRebaseAlone) : Status(options->asJson); };
 }
 
 } // namespace ovrin

@@ -3,6 +3,7 @@
 #include "Conflicts/OpenMerges.h"
 #include "Scenes/SceneFile.h"
 #include "Systems/Git.h"
+#include "Systems/GitFiles.h"
 #include "Systems/Operation.h"
 #include "Systems/Repository.h"
 #include "Systems/UnmergedFiles.h"
@@ -21,12 +22,24 @@ bool LeavesNoTrace(const Occasion& occasion) {
     return occasion.action.empty() || occasion.action == "stash";
 }
 
+std::string FirstWord(const std::string& text) {
+    return text.substr(0, text.find(' '));
+}
+
+/// Whether a rebase has gone on from the commit that was merged to another one: "git rebase --skip" leaves
+/// the head as it was.
+bool IsOfAnotherCommit(const Occasion& occasion, const std::string& atHand) {
+    if (occasion.action != "rebase" || occasion.theirs.empty() || atHand.empty()) return false;
+    const std::string merged = FirstWord(occasion.theirs), now = FirstWord(atHand);
+    return !merged.starts_with(now) && !now.starts_with(merged);
+}
+
 /// What git knows of merged files.
 class GitState {
 public:
     GitState(const Repository& repository, const std::vector<OpenMerge>& merges)
         : m_Git(Git(repository).WithOwnIndex()), m_IsUnderWay(!OperationIn(repository).action.empty()),
-          m_Head(m_Git.Commit("HEAD")) {
+          m_Head(m_Git.Commit("HEAD")), m_AtHand(CommitAtHand(repository)) {
         std::vector<std::string> paths;
         for (const OpenMerge& merge : merges)
             if (LeavesNoTrace(merge.occasion)) paths.push_back(merge.path);
@@ -40,13 +53,15 @@ public:
         if (LeavesNoTrace(occasion) &&
             Holds(m_Differing, merge.path)) // other files may be committed meanwhile
             return !hasMoved || m_Git.IsSameIn(occasion.head, m_Head, merge.path);
-        return !hasMoved && (isUnmerged || (m_IsUnderWay && occasion.action != "stash"));
+        if (hasMoved || isUnmerged) return !hasMoved;
+        return m_IsUnderWay && occasion.action != "stash" && !IsOfAnotherCommit(occasion, m_AtHand);
     }
 
 private:
     const Git m_Git;
     const bool m_IsUnderWay;
     const std::string m_Head;
+    const std::string m_AtHand;           // the commit that a rebase applies
     std::vector<std::string> m_Differing; // of the merges that leave no trace
 };
 

@@ -226,7 +226,8 @@ Diagnosis LookAtGitPath(Patient& patient) {
 Diagnosis LookAtGuard(Patient& patient) {
     if (!patient.IsIn(SystemKind::Git) || !HasGit())
         return {Health::Skipped, "there is no git repository around this folder"};
-    const std::string hook = PreCommitHook();
+    const std::string hooks = GitHooks();
+    const std::string hook = hooks.empty() ? "" : hooks + "/pre-commit";
     if (hook.empty()) return {Health::Skipped, "nobody commits in a repository without a working tree"};
     if (!CallsGuard(hook, patient.Around()->top))
         return {Health::Note, "nothing keeps unsettled scenes from being committed here",

@@ -61,13 +61,13 @@ std::vector<std::string> GitAttributes(Scope scope) {
     return places;
 }
 
-std::string PreCommitHook() {
+std::string GitHooks() {
     if (AnswerOf({"git", "rev-parse", "--is-bare-repository"}) == "true") return {};
     std::string folder = AnswerOf({"git", "config", "--path", "--get", "core.hooksPath"});
-    if (folder.empty()) return GitPath("hooks/pre-commit");
+    if (folder.empty()) return GitPath("hooks");
     if (!folder.starts_with('/')) // git runs hooks at the top
         folder.insert(0, WithoutLineEnd(OutputOf({"git", "rev-parse", "--show-toplevel"})) + '/');
-    return fs::path(folder + "/pre-commit").lexically_normal().string();
+    return fs::path(folder).lexically_normal().string();
 }
 
 std::vector<std::string> EntriesOfGitConfig(const std::string& text) {

@@ -58,13 +58,29 @@ std::string ConfigLines(const ProgramCall& program) {
            line("trustExitCode", "true");
 }
 
+struct GuardHook {
+    const char* name;
+    const char* comment;
+    const char* command;
+};
+
+/// A rebase that goes on commits without the first hook, and in each of its two forms with another one.
+constexpr GuardHook kGuardHooks[] = {
+    {"pre-commit", "# Stops a commit that holds unsettled scenes; \"git commit --no-verify\" passes it by.\n",
+     " status --guard"},
+    {"prepare-commit-msg", "# Stops \"git rebase --continue\" where scenes are unsettled.\n",
+     " status --guard --in-rebase"},
+    {"pre-applypatch",
+     "# Stops \"git am --continue\", and a rebase by patches, where scenes are unsettled.\n",
+     " status --guard --in-rebase"},
+};
+
 /// A machine without the program must not make commits impossible.
-std::string GuardLines(const ProgramCall& program) {
+std::string GuardLines(const ProgramCall& program, const GuardHook& hook) {
     const std::string call = program.ForShell();
-    return "# Stops a commit that holds unsettled scenes; \"git commit --no-verify\" passes it by.\n"
-           "if command -v " +
-           call + " >/dev/null; then\n    " + call +
-           " status --guard || exit 1\nelse\n"
+    return std::string(hook.comment) + "if command -v " + call + " >/dev/null; then\n    " + call +
+           hook.command +
+           " || exit 1\nelse\n"
            "    echo 'ovrin is not installed here: nothing keeps unsettled scenes from this commit' "
            ">&2\nfi\n";
 }
@@ -120,17 +136,19 @@ void NoticeOthers(const std::string& config, const std::string& attributes, Syst
 }
 
 void AddGuard(const ProgramCall& program, SystemSetup& setup) {
-    const fs::path hook = PreCommitHook();
-    if (hook.empty()) return;
+    const fs::path folder = GitHooks();
+    if (folder.empty()) return;
     std::error_code error;
-    if (fs::exists(hook.parent_path(), error) && !fs::is_directory(hook.parent_path(), error)) {
-        setup.notices.push_back("core.hooksPath leads to " + hook.parent_path().string() +
+    if (fs::exists(folder, error) && !fs::is_directory(folder, error)) {
+        setup.notices.push_back("core.hooksPath leads to " + folder.string() +
                                 ", which is no folder: hooks are switched off here, and the guard with them");
         return;
     }
-    setup.files.push_back({"git", hook.string(), GuardLines(program), FileKind::Script, {}});
-    if (hook.parent_path() != fs::path(GitConfigs(Scope::Local).front()).parent_path() / "hooks")
-        setup.notices.push_back(hook.string() +
+    for (const GuardHook& hook : kGuardHooks)
+        setup.files.push_back(
+            {"git", (folder / hook.name).string(), GuardLines(program, hook), FileKind::Script, {}});
+    if (folder != fs::path(GitConfigs(Scope::Local).front()).parent_path() / "hooks")
+        setup.notices.push_back(folder.string() +
                                 " is where core.hooksPath leads: it may be committed, or serve other "
                                 "repositories as well");
 }
@@ -165,6 +183,7 @@ SystemSetup RemovalFromGit(Scope scope, const ProgramCall& program) {
     for (const std::string& path : GitAttributes(scope)) setup.files.push_back(AttributesOf(path));
     for (const std::string& path : GitConfigs(scope)) setup.files.push_back(ConfigOf(path, program));
     if (scope == Scope::Local) AddGuard(program, setup);
+    std::ranges::reverse(setup.files); // the first of the hooks may have made their folder
     return setup;
 }
 
