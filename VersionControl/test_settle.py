@@ -121,6 +121,18 @@ def test_next_step_is_that_of_the_operation(user, command):
     assert user.committed() == ONE_CONFLICT[2 if command == "rebase" else 1]
 
 
+@pytest.mark.parametrize("way", ["--merge", "--apply"])
+def test_rebase_does_not_go_on_with_what_is_unsettled(user, way):
+    user.sides(*CONFLICT_AND_MORE)
+    user.git("rebase", way, "topic", fails=True)
+    user.git("add", user.name)
+    user.git("rebase", "--continue", fails=True, EDITOR="true")
+    assert "1 open conflict" in user.words()
+    user.ovrin("settle", "--take", "theirs")
+    user.git("rebase", "--continue", EDITOR="true")
+    assert user.committed() == scene("5 Lamp 3")
+
+
 def test_stash_is_guarded_without_an_operation_under_way(user):
     user.sides(scene("1 Lantern 1"), scene("1 Lantern 1 20"), scene("5 Lantern 1"))
     user.write(scene("5 Lantern 4"))

@@ -69,6 +69,15 @@ std::string GuardLines(const ProgramCall& program) {
            ">&2\nfi\n";
 }
 
+/// A rebase goes on without pre-commit. prepare-commit-msg is asked of other commits too, even with
+/// --no-verify, and pre-applypatch of patches alone.
+std::string GuardLinesOfRebase(const ProgramCall& program, const std::string& condition) {
+    const std::string call = program.ForShell();
+    return "# Stops what would go on with unsettled scenes; \"ovrin settle --forget\" lets it pass.\nif " +
+           condition + "command -v " + call + " >/dev/null; then\n    " + call +
+           " status --guard || exit 1\nfi\n";
+}
+
 bool IsOurs(const std::string& entry) {
     return std::ranges::any_of(kNames, [&](const char* name) { return entry.starts_with(name); });
 }
@@ -128,7 +137,13 @@ void AddGuard(const ProgramCall& program, SystemSetup& setup) {
                                 ", which is no folder: hooks are switched off here, and the guard with them");
         return;
     }
-    setup.files.push_back({"git", hook.string(), GuardLines(program), FileKind::Script, {}});
+    const auto add = [&](const fs::path& path, const std::string& lines) {
+        setup.files.push_back({"git", path.string(), lines, FileKind::Script, {}});
+    };
+    add(hook, GuardLines(program));
+    add(hook.parent_path() / "prepare-commit-msg",
+        GuardLinesOfRebase(program, "[ -d \"$(git rev-parse --git-path rebase-merge)\" ] && "));
+    add(hook.parent_path() / "pre-applypatch", GuardLinesOfRebase(program, ""));
     if (hook.parent_path() != fs::path(GitConfigs(Scope::Local).front()).parent_path() / "hooks")
         setup.notices.push_back(hook.string() +
                                 " is where core.hooksPath leads: it may be committed, or serve other "
@@ -165,6 +180,7 @@ SystemSetup RemovalFromGit(Scope scope, const ProgramCall& program) {
     for (const std::string& path : GitAttributes(scope)) setup.files.push_back(AttributesOf(path));
     for (const std::string& path : GitConfigs(scope)) setup.files.push_back(ConfigOf(path, program));
     if (scope == Scope::Local) AddGuard(program, setup);
+    std::ranges::reverse(setup.files); // the first of the hooks may have made their folder
     return setup;
 }
 
