@@ -5,6 +5,7 @@
 #include "Commands/Misuse.h"
 #include "Commands/Output.h"
 #include "Commands/PathArguments.h"
+#include "Names/PrintableText.h"
 #include "Words/Failure.h"
 
 #include "Descriptor.h"
@@ -59,15 +60,20 @@ Outcome TellMisuse(const CLI::App& program, const CLI::ParseError& error,
     return Outcome::Failed;
 }
 
+/// Names of files and branches, and what other programs said, may stand in it.
+void TellFailure(const std::string& what) {
+    Tell("ovrin: " + PrintableLines(what) + '\n');
+}
+
 Outcome RunAction(const Action& action) {
     try {
         return action();
     } catch (const std::bad_alloc&) {
         Tell("ovrin: out of memory\n");
     } catch (const std::exception& error) {
-        Tell(std::string("ovrin: ") + error.what() + '\n');
+        TellFailure(error.what());
     } catch (const ovrin_yaml::YAMLError& error) {
-        Tell(std::string("ovrin: ") + error.what() + '\n');
+        TellFailure(error.what());
     }
     return Outcome::Failed;
 }

@@ -88,6 +88,17 @@ std::string Printable(std::string_view text) {
     return printable;
 }
 
+std::string PrintableLines(std::string_view text) {
+    std::string printable;
+    for (;;) {
+        const std::size_t end = text.find_first_of("\n\t");
+        printable += Printable(text.substr(0, end));
+        if (end == std::string_view::npos) return printable;
+        printable += text[end];
+        text.remove_prefix(end + 1);
+    }
+}
+
 std::size_t CharacterCount(std::string_view text) {
     return static_cast<std::size_t>(std::ranges::count_if(text, StartsCharacter));
 }

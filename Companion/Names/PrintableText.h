@@ -10,6 +10,8 @@ namespace ovrin {
 /// direction of writing and bytes that are no UTF-8 stand as escapes (`\n`, `\x1b`, `\u202e`). All else,
 /// backslashes too, stays as it is.
 std::string Printable(std::string_view text);
+/// The same of a text of several lines, which keeps its line breaks and tabs.
+std::string PrintableLines(std::string_view text);
 
 /// Characters of a text that is printable; combining marks count as well.
 std::size_t CharacterCount(std::string_view text);

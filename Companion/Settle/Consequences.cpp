@@ -6,8 +6,12 @@
 #include "Diff/YAMLMappingDiff.h"
 
 #include <algorithm>
+#include <array>
 #include <iterator>
+#include <map>
 #include <set>
+#include <tuple>
+#include <unordered_map>
 
 namespace ovrin {
 
@@ -74,11 +78,18 @@ private:
     }
 
     /// The highest object of those that were removed with this one.
-    ID TopOfRemoval(ID id, Side remover) const {
+    ID TopOfRemoval(ID id, Side remover) {
         const ObjectNames& names = m_Names.In(VersionOf(OtherThan(remover)));
+        std::unordered_map<ID, ID>& tops = m_Tops[static_cast<std::size_t>(remover)];
+        std::vector<ID> way;
         ID top = id;
-        for (ID above = names.Above(id); above && IsRemoved(above, remover); above = names.Above(above))
-            top = above;
+        for (ID at = id; at && (at == id || IsRemoved(at, remover)); at = names.Above(at)) {
+            const auto known = tops.find(at);
+            top = known == tops.end() ? at : known->second;
+            if (known != tops.end()) break;
+            way.push_back(at);
+        }
+        for (const ID below : way) tops.emplace(below, top);
         return top;
     }
 
@@ -103,14 +114,22 @@ private:
         return ids;
     }
 
+    /// The only entry of a list that the side added or removed; null where there are none or several.
+    ID OnlyChange(Side side, ID owner, const YAMLScalar* list) {
+        const auto [found, isNew] = m_OnlyChanges.try_emplace({side, owner, list}, nullptr);
+        if (!isNew) return found->second;
+        const IDs before = Listed(Side::Base, owner, list), after = Listed(side, owner, list);
+        std::vector<ID> changed;
+        std::ranges::set_symmetric_difference(before, after, std::back_inserter(changed));
+        if (changed.size() == 1) found->second = changed.front();
+        return found->second;
+    }
+
     /// Takes the other side's list where all that the side changed in it is this entry.
     void DropChange(Side dropped, ID owner, const char* name, ID entry) {
         if (!owner) return;
         const YAMLScalar* list = YAMLScalar::Lookup(name);
-        const IDs before = Listed(Side::Base, owner, list), after = Listed(dropped, owner, list);
-        std::vector<ID> changed;
-        std::ranges::set_symmetric_difference(before, after, std::back_inserter(changed));
-        if (changed != std::vector{entry}) return;
+        if (OnlyChange(dropped, owner, list) != entry) return;
         const Path path = PathOfChange(dropped, owner, list);
         if (!path.empty()) m_Decisions.push_back({DecisionPath(path), OtherThan(dropped)});
     }
@@ -135,6 +154,9 @@ private:
     SceneMerge& m_Merge;
     const MergeNames& m_Names;
     IDs m_Open;
+    // What was found, since many objects may have one list or stand above each other.
+    std::array<std::unordered_map<ID, ID>, 3> m_Tops; // by the side that removed them
+    std::map<std::tuple<Side, ID, const YAMLScalar*>, ID> m_OnlyChanges;
     std::vector<Decision> m_Decisions;
 };
 

@@ -102,6 +102,7 @@ TEST(ObjectNames, NothingOfANameReachesATerminalAsMoreThanText) {
     EXPECT_EQ(ObjectNames(scene.Root()).Name(Id("1")), "\\x1b[2Ja\\nb\\u202ec\\u0085");
     EXPECT_EQ(Printable("a\xff\xc3("), "a\\xff\\xc3(");
     EXPECT_EQ(Printable("Hafen – Träger 港"), "Hafen – Träger 港");
+    EXPECT_EQ(PrintableLines("a\x1b:\n\tb\n"), "a\\x1b:\n\tb\n");
 }
 
 TEST(ObjectNames, LongWaysAreShortenedInTheMiddle) {
