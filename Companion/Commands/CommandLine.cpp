@@ -56,7 +56,7 @@ Outcome TellMisuse(const CLI::App& program, const CLI::ParseError& error,
     if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) { // --help and --version
         return program.exit(error) == 0 && std::cout.flush() ? Outcome::Done : Outcome::Failed;
     }
-    std::cerr << DescribeMisuse(program, error, arguments);
+    Tell(PrintableLines(DescribeMisuse(program, error, arguments)));
     return Outcome::Failed;
 }
 
