@@ -39,3 +39,11 @@ function(ovrin_add_program name main library)
   # The linker warns of functions that need shared libraries of the system when they run, for users and hosts.
   target_link_options(${name}-static PRIVATE ${OVRIN_STATIC_LINK} -Wl,--fatal-warnings)
 endfunction()
+
+# ovrin_link_quickly(NAME): a program of which speed doesn't matter does without interprocedural optimisation.
+function(ovrin_link_quickly name)
+  set_target_properties(${name} PROPERTIES INTERPROCEDURAL_OPTIMIZATION OFF)
+  if(ovrin_fat_objects)
+    target_link_options(${name} PRIVATE -fno-lto)
+  endif()
+endfunction()

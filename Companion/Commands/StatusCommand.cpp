@@ -40,8 +40,8 @@ std::vector<OpenMerge> FindUnsettled(const Repository& repository, std::vector<O
     if (repository.kind != SystemKind::Git || live.empty()) return live;
     // What concludes an operation concludes it for all files. Any other commit takes some.
     if (!OperationIn(repository).action.empty()) return live;
-    std::vector<std::string> paths;
-    for (const OpenMerge& merge : live) paths.push_back(merge.path);
+    std::vector<std::string> paths(live.size());
+    std::ranges::transform(live, paths.begin(), &OpenMerge::path);
     const std::vector<std::string> committed = Git(repository).DifferingFromHead(paths, true);
     std::erase_if(live, [&](const OpenMerge& merge) {
         return std::ranges::find(committed, merge.path) == committed.end();
