@@ -149,10 +149,13 @@ private:
             Start();
             idle = std::prev(m_Workers.end());
         }
-        if (idle->Begin(piece, size))
+        if (idle->Begin(piece, size)) {
             ++m_Next;
-        else
-            m_Workers.erase(idle);
+            return true;
+        }
+        // One that has worked may have come to its end; where a new one does, so would the next.
+        if (idle->Done() == 0) throw Failure("Cannot start a process: it ends before it has begun");
+        m_Workers.erase(idle);
         return true;
     }
 
