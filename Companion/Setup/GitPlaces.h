@@ -16,8 +16,8 @@ std::vector<std::string> GitConfigs(Scope scope);
 /// The attributes files, the one first that git reads. That of a repository is the one that nobody commits,
 /// which wins over all others.
 std::vector<std::string> GitAttributes(Scope scope);
-/// The folder of the repository's hooks, whether it is there or not; empty where nobody commits: the repository
-/// has no working tree.
+/// The folder of the repository's hooks, whether it is there or not; empty where nobody commits: the
+/// repository has no working tree.
 std::string GitHooks();
 
 /// The names and values that git reads from a configuration of this text, as "NAME\nVALUE". Throws Failure
