@@ -61,7 +61,7 @@ std::string ObjectsOf(const std::string& file, const std::string& other, const S
     if (!IsMissing(file) && !IsFileEmpty(file)) return file;
     const std::string text = Read(other);
     const std::size_t begin = text.starts_with("--- ") ? 0 : text.find("\n--- ");
-    const std::string standIn = scratch.File("none");
+    std::string standIn = scratch.File("none");
     Write(standIn, begin == 0 ? "" : text.substr(0, begin == std::string::npos ? begin : begin + 1),
           Durability::Unsynced);
     return standIn;

@@ -72,6 +72,7 @@ std::vector<SettleSession::Met> SettleSession::Conflicts() const {
     }
     std::ranges::stable_sort(ranked, {}, &std::pair<std::uint32_t, Met>::first);
     std::vector<Met> conflicts;
+    conflicts.reserve(ranked.size());
     for (auto& [rank, conflict] : ranked) conflicts.push_back(std::move(conflict));
     return conflicts;
 }

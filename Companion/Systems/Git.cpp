@@ -110,10 +110,9 @@ std::string Git::Commit(const std::string& name) const {
 }
 
 std::string Git::NameOfCommit(const std::string& commit) const {
-    const std::string name =
-        WithoutLineEnd(Run({"name-rev", "--name-only", "--no-undefined", "--refs=refs/heads/*",
-                            "--refs=refs/remotes/*", "--refs=refs/tags/*", commit})
-                           .output);
+    std::string name = WithoutLineEnd(Run({"name-rev", "--name-only", "--no-undefined", "--refs=refs/heads/*",
+                                           "--refs=refs/remotes/*", "--refs=refs/tags/*", commit})
+                                          .output);
     // One that only leads to the commit, "main~3", tells less than the number.
     if (!name.empty() && name.find_first_of("~^") == std::string::npos) return name;
     return WithoutLineEnd(Output({"rev-parse", "--short", commit}));

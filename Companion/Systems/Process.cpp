@@ -78,7 +78,7 @@ std::string FindProgram(const std::string& name) {
     const char* path = std::getenv("PATH");
     std::istringstream folders(path ? path : "/usr/bin:/bin");
     for (std::string folder; std::getline(folders, folder, ':');) {
-        const std::string place = (folder.empty() ? "." : folder) + "/" + name;
+        std::string place = (folder.empty() ? "." : folder) + "/" + name;
         if (access(place.c_str(), X_OK) == 0) return place;
     }
     return {};
