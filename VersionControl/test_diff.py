@@ -181,21 +181,32 @@ def test_two_files_need_no_repository(git):
     diff(git, "a.ovrin", "nowhere.ovrin", fails=True)
 
 
+def has_terminals():
+    return shutil.which("script") and subprocess.run(
+        ["script", "-qc", "true", "/dev/null"], stdin=subprocess.DEVNULL, stdout=subprocess.DEVNULL,
+        stderr=subprocess.DEVNULL, check=False).returncode == 0
+
+
+def test_colour_is_for_those_who_want_it(git):
+    git.commit(scene("1 Lantern 1"), "a.ovrin")
+    git.write(scene("2 Lantern 1"), "a.ovrin")
+    assert "\033[" not in diff(git) and "\033[" in diff(git, "--color", "always")
+
+
+@pytest.mark.skipif(not has_terminals(), reason="terminals can't be made here")
 def test_colour_and_pages_are_for_terminals(git):
     git.write("#!/bin/sh\nsed 's/^/paged: /'\n", "pager")
     (git.here / "pager").chmod(0o755)
     git.commit(scene("1 Lantern 1"), "a.ovrin")
     git.write(scene("2 Lantern 1"), "a.ovrin")
-    assert "\033[" not in diff(git) and "\033[" in diff(git, "--color", "always")
-    if shutil.which("script"):
-        setting = git.environment | {"GIT_PAGER": "./pager", "TERM": "xterm"}
-        shown = {}
-        for variables in ({}, {"NO_COLOR": "1"}):
-            shown[len(variables)] = subprocess.run(["script", "-qc", "ovrin diff", "/dev/null"], cwd=git.here,
-                                                   env=setting | variables, stdin=subprocess.DEVNULL, text=True,
-                                                   stdout=subprocess.PIPE, check=True, timeout=60).stdout
-        assert "paged: " in shown[0] and "\033[" in shown[0]
-        assert "paged: a.ovrin" in shown[1] and "\033[" not in shown[1]
+    setting = git.environment | {"GIT_PAGER": "./pager", "TERM": "xterm"}
+    shown = {}
+    for variables in ({}, {"NO_COLOR": "1"}):
+        shown[len(variables)] = subprocess.run(["script", "-qc", "ovrin diff", "/dev/null"], cwd=git.here,
+                                               env=setting | variables, stdin=subprocess.DEVNULL, text=True,
+                                               stdout=subprocess.PIPE, check=True, timeout=60).stdout
+    assert "paged: " in shown[0] and "\033[" in shown[0]
+    assert "paged: a.ovrin" in shown[1] and "\033[" not in shown[1]
 
 
 @pytest.mark.parametrize("kind", [Mercurial, Subversion])
