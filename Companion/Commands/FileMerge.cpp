@@ -90,10 +90,15 @@ std::unique_ptr<SceneMerge> Compare(const FileMerge& files, ovrin_yaml::StageWat
     }
 }
 
+/// Whether the file is git's own copy of ours, which it removes as soon as it has read the result there.
+bool IsPassing(const std::string& file) {
+    return fs::path(file).filename().string().starts_with(".merge_file_");
+}
+
 void DeliverResult(const std::string& file, const std::string& text) {
     // Version control doesn't sync the files of a merge either, and would have to start again without them.
     const Content content = {text.size(), [&](OutputStream& stream) { stream << text; },
-                             Durability::Unsynced};
+                             IsPassing(file) ? Durability::Passing : Durability::Unsynced};
     if (const int error = Deliver(file, content))
         throw Failure("cannot write the result, " + Printable(file) + ": " +
                       std::system_category().message(error));
