@@ -8,8 +8,8 @@
 
 #include <algorithm>
 #include <new>
+#include <set>
 #include <sstream>
-#include <unordered_set>
 #include <utility>
 
 namespace ovrin {
@@ -105,27 +105,19 @@ ConflictKind KindOf(const MergeSession::Record& record) {
     }
 }
 
-bool Matches(const Path& pattern, const Path& path) {
-    if (pattern.size() != path.size()) return false;
-    if (path.front() == YAMLScalar::underscore && pattern.front() != path.front()) return false;
-    return std::ranges::equal(pattern, path, [](const YAMLScalar* wanted, const YAMLScalar* element) {
-        return wanted == YAMLScalar::star || wanted == element;
-    });
-}
-
-/// Those of `decisions` that match no record.
-std::vector<Decision> FindUnmatched(std::span<const Decision> decisions,
+/// Those of `decisions`, which are those of the table, that match no record.
+std::vector<Decision> FindUnmatched(std::span<const Decision> decisions, const ResolveTable& table,
                                     const std::vector<MergeSession::Record>& records) {
-    std::vector<std::pair<Path, const Decision*>> left;
-    for (const Decision& decision : decisions) left.emplace_back(PathOfDecision(decision.path), &decision);
-    for (const MergeSession::Record& record : records) {
-        if (left.empty()) break;
-        const Path path = record.path.Elements();
-        if (!path.empty()) std::erase_if(left, [&](const auto& one) { return Matches(one.first, path); });
-    }
+    if (decisions.empty()) return {};
+    std::vector<bool> isFound(decisions.size());
+    for (const MergeSession::Record& record : records)
+        table.ForEachMatch(record.path.Elements(), [&](std::size_t number) { isFound[number] = true; });
+    std::set<Path> found;
+    for (std::size_t i = 0; i < decisions.size(); ++i)
+        if (isFound[i]) found.insert(table.All()[i].path);
     std::vector<Decision> unmatched;
-    unmatched.reserve(left.size());
-    for (const auto& [path, decision] : left) unmatched.push_back(*decision);
+    for (std::size_t i = 0; i < decisions.size(); ++i)
+        if (!found.contains(table.All()[i].path)) unmatched.push_back(decisions[i]);
     return unmatched;
 }
 
@@ -150,7 +142,7 @@ void SceneMerge::Merge(std::span<const Decision> decisions, Side take) {
     ResolveTable decided;
     decided.Set(resolves);
     CollectOpen(decided);
-    m_Unmatched = FindUnmatched(decisions, m_Session.Resolver().Records());
+    m_Unmatched = FindUnmatched(decisions, decided, m_Session.Resolver().Records());
     BreakLoops(resolves, take);
 }
 

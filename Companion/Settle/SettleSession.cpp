@@ -6,7 +6,10 @@
 #include "Settle/Consequences.h"
 
 #include <algorithm>
+#include <iterator>
+#include <map>
 #include <set>
+#include <string_view>
 #include <utility>
 
 namespace ovrin {
@@ -101,18 +104,21 @@ template <class Step> auto SettleSession::OrBack(const Step& step) {
 std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisions, Follow follow) {
     return OrBack([&] {
         const std::size_t before = m_Decisions.size();
+        std::map<Path, const OpenConflict*> open;
+        for (const OpenConflict& conflict : Open()) open.emplace(conflict.path, &conflict);
         for (const Decision& decision : decisions) {
             m_Decisions.push_back(decision);
-            const Path path = PathOfDecision(decision.path);
-            const auto open = std::ranges::find(Open(), path, &OpenConflict::path);
-            if (follow == Follow::Yes && open != Open().end()) AddConsequences({*open}, decision.side);
+            const auto decided = open.find(PathOfDecision(decision.path));
+            if (follow == Follow::Yes && decided != open.end())
+                AddConsequences({*decided->second}, decision.side);
         }
         m_Steps.push_back(m_Decisions.size() - before);
         MergeBy(m_Decisions);
+        std::set<std::string_view> wanted;
+        for (const Decision& decision : decisions) wanted.insert(decision.path);
         std::vector<Decision> unmatched;
-        for (const Decision& lost : m_Merge.Unmatched())
-            if (std::ranges::find(decisions, lost.path, &Decision::path) != decisions.end())
-                unmatched.push_back(lost);
+        std::ranges::copy_if(m_Merge.Unmatched(), std::back_inserter(unmatched),
+                             [&](const Decision& lost) { return wanted.contains(lost.path); });
         if (!unmatched.empty()) Undo();
         return unmatched;
     });
