@@ -11,7 +11,7 @@ class Descriptor;
 enum class Durability {
     Synced,   ///< a failure of the machine too, which costs a few milliseconds and more
     Unsynced, ///< the end of the process; after a failure of the machine the old one may stand there again
-    Passing,  ///< the end of the process; made for whoever reads it next and then removes it
+    Passing,  ///< the end of the process alone: what is removed soon, or can be made again
 };
 
 /// Fills a file.
