@@ -110,8 +110,9 @@ private:
 
     void TakeMessage(std::string_view& text) {
         const std::string count(TakeUntil(text, '\0'));
-        std::vector<std::string> paths(std::strtoul(count.c_str(), nullptr, 10));
-        for (std::string& path : paths) path = OwnPath(TakeUntil(text, '\0'));
+        std::vector<std::string> paths;
+        for (auto left = std::strtoul(count.c_str(), nullptr, 10); left > 0 && !text.empty(); --left)
+            paths.push_back(OwnPath(TakeUntil(text, '\0')));
         const std::string_view kind = TakeUntil(text, '\0');
         TakeUntil(text, '\0');
         const std::size_t open = kind.find('(');

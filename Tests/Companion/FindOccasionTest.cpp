@@ -73,15 +73,4 @@ TEST_F(FindOccasionTest, NothingIsRequired) {
     EXPECT_EQ(Found({}).action, "");
 }
 
-TEST(Caller, IsToldFromOtherPrograms) {
-    const auto picked = CallerOf({"/usr/bin/git", "-C", "merge", "--no-pager", "cherry-pick", "-x", "topic"});
-    ASSERT_TRUE(picked);
-    EXPECT_EQ(picked->command, "cherry-pick");
-    EXPECT_EQ(picked->Operands(), std::vector<std::string>{"topic"});
-    EXPECT_EQ(CallerOf({"/usr/lib/git-core/git-stash", "pop"})->command, "stash");
-    EXPECT_EQ(CallerOf({"/usr/bin/python3", "/usr/bin/hg", "--config", "a.b=c", "merge"})->command, "merge");
-    EXPECT_FALSE(CallerOf({"/bin/sh", "-c", "git merge"}));
-    EXPECT_FALSE(CallerOf({}));
-}
-
 } // namespace
