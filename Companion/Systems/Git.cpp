@@ -27,11 +27,6 @@ std::vector<GitEntry> ParseEntries(std::string_view listing) {
     return entries;
 }
 
-std::string WithoutLineEnd(std::string text) {
-    while (text.ends_with('\n')) text.pop_back();
-    return text;
-}
-
 } // namespace
 
 Git::Git(const Repository& repository)

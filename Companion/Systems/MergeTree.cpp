@@ -34,8 +34,8 @@ std::string QuotedFolder(const std::string& path) {
 /// git with the objects of a repository, whose new objects go into a folder of their own.
 Git GitBeside(const Repository& repository, const std::string& tree, const std::string& newObjects) {
     const Git git(repository);
-    std::string objects = git.Output({"rev-parse", "--path-format=absolute", "--git-path", "objects"});
-    if (objects.ends_with('\n')) objects.pop_back();
+    const std::string objects =
+        WithoutLineEnd(git.Output({"rev-parse", "--path-format=absolute", "--git-path", "objects"}));
     std::string alternates = QuotedFolder(objects);
     if (const char* others = std::getenv("GIT_ALTERNATE_OBJECT_DIRECTORIES"))
         alternates += ':' + std::string(others);
