@@ -122,8 +122,7 @@ TEST(ChangeStat, SumIsThatOfTheFiles) {
                                   Change(FileStatus::Changed, "c.txt", "c.txt")};
     const std::string stat = ChangeStat(changes, false);
     EXPECT_NE(stat.find("aa.ovrin"), std::string::npos);
-    EXPECT_NE(stat.find("2 scenes: 2 added, 2 removed, 2 changed, 2 moved"), std::string::npos)
-        << stat;
+    EXPECT_NE(stat.find("2 scenes: 2 added, 2 removed, 2 changed, 2 moved"), std::string::npos) << stat;
 }
 
 } // namespace

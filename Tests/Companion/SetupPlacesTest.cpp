@@ -152,9 +152,10 @@ TEST_F(SetupRunTest, NothingToSetUpIsAFailure) {
 
 TEST_F(SetupRunTest, LocalSetUpNeedsARepository) {
     const surroundings::Here outside(home.Path());
-    EXPECT_NE(
-        ErrorOf<Failure>([] { RunSetup({.system = "", .scope = Scope::Local}); }).find("no repository around this folder"),
-        std::string::npos);
+    EXPECT_NE(ErrorOf<Failure>([] {
+                  RunSetup({.system = "", .scope = Scope::Local});
+              }).find("no repository around this folder"),
+              std::string::npos);
 }
 
 TEST_F(SetupRunTest, ToolOfAnotherIsNotTakenFromSubversion) {
