@@ -1,6 +1,7 @@
 #include "Systems/MergeTree.h"
 
 #include "Systems/Git.h"
+#include "Systems/PartialClone.h"
 #include "Systems/Repository.h"
 #include "Systems/ScratchFolder.h"
 #include "Words/Failure.h"
@@ -154,6 +155,13 @@ std::vector<TreeEntry*> BlobsOf(std::vector<UnmergedFile>& files) {
     return blobs;
 }
 
+/// In a partial clone even the size of a blob is only known where the blob is.
+void FetchMissing(const Git& git, std::vector<UnmergedFile>& files) {
+    std::vector<std::string> ids;
+    for (const TreeEntry* blob : BlobsOf(files)) ids.push_back(blob->id);
+    FetchBlobs(git, ids);
+}
+
 void LookUpSizes(const Git& git, std::vector<UnmergedFile>& files) {
     const std::vector<TreeEntry*> blobs = BlobsOf(files);
     std::string ids;
@@ -198,6 +206,7 @@ std::vector<UnmergedFile> ListUnmerged(const Repository& repository, const std::
     const Git beside = GitBeside(repository, tree, scratch.NewFolder("objects"));
     std::vector<UnmergedFile> files = Answer(ours, theirs).Read(RunMergeTree(beside, tree, ours, theirs));
     if (files.empty()) return files;
+    FetchMissing(Git(repository), files);
     LookUpSizes(beside, files);
     LookUpAttributes(repository, ours, scratch, files);
     return files;

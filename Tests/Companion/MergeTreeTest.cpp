@@ -180,4 +180,25 @@ TEST_F(MergeTreeTest, RepositoryAndItsSettingsStayAsTheyAre) {
     EXPECT_EQ(Git({"count-objects"}).size(), before + 1); // two commits make it of two digits
 }
 
+/// A clone that has no blobs but those that are checked out.
+TEST_F(MergeTreeTest, BlobsThatAPartialCloneLacksAreFetchedAtOnce) {
+    for (int i = 0; i < 6; ++i)
+        Make("step" + std::to_string(i), i ? "HEAD" : base, {{"s" + std::to_string(i), lines}});
+    const std::string start = Git({"rev-parse", "HEAD"});
+    std::map<std::string, std::string> ours, theirs;
+    for (int i = 0; i < 6; ++i) {
+        ours["s" + std::to_string(i)] = lines + "ours " + std::to_string(i) + "\n";
+        theirs["s" + std::to_string(i)] = std::to_string(i) + "theirs\n" + lines;
+    }
+    const std::string theirCommit = Make("theirs", start, theirs), ourCommit = Make("ours", start, ours);
+    Git({"config", "uploadpack.allowFilter", "true"});
+    Git({"config", "uploadpack.allowAnySHA1InWant", "true"});
+    Git({"clone", "-q", "--no-local", "--filter=blob:none", "file://" + folder.Path().string(), "clone"});
+    const surroundings::Here clone("clone");
+    const auto packs = [] { return OutputOf({"sh", "-c", "ls .git/objects/pack/*.pack | wc -l"}); };
+    const int before = std::stoi(packs());
+    EXPECT_EQ(ListUnmerged(FindRepository().value(), ourCommit, theirCommit).size(), 6u);
+    EXPECT_EQ(std::stoi(packs()), before + 1);
+}
+
 } // namespace
