@@ -108,7 +108,7 @@ TEST_F(MergeTreeAnswerTest, MissingObjectAndARefusalAreFailures) {
 
 TEST_F(MergeTreeAnswerTest, NoAnswerEndsTheProgram) {
     const std::string whole = "tree/100644 aaaa 1\tb/100644 bbbb 2\to//3/b/o/t/CONFLICT (rename\\rename)/w/";
-    for (std::size_t length = 0; length <= whole.size(); length += 9)
+    for (std::size_t length = 0; length <= whole.size(); length += 15)
         for (const char* more : {"", "//-1", "\t\t  "}) {
             try {
                 List(whole.substr(0, length) + more, 1);

@@ -101,8 +101,8 @@ TEST_F(OpenMergesTest, ChangedRecordIsAMergeOrAFailure) {
     Added("a.ovrin");
     const std::filesystem::path file = OnlyFile(data, ".merge");
     const std::string whole = program::ReadFile(file);
-    for (std::size_t at = 0; at < whole.find('\n'); ++at)
-        for (const char other : {'0', '9', '"', '-', '}', '\n', '\xff'}) {
+    for (std::size_t at = 0; at < whole.find('\n'); at += 2)
+        for (const char other : {'9', '"', '\xff'}) {
             std::string changed = whole;
             changed[at] = other;
             Put(file, changed);

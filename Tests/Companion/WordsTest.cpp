@@ -162,17 +162,21 @@ TEST(TemporaryFiles, AreForgottenOnesOfMergesAlone) {
 
 /// What stands on a terminal after some work. The terminal is standard error for as long.
 template <class Work> std::string OnTerminal(const Work& work) {
-    const Descriptor terminal(posix_openpt(O_RDWR | O_NOCTTY)), before(dup(STDERR_FILENO));
+    const Descriptor terminal(posix_openpt(O_RDWR | O_NOCTTY));
     if (!terminal.IsOpen() || grantpt(terminal.Get()) != 0 || unlockpt(terminal.Get()) != 0)
         return "no terminal";
-    const Descriptor side = OpenFile(ptsname(terminal.Get()), O_RDWR | O_NOCTTY);
-    dup2(side.Get(), STDERR_FILENO);
-    work();
-    dup2(before.Get(), STDERR_FILENO);
-    fcntl(terminal.Get(), F_SETFL, O_NONBLOCK);
+    {
+        const Descriptor before(dup(STDERR_FILENO)),
+            side = OpenFile(ptsname(terminal.Get()), O_RDWR | O_NOCTTY);
+        dup2(side.Get(), STDERR_FILENO);
+        work();
+        dup2(before.Get(), STDERR_FILENO);
+    }
+    std::string shown;
     char bytes[4096];
-    const ssize_t count = read(terminal.Get(), bytes, sizeof(bytes));
-    return count > 0 ? std::string(bytes, static_cast<std::size_t>(count)) : "";
+    for (ssize_t count; (count = read(terminal.Get(), bytes, sizeof(bytes))) > 0;)
+        shown.append(bytes, static_cast<std::size_t>(count));
+    return shown;
 }
 
 TEST(Progress, IsSilentForShortWorkAndWithoutATerminal) {
