@@ -6,6 +6,7 @@
 #include "Settle/ExternalTool.h"
 #include "Settle/SceneWords.h"
 #include "Settle/SettleScenes.h"
+#include "Settle/Steps.h"
 #include "Settle/Wanted.h"
 #include "Systems/WorkingPath.h"
 #include "Words/Failure.h"
@@ -56,22 +57,21 @@ Outcome List(const SettleScenes& scenes, bool asJson) {
 
 /// Makes the steps that are asked for, all of them or none.
 void Decide(const SettleScenes& scenes, const SettleOptions& options) {
+    BeginStep(scenes.Sessions());
     std::vector<Wanted> wanted;
     for (const std::string& text : options.set) wanted.push_back(ParseWanted(text));
     if (!wanted.empty()) DecideWanted(scenes.Sessions(), wanted);
     if (!options.decisionFile.empty()) DecideByFile(scenes.Sessions(), options.decisionFile);
     if (!options.take.empty()) TakeSide(scenes.Sessions(), SideNamed(options.take), options.under);
     if (!options.isUndo) return;
-    std::size_t undone = 0;
-    for (const auto& session : scenes.Sessions()) undone += session->Undo() ? 1 : 0;
-    if (undone == 0) throw Failure("There is no decision to take back");
+    if (!UndoStep(scenes.Sessions())) throw Failure("There is no decision to take back");
 }
 
 /// Tells of the sessions that stay, and of what is missing in those that go.
 bool TellOpen(const SettleScenes& scenes, bool wasDecided) {
     bool isAnyOpen = false;
     for (const auto& session : scenes.Sessions()) {
-        Tell(TellMissing(*session));
+        Tell(session->Missing());
         if (session->IsSettled()) continue;
         isAnyOpen = true;
         std::cerr << TellCount(SceneCount::Of(*session)) << '\n';

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -45,11 +46,18 @@ struct OpenMerge {
     ThreeTexts texts;            ///< empty where only the rest was asked for
 };
 
+/// Decisions that were made at once, and are taken back at once.
+struct DecisionStep {
+    std::size_t decisions; ///< how many
+    /// Counted over all scenes that are settled together: steps of one number are one.
+    std::uint64_t number;
+};
+
 /// How far a person has come with an open merge.
 struct Progress {
-    std::vector<Decision> decisions;     ///< in the order in which they were made
-    std::size_t open = 0;                ///< conflicts that are left
-    std::vector<std::size_t> steps = {}; ///< how many decisions each step made, to be undone together
+    std::vector<Decision> decisions;      ///< in the order in which they were made
+    std::size_t open = 0;                 ///< conflicts that are left
+    std::vector<DecisionStep> steps = {}; ///< of all decisions, in order
 };
 
 } // namespace ovrin

@@ -11,7 +11,6 @@
 #include <fcntl.h>
 #include <filesystem>
 #include <nlohmann/json.hpp>
-#include <numeric>
 #include <random>
 #include <system_error>
 #include <unistd.h>
@@ -215,13 +214,15 @@ Progress OpenMerges::ProgressOf(const OpenMerge& merge) const {
         const json read = json::parse(bytes);
         if (read.at("identity") != merge.identity) return progress;
         progress.open = read.at("open");
-        progress.steps = read.at("steps").get<std::vector<std::size_t>>();
+        std::size_t inSteps = 0;
+        for (const json& step : read.at("steps")) {
+            progress.steps.push_back({step.at("decisions"), step.at("number")});
+            inSteps += progress.steps.back().decisions;
+        }
         for (const json& decision : read.at("decisions"))
             progress.decisions.push_back(
                 {decision.at("path"), SideNamed(decision.at("side").get<std::string>())});
-        if (std::accumulate(progress.steps.begin(), progress.steps.end(), std::size_t{}) !=
-            progress.decisions.size())
-            throw Failure("its steps don't add up");
+        if (inSteps != progress.decisions.size()) throw Failure("its steps don't add up");
     } catch (const std::exception& error) {
         throw Failure("Cannot read the decisions in " + file + ": " + error.what() +
                       ".\nRemove that file to decide anew");
@@ -233,10 +234,11 @@ void OpenMerges::SetProgress(const OpenMerge& merge, const Progress& progress) {
     json decisions = json::array();
     for (const Decision& decision : progress.decisions)
         decisions.push_back({{"path", decision.path}, {"side", SideName(decision.side)}});
-    const json written = {{"identity", merge.identity},
-                          {"open", progress.open},
-                          {"decisions", decisions},
-                          {"steps", progress.steps}};
+    json steps = json::array();
+    for (const DecisionStep& step : progress.steps)
+        steps.push_back({{"decisions", step.decisions}, {"number", step.number}});
+    const json written = {
+        {"identity", merge.identity}, {"open", progress.open}, {"decisions", decisions}, {"steps", steps}};
     Write(PlaceOf(merge.path).file + kProgressExtension, TextOf(written) + "\n", {});
 }
 

@@ -33,8 +33,9 @@ Side OtherThan(Side side) {
 /// Finds decisions in the trees of a merge.
 class Search {
 public:
-    Search(SceneMerge& merge, const MergeNames& names) : m_Merge(merge), m_Names(names) {
-        for (const OpenConflict& conflict : merge.Open())
+    Search(SceneMerge& merge, const MergeNames& names, std::span<const OpenConflict> open)
+        : m_Merge(merge), m_Names(names) {
+        for (const OpenConflict& conflict : open)
             if (conflict.path.size() == 1) m_Open.insert(conflict.path.front());
     }
 
@@ -163,8 +164,9 @@ private:
 } // namespace
 
 std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
+                                   std::span<const OpenConflict> open,
                                    std::span<const OpenConflict> conflicts, Side side) {
-    Search search(merge, names);
+    Search search(merge, names, open);
     for (const OpenConflict& conflict : conflicts)
         if (conflict.kind == ConflictKind::ParentLoop) search.EndLoop(conflict.path.front(), side);
     for (const Side remover : {Side::Ours, Side::Theirs}) {

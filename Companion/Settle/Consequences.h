@@ -17,8 +17,9 @@ namespace ovrin {
 ///     a loop of parents is ended   the lists of children follow
 ///
 /// A list is left to the merge where the side whose change is dropped changed other entries of it, too, or
-/// alone changed other fields of the owner. What is open by itself is left to its own decision.
+/// alone changed other fields of the owner. What is among `open` is left to its own decision.
 std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
+                                   std::span<const OpenConflict> open,
                                    std::span<const OpenConflict> conflicts, Side side);
 
 } // namespace ovrin

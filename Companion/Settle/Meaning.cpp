@@ -69,8 +69,8 @@ std::vector<std::string> ConflictsCalled(SettleSession& session, const std::stri
     const ConflictWords words(session.Merge());
     std::vector<std::string> paths;
     for (const SettleSession::Met& met : session.Conflicts()) {
-        const Path& path = met.conflict.path;
-        const auto properties = PropertiesOf(words.Describe(met.conflict), path);
+        const Path& path = met.conflict->path;
+        const auto properties = PropertiesOf(words.Describe(*met.conflict), path);
         const bool isCalled = std::ranges::any_of(properties, [&](const std::string& property) {
             return name.ends_with(property) &&
                    IsCalled(session.Names(), path.front(), name.substr(0, name.size() - property.size()));

@@ -46,7 +46,7 @@ std::string TellConflicts(SettleSession& session) {
     const SideLabels labels = SideLabels::Of(session.Source().occasion);
     std::string text, heading;
     for (const SettleSession::Met& met : session.Conflicts()) {
-        const Conflict conflict = words.Describe(met.conflict);
+        const Conflict conflict = words.Describe(*met.conflict);
         if (conflict.heading != heading) text += (heading = conflict.heading) + '\n';
         if (met.isOpen)
             text += TellConflict(conflict, labels);
@@ -63,23 +63,12 @@ json ToJson(SettleSession& session) {
     json written = ToJson(SceneCount::Of(session));
     json& conflicts = written["conflicts"] = json::array();
     for (const SettleSession::Met& met : session.Conflicts()) {
-        json conflict = ToJson(words.Describe(met.conflict));
+        json conflict = ToJson(words.Describe(*met.conflict));
         conflict["state"] = met.isOpen ? "open" : "settled";
         conflict["decided"] = met.decided ? json(SideName(*met.decided)) : json();
         conflicts.push_back(std::move(conflict));
     }
     return written;
-}
-
-std::vector<std::string> TellMissing(SettleSession& session) {
-    std::vector<std::string> lines;
-    if (!session.Merge().HasBrokenDependencies()) return lines;
-    for (const MergeSession::Record* record : session.Merge().Session().PendingConflicts())
-        if (const YAMLScalar* id = record->path.OnlyElement())
-            lines.push_back(session.Names().NameWithID(id) +
-                            " is removed, and something in the scene needs it");
-    if (lines.empty()) lines.emplace_back("Something in the scene needs a component that neither side has");
-    return lines;
 }
 
 } // namespace ovrin

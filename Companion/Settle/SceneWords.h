@@ -19,7 +19,4 @@ std::string TellConflicts(SettleSession& session);
 /// which is "open" or "settled", and "decided", a side or null.
 nlohmann::json ToJson(SettleSession& session);
 
-/// What the result of the session lacks although something in it needs it, a line each.
-std::vector<std::string> TellMissing(SettleSession& session);
-
 } // namespace ovrin

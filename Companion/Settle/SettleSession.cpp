@@ -45,16 +45,32 @@ std::optional<Side> SideOf(std::optional<MergeResolve> resolve) {
 SettleSession::SettleSession(OpenMerge merge, Progress progress)
     : m_Source(std::move(merge)), m_Merge(MergeOf(m_Source)), m_Names(m_Merge.Session()),
       m_Decisions(std::move(progress.decisions)), m_Steps(std::move(progress.steps)) {
-    MergeBy({});
+    MergeHere(m_Merge, {}, m_Source.take);
+    Meet(m_Merge.Open());
+    m_Open = m_Merge.Open();
     if (m_Source.identity.empty()) m_Source.conflicts = Open().size();
     if (!m_Decisions.empty()) MergeBy(m_Decisions);
 }
 
-void SettleSession::MergeBy(const std::vector<Decision>& decisions) {
-    // The engine goes by the first decision that matches.
-    m_Merge.Merge(std::vector<Decision>(decisions.rbegin(), decisions.rend()), m_Source.take);
-    for (const OpenConflict& conflict : Open())
+void SettleSession::Meet(const std::vector<OpenConflict>& conflicts) {
+    for (const OpenConflict& conflict : conflicts)
         m_Conflicts.try_emplace(DecisionPath(conflict.path), conflict);
+}
+
+void SettleSession::MergeBy(const std::vector<Decision>& decisions) {
+    MergedScene merged = MergeApart(m_Merge, m_Names, decisions, m_Source.take);
+    const auto isMet = [&](const std::string& path) { return m_Conflicts.contains(path); };
+    if (!std::ranges::all_of(merged.open, isMet)) {
+        // Its operations are wanted, and stay only with a merge in this process. That is rare enough.
+        MergeHere(m_Merge, decisions, m_Source.take);
+        Meet(m_Merge.Open());
+        MergeHere(m_Merge, {}, m_Source.take);
+    }
+    std::vector<OpenConflict> open;
+    open.reserve(merged.open.size());
+    for (const std::string& path : merged.open) open.push_back(m_Conflicts.at(path));
+    m_Open = std::move(open);
+    m_Merged = std::move(merged);
 }
 
 std::vector<SettleSession::Met> SettleSession::Conflicts() const {
@@ -68,7 +84,7 @@ std::vector<SettleSession::Met> SettleSession::Conflicts() const {
     for (const auto& [path, conflict] : m_Conflicts) {
         const bool isOpen = open.contains(conflict.path);
         const auto side = isOpen ? std::nullopt : SideOf(decided.Find(conflict.path));
-        ranked.push_back({ranks[ranked.size()], {conflict, isOpen, side}});
+        ranked.push_back({ranks[ranked.size()], {&conflict, isOpen, side}});
     }
     std::ranges::stable_sort(ranked, {}, &std::pair<std::uint32_t, Met>::first);
     std::vector<Met> conflicts;
@@ -84,16 +100,19 @@ bool SettleSession::Touches(const std::string& path) {
         [&](const MergeSession::Record& record) { return table.Find(record.path.Elements()).has_value(); });
 }
 
-/// What `step` returns. If it throws, the decisions and the merge are as before.
+/// What `step` returns. If it throws, the session is as before.
 template <class Step> auto SettleSession::OrBack(const Step& step) {
     const std::vector<Decision> decisions = m_Decisions;
-    const std::vector<std::size_t> steps = m_Steps;
+    const std::vector<DecisionStep> steps = m_Steps;
+    const MergedScene merged = m_Merged;
+    const std::vector<OpenConflict> open = m_Open;
     try {
         return step();
     } catch (...) {
         m_Decisions = decisions;
         m_Steps = steps;
-        MergeBy(m_Decisions);
+        m_Merged = merged;
+        m_Open = open;
         throw;
     }
 }
@@ -107,20 +126,29 @@ std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisio
             const auto open = std::ranges::find(Open(), path, &OpenConflict::path);
             if (follow == Follow::Yes && open != Open().end()) AddConsequences({*open}, decision.side);
         }
-        m_Steps.push_back(m_Decisions.size() - before);
         MergeBy(m_Decisions);
         std::vector<Decision> unmatched;
-        for (const Decision& lost : m_Merge.Unmatched())
-            if (std::ranges::find(decisions, lost.path, &Decision::path) != decisions.end())
-                unmatched.push_back(lost);
-        if (!unmatched.empty()) Undo();
+        for (const Decision& decision : decisions)
+            if (std::ranges::find(m_Merged.unmatched, decision.path) != m_Merged.unmatched.end())
+                unmatched.push_back(decision);
+        if (unmatched.empty()) {
+            EndStep(before);
+        } else {
+            m_Decisions.resize(before);
+            MergeBy(m_Decisions);
+        }
         return unmatched;
     });
 }
 
 void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, Side side) {
-    const std::vector<Decision> more = Consequences(m_Merge, m_Names, conflicts, side);
+    const std::vector<Decision> more = Consequences(m_Merge, m_Names, m_Open, conflicts, side);
     m_Decisions.insert(m_Decisions.end(), more.begin(), more.end());
+}
+
+void SettleSession::EndStep(std::size_t decisionsBefore) {
+    m_Steps.push_back({m_Decisions.size() - decisionsBefore, m_NextStep ? m_NextStep : LastStep() + 1});
+    m_Undone.clear();
 }
 
 std::size_t SettleSession::TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant) {
@@ -137,7 +165,7 @@ std::size_t SettleSession::TakeAll(Side side, const std::function<bool(const Ope
             AddConsequences(round, side);
             MergeBy(m_Decisions);
         }
-        m_Steps.push_back(m_Decisions.size() - before);
+        EndStep(before);
         std::size_t settled = tried.size();
         for (const OpenConflict& conflict : Open()) settled -= tried.count(conflict.path);
         return settled;
@@ -146,10 +174,28 @@ std::size_t SettleSession::TakeAll(Side side, const std::function<bool(const Ope
 
 bool SettleSession::Undo() {
     if (m_Steps.empty()) return false;
-    m_Decisions.resize(m_Decisions.size() - m_Steps.back());
-    m_Steps.pop_back();
-    MergeBy(m_Decisions);
-    return true;
+    return OrBack([&] {
+        const DecisionStep step = m_Steps.back();
+        const auto begin = m_Decisions.end() - static_cast<std::ptrdiff_t>(step.decisions);
+        UndoneStep undone{{begin, m_Decisions.end()}, step.number};
+        m_Decisions.erase(begin, m_Decisions.end());
+        m_Steps.pop_back();
+        MergeBy(m_Decisions);
+        m_Undone.push_back(std::move(undone));
+        return true;
+    });
+}
+
+bool SettleSession::Redo() {
+    if (m_Undone.empty()) return false;
+    return OrBack([&] {
+        const UndoneStep& step = m_Undone.back();
+        m_Decisions.insert(m_Decisions.end(), step.decisions.begin(), step.decisions.end());
+        m_Steps.push_back({step.decisions.size(), step.number});
+        MergeBy(m_Decisions);
+        m_Undone.pop_back();
+        return true;
+    });
 }
 
 void SettleSession::Keep(OpenMerges& store) {
@@ -157,11 +203,12 @@ void SettleSession::Keep(OpenMerges& store) {
     store.SetProgress(m_Source, {m_Decisions, Open().size(), m_Steps});
 }
 
-std::string SettleSession::Left() {
-    MergeBy({});
-    std::string left = m_Merge.Result();
-    MergeBy(m_Decisions);
-    return left;
+std::string SettleSession::InMerged(const std::function<std::string()>& make) {
+    return MergeApartTo(m_Merge, m_Decisions, m_Source.take, make);
+}
+
+std::string SettleSession::Result() {
+    return InMerged([&] { return m_Merge.Result(); });
 }
 
 } // namespace ovrin

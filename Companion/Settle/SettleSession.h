@@ -3,8 +3,10 @@
 #include "Conflicts/OpenMerge.h"
 #include "Conflicts/SceneMerge.h"
 #include "Names/MergeNames.h"
+#include "Settle/MergedScene.h"
 
 #include <cstddef>
+#include <cstdint>
 #include <functional>
 #include <map>
 #include <optional>
@@ -23,9 +25,9 @@ class OpenMerges;
 ///     session.Decide({{"734813.MonoBehaviour.m_Brightness", Side::Theirs}});
 ///     store.SetProgress(session.Source(), session.GetProgress());
 ///
-/// After each step the scene is merged again; it is read and compared once. A later decision counts more than
-/// an earlier one. All functions throw Failure, worded for people, for texts that can't be merged, and leave
-/// the session as it was then. It belongs to one thread at a time.
+/// After each step the scene is merged again (Settle/MergedScene.h); it is read and compared once. A later
+/// decision counts more than an earlier one. All functions throw Failure, worded for people, for texts that
+/// can't be merged, and leave the session as it was then. Only for a process without other threads.
 class SettleSession {
 public:
     /// `merge` comes with its texts.
@@ -35,18 +37,19 @@ public:
     const std::vector<Decision>& Decisions() const { return m_Decisions; }
     /// Nothing is open, and a scene that both sides added was looked through, which a step shows.
     bool IsSettled() const { return Open().empty() && !(m_Merge.IsBothAdded() && m_Steps.empty()); }
+    /// What the result lacks although something in it needs it, a line each.
+    const std::vector<std::string>& Missing() const { return m_Merged.missing; }
 
     struct Met {
-        OpenConflict conflict;
+        const OpenConflict* conflict; ///< stays as long as the session
         bool isOpen;
         std::optional<Side> decided; ///< by the decision that counts there, of a settled one
     };
     /// The conflicts of the merge as it began and those that decisions led to, in the order of the hierarchy.
     std::vector<Met> Conflicts() const;
     std::size_t CountMet() const { return m_Conflicts.size(); }
-    const std::vector<OpenConflict>& Open() const { return m_Merge.Open(); }
-    /// Whether a path or pattern matches anything that either side changed, as far as the decisions let that
-    /// through.
+    const std::vector<OpenConflict>& Open() const { return m_Open; }
+    /// Whether a path or pattern matches anything that either side changed.
     bool Touches(const std::string& path);
 
     /// Whether what follows from decisions about open conflicts (Settle/Consequences.h) is decided with them.
@@ -59,27 +62,52 @@ public:
     std::size_t TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant);
     /// Takes the last step back. False if there is none.
     bool Undo();
+    /// Makes the step again that was taken back last, unless another was made since. False if there is none.
+    bool Redo();
+
+    /// The number of the last step, and of the one that Redo would make; 0 where there is none. Steps count
+    /// up from 1, unless a number is given for those that follow, not less than the last: the scenes that are
+    /// settled together share one row of steps (Settle/Steps.h).
+    std::uint64_t LastStep() const { return m_Steps.empty() ? 0 : m_Steps.back().number; }
+    std::uint64_t NextUndone() const { return m_Undone.empty() ? 0 : m_Undone.back().number; }
+    void NumberSteps(std::uint64_t number) { m_NextStep = number; }
+    /// Redo has nothing left to make.
+    void ForgetUndone() { m_Undone.clear(); }
 
     /// Writes the decisions down, and the merge itself if nobody has.
     void Keep(OpenMerges& store);
 
+    /// What `make` returns in a process of its own, where Merge() is merged by the decisions
+    /// (Settle/MergedScene.h).
+    std::string InMerged(const std::function<std::string()>& make);
     /// The scene as it is merged by the decisions.
-    std::string Result() const { return m_Merge.Result(); }
+    std::string Result();
     /// The scene as the merge left it before anything was decided.
-    std::string Left();
+    std::string Left() const { return m_Merge.Result(); }
+    /// The merge without decisions: trees and diffs of the three versions.
     SceneMerge& Merge() { return m_Merge; }
     const MergeNames& Names() const { return m_Names; }
 
 private:
     void AddConsequences(const std::vector<OpenConflict>& conflicts, Side side);
+    void EndStep(std::size_t decisionsBefore);
     void MergeBy(const std::vector<Decision>& decisions);
+    void Meet(const std::vector<OpenConflict>& conflicts);
     template <class Step> auto OrBack(const Step& step);
 
     OpenMerge m_Source;
     SceneMerge m_Merge;
     MergeNames m_Names;
     std::vector<Decision> m_Decisions;
-    std::vector<std::size_t> m_Steps;                // how many decisions each made
+    std::vector<DecisionStep> m_Steps;
+    struct UndoneStep {
+        std::vector<Decision> decisions;
+        std::uint64_t number;
+    };
+    std::vector<UndoneStep> m_Undone; // the one that was taken back last at the end
+    std::uint64_t m_NextStep = 0;     // its number; 0 for the one behind the last
+    MergedScene m_Merged;
+    std::vector<OpenConflict> m_Open;
     std::map<std::string, OpenConflict> m_Conflicts; // by the texts of their paths
 };
 

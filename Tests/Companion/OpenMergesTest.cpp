@@ -56,9 +56,10 @@ TEST_F(OpenMergesTest, AreListedByPathAndForgotten) {
 
 TEST_F(OpenMergesTest, DecisionsBelongToTheirMergeAlone) {
     const OpenMerge first = Added("a.ovrin");
-    merges().SetProgress(first, {{{"1.Thing.x", Side::Theirs}}, 2, {1}});
+    merges().SetProgress(first, {{{"1.Thing.x", Side::Theirs}}, 2, {{1, 7}}});
     EXPECT_EQ(merges().ProgressOf(first).decisions.at(0).side, Side::Theirs);
     EXPECT_EQ(merges().ProgressOf(first).open, 2);
+    EXPECT_EQ(merges().ProgressOf(first).steps.at(0).number, 7);
     const OpenMerge second = Added("a.ovrin");
     EXPECT_TRUE(merges().ProgressOf(second).decisions.empty());
     EXPECT_EQ(merges().ProgressOf(second).open, 3);

@@ -1,5 +1,6 @@
 #include "Settle/SettleSession.h"
 
+#include "Settle/Steps.h"
 #include "Settle/Wanted.h"
 #include "Words/Failure.h"
 
@@ -63,6 +64,26 @@ TEST_F(SettleSessionTest, DecisionsAreStepsThatAreTakenBack) {
     EXPECT_FALSE(session().Undo());
 }
 
+TEST_F(SettleSessionTest, StepsGoBackAndForthOverAllScenesUntilAnotherIsMade) {
+    sessions.push_back(SessionOf(texts));
+    BeginStep(sessions);
+    TakeSide(sessions, Side::Theirs, "");
+    BeginStep(sessions);
+    sessions[1]->Decide({{"10.GameObject.m_Range", Side::Ours}});
+    const std::string result = sessions[1]->Result();
+    EXPECT_TRUE(UndoStep(sessions));
+    EXPECT_TRUE(session().IsSettled());
+    EXPECT_TRUE(UndoStep(sessions));
+    EXPECT_EQ(session().Open().size(), 3);
+    EXPECT_FALSE(UndoStep(sessions));
+    EXPECT_TRUE(RedoStep(sessions) && RedoStep(sessions));
+    EXPECT_EQ(sessions[1]->Result(), result);
+    UndoStep(sessions);
+    BeginStep(sessions);
+    session().Decide({{"10.GameObject.m_Range", Side::Base}});
+    EXPECT_FALSE(RedoStep(sessions));
+}
+
 TEST_F(SettleSessionTest, WhatMatchesNothingDecidesNothing) {
     const auto unmatched =
         session().Decide({{"10.GameObject.m_Range", Side::Ours}, {"10.GameObject.m_None", Side::Ours}});
@@ -103,7 +124,7 @@ TEST_F(SettleSessionTest, SideIsTakenForOpenConflictsUnderANameAlone) {
 }
 
 TEST_F(SettleSessionTest, ProgressIsTakenUpWhereItWasLeft) {
-    const auto taken = SessionOf(texts, {{{"10.GameObject.m_Range", Side::Theirs}}, 2, {1}});
+    const auto taken = SessionOf(texts, {{{"10.GameObject.m_Range", Side::Theirs}}, 2, {{1, 1}}});
     EXPECT_EQ(taken->Open().size(), 2);
     EXPECT_EQ(taken->Conflicts().size(), 3);
     EXPECT_EQ(taken->Left(), session().Result());

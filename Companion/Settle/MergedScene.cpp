@@ -1,0 +1,71 @@
+#include "Settle/MergedScene.h"
+
+#include "Conflicts/DecisionPath.h"
+#include "Systems/WorkerProcesses.h"
+#include "Words/Failure.h"
+
+#include <cstdint>
+#include <nlohmann/json.hpp>
+
+namespace ovrin {
+
+using namespace ovrin_yaml;
+using nlohmann::json;
+
+namespace {
+
+constexpr char kWorked = '+', kFailed = '-'; // ahead of what was made, or of why nothing was
+
+std::vector<std::string> MissingIn(SceneMerge& merge, const MergeNames& names) {
+    std::vector<std::string> lines;
+    if (!merge.HasBrokenDependencies()) return lines;
+    for (const MergeSession::Record* record : merge.Session().PendingConflicts())
+        if (const YAMLScalar* id = record->path.OnlyElement())
+            lines.push_back(names.NameWithID(id) + " is removed, and something in the scene needs it");
+    if (lines.empty()) lines.emplace_back("Something in the scene needs a component that neither side has");
+    return lines;
+}
+
+} // namespace
+
+std::string MergeApartTo(SceneMerge& merge, const std::vector<Decision>& decisions, Side take,
+                         const std::function<std::string()>& make) {
+    const auto work = [&](std::size_t) {
+        try {
+            MergeHere(merge, decisions, take);
+            return kWorked + make();
+        } catch (const Failure& failure) {
+            return kFailed + std::string(failure.what());
+        }
+    };
+    const std::uint64_t size = 1;
+    WorkerAnswer answer;
+    WorkInProcesses({&size, 1}, {1, 1, 1}, work,
+                    [&](std::size_t, WorkerAnswer got) { answer = std::move(got); });
+    if (!answer.text) throw Failure("The scene can't be merged: the process for it was " + answer.end);
+    std::string made = answer.text->substr(1);
+    if (answer.text->front() == kFailed) throw Failure(made);
+    return made;
+}
+
+MergedScene MergeApart(SceneMerge& merge, const MergeNames& names, const std::vector<Decision>& decisions,
+                       Side take) {
+    // In a form that keeps any bytes of a path.
+    const std::string merged = MergeApartTo(merge, decisions, take, [&] {
+        std::vector<std::string> open, unmatched;
+        for (const OpenConflict& conflict : merge.Open()) open.push_back(DecisionPath(conflict.path));
+        for (const Decision& decision : merge.Unmatched()) unmatched.push_back(decision.path);
+        std::string written;
+        json::to_cbor(json::array({open, unmatched, MissingIn(merge, names)}), written);
+        return written;
+    });
+    const json read = json::from_cbor(merged);
+    return {read[0], read[1], read[2]};
+}
+
+void MergeHere(SceneMerge& merge, const std::vector<Decision>& decisions, Side take) {
+    // The engine goes by the first decision that matches.
+    merge.Merge(std::vector<Decision>(decisions.rbegin(), decisions.rend()), take);
+}
+
+} // namespace ovrin

@@ -1,0 +1,151 @@
+#include "Settle/SettleDesk.h"
+
+#include "Conflicts/DecisionPath.h"
+#include "Settle/Meaning.h"
+#include "Settle/Steps.h"
+
+#include <algorithm>
+#include <map>
+
+namespace ovrin {
+
+SettleDesk::SettleDesk(SettleScenes& scenes) : m_Scenes(scenes) {
+    for (const auto& session : Scenes()) m_Words.push_back(std::make_unique<ConflictWords>(session->Merge()));
+    Refresh();
+}
+
+void SettleDesk::Refresh() {
+    m_Items.clear();
+    m_Problems.clear();
+    m_Open = m_Proposed = 0;
+    for (std::size_t scene = 0; scene < Scenes().size(); ++scene) {
+        const SettleSession& session = *Scenes()[scene];
+        for (const SettleSession::Met& met : session.Conflicts()) {
+            const bool isSame = !m_Items.empty() && m_Items.back().scene == scene &&
+                                m_Items.back().about->path.front() == met.conflict->path.front();
+            const std::size_t object = isSame ? m_Items.back().object : m_Items.size();
+            m_Items.push_back({scene, met.conflict, object, met.isOpen, met.decided, {}});
+        }
+        m_Open += session.Open().size();
+        for (const std::string& line : session.Missing()) m_Problems.push_back({scene, line, {}});
+    }
+}
+
+Conflict SettleDesk::Describe(const Item& item) const {
+    return m_Words[item.scene]->Describe(*item.about);
+}
+
+std::optional<std::size_t> SettleDesk::NextOpen(std::size_t from) const {
+    for (std::size_t i = 1; i <= m_Items.size(); ++i) {
+        const std::size_t at = (from + i) % m_Items.size();
+        if (m_Items[at].isOpen) return at;
+    }
+    return {};
+}
+
+std::optional<std::size_t> SettleDesk::PreviousOpen(std::size_t from) const {
+    for (std::size_t i = 1; i <= m_Items.size(); ++i) {
+        const std::size_t at = (from + m_Items.size() - i) % m_Items.size();
+        if (m_Items[at].isOpen) return at;
+    }
+    return {};
+}
+
+bool SettleDesk::IsSettled() const {
+    return std::ranges::all_of(Scenes(), [](const auto& session) { return session->IsSettled(); });
+}
+
+/// Makes a step in any scenes, and keeps it; if that fails anywhere it is taken back everywhere.
+template <class Make> SettleDesk::Step SettleDesk::MakeStep(const Make& make) {
+    const auto decisions = [&] {
+        std::size_t count = 0;
+        for (const auto& session : Scenes()) count += session->Decisions().size();
+        return count;
+    };
+    const std::size_t openBefore = m_Open, decisionsBefore = decisions();
+    std::vector<std::uint64_t> lastSteps;
+    for (const auto& session : Scenes()) lastSteps.push_back(session->LastStep());
+    BeginStep(Scenes());
+    std::size_t asked = 0;
+    try {
+        asked = make();
+        for (std::size_t scene = 0; scene < Scenes().size(); ++scene)
+            if (Scenes()[scene]->LastStep() != lastSteps[scene]) m_Scenes.Keep(*Scenes()[scene]);
+    } catch (...) {
+        for (std::size_t scene = 0; scene < Scenes().size(); ++scene)
+            while (Scenes()[scene]->LastStep() != lastSteps[scene]) Scenes()[scene]->Undo();
+        Refresh();
+        throw;
+    }
+    Refresh();
+    const std::size_t made = decisions() - decisionsBefore;
+    return {openBefore > m_Open ? openBefore - m_Open : 0, made > asked ? made - asked : 0};
+}
+
+SettleDesk::Step SettleDesk::Take(std::size_t item, Side side) {
+    return MakeStep([&] {
+        const Item& taken = m_Items[item];
+        SceneOf(taken).Decide({{DecisionPath(taken.about->path), side}});
+        return std::size_t{1};
+    });
+}
+
+SettleDesk::Step SettleDesk::TakeUnder(std::size_t item, Side side) {
+    return MakeStep([&] {
+        SettleSession& session = SceneOf(m_Items[item]);
+        UnderObject under(session.Names(), m_Items[item].about->path.front());
+        return session.TakeAll(side, [&](const OpenConflict& open) { return under.IsMeant(open); });
+    });
+}
+
+SettleDesk::Step SettleDesk::TakeAll(Side side) {
+    return MakeStep([&] {
+        std::size_t asked = 0;
+        for (const auto& session : Scenes())
+            if (!session->IsSettled())
+                asked += session->TakeAll(side, [](const OpenConflict&) { return true; });
+        return asked;
+    });
+}
+
+SettleDesk::Step SettleDesk::TakeProposed() {
+    return MakeStep([&] {
+        std::map<std::size_t, std::vector<Decision>> proposed;
+        for (const Item& item : m_Items)
+            if (item.isOpen && item.proposed)
+                proposed[item.scene].push_back({DecisionPath(item.about->path), *item.proposed});
+        std::size_t asked = 0;
+        for (const auto& [scene, decisions] : proposed) {
+            Scenes()[scene]->Decide(decisions);
+            asked += decisions.size();
+        }
+        return asked;
+    });
+}
+
+SettleDesk::Step SettleDesk::Mend(const SettleProblem& problem, const SettleProblem::Remedy& remedy) {
+    return MakeStep([&] {
+        Scenes()[problem.scene]->Decide(remedy.decisions);
+        return remedy.decisions.size();
+    });
+}
+
+bool SettleDesk::Undo() {
+    if (!UndoStep(Scenes())) return false;
+    for (const auto& session : Scenes()) m_Scenes.Keep(*session);
+    Refresh();
+    return true;
+}
+
+bool SettleDesk::Redo() {
+    if (!RedoStep(Scenes())) return false;
+    for (const auto& session : Scenes()) m_Scenes.Keep(*session);
+    Refresh();
+    return true;
+}
+
+std::vector<std::string> SettleDesk::Finish(bool overwrite, Remarks& remarks) {
+    return m_Scenes.Finish(overwrite, remarks);
+}
+
+} // namespace ovrin
