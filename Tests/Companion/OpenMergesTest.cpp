@@ -118,7 +118,7 @@ TEST_F(OpenMergesTest, ChangedRecordIsAMergeOrAFailure) {
 
 TEST_F(OpenMergesTest, ProgressThatCantBeReadIsToldWithItsCure) {
     const OpenMerge merge = Added("a.ovrin");
-    merges().SetProgress(merge, {{{"1.Thing.x", Side::Theirs}, {"1.Thing.y", Side::Ours}}, 1, {2}});
+    merges().SetProgress(merge, {{{"1.Thing.x", Side::Theirs}, {"1.Thing.y", Side::Ours}}, 1, {{2, 7}}});
     const std::filesystem::path file = OnlyFile(data, ".progress");
     const std::string whole = program::ReadFile(file);
     const auto without = [&](const std::string& what, const std::string& with) {
@@ -126,15 +126,18 @@ TEST_F(OpenMergesTest, ProgressThatCantBeReadIsToldWithItsCure) {
         Put(file, changed.replace(changed.find(what), what.size(), with));
         return failures::ErrorOf<Failure>([&] { merges().ProgressOf(merge); });
     };
-    for (const auto& [what, with] :
-         {std::pair{"\"open\"", "\"shut\""}, {"theirs", "left"}, {"[2]", "[1]"}, {"}", ""}, {":1", ":-"}}) {
+    for (const auto& [what, with] : {std::pair{"\"open\"", "\"shut\""},
+                                     {"theirs", "left"},
+                                     {"\"decisions\":2", "\"decisions\":1"},
+                                     {"}", ""},
+                                     {":1", ":-"}}) {
         const std::string failure = without(what, with);
         EXPECT_TRUE(failure.starts_with("Cannot read the decisions in " + file.string()))
             << what << ": " << failure;
         EXPECT_TRUE(failure.ends_with("Remove that file to decide anew"));
     }
     Put(file, whole);
-    EXPECT_EQ(merges().ProgressOf(merge).steps, std::vector<std::size_t>{2});
+    EXPECT_EQ(merges().ProgressOf(merge).steps.at(0).number, 7u);
 }
 
 TEST_F(OpenMergesTest, PathThatFindsItsPlaceTakenGetsAnother) {
