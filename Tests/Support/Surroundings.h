@@ -45,7 +45,8 @@ private:
     const fs::path m_Before;
 };
 
-/// Programs that say what they are told to, in front of all others on the path.
+/// Programs that say what they are told to, in front of all others on the path. With --batch they wait for a
+/// request first.
 class FakePrograms {
 public:
     FakePrograms()
@@ -71,6 +72,7 @@ private:
         "for word in \"$@\" otherwise; do\n"
         "    case $word in */*) continue ;; esac\n"
         "    [ -f \"$own/$word\" ] || continue\n"
+        "    [ \"$word\" = --batch ] && read -r request\n"
         "    cat \"$own/$word\"\n    exit \"$(cat \"$own/$word.status\")\"\n"
         "done\necho \"not told: $*\" >&2\nexit 99\n";
 
@@ -81,14 +83,16 @@ private:
 /// A home without settings, in which nothing of the user or the machine reaches git, Mercurial or Subversion.
 class EmptyHome {
 public:
+    EmptyHome() : m_Home("HOME", m_Folder.Path().string()) {}
+
     const fs::path& Path() const { return m_Folder.Path(); }
     const program::WorkingDirectory& Folder() const { return m_Folder; }
 
 private:
     const program::WorkingDirectory m_Folder;
-    const Variable m_Home{"HOME", m_Folder.Path().string()}, m_Config{"XDG_CONFIG_HOME", {}},
-        m_Global{"GIT_CONFIG_GLOBAL", {}}, m_System{"GIT_CONFIG_NOSYSTEM", "1"}, m_Git{"GIT_DIR", {}},
-        m_Index{"GIT_INDEX_FILE", {}}, m_Tree{"GIT_WORK_TREE", {}}, m_Author{"GIT_AUTHOR_NAME", "A"},
+    const Variable m_Home, m_Config{"XDG_CONFIG_HOME", {}}, m_Global{"GIT_CONFIG_GLOBAL", {}},
+        m_System{"GIT_CONFIG_NOSYSTEM", "1"}, m_Git{"GIT_DIR", {}}, m_Index{"GIT_INDEX_FILE", {}},
+        m_Tree{"GIT_WORK_TREE", {}}, m_Author{"GIT_AUTHOR_NAME", "A"},
         m_AuthorMail{"GIT_AUTHOR_EMAIL", "a@example.org"}, m_Committer{"GIT_COMMITTER_NAME", "A"},
         m_CommitterMail{"GIT_COMMITTER_EMAIL", "a@example.org"}, m_Mercurial{"HGRCPATH", {}},
         m_Merge{"HGMERGE", {}}, m_Subversion{"SVN_MERGE", {}};
