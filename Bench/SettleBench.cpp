@@ -1,6 +1,6 @@
 // Settles a generated scene (base.ovrin, left.ovrin, right.ovrin in a folder) as a person does it, in a
-// repository of its own: opens it, looks at a screenful, takes sides one by one and all at once, and goes back.
-// Prints the times, and by how much the memory of the process grew.
+// repository of its own: opens it, looks at a screenful, takes sides one by one and all at once, and goes
+// back. Prints the times, and by how much the memory of the process grew.
 
 #include "FileUtils.h"
 #include "Settle/SettleDesk.h"

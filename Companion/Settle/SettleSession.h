@@ -3,13 +3,16 @@
 #include "Conflicts/OpenMerge.h"
 #include "Conflicts/SceneMerge.h"
 #include "Names/MergeNames.h"
+#include "Names/RecordPlace.h"
 #include "Settle/MergedScene.h"
+#include "Settle/MetConflicts.h"
 
 #include <cstddef>
 #include <cstdint>
 #include <functional>
 #include <map>
 #include <optional>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -25,8 +28,9 @@ class OpenMerges;
 ///     session.Decide({{"734813.MonoBehaviour.m_Brightness", Side::Theirs}});
 ///     store.SetProgress(session.Source(), session.GetProgress());
 ///
-/// After each step the scene is merged again (Settle/MergedScene.h); it is read and compared once. A later
-/// decision counts more than an earlier one. All functions throw Failure, worded for people, for texts that
+/// After each step the scene is merged again (Settle/MergedScene.h), unless nothing can follow from its
+/// decisions (Settle/PlainValues.h); it is read and compared once. A later decision counts more than an
+/// earlier one. All functions throw Failure, worded for people, for texts that
 /// can't be merged, and leave the session as it was then. Only for a process without other threads.
 class SettleSession {
 public:
@@ -38,17 +42,13 @@ public:
     /// Nothing is open, and a scene that both sides added was looked through, which a step shows.
     bool IsSettled() const { return Open().empty() && !(m_Merge.IsBothAdded() && m_Steps.empty()); }
     /// What the result lacks although something in it needs it, a line each.
-    const std::vector<std::string>& Missing() const { return m_Merged.missing; }
+    const std::vector<std::string>& Missing() const { return m_Missing; }
 
-    struct Met {
-        const OpenConflict* conflict; ///< stays as long as the session
-        bool isOpen;
-        std::optional<Side> decided; ///< by the decision that counts there, of a settled one
-    };
+    using Met = MetConflict;
     /// The conflicts of the merge as it began and those that decisions led to, in the order of the hierarchy.
-    std::vector<Met> Conflicts() const;
+    std::vector<Met> Conflicts() const { return m_Conflicts.InOrder(); }
     std::size_t CountMet() const { return m_Conflicts.size(); }
-    const std::vector<OpenConflict>& Open() const { return m_Open; }
+    const std::vector<OpenConflict>& Open() const { return m_Conflicts.Open(); }
     /// Whether a path or pattern matches anything that either side changed.
     bool Touches(const std::string& path);
 
@@ -91,8 +91,11 @@ public:
 private:
     void AddConsequences(const std::vector<OpenConflict>& conflicts, Side side);
     void EndStep(std::size_t decisionsBefore);
-    void MergeBy(const std::vector<Decision>& decisions);
-    void Meet(const std::vector<OpenConflict>& conflicts);
+    std::vector<std::string> MergeAgain();
+    void TakeStates(const std::vector<std::string>& open);
+    std::optional<std::size_t> FindPlain(const Decision& decision);
+    bool DecidePlainly(std::span<const Decision> decisions);
+    bool UndoPlainly(std::span<const Decision> decisions);
     template <class Step> auto OrBack(const Step& step);
 
     OpenMerge m_Source;
@@ -106,9 +109,10 @@ private:
     };
     std::vector<UndoneStep> m_Undone; // the one that was taken back last at the end
     std::uint64_t m_NextStep = 0;     // its number; 0 for the one behind the last
-    MergedScene m_Merged;
-    std::vector<OpenConflict> m_Open;
-    std::map<std::string, OpenConflict> m_Conflicts; // by the texts of their paths
+    RecordPlaces m_Places;
+    MetConflicts m_Conflicts;
+    std::map<std::size_t, bool> m_ArePlain; // those conflicts of which it was asked, by their indexes
+    std::vector<std::string> m_Missing;
 };
 
 } // namespace ovrin
