@@ -2,11 +2,12 @@
 
 #include "Conflicts/DecisionPath.h"
 #include "Conflicts/OpenMerges.h"
-#include "Scenes/SceneRules.h"
 #include "Settle/Consequences.h"
+#include "Settle/DecisionTable.h"
 #include "Settle/PlainValues.h"
 
 #include <algorithm>
+#include <map>
 #include <set>
 #include <span>
 #include <utility>
@@ -16,31 +17,6 @@ namespace ovrin {
 using namespace ovrin_yaml;
 
 namespace {
-
-SceneMerge MergeOf(const OpenMerge& merge) {
-    FormatFiles files;
-    if (!merge.rules.empty()) files.rules = merge.rules;
-    if (!merge.typeInfo.empty()) files.typeInfo = merge.typeInfo;
-    SceneRules rules = ReadSceneRules(files);
-    return SceneMerge(merge.texts, std::move(rules.rules), std::move(rules.types));
-}
-
-/// The sides of `decisions` as a table of which the last one that matches counts.
-ResolveTable TableOf(const std::vector<Decision>& decisions) {
-    constexpr MergeResolve kResolves[] = {ResolveBase, ResolveRight, ResolveLeft};
-    std::vector<RecordResolve> resolves;
-    for (auto decision = decisions.rbegin(); decision != decisions.rend(); ++decision)
-        resolves.push_back(
-            {PathOfDecision(decision->path), kResolves[static_cast<std::size_t>(decision->side)]});
-    ResolveTable table;
-    table.Set(resolves);
-    return table;
-}
-
-std::optional<Side> SideOf(std::optional<MergeResolve> resolve) {
-    if (!resolve) return {};
-    return *resolve == ResolveBase ? Side::Base : *resolve == ResolveRight ? Side::Ours : Side::Theirs;
-}
 
 /// As RecordPlaces wants it.
 const MergeSession& MergedOnce(SceneMerge& merge, Side take) {
@@ -61,12 +37,38 @@ bool IsCoveredBy(const Decision& decision, const Path& path) {
 } // namespace
 
 SettleSession::SettleSession(OpenMerge merge, Progress progress)
-    : m_Source(std::move(merge)), m_Merge(MergeOf(m_Source)), m_Names(m_Merge.Session()),
+    : m_Source(std::move(merge)), m_Merge(SceneMergeOf(m_Source)), m_Names(m_Merge.Session()),
       m_Decisions(std::move(progress.decisions)), m_Steps(std::move(progress.steps)),
       m_Places(MergedOnce(m_Merge, m_Source.take), m_Names) {
-    m_Conflicts.Add(m_Merge.Open(), m_Names);
+    Meet();
     if (m_Source.identity.empty()) m_Source.conflicts = Open().size();
     if (!m_Decisions.empty()) MergeAgain();
+}
+
+/// The conflicts of the merge as it is in this process.
+void SettleSession::Meet() {
+    m_Conflicts.Add(m_Merge.Open(), m_Names);
+    if (m_Earlier) Propose(*m_Earlier);
+}
+
+void SettleSession::Propose(const EarlierDecisions& earlier) {
+    m_Earlier = &earlier;
+    if (earlier.IsEmpty()) return;
+    for (std::size_t i = 0; i < m_Conflicts.size(); ++i)
+        if (const auto values = EarlierDecisions::Values::Of(m_Conflicts[i], m_Places))
+            if (const std::optional<Side> side = earlier.Find(*values)) m_Conflicts.SetProposed(i, *side);
+}
+
+std::size_t SettleSession::TellDecided(EarlierDecisions& earlier) const {
+    std::size_t told = 0;
+    for (std::size_t i = 0; i < m_Conflicts.size(); ++i) {
+        const std::optional<Side> decided = m_Conflicts.StateOf(i).decided;
+        const auto values = decided ? EarlierDecisions::Values::Of(m_Conflicts[i], m_Places) : std::nullopt;
+        if (!values) continue;
+        earlier.Add(*values, *decided);
+        ++told;
+    }
+    return told;
 }
 
 /// Merges by the decisions. Returns those that match nothing.
@@ -78,7 +80,7 @@ std::vector<std::string> SettleSession::MergeAgain() {
     if (!std::ranges::all_of(merged.open, isMet)) {
         // Its operations are wanted, and stay only with a merge in this process. That is rare enough.
         MergeHere(m_Merge, m_Decisions, m_Source.take);
-        m_Conflicts.Add(m_Merge.Open(), m_Names);
+        Meet();
         MergeHere(m_Merge, {}, m_Source.take);
     }
     TakeStates(merged.open);
@@ -87,11 +89,11 @@ std::vector<std::string> SettleSession::MergeAgain() {
 }
 
 void SettleSession::TakeStates(const std::vector<std::string>& open) {
-    const ResolveTable decided = TableOf(m_Decisions);
+    const DecisionTable decided(m_Decisions);
     std::vector<MetConflicts::State> states(m_Conflicts.size(), {false, {}});
     for (const std::string& path : open) states[*m_Conflicts.Find(PathOfDecision(path))].isOpen = true;
     for (std::size_t i = 0; i < states.size(); ++i)
-        if (!states[i].isOpen) states[i].decided = SideOf(decided.Find(m_Conflicts[i].path));
+        if (!states[i].isOpen) states[i].decided = decided.Find(m_Conflicts[i].path);
     m_Conflicts.SetStates(std::move(states));
 }
 
@@ -123,19 +125,25 @@ bool SettleSession::DecidePlainly(std::span<const Decision> decisions) {
 /// The same for decisions that are taken back, those before them being left.
 bool SettleSession::UndoPlainly(std::span<const Decision> decisions) {
     std::vector<MetConflicts::State> states = m_Conflicts.States();
-    const ResolveTable decided = TableOf(m_Decisions);
+    const DecisionTable decided(m_Decisions);
     for (const Decision& decision : decisions) {
         const std::optional<std::size_t> at = FindPlain(decision);
         if (!at) return false;
-        const std::optional<Side> side = SideOf(decided.Find(m_Conflicts[*at].path));
+        const std::optional<Side> side = decided.Find(m_Conflicts[*at].path);
         states[*at] = {!side, side};
     }
     m_Conflicts.SetStates(std::move(states));
     return true;
 }
 
+std::size_t SettleSession::CountProposed() const {
+    const std::vector<MetConflict> conflicts = Conflicts();
+    return static_cast<std::size_t>(
+        std::ranges::count_if(conflicts, [](const MetConflict& met) { return met.proposed.has_value(); }));
+}
+
 bool SettleSession::Touches(const std::string& path) {
-    const ResolveTable table = TableOf({{path, Side::Ours}});
+    const DecisionTable table({{path, Side::Ours}});
     return std::ranges::any_of(
         m_Merge.Session().Resolver().Records(),
         [&](const MergeSession::Record& record) { return table.Find(record.path.Elements()).has_value(); });
@@ -193,19 +201,32 @@ void SettleSession::EndStep(std::size_t decisionsBefore) {
 }
 
 std::size_t SettleSession::TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant) {
+    return TakeEach(
+        [&](const MetConflict& met) { return isMeant(*met.conflict) ? std::optional(side) : std::nullopt; });
+}
+
+std::size_t SettleSession::TakeProposed(const std::function<bool(const OpenConflict&)>& isMeant) {
+    return TakeEach(
+        [&](const MetConflict& met) { return isMeant(*met.conflict) ? met.proposed : std::nullopt; });
+}
+
+/// Decides the open conflicts of which `choose` has a side, and those of them that follow, as one step.
+std::size_t SettleSession::TakeEach(const std::function<std::optional<Side>(const MetConflict&)>& choose) {
     return OrBack([&] {
         std::set<Path> tried;
         const std::size_t before = m_Decisions.size();
         for (;;) {
-            std::vector<OpenConflict> round;
-            for (const OpenConflict& conflict : Open())
-                if (isMeant(conflict) && tried.insert(conflict.path).second) round.push_back(conflict);
-            if (round.empty()) break;
+            std::map<Side, std::vector<OpenConflict>> round;
             const std::size_t decided = m_Decisions.size();
-            for (const OpenConflict& conflict : round)
-                m_Decisions.push_back({DecisionPath(conflict.path), side});
+            for (const MetConflict& met : Conflicts()) {
+                const std::optional<Side> side = met.isOpen ? choose(met) : std::nullopt;
+                if (!side || !tried.insert(met.conflict->path).second) continue;
+                round[*side].push_back(*met.conflict);
+                m_Decisions.push_back({DecisionPath(met.conflict->path), *side});
+            }
+            if (round.empty()) break;
             if (DecidePlainly(std::span(m_Decisions).subspan(decided))) continue;
-            AddConsequences(round, side);
+            for (const auto& [side, conflicts] : round) AddConsequences(conflicts, side);
             MergeAgain();
         }
         EndStep(before);

@@ -4,6 +4,7 @@
 #include "Conflicts/SceneMerge.h"
 #include "Names/MergeNames.h"
 #include "Names/RecordPlace.h"
+#include "Settle/EarlierDecisions.h"
 #include "Settle/MergedScene.h"
 #include "Settle/MetConflicts.h"
 
@@ -49,6 +50,8 @@ public:
     std::vector<Met> Conflicts() const { return m_Conflicts.InOrder(); }
     std::size_t CountMet() const { return m_Conflicts.size(); }
     const std::vector<OpenConflict>& Open() const { return m_Conflicts.Open(); }
+    /// How many open ones something is proposed of.
+    std::size_t CountProposed() const;
     /// Whether a path or pattern matches anything that either side changed.
     bool Touches(const std::string& path);
 
@@ -60,6 +63,8 @@ public:
     /// Decides all open conflicts that `isMeant` accepts, and those of them that follow, for a side, as one
     /// step. What can't be settled by a side stays open. Returns how many conflicts were settled.
     std::size_t TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant);
+    /// The same by what is proposed of each.
+    std::size_t TakeProposed(const std::function<bool(const OpenConflict&)>& isMeant);
     /// Takes the last step back. False if there is none.
     bool Undo();
     /// Makes the step again that was taken back last, unless another was made since. False if there is none.
@@ -73,6 +78,12 @@ public:
     void NumberSteps(std::uint64_t number) { m_NextStep = number; }
     /// Redo has nothing left to make.
     void ForgetUndone() { m_Undone.clear(); }
+
+    /// Looks up what was decided before of conflicts with the same values, and of those that will be met.
+    /// `earlier` must stay.
+    void Propose(const EarlierDecisions& earlier);
+    /// Adds what is decided of conflicts here. Returns of how many.
+    std::size_t TellDecided(EarlierDecisions& earlier) const;
 
     /// Writes the decisions down, and the merge itself if nobody has.
     void Keep(OpenMerges& store);
@@ -91,6 +102,8 @@ public:
 private:
     void AddConsequences(const std::vector<OpenConflict>& conflicts, Side side);
     void EndStep(std::size_t decisionsBefore);
+    void Meet();
+    std::size_t TakeEach(const std::function<std::optional<Side>(const MetConflict&)>& choose);
     std::vector<std::string> MergeAgain();
     void TakeStates(const std::vector<std::string>& open);
     std::optional<std::size_t> FindPlain(const Decision& decision);
@@ -110,6 +123,7 @@ private:
     std::vector<UndoneStep> m_Undone; // the one that was taken back last at the end
     std::uint64_t m_NextStep = 0;     // its number; 0 for the one behind the last
     RecordPlaces m_Places;
+    const EarlierDecisions* m_Earlier = nullptr;
     MetConflicts m_Conflicts;
     std::map<std::size_t, bool> m_ArePlain; // those conflicts of which it was asked, by their indexes
     std::vector<std::string> m_Missing;
