@@ -24,6 +24,7 @@ namespace {
 using nlohmann::json;
 
 constexpr const char* kProposed = "proposed";
+constexpr std::size_t kMostTold = 4; // decisions on one line
 
 struct SettleOptions {
     std::vector<std::string> files;
@@ -79,6 +80,10 @@ void TellProblems(const SettleSession& session) {
         std::cerr << "ovrin: " << scene << ": " << problem.text << '\n';
         for (const Remedy& remedy : problem.remedies) {
             std::cerr << "    to " << remedy.text << ": ovrin settle";
+            if (remedy.decisions.size() > kMostTold) {
+                std::cerr << " --set, " << remedy.decisions.size() << " times as --list --json tells\n";
+                continue;
+            }
             for (const Decision& decision : remedy.decisions)
                 std::cerr << " --set '" << Printable(decision.path) << '=' << SideName(decision.side) << "'";
             std::cerr << '\n';

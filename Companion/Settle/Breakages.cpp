@@ -44,11 +44,20 @@ ID EntryOf(const YAMLNode* entry, ID list) {
 } // namespace
 
 Breakages::Breakages(SceneMerge& merge, const MergeNames& names)
-    : m_Merge(merge), m_Trees{&names.In(Version::Base).Places().Root(), &names.In(Version::Ours).Places().Root(),
-                              &names.In(Version::Theirs).Places().Root(), &merge.Session().Result().GetMapping()} {}
+    : m_Merge(merge), m_Trees{&names.In(Version::Base).Places().Root(),
+                              &names.In(Version::Ours).Places().Root(),
+                              &names.In(Version::Theirs).Places().Root(),
+                              &merge.Session().Result().GetMapping()} {}
 
 ObjectBody Breakages::Body(std::size_t tree, ID id) const {
     return BodyOf(m_Trees[tree]->Get(id));
+}
+
+/// What stands for an object of a prefab goes with the instance, at the latest when scenes are merged.
+bool Breakages::IsGone(std::size_t tree, ID id) const {
+    const ObjectBody body = Body(tree, id);
+    const ID instance = body.isStripped ? InstanceOf(body) : nullptr;
+    return !Has(tree, id) || (instance && !Has(tree, instance));
 }
 
 /// Whether a version has it so already.
@@ -100,7 +109,7 @@ void Breakages::LookAtReferences(ID object, const ObjectBody& body) {
     ForEachReference(body.fields, place, [&](const Path& at, ID other) {
         if (Has(kResult, other) || !told.insert(other).second) return;
         const auto isSo = [&](std::size_t tree) {
-            return !Has(tree, other) && Has(tree, object) && RefersTo(tree, object, other);
+            return IsGone(tree, other) && Has(tree, object) && RefersTo(tree, object, other);
         };
         if (!IsOld(isSo)) m_Found.push_back({Breakage::Kind::Dangling, object, other, at});
     });
@@ -117,7 +126,8 @@ void Breakages::LookAtParent(ID object, const ObjectBody& body) {
         if (!Has(kResult, parent)) lost = parent;
     }
     if (lost)
-        m_Found.push_back({Breakage::Kind::LostParent, object, lost, {object, body.className, YAMLScalar::mFather}});
+        m_Found.push_back(
+            {Breakage::Kind::LostParent, object, lost, {object, body.className, YAMLScalar::mFather}});
 }
 
 void Breakages::LookIfListed(ID object, const ObjectBody& body, ID back, ID list) {

@@ -41,6 +41,7 @@ private:
 
     ObjectBody Body(std::size_t tree, ID id) const;
     bool Has(std::size_t tree, ID id) const { return m_Trees[tree]->HasKey(id); }
+    bool IsGone(std::size_t tree, ID id) const;
     bool RefersTo(std::size_t tree, ID object, ID other) const;
     const std::unordered_set<ID>& Listed(std::size_t tree, ID owner, ID list);
     template <class IsSo> bool IsOld(const IsSo& isSo) const;

@@ -20,6 +20,11 @@ using ID = MergeNames::ID;
 
 constexpr Side kSides[] = {Side::Ours, Side::Theirs, Side::Base};
 
+const YAMLScalar* ChildrenKey() {
+    static const YAMLScalar* const key = YAMLScalar::Lookup("m_Children");
+    return key;
+}
+
 /// "m_Target", "m_Slots[2].item".
 std::string PropertyAt(const Path& place) {
     std::string words;
@@ -46,7 +51,8 @@ public:
     void AddBroken(const Breakage& broken) {
         if (IsOpen(broken.object) || IsOpen(broken.other) || IsOpenAt(broken.place)) return;
         Problem problem{TextOf(broken), {}};
-        const bool isGone = broken.kind == Breakage::Kind::Dangling || broken.kind == Breakage::Kind::LostParent;
+        const bool isGone =
+            broken.kind == Breakage::Kind::Dangling || broken.kind == Breakage::Kind::LostParent;
         if (isGone) AddKeep(problem, broken.other);
         if (broken.kind != Breakage::Kind::WronglyListed) AddRemove(problem, broken.object);
         AddSides(problem, broken);
@@ -89,21 +95,33 @@ private:
 
     /// "removed by theirs".
     std::string HowGone(ID id) const {
-        if (m_Names.Has(Version::Base, id))
+        const ID cause = CauseOf(id);
+        if (m_Names.Has(Version::Base, cause))
             for (const Side side : {Side::Ours, Side::Theirs})
-                if (m_Structure.IsWithout(id, side)) return std::string("removed by ") + SideName(side);
+                if (m_Structure.IsWithout(cause, side)) return std::string("removed by ") + SideName(side);
         return "left out";
     }
 
+    /// As the version has it whose name comes first: one name is enough here.
+    std::string LeadingName(ID id) const {
+        return m_Names.In(m_Names.Leading(id).value_or(Version::Ours)).Name(id);
+    }
+    /// The same, where a Transform is called by what it places.
+    std::string NameOf(ID id) const {
+        const ObjectNames& names = m_Names.In(m_Names.Leading(id).value_or(Version::Ours));
+        const ID place = names.Places().Body(id).IsTransform() ? names.Above(id) : nullptr;
+        return LeadingName(place ? place : id);
+    }
+
     std::string TextOf(const Breakage& broken) const {
-        const std::string object = m_Names.Name(broken.object), other = m_Names.Name(broken.other);
+        const std::string object = NameOf(broken.object), other = NameOf(broken.other);
         const YAMLScalar* field = broken.place[2];
-        const bool isList = field == YAMLScalar::mComponent;
-        const std::string list = isList ? "the list of components of " : "the list of children of ";
+        const bool isComponents = field == YAMLScalar::mComponent;
+        const std::string list = isComponents ? "the list of components of " : "the list of children of ";
+        const std::string gone = HowGone(broken.other);
         switch (broken.kind) {
         case Breakage::Kind::LostParent:
-            return object + " stands at the top, since " + other + ", which it stood below, was " +
-                   HowGone(broken.other);
+            return object + " stands at the top, since " + other + ", which it stood below, was " + gone;
         case Breakage::Kind::NotListed:
             return object + " isn't in " + list + other;
         case Breakage::Kind::WronglyListed:
@@ -111,10 +129,13 @@ private:
         case Breakage::Kind::Dangling:
             break;
         }
-        if (field == YAMLScalar::mGameObject || field == YAMLScalar::mFather)
-            return object + " stays, and " + other + ", which it belongs to, was " + HowGone(broken.other);
-        return object + ": " + PropertyAt(broken.place) + " refers to " + other + ", which was " +
-               HowGone(broken.other);
+        if (field == YAMLScalar::mGameObject)
+            return LeadingName(broken.object) + " stays, and " + other + ", which it belongs to, was " + gone;
+        if (isComponents || field == ChildrenKey())
+            return list + object + " names " + (isComponents ? LeadingName(broken.other) : other) +
+                   ", which was " + gone;
+        return LeadingName(broken.object) + ": " + PropertyAt(broken.place) + " refers to " +
+               LeadingName(broken.other) + ", which was " + gone;
     }
 
     void AddRemedy(Problem& problem, std::string text) {
@@ -126,11 +147,23 @@ private:
         if (!decisions.empty()) problem.remedies.push_back({std::move(text), std::move(decisions)});
     }
 
-    void AddKeep(Problem& problem, ID id) {
+    /// What went because its prefab instance did is kept with that.
+    ID CauseOf(ID id) const {
+        for (const Side side : {Side::Ours, Side::Theirs}) {
+            if (m_Structure.IsWithout(id, side)) return id;
+            const ObjectBody body = m_Names.In(VersionOf(side)).Places().Body(id);
+            if (const ID instance = body.isStripped ? InstanceOf(body) : nullptr)
+                if (!m_Merge.Session().Result().GetMapping().HasKey(instance)) return instance;
+        }
+        return id;
+    }
+
+    void AddKeep(Problem& problem, ID missing) {
+        const ID id = CauseOf(missing);
         for (const Side without : {Side::Ours, Side::Theirs}) {
             if (!m_Structure.IsWithout(id, without)) continue;
             m_Structure.Keep({id}, without);
-            AddRemedy(problem, "keep " + m_Names.Name(m_Structure.TopOf(id, without)) + ", too");
+            AddRemedy(problem, "keep " + NameOf(m_Structure.TopOf(id, without)) + ", too");
         }
     }
 
@@ -139,8 +172,8 @@ private:
             if (!m_Structure.IsWithout(id, without)) continue;
             const ID whole = WholeOf(id, without);
             m_Structure.Remove({whole}, without);
-            AddRemedy(problem, (m_Names.Has(Version::Base, id) ? "remove " : "leave out ") + m_Names.Name(whole) +
-                                   ", too");
+            AddRemedy(problem,
+                      (m_Names.Has(Version::Base, id) ? "remove " : "leave out ") + NameOf(whole) + ", too");
         }
     }
 
@@ -156,29 +189,29 @@ private:
             if (!m_Structure.IsWithout(id, without)) continue;
             const std::vector<ID> needing = NeededBy(m_Merge.Session(), id, without);
             if (needing.empty()) continue; // so it was on that side
-            Problem problem{m_Names.Name(id) + " was " + HowGone(id) + ", and " + m_Names.Name(needing.front()) +
-                                " needs it",
+            Problem problem{LeadingName(id) + " was " + HowGone(id) + ", and " +
+                                LeadingName(needing.front()) + " needs it",
                             {}};
             AddKeep(problem, id);
             m_Structure.Remove(needing, without);
-            AddRemedy(problem, "leave out " + m_Names.Name(needing.front()));
+            AddRemedy(problem, "leave out " + LeadingName(needing.front()));
             m_Found.push_back(std::move(problem));
         }
     }
 
     /// What other versions have at the place, or around it, if it doesn't break anything there.
     void AddSides(Problem& problem, const Breakage& broken) {
+        const Path path = DecidableAt(broken.place);
+        if (path.empty()) return;
+        const std::string what = NameOf(path.front()) + (path.size() > 2 ? "'s " + PropertyAt(path) : "");
         for (const Side side : kSides)
-            if (const Path path = DecidableAt(broken.place, side); !path.empty() && IsSound(side, broken, path)) {
-                const std::string what = path.size() == 1 ? m_Names.Name(path.front()) : PropertyAt(path);
-                if (path.size() == 1 && !m_Names.Has(VersionOf(side), path.front())) continue; // told already
+            if (m_Names.Has(VersionOf(side), path.front()) && IsSound(side, broken, path))
                 problem.remedies.push_back(
-                    {"take " + what + " of " + SideName(side), {{DecisionPath(path), side}}});
-            }
+                    {"take " + what + " from " + SideName(side), {{DecisionPath(path), side}}});
     }
 
     /// The longest beginning of a place at which the merge decides, or nothing.
-    Path DecidableAt(Path place, Side) const {
+    Path DecidableAt(Path place) const {
         for (std::size_t i = 2; i < place.size(); ++i)
             if (std::ranges::all_of(place[i]->Value(), [](char c) { return c >= '0' && c <= '9'; })) {
                 place.resize(i); // within a list the merge counts otherwise
@@ -191,7 +224,8 @@ private:
 
     bool IsSound(Side side, const Breakage& broken, const Path& path) const {
         const YAMLNode* value = m_Names.In(VersionOf(side)).Find(path.front());
-        for (std::size_t i = 1; i < path.size() && path[i] != YAMLScalar::fileID; ++i) value = FieldOf(value, path[i]);
+        for (std::size_t i = 1; i < path.size() && path[i] != YAMLScalar::fileID; ++i)
+            value = FieldOf(value, path[i]);
         const ID named = broken.kind == Breakage::Kind::NotListed ? broken.object : broken.other;
         const bool names = Names(value, named);
         return broken.kind == Breakage::Kind::NotListed ? names : !names;
