@@ -242,7 +242,8 @@ void OpenMerges::SetProgress(const OpenMerge& merge, const Progress& progress) {
         steps.push_back({{"decisions", step.decisions}, {"number", step.number}});
     const json written = {
         {"identity", merge.identity}, {"open", progress.open}, {"decisions", decisions}, {"steps", steps}};
-    Write(PlaceOf(merge.path).file + kProgressExtension, TextOf(written) + "\n", {}, Durability::Unsynced);
+    // Nobody else has what a person decided.
+    Write(PlaceOf(merge.path).file + kProgressExtension, TextOf(written) + "\n", {}, Durability::Synced);
 }
 
 void OpenMerges::Remove(const std::string& path) {

@@ -163,8 +163,8 @@ void SceneMerge::CollectOpen(const ResolveTable& decided) {
         if (IsOpenLoop(record)) record.path = WalkedPath(ParentPath(record)).Keep();
         Path path = record.path.Elements();
         const ConflictKind kind = KindOf(record);
-        // That the requirement stays broken is what the decision says.
-        if (kind == ConflictKind::BrokenRequirement && decided.Find(path)) continue;
+        // What was decided on and is pending again breaks a requirement, and that is what the decision says.
+        if (path.size() == 1 && decided.Find(path)) continue;
         if (!m_Open.empty() && m_Open.back().path == path) continue;
         m_Open.push_back({std::move(path), kind, record});
     }

@@ -25,6 +25,17 @@ std::string TellState(const SettleSession::Met& met) {
                        : "settled by what was decided of another place";
 }
 
+json ToJson(const Problem& problem) {
+    json remedies = json::array();
+    for (const Remedy& remedy : problem.remedies) {
+        json decisions = json::array();
+        for (const Decision& decision : remedy.decisions)
+            decisions.push_back({{"path", decision.path}, {"side", SideName(decision.side)}});
+        remedies.push_back({{"text", remedy.text}, {"decisions", decisions}});
+    }
+    return {{"text", problem.text}, {"remedies", remedies}};
+}
+
 } // namespace
 
 std::vector<std::string> NextSteps(const Repository& repository, const std::string& action) {
@@ -53,8 +64,10 @@ std::string TellConflicts(SettleSession& session) {
         else
             text +=
                 "  " + (conflict.property.empty() ? "" : conflict.property + ": ") + TellState(met) + '\n';
+        if (met.proposed) text += std::string("    proposed: ") + SideName(*met.proposed) + '\n';
         text += "    path    " + Printable(conflict.path) + '\n';
     }
+    for (const Problem& problem : session.Problems()) text += "  problem: " + problem.text + '\n';
     return text;
 }
 
@@ -66,8 +79,11 @@ json ToJson(SettleSession& session) {
         json conflict = ToJson(words.Describe(*met.conflict));
         conflict["state"] = met.isOpen ? "open" : "settled";
         conflict["decided"] = met.decided ? json(SideName(*met.decided)) : json();
+        conflict["proposed"] = met.proposed ? json(SideName(*met.proposed)) : json();
         conflicts.push_back(std::move(conflict));
     }
+    json& problems = written["problems"] = json::array();
+    for (const Problem& problem : session.Problems()) problems.push_back(ToJson(problem));
     return written;
 }
 
