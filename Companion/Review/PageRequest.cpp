@@ -14,7 +14,7 @@ PageAnswer JsonAnswer(const json& value, int status) {
     return {status, "application/json", value.dump(-1, ' ', false, json::error_handler_t::replace)};
 }
 
-PageAnswer ErrorAnswer(int status, std::string_view words) {
+PageAnswer PageError(int status, std::string_view words) {
     return JsonAnswer({{"error", words}}, status);
 }
 

@@ -24,7 +24,7 @@ bool IsSet(const PageRequest& request, const std::string& key) {
 }
 
 PageAnswer Found(const json& found) {
-    return !found.is_null() ? JsonAnswer(found) : ErrorAnswer(404, "No version of the scene has this object");
+    return !found.is_null() ? JsonAnswer(found) : PageError(404, "No version of the scene has this object");
 }
 
 std::optional<MapBox> BoxOf(const PageRequest& request) {
@@ -71,7 +71,7 @@ std::optional<PageAnswer> AnswerView(SceneView& view, const PageRequest& request
         if (request.path == "api/map") return AnswerMap(view, request);
         return std::nullopt;
     } catch (const Failure& failure) {
-        return ErrorAnswer(400, failure.what());
+        return PageError(400, failure.what());
     }
 }
 
