@@ -65,5 +65,5 @@ function makeUnder(page, steps) {
     const buttons = SIDES.map((side) => makeButton(capital(side),
         () => steps.takeUnder(side), { key: `Shift+${KEYS[side]}`, focus: `under-${side}`, className: `take-${side}`,
             title: `Take ${side} for all that is open here and below` }));
-    return make("p", { class: "under" }, "All open ones of this object and what stands under it: ", ...buttons);
+    return make("p", { class: "under" }, "All that is open here and below: ", ...buttons);
 }

@@ -1,16 +1,18 @@
 /**
- * What became of a text: by lines where there are several, else by words, and by characters within a single word. The
- * work is bounded: texts that have too little in common are shown as one removed and one added.
+ * What became of a text: by lines where there are several, within what differs by words, and by characters within a single
+ * word. The work is bounded: texts that have too little in common are shown as one removed and one added.
  */
 
 const MOST_EDITS = 400;
 const MOST_TOKENS = 20000;
+const LEAST_IN_COMMON = 0.3;
 
-function cutText(text, other) {
-    const both = text + other;
-    if (both.includes("\n")) return (one) => one.match(/[^\n]*\n|[^\n]+/g) ?? [];
-    if (/\s/.test(both.trim())) return (one) => one.match(/\s+|[\p{L}\p{N}_.+-]+|[^\s\p{L}\p{N}_.+-]/gu) ?? [];
-    return (one) => Array.from(one);
+function cutLines(text) {
+    return text.match(/[^\n]*\n|[^\n]+/g) ?? [];
+}
+
+function cutWords(text) {
+    return text.match(/\s|[\p{L}\p{N}_.+-]+|[^\s\p{L}\p{N}_.+-]/gu) ?? [];
 }
 
 function commonStart(before, after) {
@@ -88,13 +90,7 @@ function joinPieces(pieces) {
     return joined;
 }
 
-/**
- * @param {string} before
- * @param {string} after
- * @returns {Array<[("same"|"removed"|"added"), string]>} pieces in order, of which neighbours differ in kind
- */
-export function differenceOf(before, after) {
-    const cut = cutText(before, after);
+function compareBy(cut, before, after) {
     const old = cut(before);
     const young = cut(after);
     const start = commonStart(old, young);
@@ -103,4 +99,28 @@ export function differenceOf(before, after) {
     const head = ["same", old.slice(0, start).join("")];
     const tail = ["same", old.slice(old.length - end).join("")];
     return joinPieces([head, ...middle, tail]);
+}
+
+/** What has little in common is read more easily as one text in the place of the other. */
+function compareInside(before, after) {
+    const isWord = !/\s/.test((before + after).trim());
+    const pieces = compareBy(isWord ? Array.from : cutWords, before, after);
+    const common = pieces.reduce((sum, [kind, text]) => sum + (kind === "same" ? text.trim().length : 0), 0);
+    const isOther = common < LEAST_IN_COMMON * Math.max(before.length, after.length);
+    return isOther ? joinPieces([["removed", before], ["added", after]]) : pieces;
+}
+
+/**
+ * @param {string} before
+ * @param {string} after
+ * @returns {Array<[("same"|"removed"|"added"), string]>} pieces in order, of which neighbours differ in kind
+ */
+export function differenceOf(before, after) {
+    const pieces = [];
+    for (const piece of compareBy(cutLines, before, after)) {
+        const isReplaced = piece[0] === "added" && pieces.at(-1)?.[0] === "removed";
+        if (isReplaced) pieces.push(...compareInside(pieces.pop()[1], piece[1]));
+        else pieces.push(piece);
+    }
+    return joinPieces(pieces);
 }

@@ -78,8 +78,7 @@ export class Ending {
         document.title = title;
         const heading = make("h1", { tabindex: "-1" }, title);
         document.body.replaceChildren(make("main", { class: "over" }, heading, listOf(finished), listOf(remarks),
-            next.length ? make("h2", {}, "What comes next") : null, listOf(next),
-            make("p", {}, "This page may be closed.")));
+            ...next.map((line) => make("p", {}, line)), make("p", { class: "aside" }, "This page may be closed.")));
         heading.focus();
     }
 }

@@ -1,12 +1,15 @@
 import { make, makeButton, part, refill } from "./dom.js";
 import { MARKS, SIDES, capital, counted, openWords } from "./words.js";
 
+/** What sides are whose branch isn't known. */
+const UNNAMED = { base: "before both", ours: "yours", theirs: "what is merged in" };
+
 /** The line on top: which scene, how many conflicts are open, what the sides are, and what concerns all of them. */
 export class Header {
     /**
      * @param {import("./state.js").PageState} page
      * @param {import("./steps.js").Steps} steps
-     * @param {{finish: function, leave: function, help: function}} more
+     * @param {{finish: function, leave: function}} more
      */
     constructor(page, steps, more) {
         Object.assign(this, { page, steps, more });
@@ -44,13 +47,10 @@ export class Header {
 
     showCount() {
         const { session } = this.page;
-        const children = [make("span", { class: "changes" }, ...this.makeChangeCounts())];
-        if (session.total) {
-            const settled = session.total - session.open;
-            children.push(make("strong", { id: "open-count" }, openWords(session)),
-                make("progress", { max: session.total, value: settled, "aria-label": "Settled conflicts" }));
-        }
-        part("count").replaceChildren(...children);
+        const value = session.total - session.open;
+        part("changes").replaceChildren(...this.makeChangeCounts());
+        part("count").replaceChildren(...(session.total ? [make("strong", { id: "open-count" }, openWords(session)),
+            make("progress", { max: session.total, value, "aria-label": "Settled conflicts" })] : []));
     }
 
     makeChangeCounts() {
@@ -66,15 +66,14 @@ export class Header {
         const scene = page.session.scenes[page.scene];
         const columns = page.columns.filter(({ side }) => side !== "result");
         const chips = columns.map(({ side, title, label }) => make("span", { class: `chip chip-${side}` },
-            make("strong", {}, title), label ? ` — ${label}` : ""));
-        const sentence = scene?.sides ? make("span", { class: "sentence" }, scene.sides) : null;
-        part("sides").replaceChildren(...chips, ...(sentence ? [sentence] : []));
+            make("strong", {}, title), ` — ${label || UNNAMED[side]}`));
+        part("sides").replaceChildren(...chips);
+        part("sentence").textContent = scene?.sides ?? "";
     }
 
     makeSteps() {
         const { page, steps, more } = this;
-        const help = makeButton("Help", more.help, { key: "?", focus: "help", title: "All keys", className: "quiet" });
-        if (!page.canDecide) return [help];
+        if (!page.canDecide) return [];
         const refuse = (reason) => steps.notices.happened(reason);
         const { canUndo, canRedo } = page.session;
         const undone = canUndo ? "" : "There is nothing to take back.";
@@ -82,7 +81,7 @@ export class Header {
         return [
             makeButton("Undo", () => steps.undo(), { key: "U", focus: "undo", reason: undone, onRefused: refuse }),
             makeButton("Redo", () => steps.redo(), { key: "R", focus: "redo", reason: redone, onRefused: refuse }),
-            this.makeAllButtons(refuse), this.makeProposalButton(), help,
+            this.makeAllButtons(refuse), this.makeProposalButton(),
             makeButton("Leave", more.leave, { focus: "leave", title: "Stop here; all decisions are kept" }),
             makeButton("Finish", more.finish, { key: "F", focus: "finish", className: "primary",
                 reason: this.whyNotFinish(), onRefused: refuse, title: "Write what is settled" }),
@@ -103,7 +102,7 @@ export class Header {
         const { proposed } = this.page.session;
         if (!proposed) return null;
         const title = "The same values were decided before; take the same sides again";
-        const words = `Decide ${counted(proposed, "conflict")} as before`;
+        const words = `Take ${proposed.toLocaleString("en")} as before`;
         return makeButton(words, () => this.steps.takeProposed(), { focus: "proposed", title, className: "proposal" });
     }
 

@@ -23,7 +23,7 @@ function listKeys(page, steps, ways) {
         ...views,
         { keys: ["/"], words: "search the hierarchy by name", act: () => goToSearch(page), isHint: "search" },
         { keys: ["f"], words: "finish: write what is settled", act: ways.finish, isStep: true },
-        { keys: ["?"], words: "this help", act: ways.help, isHint: "help" },
+        { keys: ["?"], words: "this help", act: ways.help },
     ];
 }
 
@@ -68,7 +68,7 @@ export class Keys {
     showHints() {
         if (part("hints").firstChild) return;
         part("hints").append(...this.offered().filter(({ isHint }) => isHint).flatMap(({ keys, isHint }) =>
-            [make("kbd", {}, keys[0]), ` ${isHint} `]));
+            [make("kbd", {}, keys[0]), ` ${isHint} `]), makeButton("All keys", () => this.help(), { key: "?", className: "quiet" }));
     }
 
     /** Opens the help, which tells all of them and can switch them off. */

@@ -3,9 +3,12 @@ import { draw, make, makeButton, part } from "./dom.js";
 import { bundleWords, drawBundle, drawDots, drawGrid, drawItem, drawLabels, spotOf, spotWords } from "./mapmarks.js";
 import { MARKS } from "./words.js";
 
-const CELLS = 64;
+const CELL = 44;
+const MOST_CELLS = 64;
 const WAIT_FOR_MORE = 140;
 const NEAR = 16;
+/** What is asked for reaches beyond what is in sight by this part of it, so that little moves need nothing new. */
+const BEYOND = 0.25;
 const AXES_OF = { top: ["x", "z"], side: ["x", "y"] };
 
 /** The view of the map: where things stand, from above or from the side. */
@@ -103,17 +106,22 @@ export class MapView {
     async loadAll() {
         this.scene = this.page.scene;
         await this.ask({});
-        if (this.answer) this.camera.fit(this.answer.bounds);
+        this.fitAll();
         this.render();
     }
 
     load() {
-        const [x0, y0, x1, y1] = this.camera.box(0.25);
+        const [x0, y0, x1, y1] = this.camera.box(BEYOND);
         return this.ask({ x0, y0, x1, y1 });
     }
 
+    /** As many as there is room for bundles beside each other. */
+    countCells() {
+        return Math.min(MOST_CELLS, Math.max(8, Math.round((this.camera.width * (1 + 2 * BEYOND)) / CELL)));
+    }
+
     async ask(box) {
-        const query = { scene: this.page.scene, view: this.view, cells: CELLS, ...box };
+        const query = { scene: this.page.scene, view: this.view, cells: this.countCells(), ...box };
         const asked = (this.asked = this.page.source.get("map", query));
         const answer = await asked.catch((failure) => {
             this.notices.alert(`The map can't be shown: ${failure.message}`);
@@ -135,8 +143,12 @@ export class MapView {
         this.changed();
     }
 
+    fitAll() {
+        if (this.answer?.bounds) this.camera.fit(this.answer.bounds);
+    }
+
     showAll() {
-        if (this.answer) this.camera.fit(this.answer.bounds);
+        this.fitAll();
         this.changed();
     }
 

@@ -5,9 +5,10 @@ import { counted, markWords, splitName } from "./words.js";
 const MOST_LABELS = 80;
 const LETTER = 6.6;
 
-/** Where the map shows an object: as it is in the result or in ours, or where it was. */
-export function spotOf(item) {
-    return item.result ?? (item.mark === "removed" ? item.base : item.ours) ?? item.theirs ?? item.ours ?? item.base;
+/** Where the map shows an object: where ours has it, or theirs if it alone moved it, or else where it was. */
+export function spotOf({ base, ours, theirs }) {
+    const isByTheirs = theirs && (!ours || (base && !isElsewhere(base, ours)));
+    return isByTheirs ? theirs : ours ?? base;
 }
 
 /** What a mark of the map says. */
@@ -84,17 +85,18 @@ export function drawBundle(bundle, camera, id) {
 
 /** Names beside marks, as many as fit without covering each other. */
 export function drawLabels(items, camera) {
-    const taken = items.map((item) => around(camera.toScreen(spotOf(item)), 16, 16));
+    const taken = items.map((item) => around(camera.toScreen(spotOf(item)), 22, 22));
     const labels = [];
     for (const item of items) {
         if (labels.length === MOST_LABELS) break;
         const name = splitName(item.name).own;
         const text = name.length > 28 ? `${name.slice(0, 27)}…` : name;
-        const [left, top] = camera.toScreen(spotOf(item));
-        const box = [left + 11, top - 8, left + 13 + text.length * LETTER, top + 8];
+        const [middle, top] = camera.toScreen(spotOf(item));
+        const left = middle + (item.open ? 17 : 11);
+        const box = [left, top - 8, left + text.length * LETTER, top + 8];
         if (taken.some((other) => covers(other, box))) continue;
         taken.push(box);
-        labels.push(draw("text", { class: "label", x: left + 12, y: top + 4, "aria-hidden": "true" }, text));
+        labels.push(draw("text", { class: "label", x: left, y: top + 4, "aria-hidden": "true" }, text));
     }
     return labels;
 }

@@ -98,7 +98,8 @@ export class Steps {
 
     tell(words, answer) {
         const followed = answer.followed ? ` ${counted(answer.followed, "more decision")} followed from it.` : "";
-        this.notices.happened(`${words}${followed} ${openWords(answer.session)}.`);
+        const finish = answer.session.isSettled ? " Finish (key F) writes the result." : "";
+        this.notices.happened(`${words}${followed} ${openWords(answer.session)}.${finish}`);
     }
 
     async fail(failure) {

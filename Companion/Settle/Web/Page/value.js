@@ -2,7 +2,6 @@ import { differenceOf } from "./difference.js";
 import { draw, make } from "./dom.js";
 
 const AXES = { vector: ["x", "y", "z", "w"], colour: ["r", "g", "b", "a"] };
-const LEAST_IN_COMMON = 0.3;
 
 /**
  * A value for people, with what became of it since another one.
@@ -76,10 +75,6 @@ function showText(text, before) {
 }
 
 function markDifference(before, after) {
-    const pieces = differenceOf(before, after);
-    const common = pieces.reduce((sum, [kind, text]) => sum + (kind === "same" ? text.length : 0), 0);
-    const isOther = common < LEAST_IN_COMMON * Math.max(before.length, after.length);
-    const told = isOther ? [["removed", before], ["added", after]] : pieces;
     const tags = { same: "span", removed: "del", added: "ins" };
-    return told.filter(([, text]) => text !== "").map(([kind, text]) => make(tags[kind], {}, text));
+    return differenceOf(before, after).map(([kind, text]) => make(tags[kind], {}, text));
 }

@@ -43,7 +43,7 @@ export class ValuesView {
         this.shown = page.object;
         const children = [];
         if (page.item) children.push(makeCard(page, steps, row, this.follow));
-        if (object) children.push(...this.makeObject(object));
+        if (object) children.push(this.makeObject(object, row));
         if (failure) children.push(make("p", { class: "empty" }, failure));
         if (!page.item && !page.object) children.push(make("p", { class: "empty" }, this.whatToSelect()));
         refill(this.panel, children, part("main"));
@@ -54,26 +54,27 @@ export class ValuesView {
         return "Nothing is selected. Choose an object in the hierarchy or on the map to see its values.";
     }
 
-    makeObject(object) {
+    /** The object with all fields but the one that stands above already. */
+    makeObject(object, above) {
         const { page } = this;
-        const name = splitName(object.heading);
-        const marks = [make("span", { class: `mark mark-${object.mark}` },
+        const rows = object.rows.filter((row) => row !== above);
+        const none = above ? "No other field of it differs." : "None of its own fields differs.";
+        const mark = make("span", { class: `mark mark-${object.mark}` },
             make("span", { class: "sign", "aria-hidden": "true" }, MARKS[object.mark].sign),
-            ` ${capital(markWords(object.mark, object.by, page.isComparison))}`)];
-        const show = makeButton("Show in the hierarchy", () => page.show("hierarchy"), { className: "quiet" });
-        return [make("section", { class: "object", "aria-labelledby": "object-title" },
-            this.makeWay(object), make("h2", { id: "object-title" }, name.own), ...marks, show,
-            this.makeNames(object), this.makeParts(object),
-            object.rows.length ? this.makeTable(object.rows)
-                : make("p", { class: "empty" }, "None of its own fields differs."),
-            object.isShortened ? make("p", { class: "aside" }, "It has more fields than can be shown here.") : null)];
+            ` ${capital(markWords(object.mark, object.by, page.isComparison))}`);
+        return make("section", { class: "object", "aria-labelledby": "object-title" },
+            make("h2", { id: "object-title" }, above ? "Also in " : "", ...headingOf(object)), mark,
+            makeButton("Show in the hierarchy", () => page.show("hierarchy"), { className: "quiet" }),
+            this.makeWay(object), this.makeNames(object), this.makeParts(object),
+            rows.length ? this.makeTable(rows) : make("p", { class: "empty" }, none),
+            object.isShortened ? make("p", { class: "aside" }, "It has more fields than can be shown here.") : null);
     }
 
     makeWay(object) {
         const links = object.way.map(({ id, name }) => makeButton(splitName(name).own, () => this.follow(id),
             { className: "link", title: name }));
         return links.length ? make("nav", { class: "way", "aria-label": "Stands in" },
-            ...links.flatMap((link) => [link, " / "])) : null;
+            "in ", ...links.flatMap((link, at) => (at ? [" / ", link] : [link]))) : null;
     }
 
     /** The names that other versions have for it. */
@@ -123,4 +124,11 @@ export class ValuesView {
         return make("td", { class: `cell-${side}${isAsBase ? " as-base" : ""}` },
             showValue(value, before, row.type, this.follow));
     }
+}
+
+/** The name, and behind it the id and what other versions call it. */
+function headingOf({ id, heading }) {
+    const cut = heading.lastIndexOf(` (${id}`);
+    if (cut < 0) return [splitName(heading).own];
+    return [splitName(heading.slice(0, cut)).own, make("span", { class: "label" }, heading.slice(cut))];
 }
