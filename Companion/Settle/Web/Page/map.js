@@ -256,6 +256,7 @@ export class MapView {
         if (event.button !== 0) return;
         const start = [event.clientX, event.clientY];
         const hit = this.nearest(event);
+        const over = new AbortController();
         let last = start;
         this.svg.setPointerCapture(event.pointerId);
         const move = (moved) => {
@@ -263,12 +264,12 @@ export class MapView {
             last = [moved.clientX, moved.clientY];
         };
         const release = (released) => {
-            this.svg.removeEventListener("pointermove", move);
+            over.abort();
             const isClick = Math.hypot(released.clientX - start[0], released.clientY - start[1]) < 4;
             if (isClick && hit && released.type === "pointerup") this.choose(hit);
         };
-        this.svg.addEventListener("pointermove", move);
-        for (const end of ["pointerup", "pointercancel"]) this.svg.addEventListener(end, release, { once: true });
+        this.svg.addEventListener("pointermove", move, over);
+        for (const end of ["pointerup", "pointercancel"]) this.svg.addEventListener(end, release, over);
     }
 
     hover(event) {

@@ -1,6 +1,6 @@
 import { draw } from "./dom.js";
 import { gridStep } from "./camera.js";
-import { counted, markWords, splitName } from "./words.js";
+import { counted, markWords } from "./words.js";
 
 const MOST_LABELS = 80;
 const LETTER = 6.6;
@@ -89,7 +89,7 @@ export function drawLabels(items, camera) {
     const labels = [];
     for (const item of items) {
         if (labels.length === MOST_LABELS) break;
-        const name = splitName(item.name).own;
+        const { name } = item;
         const text = name.length > 28 ? `${name.slice(0, 27)}…` : name;
         const [middle, top] = camera.toScreen(spotOf(item));
         const left = middle + (item.open ? 17 : 11);

@@ -9,14 +9,16 @@ import { capital } from "./words.js";
 export function showProblems(page, steps) {
     let shown = "";
     page.addEventListener("session", () => {
-        const { problems } = page.session;
-        const told = JSON.stringify(problems);
+        const { problems, isSettled, open, scenes } = page.session;
+        const unions = page.canDecide && !isSettled && open === 0 ? scenes.filter(({ bothAdded }) => bothAdded) : [];
+        const told = JSON.stringify([problems, unions.map(({ path }) => path)]);
         if (told === shown) return;
         shown = told;
         const section = part("problems");
         const hadFocus = section.contains(document.activeElement);
-        section.replaceChildren(...problems.map((problem, at) => showProblem(page, steps, problem, at)));
-        section.hidden = problems.length === 0;
+        section.replaceChildren(...problems.map((problem, at) => showProblem(page, steps, problem, at)),
+            ...(unions.length ? [showUnions(steps, unions)] : []));
+        section.hidden = !section.firstChild;
         if (hadFocus) (section.querySelector("button") ?? part("main")).focus();
     });
 }
@@ -27,4 +29,12 @@ function showProblem(page, steps, problem, at) {
     const buttons = remedies.map((remedy, choice) =>
         makeButton(capital(remedy), () => steps.mend(at, choice, remedy)));
     return make("div", { class: "problem" }, make("p", {}, `${scene}${problem.text}`), ...buttons);
+}
+
+/** Scenes that both sides added have no conflict, and are to be looked through nevertheless. */
+function showUnions(steps, unions) {
+    const words = `Both sides added ${unions.map(({ path }) => path).join(", ")}. The result has what either of them has: ` +
+        "look through it, then take it.";
+    const take = makeButton("Take it as it is", () => steps.takeAll("ours"), { className: "primary" });
+    return make("div", { class: "problem" }, make("p", {}, words), take);
 }

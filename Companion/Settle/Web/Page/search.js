@@ -1,5 +1,5 @@
 import { make } from "./dom.js";
-import { counted, splitName } from "./words.js";
+import { counted } from "./words.js";
 
 const WAIT = 150;
 const MOST_HITS = 50;
@@ -47,11 +47,8 @@ class Search {
     }
 
     show(words) {
-        const options = this.found.map((hit, index) => {
-            const { own, above } = splitName(hit.name);
-            return make("div", { role: "option", id: `hit-${index}`, "data-at": index, "aria-selected": "false" },
-                make("span", { class: "own" }, own), make("span", { class: "above" }, above && ` in ${above}`));
-        });
+        const options = this.found.map((hit, index) => make("div",
+            { role: "option", id: `hit-${index}`, "data-at": index, "aria-selected": "false" }, hit.name));
         this.hits.replaceChildren(...options, ...(words ? [make("p", { role: "status", class: "aside" }, words)] : []));
         this.hits.hidden = false;
         this.input.setAttribute("aria-expanded", "true");

@@ -1,5 +1,5 @@
 import { make } from "./dom.js";
-import { MARKS, capital, counted, markWords, splitName } from "./words.js";
+import { MARKS, capital, counted, markWords } from "./words.js";
 
 /**
  * A row of the tree: an object, or what stands for the rest of a branch.
@@ -18,7 +18,7 @@ function makeNodeRow({ node, level, at, of }, how) {
         role: "treeitem", class: `row row-${node.mark} row-${node.kind}`, "data-id": node.id, "aria-level": level,
         "aria-setsize": of, "aria-posinset": at, "aria-selected": String(how.isSelected),
         "aria-expanded": hasChildren ? String(how.isOpened) : null, tabindex: how.isReached ? "0" : "-1",
-    }, makeTwist(hasChildren, how.isOpened), make("span", { class: "name" }, splitName(node.name).own), " ");
+    }, makeTwist(hasChildren, how.isOpened), make("span", { class: "name" }, node.name), " ");
     if (node.mark !== "same") row.append(makeMark(node.mark, capital(markWords(node.mark, node.by, how.isComparison))));
     if (node.open) row.append(makeMark("open", `${node.open} open`));
     if (hasChildren && !how.isOpened) row.append(makeBelow(node.below));

@@ -38,7 +38,7 @@ export class ValuesView {
 
     render(object, failure) {
         const { page, steps } = this;
-        const row = object?.rows.find((one) => one.item !== null && one.item === page.item?.index) ?? null;
+        const row = object && page.item ? rowOf(object.rows, page.item.index) : null;
         const isOther = this.shown !== page.object;
         this.shown = page.object;
         const children = [];
@@ -71,8 +71,7 @@ export class ValuesView {
     }
 
     makeWay(object) {
-        const links = object.way.map(({ id, name }) => makeButton(splitName(name).own, () => this.follow(id),
-            { className: "link", title: name }));
+        const links = object.way.map(({ id, name }) => makeButton(name, () => this.follow(id), { className: "link" }));
         return links.length ? make("nav", { class: "way", "aria-label": "Stands in" },
             "in ", ...links.flatMap((link, at) => (at ? [" / ", link] : [link]))) : null;
     }
@@ -89,7 +88,7 @@ export class ValuesView {
     makeParts(object) {
         if (!object.parts.length) return null;
         const links = object.parts.map(({ id, name, mark, open }) => make("li", {},
-            makeButton(splitName(name).own, () => this.follow(id), { className: "link" }),
+            makeButton(name, () => this.follow(id), { className: "link" }),
             mark === "same" ? null : make("span", { class: `mark mark-${mark}` }, ` ${MARKS[mark].sign} ${MARKS[mark].word}`),
             open ? make("span", { class: "mark mark-open" }, ` ◆ ${open} open`) : null));
         return make("ul", { class: "parts", "aria-label": "Components" }, ...links);
@@ -131,4 +130,11 @@ function headingOf({ id, heading }) {
     const cut = heading.lastIndexOf(` (${id}`);
     if (cut < 0) return [splitName(heading).own];
     return [splitName(heading.slice(0, cut)).own, make("span", { class: "label" }, heading.slice(cut))];
+}
+
+/** The row of a conflict. Where it is about the id in a reference people see the whole reference. */
+function rowOf(rows, item) {
+    const row = rows.find((one) => one.item === item) ?? null;
+    const whole = row?.property.endsWith(".fileID") ? row.property.slice(0, -".fileID".length) : null;
+    return rows.find((one) => one.property === whole && one.type === "reference") ?? row;
 }

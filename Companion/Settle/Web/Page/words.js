@@ -32,13 +32,22 @@ export function openWords(session) {
 }
 
 /**
- * The name of an object without what it stands under, and that: "Lantern · Light" in "Harbour/Pier".
+ * The name of an object without what it stands under, and that: "Lantern · Light" in "Harbour/Pier"; and what other
+ * versions call it, "(theirs: Harbour/Lamp · Light)".
  * @param {string} name
  */
 export function splitName(name) {
-    const component = name.lastIndexOf(" · ");
-    const cut = name.lastIndexOf("/", component < 0 ? name.length : component);
-    return cut < 0 ? { own: name, above: "" } : { own: name.slice(cut + 1), above: name.slice(0, cut) };
+    const others = name.search(/ \((base|ours|theirs|before|after)( and (base|ours|theirs))?: /);
+    const first = others < 0 ? name : name.slice(0, others);
+    const component = first.indexOf(" · ");
+    const cut = first.lastIndexOf("/", component < 0 ? first.length : component);
+    return { own: first.slice(cut + 1), above: first.slice(0, Math.max(0, cut)), others: name.slice(first.length).trim() };
+}
+
+/** "Harbour/Pier/Lantern · Light", without what other versions call it. */
+export function fullName(name) {
+    const { own, above } = splitName(name);
+    return above ? `${above}/${own}` : own;
 }
 
 /** "added by theirs"; in a comparison of two versions nobody is told. */
