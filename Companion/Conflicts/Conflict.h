@@ -36,6 +36,10 @@ const char* WhatHappened(ConflictKind kind);
 /// "broken-requirement", "key-order".
 const char* CodeOf(ConflictKind kind);
 
+/// What a side did to an object as a whole, whose value would fill pages: "removed", "changed m_Layer,
+/// m_Name", "kept". `value` is the object in that version, or null.
+std::string ObjectWords(const ovrin_yaml::Operation* operation, const ovrin_yaml::YAMLNode* value);
+
 /// Puts the conflicts of one merge into words. For one thread at a time, as long as the merge lives.
 class ConflictWords {
 public:
