@@ -1,0 +1,66 @@
+#include "Settle/Web/DeskViews.h"
+
+#include "Review/ViewRequests.h"
+#include "Settle/SettleSession.h"
+#include "Words/Failure.h"
+
+#include <algorithm>
+#include <array>
+#include <limits>
+#include <nlohmann/json.hpp>
+#include <string_view>
+
+namespace ovrin {
+
+using nlohmann::json;
+
+namespace {
+
+std::vector<ConflictMark> MarksOf(const SettleDesk& desk, std::size_t scene) {
+    std::vector<ConflictMark> marks;
+    for (std::size_t i = 0; i < desk.Items().size(); ++i) {
+        const SettleDesk::Item& item = desk.Items()[i];
+        if (item.scene == scene) marks.push_back({item.about, i, item.isOpen, item.decided, item.proposed});
+    }
+    return marks;
+}
+
+/// The answer of a process that has the merge by the decisions.
+PageAnswer AnswerMerged(SettleSession& session, SceneView& view, const PageRequest& request) {
+    const std::string told = session.InMerged([&] {
+        const PageAnswer answer = AnswerView(view, request).value();
+        return std::to_string(answer.status) + ' ' + answer.body;
+    });
+    const std::size_t space = told.find(' ');
+    return {.status = std::stoi(told.substr(0, space)), .body = told.substr(space + 1)};
+}
+
+} // namespace
+
+SceneView& DeskViews::View(std::size_t scene) {
+    Shown& shown = m_Views[scene];
+    SettleSession& session = *m_Desk.Scenes()[scene];
+    if (!shown.view) shown.view = std::make_unique<SceneView>(session.Merge(), session.Names());
+    if (shown.revision != m_Revision) shown.view->SetConflicts(MarksOf(m_Desk, scene));
+    shown.revision = m_Revision;
+    return *shown.view;
+}
+
+json DeskViews::Counts(std::size_t scene) {
+    return View(scene).Counts();
+}
+
+std::optional<PageAnswer> DeskViews::Answer(const PageRequest& request) {
+    constexpr std::array<std::string_view, 4> kKnown = {"api/tree", "api/find", "api/object", "api/map"};
+    if (std::ranges::find(kKnown, request.path) == kKnown.end()) return {};
+    const std::size_t scene = QueryNumber(request, "scene", 0, std::numeric_limits<std::size_t>::max());
+    if (scene >= m_Views.size()) throw Failure("There is no such scene");
+    SettleSession& session = *m_Desk.Scenes()[scene];
+    SceneView& view = View(scene);
+    // Only the values of an object come from the result, which without decisions is there already.
+    if (request.path == "api/object" && !session.Decisions().empty())
+        return AnswerMerged(session, view, request);
+    return AnswerView(view, request);
+}
+
+} // namespace ovrin
