@@ -22,10 +22,6 @@ constexpr std::size_t kMostHeld = 3, kMostItems = 1000;
 constexpr const char* kNothing =
     R"({"tree":[],"objects":{},"map":{"bounds":null,"unplaced":0,"items":[],"bundles":[]}})";
 
-std::string Text(const json& value) {
-    return value.dump(-1, ' ', false, json::error_handler_t::replace);
-}
-
 /// The work on each of `count` scenes, a process each.
 void WorkOnEach(std::size_t count, const ReviewPage::Progress& progress,
                 const std::function<std::string(std::size_t)>& work,
@@ -78,9 +74,9 @@ std::string ReviewPage::LookAt(std::size_t source) const {
         std::optional<ThreeTexts> texts = m_Sources.files[source].read();
         if (!texts) return "null";
         ReviewedScene scene(std::move(*texts), m_Rules, m_Sources.isMerge, 0);
-        return Text({{"counts", scene.View().Counts()}, {"open", scene.CountOpen()}});
+        return JsonText({{"counts", scene.View().Counts()}, {"open", scene.CountOpen()}});
     } catch (const Failure& failure) {
-        return Text({{"problem", failure.what()}});
+        return JsonText({{"problem", failure.what()}});
     }
 }
 
@@ -202,34 +198,37 @@ PageAnswer ReviewPage::Ask(std::size_t scene, const PageRequest& request) {
     }
 }
 
-/// [items, whole, problem] in a form that leaves texts of JSON as they are; the problem is empty where there
-/// is none.
+/// [items, whole, left out, problem] in a form that leaves texts of JSON as they are; the problem is empty
+/// where there is none.
 std::string ReviewPage::WholeOf(std::size_t index) const {
     const Scene& scene = m_Scenes[index];
-    std::string items, whole, problem, bytes;
+    std::string items, problem, bytes;
+    ReviewedScene::WholeText whole;
     try {
         const std::unique_ptr<ReviewedScene> opened = Open(scene);
-        items = Text(opened->Items(index, {0, scene.open}));
-        whole = Text(opened->Whole());
+        items = JsonText(opened->Items(index, {0, scene.open}));
+        whole = opened->Whole();
     } catch (const Failure& failure) {
         problem = failure.what();
     }
-    json::to_cbor(json::array({items, whole, problem}), bytes);
+    json::to_cbor(json::array({items, whole.text, whole.leftOut, problem}), bytes);
     return bytes;
 }
 
-std::string ReviewPage::Whole(const Progress& progress) const {
+std::string ReviewPage::Whole(const Progress& progress, std::size_t& leftOut) const {
     struct Texts {
         std::string items, whole;
     };
     std::vector<Texts> scenes(m_Scenes.size());
+    leftOut = 0;
     const auto take = [&](std::size_t index, WorkerAnswer answer) {
         const Scene& scene = m_Scenes[index];
         if (!scene.problem.empty()) return;
         const std::string path = Printable(m_Sources.files[scene.source].path);
         if (!answer.text) throw Failure(path + ": " + EndOf(answer));
         const json read = json::from_cbor(*answer.text);
-        if (read[2] != "") throw Failure(path + ": " + std::string(read[2]));
+        if (read[3] != "") throw Failure(path + ": " + std::string(read[3]));
+        leftOut += read[2].get<std::size_t>();
         scenes[index] = {read[0], read[1]};
     };
     WorkOnEach(
@@ -240,8 +239,8 @@ std::string ReviewPage::Whole(const Progress& progress) const {
         if (!items.empty()) conflicts += (conflicts.empty() ? "" : ",") + items;
         wholes += (wholes.empty() ? "" : ",") + (scene.whole.empty() ? kNothing : scene.whole);
     }
-    return R"({"session":)" + Text(Session()) + R"(,"conflicts":[)" + conflicts + R"(],"scenes":[)" + wholes +
-           "]}";
+    return R"({"session":)" + JsonText(Session()) + R"(,"conflicts":[)" + conflicts + R"(],"scenes":[)" +
+           wholes + "]}";
 }
 
 } // namespace ovrin

@@ -42,7 +42,9 @@ public:
     /// All that a page could ask for, of what was touched, as JSON text:
     ///
     ///     {"session", "conflicts": [all items], "scenes": [as ReviewedScene::Whole]}
-    std::string Whole(const Progress& progress) const;
+    ///
+    /// `leftOut` becomes the number of objects for whose values there was no room.
+    std::string Whole(const Progress& progress, std::size_t& leftOut) const;
 
 private:
     struct Scene {

@@ -2,6 +2,7 @@
 
 #include "Names/PrintableText.h"
 #include "Review/ConflictItem.h"
+#include "Review/PageRequest.h"
 
 #include <algorithm>
 #include <limits>
@@ -48,29 +49,36 @@ json ReviewedScene::Items(std::size_t scene, PageRange range) const {
     return items;
 }
 
-json ReviewedScene::Whole() {
+json ReviewedScene::TouchedNodes() const {
     const SceneTree& tree = m_View.Nodes();
-    json nodes = json::array(), objects = json::object();
-    bool isShortened = false;
+    json nodes = json::array();
     for (SceneTree::Index i = 0; i < tree.Nodes().size(); ++i) {
         const MarkedNode& node = tree.Nodes()[i];
         if (!node.IsOfInterest()) continue;
         json written = m_View.Pages().NodeOf(i, true);
-        const std::string id = written["id"];
         const bool isTop = node.parent == MarkedNode::kTop;
         written["parent"] = isTop ? json() : json(Printable(tree.Nodes()[node.parent].id->Value()));
         nodes.push_back(std::move(written));
-        if (objects.size() < kMostWholeObjects)
-            objects[id] = m_View.Object(node.id->Value(), false);
-        else
-            isShortened = true;
     }
-    json whole = {
-        {"tree", std::move(nodes)},
-        {"objects", std::move(objects)},
-        {"map",
-         {{"top", m_View.Map({.view = MapView::Top})}, {"side", m_View.Map({.view = MapView::Side})}}}};
-    if (isShortened) whole["isShortened"] = true;
+    return nodes;
+}
+
+ReviewedScene::WholeText ReviewedScene::Whole() {
+    WholeText whole;
+    std::string objects;
+    for (const MarkedNode& node : m_View.Nodes().Nodes()) {
+        if (!node.mark.IsTouched() && !node.open) continue;
+        if (objects.size() > kMostWhole) {
+            ++whole.leftOut;
+            continue;
+        }
+        if (!objects.empty()) objects += ',';
+        objects +=
+            JsonText(Printable(node.id->Value())) + ":" + JsonText(m_View.Object(node.id->Value(), false));
+    }
+    const json map = {{"top", m_View.Map({MapView::Top, {}})}, {"side", m_View.Map({MapView::Side, {}})}};
+    whole.text = R"({"tree":)" + JsonText(TouchedNodes()) + R"(,"objects":{)" + objects + R"(},"map":)" +
+                 JsonText(map) + "}";
     return whole;
 }
 
