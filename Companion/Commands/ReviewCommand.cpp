@@ -47,7 +47,7 @@ void TellRest(const ReviewPage& review) {
                   << " not shown, being no scene: \"ovrin diff\" has all.\n";
 }
 
-void WritePage(const std::string& file, const ReviewPage& review, const ReviewPage::Progress& progress) {
+void WritePage(const std::string& file, ReviewPage& review, const ReviewPage::Progress& progress) {
     std::size_t leftOut = 0;
     const std::string page = SinglePage(PageFiles(), review.Whole(progress, leftOut));
     if (leftOut)

@@ -31,14 +31,20 @@ std::vector<const OpenConflict*> InOrder(const SceneMerge& merge, const SceneTre
 
 } // namespace
 
-ReviewedScene::ReviewedScene(ThreeTexts texts, const SceneRules& rules, bool isMerge, std::size_t firstItem)
+ReviewedScene::ReviewedScene(ThreeTexts texts, const SceneRules& rules, bool isMerge)
     : m_Merge(std::move(texts), rules.rules, rules.types),
       m_Words(Merged(m_Merge), 0,
               isMerge ? MergeNames::Words{"base", "ours", "theirs"}
                       : MergeNames::Words{"before", "before", "after"}),
       m_View(m_Merge, m_Words.Names()) {
     for (const OpenConflict* conflict : InOrder(m_Merge, m_View.Nodes()))
-        m_Marks.push_back({conflict, firstItem + m_Marks.size()});
+        m_Marks.push_back({conflict, m_Marks.size()});
+    m_View.SetConflicts(m_Marks);
+}
+
+void ReviewedScene::NumberFrom(std::size_t firstItem) {
+    if (m_Marks.empty() || m_Marks.front().item == firstItem) return;
+    for (ConflictMark& mark : m_Marks) mark.item = firstItem++;
     m_View.SetConflicts(m_Marks);
 }
 

@@ -13,14 +13,15 @@ namespace ovrin {
 /// A scene of a review that was read: the merge of its versions, and the views of it.
 class ReviewedScene {
 public:
-    /// Throws Failure for texts that can't be read. `firstItem` is the number of its first conflict among
-    /// those of all scenes.
-    ReviewedScene(ThreeTexts texts, const SceneRules& rules, bool isMerge, std::size_t firstItem);
+    /// Throws Failure for texts that can't be read.
+    ReviewedScene(ThreeTexts texts, const SceneRules& rules, bool isMerge);
     ReviewedScene(const ReviewedScene&) = delete;
     ReviewedScene& operator=(const ReviewedScene&) = delete;
 
     std::size_t CountOpen() const { return m_Merge.Open().size(); }
     SceneView& View() { return m_View; }
+    /// Says which number the first conflict has among those of all scenes; 0 in the beginning.
+    void NumberFrom(std::size_t firstItem);
     /// Conflicts from `from` on, `count` at most, as Review/ConflictItem.h has them; in the order of the
     /// hierarchy. `scene` is the scene's number.
     nlohmann::json Items(std::size_t scene, PageRange range) const;
