@@ -1,6 +1,7 @@
 #include "Commands/SettleCommand.h"
 
 #include "Commands/Output.h"
+#include "Commands/SettleInBrowser.h"
 #include "Conflicts/ConflictReport.h"
 #include "Names/PrintableText.h"
 #include "Settle/ExternalTool.h"
@@ -32,6 +33,8 @@ struct SettleOptions {
     std::string take, under, decisionFile;
     bool isList = false, asJson = false, isUndo = false, isAsIs = false, isForget = false;
     bool overwrites = false, withTool = false;
+    bool inBrowser = false, isBrowserLeft = false;
+    int port = 0;
 };
 
 void Tell(const Remarks& remarks) {
@@ -172,6 +175,7 @@ Outcome RunSettle(const SettleOptions& options) {
     const bool isAnyUnreadable = scenes.Open(unreadable) > 0;
     Tell(unreadable);
     if (options.isList) return List(scenes, options.asJson);
+    if (options.inBrowser) return SettleInBrowser(scenes, {options.port, !options.isBrowserLeft}, unreadable);
     return Settle(scenes, options, isAnyUnreadable);
 }
 
@@ -199,6 +203,21 @@ void DescribeDecisions(CLI::App& command, SettleOptions& options) {
     command.add_flag("--undo", options.isUndo, "take the last decisions back");
 }
 
+void DescribeBrowser(CLI::App& command, SettleOptions& options) {
+    auto* web = command.add_flag("--web", options.inBrowser, "settle on a page in the browser");
+    command
+        .add_option("--port", options.port, "serve the page on this port of 127.0.0.1, not on any free one")
+        ->check(CLI::Range(1024, 65535))
+        ->type_name("PORT")
+        ->needs(web);
+    command
+        .add_flag("--no-browser", options.isBrowserLeft, "tell the address of the page, and open no browser")
+        ->needs(web);
+    for (const char* other :
+         {"--list", "--set", "--take", "--decisions", "--undo", "--as-is", "--forget", "--with-tool"})
+        web->excludes(command.get_option(other));
+}
+
 } // namespace
 
 Action DescribeSettle(CLI::App& command) {
@@ -213,6 +232,7 @@ Action DescribeSettle(CLI::App& command) {
                      "put the settled scene in the place of a file that was changed by hand");
     command.add_flag("--with-tool", options->withTool,
                      "let the external merge tool settle BASE OURS THEIRS RESULT, as git mergetool calls it");
+    DescribeBrowser(command, *options);
     command.add_option("FILE", options->files, "only these scenes, or those in these folders");
     return [options] { return RunSettle(*options); };
 }

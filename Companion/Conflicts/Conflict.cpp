@@ -60,15 +60,6 @@ std::string TouchedFields(const Operation& operation) {
     return ShortenedAtEnd(Printable(fields), kWidth);
 }
 
-/// What a side did to an object as a whole, whose value would fill pages.
-std::string ObjectWords(const Operation* operation, const YAMLNode* value) {
-    if (!value) return As<RemoveOperation>(operation) ? "removed" : "none";
-    if (!operation) return "kept";
-    if (As<AddOperation>(operation)) return "added";
-    const std::string fields = TouchedFields(*operation);
-    return fields.empty() ? "changed" : "changed " + fields;
-}
-
 json ToJson(const YAMLNode* value) {
     if (const YAMLScalar* scalar = AsScalar(value)) return std::string(scalar->Value());
     if (const YAMLSequence* sequence = AsSequence(value)) {
@@ -93,8 +84,16 @@ const char* CodeOf(ConflictKind kind) {
     return kKindWords[static_cast<std::size_t>(kind)].code;
 }
 
-ConflictWords::ConflictWords(SceneMerge& merge, std::size_t width)
-    : m_Merge(merge), m_Width(width), m_Names(merge.Session()), m_Places(merge.Session(), m_Names) {}
+std::string ObjectWords(const Operation* operation, const YAMLNode* value) {
+    if (!value) return As<RemoveOperation>(operation) ? "removed" : "none";
+    if (!operation) return "kept";
+    if (As<AddOperation>(operation)) return "added";
+    const std::string fields = TouchedFields(*operation);
+    return fields.empty() ? "changed" : "changed " + fields;
+}
+
+ConflictWords::ConflictWords(SceneMerge& merge, std::size_t width, MergeNames::Words versions)
+    : m_Merge(merge), m_Width(width), m_Names(merge.Session(), std::move(versions)), m_Places(merge.Session(), m_Names) {}
 
 Conflict ConflictWords::Describe(const OpenConflict& open) const {
     Conflict conflict{};

@@ -41,11 +41,17 @@ const char* WhatHappened(ConflictKind kind);
 /// "broken-requirement", "key-order".
 const char* CodeOf(ConflictKind kind);
 
+/// What a side did to an object as a whole, whose value would fill pages: "removed", "changed m_Layer,
+/// m_Name", "kept". `value` is the object in that version, or null.
+std::string ObjectWords(const ovrin_yaml::Operation* operation, const ovrin_yaml::YAMLNode* value);
+
 /// Puts the conflicts of one merge into words. For one thread at a time, as long as the merge lives.
 class ConflictWords {
 public:
     /// The merge must have been merged. Words for values have at most `width` characters each; 0 is no limit.
-    explicit ConflictWords(SceneMerge& merge, std::size_t width = 0);
+    /// Names tell the versions by `versions`.
+    explicit ConflictWords(SceneMerge& merge, std::size_t width = 0,
+                           MergeNames::Words versions = {"base", "ours", "theirs"});
 
     const MergeNames& Names() const { return m_Names; }
     Conflict Describe(const OpenConflict& open) const;

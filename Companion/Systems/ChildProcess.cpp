@@ -38,20 +38,22 @@ std::vector<std::string> Environment(const ProcessSetting& setting) {
     return variables;
 }
 
-/// What a new process is to be: its folder, its standard streams, and signals as programs expect them.
+/// What a new process is to be: its folder, its session, its standard streams, and signals as programs expect
+/// them.
 class Start {
 public:
-    Start(const std::string& folder, const std::array<int, 3>& streams) {
+    Start(const ProcessSetting& setting, const std::array<int, 3>& streams) {
         posix_spawn_file_actions_init(&m_Actions);
         posix_spawnattr_init(&m_Attributes);
         for (int number = 0; number < 3; ++number)
             posix_spawn_file_actions_adddup2(&m_Actions, streams[static_cast<std::size_t>(number)], number);
-        if (!folder.empty()) posix_spawn_file_actions_addchdir_np(&m_Actions, folder.c_str());
+        if (!setting.folder.empty()) posix_spawn_file_actions_addchdir_np(&m_Actions, setting.folder.c_str());
         sigset_t signals;
         sigemptyset(&signals);
         for (const int signal : {SIGPIPE, SIGXFSZ}) sigaddset(&signals, signal);
         posix_spawnattr_setsigdefault(&m_Attributes, &signals);
-        posix_spawnattr_setflags(&m_Attributes, POSIX_SPAWN_SETSIGDEF);
+        const int apart = setting.isApart ? POSIX_SPAWN_SETSID : 0;
+        posix_spawnattr_setflags(&m_Attributes, static_cast<short>(POSIX_SPAWN_SETSIGDEF | apart));
     }
     Start(const Start&) = delete;
     Start& operator=(const Start&) = delete;
@@ -86,7 +88,7 @@ Pipe::Pipe() {
 
 pid_t StartProcess(const CommandWords& command, const ProcessSetting& setting,
                    const std::array<int, 3>& streams) {
-    return Start(setting.folder, streams).Run(command, setting);
+    return Start(setting, streams).Run(command, setting);
 }
 
 int WaitForProcess(pid_t child) {

@@ -17,9 +17,9 @@ struct Pipe {
     Pipe();
 };
 
-/// Starts a program with these standard streams, signals as programs expect them, and the folder and
-/// environment of the setting; the rest of the setting is the caller's business. Throws Failure if it can't
-/// be started. Every program that was started must be waited for.
+/// Starts a program with these standard streams, signals as programs expect them, and the folder,
+/// environment and session of the setting; the rest of the setting is the caller's business. Throws Failure
+/// if it can't be started. Every program that was started must be waited for.
 pid_t StartProcess(const CommandWords& command, const ProcessSetting& setting,
                    const std::array<int, 3>& streams);
 

@@ -16,6 +16,7 @@ struct ProcessSetting {
     std::string input = {};  ///< its standard input
     std::vector<std::pair<std::string, std::string>> environment = {}; ///< added to the one of this process
     bool showErrors = false; ///< its standard error is that of this process, not kept
+    bool isApart = false;    ///< in a session of its own: no key and no closed terminal reaches it
 };
 
 /// How a program ended and what it said.

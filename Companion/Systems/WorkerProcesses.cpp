@@ -23,6 +23,8 @@ namespace {
 using Work = std::function<std::string(std::size_t)>;
 using Take = std::function<void(std::size_t, WorkerAnswer)>;
 
+int g_ClosedInCopies = -1;
+
 bool SendAll(int socket, const void* bytes, std::size_t count) {
     const auto* from = static_cast<const char*>(bytes);
     while (count > 0) {
@@ -177,6 +179,7 @@ private:
         if (process < 0) Fail();
         if (process == 0) {
             here.Close();
+            CloseInCopy();
             for (const Worker& other : m_Workers) close(other.Socket()); // theirs end when this process does
             Serve(there.Get(), m_Work);
         }
@@ -215,6 +218,18 @@ private:
 void WorkInProcesses(std::span<const std::uint64_t> sizes, const WorkLimits& limits, const Work& work,
                      const Take& take) {
     Pool(sizes, limits, work).Run(take);
+}
+
+ClosedInCopies::ClosedInCopies(int descriptor) {
+    g_ClosedInCopies = descriptor;
+}
+
+ClosedInCopies::~ClosedInCopies() {
+    g_ClosedInCopies = -1;
+}
+
+void CloseInCopy() {
+    Descriptor(std::exchange(g_ClosedInCopies, -1)).Close();
 }
 
 } // namespace ovrin

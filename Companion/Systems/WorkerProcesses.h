@@ -34,4 +34,16 @@ void WorkInProcesses(std::span<const std::uint64_t> sizes, const WorkLimits& lim
                      const std::function<std::string(std::size_t)>& work,
                      const std::function<void(std::size_t, WorkerAnswer)>& take);
 
+/// While it lives, copies of this process close a descriptor first: whoever waits for the end of what it
+/// leads to doesn't wait for them, too. One at a time.
+class ClosedInCopies {
+public:
+    explicit ClosedInCopies(int descriptor);
+    ClosedInCopies(const ClosedInCopies&) = delete;
+    ClosedInCopies& operator=(const ClosedInCopies&) = delete;
+    ~ClosedInCopies();
+};
+/// What a copy of this process that is made elsewhere calls first.
+void CloseInCopy();
+
 } // namespace ovrin

@@ -1,0 +1,43 @@
+#include "Review/ConflictItem.h"
+
+#include "Names/PrintableText.h"
+
+#include <nlohmann/json.hpp>
+
+namespace ovrin {
+
+using nlohmann::json;
+
+namespace {
+
+constexpr std::size_t kWidth = 200, kChoiceWidth = 40;
+
+json NameOrNull(const std::optional<Side>& side) {
+    return side ? json(SideName(*side)) : json();
+}
+
+} // namespace
+
+json ConflictItem(const Conflict& conflict, const ItemState& state) {
+    json item = {{"index", state.index},
+                 {"scene", state.scene},
+                 {"path", Printable(conflict.path)},
+                 {"id", Printable(conflict.id)},
+                 {"object", conflict.object},
+                 {"heading", conflict.heading},
+                 {"property", conflict.property},
+                 {"kind", CodeOf(conflict.kind)},
+                 {"what", WhatHappened(conflict.kind)},
+                 {"isOpen", state.isOpen},
+                 {"decided", NameOrNull(state.decided)},
+                 {"proposed", NameOrNull(state.proposed)}};
+    for (const Side side : {Side::Base, Side::Ours, Side::Theirs}) {
+        const std::string& words = conflict.WordsOf(side);
+        item["words"][SideName(side)] = ShortenedAtEnd(words, kWidth);
+        item["choices"][SideName(side)] =
+            "Take " + std::string(SideName(side)) + ": " + ShortenedAtEnd(words, kChoiceWidth);
+    }
+    return item;
+}
+
+} // namespace ovrin
