@@ -18,7 +18,6 @@ export function makeCard(page, steps, row, follow) {
         make("h2", { id: "card-title" },
             make("span", { class: "above" }, name.above ? `${name.above} / ` : ""), name.own,
             make("span", { class: "property" }, item.property ? ` · ${item.property}` : "")),
-        name.others ? make("p", { class: "aside" }, name.others) : null,
         make("p", { class: "what" }, stateWords(item)),
         make("div", { class: "columns" }, ...SIDES.map((side) => makeColumn(page, steps, side, row, follow))),
         makeResult(item, row, follow),

@@ -1,5 +1,5 @@
 import { make, makeButton, part } from "./dom.js";
-import { counted } from "./words.js";
+import { counted, readyScenes } from "./words.js";
 
 /** How a session ends: what is settled is written, or everything is kept for another time. */
 export class Ending {
@@ -15,7 +15,7 @@ export class Ending {
     /** Asks whether the result is to be written. */
     askToFinish(reason) {
         if (reason) return this.notices.happened(reason);
-        const ready = this.page.session.scenes.filter((scene) => scene.open === 0 && !scene.problem);
+        const ready = readyScenes(this.page.session);
         const open = this.page.session.open;
         const words = open ? `${counted(open, "conflict")} in other scenes stay${open === 1 ? "s" : ""} open.` : "";
         return this.ask(`Write ${ready.length === 1 ? "the result" : counted(ready.length, "result")}?`, [

@@ -173,11 +173,12 @@ export class MapView {
         const isDot = (item) => item.mark === "same" && !item.open && item.id !== this.selected;
         const touched = items.filter((item) => !isDot(item));
         this.dots = items.filter(isDot);
-        this.spots = [...touched.map((item) => ({ item, place: spotOf(item) })),
-            ...answer.bundles.map((bundle) => ({ bundle, place: [bundle.x, bundle.y] }))];
+        this.spots = [...answer.bundles.map((bundle) => ({ bundle, place: [bundle.x, bundle.y] })),
+            ...touched.map((item) => ({ item, place: spotOf(item) }))];
         const marks = this.spots.map(({ item, bundle }, at) => bundle ? drawBundle(bundle, camera, `spot-${at}`)
             : drawItem(item, camera, `spot-${at}`, spotWords(item, page.isComparison)));
-        this.moving = draw("g", {}, drawDots(this.dots, camera), ...marks, ...drawLabels(touched, camera));
+        const labels = drawLabels(touched, this.spots, camera);
+        this.moving = draw("g", {}, drawDots(this.dots, camera), ...marks, ...labels);
         this.svg.replaceChildren(drawGrid(camera, AXES_OF[this.view]), this.moving);
         this.svg.setAttribute("aria-label", `Map seen ${this.view === "top" ? "from above" : "from the side"}`);
         this.markSelected();

@@ -83,9 +83,9 @@ export function drawBundle(bundle, camera, id) {
     draw("rect", { x: -width / 2, y: -9, width, height: 18, rx: 9 }), draw("text", { y: 4, "text-anchor": "middle" }, text));
 }
 
-/** Names beside marks, as many as fit without covering each other. */
-export function drawLabels(items, camera) {
-    const taken = items.map((item) => around(camera.toScreen(spotOf(item)), 22, 22));
+/** The names of items beside their marks, as many as fit without covering each other or any of the spots. */
+export function drawLabels(items, spots, camera) {
+    const taken = spots.map(({ place }) => around(camera.toScreen(place), 22, 22));
     const labels = [];
     for (const item of items) {
         if (labels.length === MOST_LABELS) break;
