@@ -5,6 +5,7 @@
 #include "Commands/DoctorCommand.h"
 #include "Commands/MergeCommand.h"
 #include "Commands/PreviewCommand.h"
+#include "Commands/ReviewCommand.h"
 #include "Commands/SettleCommand.h"
 #include "Commands/SetupCommand.h"
 #include "Commands/StatusCommand.h"
@@ -20,6 +21,7 @@ constexpr Command kCommands[] = {
     {"check", "tell what is wrong in scenes", DescribeCheck},
     {"preview", "tell which scenes would conflict if a branch were merged", DescribePreview},
     {"diff", "tell what changed in scenes, by the names of objects", DescribeDiff},
+    {"review", "show what changed in scenes, or a merge of them, in a browser", DescribeReview},
     {"setup", "let git, Mercurial and Subversion merge scenes with this program", DescribeSetup},
     {"doctor", "tell what keeps version control from merging scenes, and the cure", DescribeDoctor},
 };

@@ -44,6 +44,8 @@ ChangedFiles TwoFiles(FilePair shown, const std::string& before, const std::stri
     if (before == kNothing) shown.status = FileStatus::Added;
     if (after == kNothing) shown.status = FileStatus::Removed;
     ChangedFiles changes;
+    changes.before = before;
+    changes.after = after;
     changes.files.push_back({shown, VersionAt(before), VersionAt(after)});
     changes.lines = [before, after](std::span<const FilePair> files) {
         return files.empty() ? "" : DiffOfFiles(files.front(), before, after);
@@ -84,6 +86,8 @@ ComparisonWish Sorted(const DiffOperands& operands, const Repository& repository
         if (areRevisions && !areMarked && mayBeFile) FailForBoth(word);
         (areRevisions ? wish.revisions : wish.paths).push_back(word);
     }
+    if (wish.revisions.empty() && !operands.otherwise.empty() && repository.kind == SystemKind::Git)
+        wish.revisions.push_back(operands.otherwise);
     return wish;
 }
 

@@ -12,6 +12,7 @@ struct DiffOperands {
     std::vector<std::string> words; ///< revisions, paths or two files
     std::vector<std::string> paths; ///< those that were marked as paths
     bool isStaged = false;
+    std::string otherwise; ///< the revision of git where none is given; empty: what "git diff" takes then
 };
 
 /// The files that are to be compared: two, if the words are names of two files and no revisions; otherwise

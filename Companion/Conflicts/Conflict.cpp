@@ -91,8 +91,8 @@ std::string ObjectWords(const Operation* operation, const YAMLNode* value) {
     return fields.empty() ? "changed" : "changed " + fields;
 }
 
-ConflictWords::ConflictWords(SceneMerge& merge, std::size_t width)
-    : m_Merge(merge), m_Width(width), m_Names(merge.Session()), m_Places(merge.Session(), m_Names) {}
+ConflictWords::ConflictWords(SceneMerge& merge, std::size_t width, MergeNames::Words versions)
+    : m_Merge(merge), m_Width(width), m_Names(merge.Session(), std::move(versions)), m_Places(merge.Session(), m_Names) {}
 
 Conflict ConflictWords::Describe(const OpenConflict& open) const {
     Conflict conflict{};

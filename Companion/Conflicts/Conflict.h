@@ -44,7 +44,9 @@ std::string ObjectWords(const ovrin_yaml::Operation* operation, const ovrin_yaml
 class ConflictWords {
 public:
     /// The merge must have been merged. Words for values have at most `width` characters each; 0 is no limit.
-    explicit ConflictWords(SceneMerge& merge, std::size_t width = 0);
+    /// Names tell the versions by `versions`.
+    explicit ConflictWords(SceneMerge& merge, std::size_t width = 0,
+                           MergeNames::Words versions = {"base", "ours", "theirs"});
 
     const MergeNames& Names() const { return m_Names; }
     Conflict Describe(const OpenConflict& open) const;

@@ -34,6 +34,7 @@ struct ChangedFiles {
     std::vector<ChangedFile> files;
     /// What changed in some of them by lines, as the system tells it.
     std::function<std::string(std::span<const FilePair>)> lines;
+    std::string before, after; ///< what people call the versions; empty where that isn't known
 };
 
 /// What is to be compared: no revision, or one or two, as the system's own diff takes them.

@@ -132,6 +132,20 @@ bool IsAgainstWorkingTree(const ComparisonWish& wish) {
     return std::ranges::count(OutputOf(call), '\n') == 1;
 }
 
+void NameVersions(ChangedFiles& changes, const ComparisonWish& wish, bool isAgainstTree) {
+    const std::vector<std::string>& revisions = wish.revisions;
+    changes.before = !revisions.empty() ? revisions[0] : wish.isStaged ? "HEAD" : "the index";
+    changes.after = wish.isStaged ? "the index" : "the working tree";
+    if (wish.isStaged || isAgainstTree) return;
+    const std::vector<std::string> ends = revisions.size() > 1 ? revisions : Ends(revisions[0]);
+    const bool areNamed = ends.size() > 1;
+    const auto named = [](const std::string& end) { return end.empty() ? "HEAD" : end; };
+    changes.before = areNamed ? named(ends[0]) : "";
+    changes.after = areNamed ? named(ends[1]) : "";
+    if (areNamed && revisions[0].find("...") != std::string::npos)
+        changes.before = "where " + changes.after + " left " + changes.before;
+}
+
 bool NamesSomething(const std::string& path, const ComparisonWish& wish) {
     if (RunProcess({"git", "ls-files", "--error-unmatch", "--", path}).Succeeded()) return true;
     std::vector<std::string> commits = {"HEAD"};
@@ -172,6 +186,7 @@ ChangedFiles ListGitChanges(const Repository& repository, const ComparisonWish& 
                 "\" is no revision, and no file that git knows: \"git status\" tells what isn't tracked");
     const Listing listing(isAgainstTree ? std::optional(repository.top) : std::nullopt);
     ChangedFiles changes;
+    NameVersions(changes, wish, isAgainstTree);
     for (Pieces pieces(listed); !pieces.IsEmpty();) changes.files.push_back(listing.TakeEntry(pieces));
     DropRepeatedUnmerged(changes.files);
     changes.lines = [wish](std::span<const FilePair> files) { return DiffByLines(wish, files); };

@@ -137,6 +137,8 @@ ChangedFiles ListOtherChanges(const Repository& repository, const ComparisonWish
         caller = std::make_shared<Subversion>(wish);
     const std::string before = wish.revisions.empty() ? caller->Parent() : wish.revisions[0];
     ChangedFiles changes;
+    changes.before = wish.revisions.empty() ? "the last commit" : before;
+    changes.after = wish.revisions.size() > 1 ? wish.revisions[1] : "the working copy";
     for (const auto& [letter, path] : caller->List()) {
         ChangedFile changed{{FileStatus::Changed, path, path}, VersionAt(caller, before, path), nullptr};
         changed.after = wish.revisions.size() > 1 ? VersionAt(caller, wish.revisions[1], path)

@@ -179,7 +179,7 @@ private:
         if (process < 0) Fail();
         if (process == 0) {
             here.Close();
-            Descriptor(std::exchange(g_ClosedInCopies, -1)).Close();
+            CloseInCopy();
             for (const Worker& other : m_Workers) close(other.Socket()); // theirs end when this process does
             Serve(there.Get(), m_Work);
         }
@@ -226,6 +226,10 @@ ClosedInCopies::ClosedInCopies(int descriptor) {
 
 ClosedInCopies::~ClosedInCopies() {
     g_ClosedInCopies = -1;
+}
+
+void CloseInCopy() {
+    Descriptor(std::exchange(g_ClosedInCopies, -1)).Close();
 }
 
 } // namespace ovrin

@@ -43,5 +43,7 @@ public:
     ClosedInCopies& operator=(const ClosedInCopies&) = delete;
     ~ClosedInCopies();
 };
+/// What a copy of this process that is made elsewhere calls first.
+void CloseInCopy();
 
 } // namespace ovrin
