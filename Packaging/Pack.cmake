@@ -1,6 +1,6 @@
 # Read by cpack for each kind of package. A package for one system asks it for the libraries that the programs need;
 # an archive is for any system, and has programs that need none.
-set(targets OvrinMerge ovrin completions)
+set(targets OvrinMerge ovrin ${CPACK_OVRIN_WEB} completions)
 set(components Unspecified programs)
 if(NOT CPACK_GENERATOR MATCHES "^(DEB|RPM)$")
   if(NOT CPACK_OVRIN_STATIC_LINK)

@@ -6,7 +6,9 @@
 import itertools
 import json
 import os
+import pathlib
 import random
+import shutil
 import signal
 import time
 
@@ -348,14 +350,10 @@ def test_nothing_to_settle_serves_nothing(user):
 
 def test_without_the_server_the_other_ways_are_told(user, tmp_path):
     user.conflict(*ONE_CONFLICT)
-    installed = os.path.dirname(os.path.realpath(user.path_of("ovrin")))
-    for name in os.listdir(installed):
-        if name not in ("ovrin-web", "ovrin"):
-            os.symlink(os.path.join(installed, name), tmp_path / name)
-    (tmp_path / "ovrin").write_bytes(open(os.path.join(installed, "ovrin"), "rb").read())
-    (tmp_path / "ovrin").chmod(0o755)
-    user.environment["PATH"] = f"{tmp_path}:{user.environment['PATH']}"
-    user.ovrin("settle", "--web", status=FAILED)
+    installed = pathlib.Path(shutil.which("ovrin", path=user.environment["PATH"])).resolve().parent
+    for name in ("ovrin", "mergerules.txt", "mergespecfile.txt"):
+        shutil.copy(installed / name, tmp_path)
+    user.ovrin("settle", "--web", status=FAILED, PATH=f"{tmp_path}:{user.environment['PATH']}")
     assert "ovrin-web" in user.words() and '"ovrin settle"' in user.words()
 
 

@@ -47,6 +47,8 @@ std::optional<std::string> RequestReader::Head() {
             m_Read.resize(end + kHeadEnd.size());
             return std::exchange(m_Read, std::move(rest));
         }
+        // Lines that end in another way are no request either, and nothing else needs to be waited for.
+        if (m_Read.find("\n\n", searched) != std::string::npos) return std::exchange(m_Read, {});
         searched = m_Read.size() < kHeadEnd.size() ? 0 : m_Read.size() - kHeadEnd.size();
         if (m_Read.size() >= kMostHead || !ReadMore()) return {};
     }

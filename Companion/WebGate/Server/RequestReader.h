@@ -14,7 +14,8 @@ public:
     /// `socket` stays open.
     explicit RequestReader(int socket);
 
-    /// The head with its empty line; nothing if it isn't there in time, or is longer than 16 KB.
+    /// The head with its empty line, however lines end; nothing if it isn't there in time, or is longer than
+    /// 16 KB.
     std::optional<std::string> Head();
     /// The body of so many bytes; nothing if it isn't there in time.
     std::optional<std::string> Body(std::size_t length);
