@@ -26,8 +26,8 @@ export function makeCard(page, steps, row, follow) {
 
 function stateWords(item) {
     const what = `${capital(item.what)}.`;
-    if (!item.isOpen) return `${what} ${item.decided ? `You took ${item.decided}.` : "Another decision settled it, too."}`;
-    return item.proposed ? `${what} Open; the same was decided before: ${item.proposed}.` : `${what} Open.`;
+    if (!item.isOpen) return `${what} ${item.decided ? `You took ${item.decided}.` : "Another decision settled it."}`;
+    return item.proposed ? `${what} Open; it was decided before: ${item.proposed}.` : `${what} Open.`;
 }
 
 function makeColumn(page, steps, side, row, follow) {

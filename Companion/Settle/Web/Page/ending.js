@@ -19,7 +19,7 @@ export class Ending {
         const open = this.page.session.open;
         const words = open ? `${counted(open, "conflict")} in other scenes stay${open === 1 ? "s" : ""} open.` : "";
         return this.ask(`Write ${ready.length === 1 ? "the result" : counted(ready.length, "result")}?`, [
-            make("p", {}, "Each result takes the place of its scene's file, and version control is told that it is settled:"),
+            make("p", {}, "Each takes the place of its scene's file, and version control is told that it is settled:"),
             make("ul", {}, ...ready.map(({ path }) => make("li", {}, path))),
             words ? make("p", {}, words) : null,
         ], makeButton("Write", () => this.finish(false), { className: "primary" }));
@@ -84,7 +84,8 @@ export class Ending {
 }
 
 function finishedWords(finished) {
-    return finished.length === 1 ? "The scene is settled and written" : `${finished.length} scenes are settled and written`;
+    const what = finished.length === 1 ? "The scene is" : `${finished.length} scenes are`;
+    return `${what} settled and written`;
 }
 
 function listOf(lines) {

@@ -35,8 +35,8 @@ function showProblem(page, steps, problem, at) {
 
 /** Scenes that both sides added have no conflict, and are to be looked through nevertheless. */
 function showUnions(steps, unions) {
-    const words = `Both sides added ${unions.map(({ path }) => path).join(", ")}. The result has what either of them has: ` +
-        "look through it, then take it.";
+    const words = `Both sides added ${unions.map(({ path }) => path).join(", ")}. The result has what either of ` +
+        "them has: look through it, then take it.";
     const take = makeButton("Take it as it is", () => steps.takeAll("ours"), { className: "primary" });
     return showWords(words, take);
 }

@@ -90,7 +90,8 @@ export class ValuesView {
         if (!object.parts.length) return null;
         const links = object.parts.map(({ id, name, mark, open }) => make("li", {},
             makeButton(name, () => this.follow(id), { className: "link" }),
-            mark === "same" ? null : make("span", { class: `mark mark-${mark}` }, ` ${MARKS[mark].sign} ${MARKS[mark].word}`),
+            mark === "same" ? null
+                : make("span", { class: `mark mark-${mark}` }, ` ${MARKS[mark].sign} ${MARKS[mark].word}`),
             open ? make("span", { class: "mark mark-open" }, ` ◆ ${open} open`) : null));
         return make("ul", { class: "parts", "aria-label": "Components" }, ...links);
     }

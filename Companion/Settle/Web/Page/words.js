@@ -32,8 +32,8 @@ export function openWords(session) {
 }
 
 /**
- * The name of an object without what it stands under, and that: "Lantern · Light" in "Harbour/Pier". What other versions
- * call it, "(theirs: Harbour/Lamp · Light)", is left out.
+ * The name of an object without what it stands under, and that: "Lantern · Light" in "Harbour/Pier". What other
+ * versions call it, "(theirs: Harbour/Lamp · Light)", is left out.
  * @param {string} name
  */
 export function splitName(name) {
