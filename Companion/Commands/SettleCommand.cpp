@@ -24,6 +24,8 @@ namespace {
 
 using nlohmann::json;
 
+constexpr const char* kProposed = "proposed";
+
 struct SettleOptions {
     std::vector<std::string> files;
     std::vector<std::string> set;
@@ -65,9 +67,20 @@ void Decide(const SettleScenes& scenes, const SettleOptions& options) {
     for (const std::string& text : options.set) wanted.push_back(ParseWanted(text));
     if (!wanted.empty()) DecideWanted(scenes.Sessions(), wanted);
     if (!options.decisionFile.empty()) DecideByFile(scenes.Sessions(), options.decisionFile);
-    if (!options.take.empty()) TakeSide(scenes.Sessions(), SideNamed(options.take), options.under);
+    if (options.take == kProposed)
+        TakeProposed(scenes.Sessions(), options.under);
+    else if (!options.take.empty())
+        TakeSide(scenes.Sessions(), SideNamed(options.take), options.under);
     if (!options.isUndo) return;
     if (!UndoStep(scenes.Sessions())) throw Failure("There is no decision to take back");
+}
+
+void TellProposed(const SettleScenes& scenes) {
+    std::size_t count = 0;
+    for (const auto& session : scenes.Sessions()) count += session->CountProposed();
+    if (count)
+        std::cerr << CountOpen(count) << (count == 1 ? " was" : " were")
+                  << " decided before: \"ovrin settle --take proposed\" takes the same sides.\n";
 }
 
 /// Tells of the sessions that stay, and of what is missing in those that go.
@@ -82,6 +95,7 @@ bool TellOpen(const SettleScenes& scenes, bool wasDecided) {
             std::cerr << "Both sides added the scene: look through the union of the two, and take it with "
                          "\"ovrin settle --take ours\" or, changed by you, with \"ovrin settle --as-is\".\n";
     }
+    TellProposed(scenes);
     if (isAnyOpen)
         std::cerr << (wasDecided ? "The decisions are kept. " : "")
                   << "\"ovrin settle --list\" shows what is open.\n";
@@ -103,7 +117,8 @@ Outcome Settle(SettleScenes& scenes, const SettleOptions& options, bool isAnyUnr
     if (finished.empty() && !isAnyOpen && refused.empty() && !isAnyUnreadable)
         std::cerr << "No scene has open conflicts.\n";
     if (!finished.empty()) TellNext(scenes, scenes.Sessions().front()->Source().occasion.action);
-    return isAnyOpen || isAnyUnreadable || !refused.empty() ? Outcome::LeftOpen : Outcome::Done;
+    const bool isAllFinished = finished.size() == scenes.Sessions().size();
+    return isAnyUnreadable || !isAllFinished ? Outcome::LeftOpen : Outcome::Done;
 }
 
 /// Takes files as they stand, or forgets that they had conflicts.
@@ -153,8 +168,11 @@ void DescribeDecisions(CLI::App& command, SettleOptions& options) {
             "shows, a pattern with * for any one element, or the name of the object and the property")
         ->type_name("PATH=SIDE")
         ->allow_extra_args(false);
-    auto* take = command.add_option("--take", options.take, "take a side at all open conflicts")
-                     ->check(CLI::IsMember({"ours", "theirs", "base"}))
+    auto* take = command
+                     .add_option("--take", options.take,
+                                 "take a side at all open conflicts; proposed: at each what was decided when "
+                                 "the same one was met before")
+                     ->check(CLI::IsMember({"ours", "theirs", "base", kProposed}))
                      ->type_name("SIDE");
     command.add_option("--under", options.under, "only at those of this object and what stands under it")
         ->needs(take)

@@ -1,11 +1,13 @@
 #include "Settle/MergedScene.h"
 
 #include "Conflicts/DecisionPath.h"
+#include "Scenes/SceneRules.h"
 #include "Systems/WorkerProcesses.h"
 #include "Words/Failure.h"
 
 #include <cstdint>
 #include <nlohmann/json.hpp>
+#include <utility>
 
 namespace ovrin {
 
@@ -27,6 +29,14 @@ std::vector<std::string> MissingIn(SceneMerge& merge, const MergeNames& names) {
 }
 
 } // namespace
+
+SceneMerge SceneMergeOf(const OpenMerge& merge) {
+    FormatFiles files;
+    if (!merge.rules.empty()) files.rules = merge.rules;
+    if (!merge.typeInfo.empty()) files.typeInfo = merge.typeInfo;
+    SceneRules rules = ReadSceneRules(files);
+    return SceneMerge(merge.texts, std::move(rules.rules), std::move(rules.types));
+}
 
 std::string MergeApartTo(SceneMerge& merge, const std::vector<Decision>& decisions, Side take,
                          const std::function<std::string()>& make) {

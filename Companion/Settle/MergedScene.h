@@ -10,6 +10,9 @@
 
 namespace ovrin {
 
+/// The merge of these texts, by the rules that they are to be merged by; not merged yet.
+SceneMerge SceneMergeOf(const OpenMerge& merge);
+
 /// What a merge by certain decisions came to, as a text can hold it.
 struct MergedScene {
     std::vector<std::string> open; ///< paths of the conflicts that nothing settles, as decisions name them

@@ -1,6 +1,7 @@
 #include "Settle/Web/DeskViews.h"
 
 #include "Review/ViewRequests.h"
+#include "Settle/MergedScene.h"
 #include "Settle/SettleSession.h"
 #include "Words/Failure.h"
 
@@ -25,23 +26,16 @@ std::vector<ConflictMark> MarksOf(const SettleDesk& desk, std::size_t scene) {
     return marks;
 }
 
-/// The answer of a process that has the merge by the decisions.
-PageAnswer AnswerMerged(SettleSession& session, SceneView& view, const PageRequest& request) {
-    const std::string told = session.InMerged([&] {
-        const PageAnswer answer = AnswerView(view, request).value();
-        return std::to_string(answer.status) + ' ' + answer.body;
-    });
-    const std::size_t space = told.find(' ');
-    return {.status = std::stoi(told.substr(0, space)), .body = told.substr(space + 1)};
-}
-
 } // namespace
 
 SceneView& DeskViews::View(std::size_t scene) {
     Shown& shown = m_Views[scene];
     SettleSession& session = *m_Desk.Scenes()[scene];
     if (!shown.view) shown.view = std::make_unique<SceneView>(session.Merge(), session.Names());
-    if (shown.revision != m_Revision) shown.view->SetConflicts(MarksOf(m_Desk, scene));
+    if (shown.revision != m_Revision) {
+        shown.view->SetConflicts(MarksOf(m_Desk, scene));
+        shown.merged.reset();
+    }
     shown.revision = m_Revision;
     return *shown.view;
 }
@@ -50,17 +44,33 @@ json DeskViews::Counts(std::size_t scene) {
     return View(scene).Counts();
 }
 
+/// Merges by the decisions in a process of its own, the first time that it is asked since they were made.
+PageAnswer DeskViews::AnswerMerged(std::size_t scene, const PageRequest& request) {
+    SceneView& view = View(scene);
+    std::unique_ptr<SceneProcess>& process = m_Views[scene].merged;
+    if (!process)
+        process = std::make_unique<SceneProcess>([&] {
+            SettleSession& session = *m_Desk.Scenes()[scene];
+            MergeHere(session.Merge(), session.Decisions(), session.Source().take);
+            return [&view](const PageRequest& asked) { return AnswerView(view, asked).value(); };
+        });
+    try {
+        return process->Ask(request);
+    } catch (const Failure&) {
+        process.reset();
+        throw;
+    }
+}
+
 std::optional<PageAnswer> DeskViews::Answer(const PageRequest& request) {
     constexpr std::array<std::string_view, 4> kKnown = {"api/tree", "api/find", "api/object", "api/map"};
     if (std::ranges::find(kKnown, request.path) == kKnown.end()) return {};
     const std::size_t scene = QueryNumber(request, "scene", 0, std::numeric_limits<std::size_t>::max());
     if (scene >= m_Views.size()) throw Failure("There is no such scene");
-    SettleSession& session = *m_Desk.Scenes()[scene];
-    SceneView& view = View(scene);
     // Only the values of an object come from the result, which without decisions is there already.
-    if (request.path == "api/object" && !session.Decisions().empty())
-        return AnswerMerged(session, view, request);
-    return AnswerView(view, request);
+    if (request.path == "api/object" && !m_Desk.Scenes()[scene]->Decisions().empty())
+        return AnswerMerged(scene, request);
+    return AnswerView(View(scene), request);
 }
 
 } // namespace ovrin

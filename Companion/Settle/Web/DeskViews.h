@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Review/PageRequest.h"
+#include "Review/SceneProcess.h"
 #include "Review/SceneView.h"
 #include "Settle/SettleDesk.h"
 
@@ -29,9 +30,11 @@ private:
     struct Shown {
         std::unique_ptr<SceneView> view;
         std::uint64_t revision = 0;
+        std::unique_ptr<SceneProcess> merged; ///< has the merge by the decisions of that revision
     };
 
     SceneView& View(std::size_t scene);
+    PageAnswer AnswerMerged(std::size_t scene, const PageRequest& request);
 
     const SettleDesk& m_Desk;
     std::vector<Shown> m_Views;
