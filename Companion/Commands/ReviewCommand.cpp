@@ -35,7 +35,7 @@ ReviewSources SourcesOf(const ReviewWish& wish) {
     return SidesOfMerge(wish.merge, wish.operands.paths);
 }
 
-std::string CountFiles(std::size_t count, const char* what) {
+std::string CountOf(std::size_t count, const char* what) {
     return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
 }
 
@@ -43,11 +43,16 @@ std::string CountFiles(std::size_t count, const char* what) {
 void TellRest(const ReviewPage& review) {
     for (const std::string& problem : review.Problems()) std::cerr << problem << ".\n";
     if (const std::size_t others = review.CountOthers())
-        std::cerr << CountFiles(others, "file") << (others == 1 ? " is" : " are")
+        std::cerr << CountOf(others, "file") << (others == 1 ? " is" : " are")
                   << " not shown, being no scene: \"ovrin diff\" has all.\n";
 }
 
-void WritePage(const std::string& file, const std::string& page) {
+void WritePage(const std::string& file, ReviewPage& review, const ReviewPage::Progress& progress) {
+    std::size_t leftOut = 0;
+    const std::string page = SinglePage(PageFiles(), review.Whole(progress, leftOut));
+    if (leftOut)
+        std::cerr << "The page has no room for the values of " << CountOf(leftOut, "object")
+                  << ": \"ovrin review\" without --html shows them.\n";
     const std::string path = file == "-" ? "" : file;
     if (const int error = Deliver(
             path, {page.size(), [&page](OutputStream& stream) { stream << page; }, Durability::Synced}))
@@ -79,7 +84,7 @@ Outcome RunReview(const ReviewWish& wish) {
     if (wish.file.empty())
         Serve(wish.page, review);
     else
-        WritePage(wish.file, SinglePage(PageFiles(), review.Whole(progress)));
+        WritePage(wish.file, review, progress);
     return review.Problems().empty() ? Outcome::Done : Outcome::LeftOpen;
 }
 

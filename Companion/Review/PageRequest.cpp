@@ -10,8 +10,12 @@ namespace ovrin {
 
 using nlohmann::json;
 
+std::string JsonText(const json& value) {
+    return value.dump(-1, ' ', false, json::error_handler_t::replace);
+}
+
 PageAnswer JsonAnswer(const json& value, int status) {
-    return {status, "application/json", value.dump(-1, ' ', false, json::error_handler_t::replace)};
+    return {status, "application/json", JsonText(value)};
 }
 
 PageAnswer PageError(int status, std::string_view words) {

@@ -24,6 +24,7 @@ struct PageAnswer {
 };
 
 /// A value as JSON. Bytes that are no UTF-8 are replaced: names and what other programs said may stand in it.
+std::string JsonText(const nlohmann::json& value);
 PageAnswer JsonAnswer(const nlohmann::json& value, int status = 200);
 /// {"error": words} with that status.
 PageAnswer PageError(int status, std::string_view words);

@@ -1,33 +1,26 @@
 #pragma once
 
 #include "Review/PageRequest.h"
+#include "Review/ReviewScenes.h"
 #include "Review/ReviewSource.h"
-#include "Review/SceneProcess.h"
-#include "Review/TreePages.h"
 #include "Scenes/SceneRules.h"
 
 #include <cstddef>
-#include <functional>
-#include <list>
-#include <memory>
 #include <nlohmann/json_fwd.hpp>
 #include <string>
 #include <vector>
 
 namespace ovrin {
 
-class ReviewedScene;
-
 /// The scenes of a review, as a page shows them: one list over all of them, in which nothing can be decided.
-///
-/// Each scene is read in a process of its own when the review begins, for its numbers, and in another one
-/// when a page asks for it; few of those are kept. Only for a process without other threads.
+/// All are looked at when it begins. Only for a process without other threads.
 class ReviewPage {
 public:
-    /// Is told how many scenes of how many were read.
-    using Progress = std::function<void(std::size_t done, std::size_t all)>;
+    using Progress = ReviewScenes::Progress;
 
     ReviewPage(ReviewSources sources, SceneRules rules, const Progress& progress);
+    ReviewPage(const ReviewPage&) = delete;
+    ReviewPage& operator=(const ReviewPage&) = delete;
 
     /// Files that are scenes, those that can't be read among them.
     std::size_t CountScenes() const { return m_Scenes.size(); }
@@ -41,35 +34,31 @@ public:
 
     /// All that a page could ask for, of what was touched, as JSON text:
     ///
-    ///     {"session", "conflicts": [all items], "scenes": [as ReviewedScene::Whole]}
-    std::string Whole(const Progress& progress) const;
+    ///     {"session", "conflicts": [all items], "scenes": [as ReviewedScene::WholeText]}
+    ///
+    /// `leftOut` becomes the number of objects for whose values there was no room. Throws Failure for a scene
+    /// that was changed since the review began.
+    std::string Whole(const Progress& progress, std::size_t& leftOut);
 
 private:
     struct Scene {
-        std::size_t source = 0;
-        std::size_t open = 0, firstItem = 0;
-        std::string counts; // JSON
+        std::size_t file = 0; ///< among the sources
+        SceneAnswers::Known known;
+        std::string counts; ///< JSON
         std::string problem;
     };
-    void Look(const Progress& progress);
-    std::string LookAt(std::size_t source) const;
-    std::string WholeOf(std::size_t scene) const;
+    void TakeLook(std::size_t file, const nlohmann::json& look);
     nlohmann::json Session() const;
     nlohmann::json SceneJson(const Scene& scene) const;
     PageAnswer AnswerItems(const PageRequest& request);
     PageAnswer AnswerOfScene(const PageRequest& request);
-    std::unique_ptr<ReviewedScene> Open(const Scene& scene) const;
-    PageAnswer Ask(std::size_t scene, const PageRequest& request);
+    PageAnswer Ask(const Scene& scene, const PageRequest& request);
 
-    ReviewSources m_Sources;
-    SceneRules m_Rules;
+    const ReviewSources m_Sources;
+    const SceneRules m_Rules;
+    ReviewScenes m_Processes;
     std::vector<Scene> m_Scenes; // in the order of the sources
     std::size_t m_Open = 0;
-    struct Held {
-        std::size_t scene;
-        std::unique_ptr<SceneProcess> process;
-    };
-    std::list<Held> m_Held; // the one that was asked last in front
 };
 
 } // namespace ovrin

@@ -2,6 +2,7 @@
 
 #include "Names/PrintableText.h"
 #include "Review/ConflictItem.h"
+#include "Review/PageRequest.h"
 
 #include <algorithm>
 #include <limits>
@@ -30,14 +31,20 @@ std::vector<const OpenConflict*> InOrder(const SceneMerge& merge, const SceneTre
 
 } // namespace
 
-ReviewedScene::ReviewedScene(ThreeTexts texts, const SceneRules& rules, bool isMerge, std::size_t firstItem)
+ReviewedScene::ReviewedScene(ThreeTexts texts, const SceneRules& rules, bool isMerge)
     : m_Merge(std::move(texts), rules.rules, rules.types),
       m_Words(Merged(m_Merge), 0,
               isMerge ? MergeNames::Words{"base", "ours", "theirs"}
                       : MergeNames::Words{"before", "before", "after"}),
       m_View(m_Merge, m_Words.Names()) {
     for (const OpenConflict* conflict : InOrder(m_Merge, m_View.Nodes()))
-        m_Marks.push_back({conflict, firstItem + m_Marks.size()});
+        m_Marks.push_back({conflict, m_Marks.size()});
+    m_View.SetConflicts(m_Marks);
+}
+
+void ReviewedScene::NumberFrom(std::size_t firstItem) {
+    if (m_Marks.empty() || m_Marks.front().item == firstItem) return;
+    for (ConflictMark& mark : m_Marks) mark.item = firstItem++;
     m_View.SetConflicts(m_Marks);
 }
 
@@ -48,29 +55,36 @@ json ReviewedScene::Items(std::size_t scene, PageRange range) const {
     return items;
 }
 
-json ReviewedScene::Whole() {
+json ReviewedScene::TouchedNodes() const {
     const SceneTree& tree = m_View.Nodes();
-    json nodes = json::array(), objects = json::object();
-    bool isShortened = false;
+    json nodes = json::array();
     for (SceneTree::Index i = 0; i < tree.Nodes().size(); ++i) {
         const MarkedNode& node = tree.Nodes()[i];
         if (!node.IsOfInterest()) continue;
         json written = m_View.Pages().NodeOf(i, true);
-        const std::string id = written["id"];
         const bool isTop = node.parent == MarkedNode::kTop;
         written["parent"] = isTop ? json() : json(Printable(tree.Nodes()[node.parent].id->Value()));
         nodes.push_back(std::move(written));
-        if (objects.size() < kMostWholeObjects)
-            objects[id] = m_View.Object(node.id->Value(), false);
-        else
-            isShortened = true;
     }
-    json whole = {
-        {"tree", std::move(nodes)},
-        {"objects", std::move(objects)},
-        {"map",
-         {{"top", m_View.Map({.view = MapView::Top})}, {"side", m_View.Map({.view = MapView::Side})}}}};
-    if (isShortened) whole["isShortened"] = true;
+    return nodes;
+}
+
+ReviewedScene::WholeText ReviewedScene::Whole() {
+    WholeText whole;
+    std::string objects;
+    for (const MarkedNode& node : m_View.Nodes().Nodes()) {
+        if (!node.mark.IsTouched() && !node.open) continue;
+        if (objects.size() > kMostWhole) {
+            ++whole.leftOut;
+            continue;
+        }
+        if (!objects.empty()) objects += ',';
+        objects +=
+            JsonText(Printable(node.id->Value())) + ":" + JsonText(m_View.Object(node.id->Value(), false));
+    }
+    const json map = {{"top", m_View.Map({MapView::Top, {}})}, {"side", m_View.Map({MapView::Side, {}})}};
+    whole.text = R"({"tree":)" + JsonText(TouchedNodes()) + R"(,"objects":{)" + objects + R"(},"map":)" +
+                 JsonText(map) + "}";
     return whole;
 }
 
