@@ -22,6 +22,13 @@ void Replace(std::string& text, std::string_view what, const std::string& by) {
     text.replace(at, what.size(), by);
 }
 
+/// What stands in an element ends it nowhere.
+std::string Inside(const std::string& text, const char* element) {
+    if (text.find("</" + std::string(element)) != std::string::npos || text.find("<!--") != std::string::npos)
+        throw Failure("The page's own files hold what would end the element " + std::string(element));
+    return text;
+}
+
 /// 128 random bits.
 std::string RandomNumber() {
     static constexpr std::string_view kDigits = "0123456789abcdef";
@@ -63,13 +70,14 @@ std::string SinglePage(std::span<const PageFile> files, std::string_view data) {
 <meta http-equiv="Content-Security-Policy" content="default-src 'none'; script-src 'nonce-)" +
                 number + "'; style-src 'nonce-" + number + R"('; base-uri 'none'; form-action 'none'">)");
     Replace(page, R"(<link rel="stylesheet" href="style.css">)",
-            "<style nonce=\"" + number + "\">\n" + std::string(FileNamed(files, "style.css")) + "</style>");
+            "<style nonce=\"" + number + "\">\n" +
+                Inside(std::string(FileNamed(files, "style.css")), "style") + "</style>");
     Replace(page, "<script type=\"module\" src=\"main.js\"></script>\n", "");
     // Behind all that the script looks for.
     Replace(page, "</body>",
             "<script type=\"application/json\" id=\"data\">" + SafeInScript(data) +
                 "</script>\n<script nonce=\"" + number + "\">\n\"use strict\";\n" +
-                BundleModules(files, "main.js") + "</script>\n</body>");
+                Inside(BundleModules(files, "main.js"), "script") + "</script>\n</body>");
     return page;
 }
 
