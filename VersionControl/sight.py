@@ -140,7 +140,7 @@ class Sight:
 
     def tab_through(self):
         """What the tab key reaches, from the first to the last."""
-        self.run("document.activeElement.blur(); window.getSelection().removeAllRanges()")
+        self.focus(".skip")
         reached = []
         while len(reached) < 200:
             self.press(Keys.TAB)
@@ -152,4 +152,7 @@ class Sight:
 
     def check_errors(self):
         """Nothing was refused by the content security policy or failed, as the browser tells."""
-        assert [entry for entry in self.driver.get_log("browser") if entry["level"] != "DEBUG"] == []
+        told = [entry["message"] for entry in self.driver.get_log("browser") if entry["level"] != "DEBUG"]
+        # Browsers ask every address for an icon, of their own accord and outside of the page's place.
+        told = [message for message in told if "/favicon.ico" not in message]
+        assert not told, told

@@ -44,12 +44,24 @@ export class Ending {
     finish(overwrite) {
         part("ending").close();
         return this.steps.inTurn(async () => {
-            const answer = await this.steps.post("finish", { overwrite });
+            const answer = await this.askLast(() => this.steps.post("finish", { overwrite }));
             if (answer.isOver) return this.end(finishedWords(answer.finished), answer);
             await this.page.load();
             await this.page.renewItem();
             return this.tellRest(answer, overwrite);
         });
+    }
+
+    /** Asks for what the program may end with, which is no loss of the connection then. */
+    async askLast(ask) {
+        let answer = null;
+        this.page.source.stopWatching();
+        try {
+            answer = await ask();
+        } finally {
+            if (!answer?.isOver) this.notices.watch(this.page);
+        }
+        return answer;
     }
 
     /** What was written, what wasn't and why, where the session goes on. */
@@ -67,8 +79,9 @@ export class Ending {
     leave() {
         part("ending").close();
         return this.steps.inTurn(async () => {
-            const answer = await this.page.source.post("leave", {});
-            this.end("You left; all decisions are kept", { finished: [], remarks: [], ...answer });
+            const leave = async () => ({ ...await this.page.source.post("leave", {}), isOver: true });
+            const { next } = await this.askLast(leave);
+            this.end("You left; all decisions are kept", { finished: [], remarks: [], next });
         });
     }
 

@@ -27,6 +27,11 @@ export class Notices {
         part("alert").replaceChildren();
     }
 
+    /** Tells when the program ends, and when it is there again. */
+    watch(page) {
+        page.source.watch((isThere) => this.connection(isThere, page.session.mode));
+    }
+
     /**
      * @param {boolean} isThere whether the program is
      * @param {"settle"|"review"} mode
