@@ -46,7 +46,7 @@ function makeColumn(page, steps, side, row, follow) {
 function makeChoice(page, steps, side, isTaken) {
     const { item } = page;
     const isProposed = item.isOpen && item.proposed === side;
-    const words = make("span", {}, item.choices[side], isProposed ? make("em", {}, " (as before)") : null);
+    const words = make("span", {}, capital(item.choices[side]), isProposed ? make("em", {}, " (as before)") : null);
     const button = makeButton(words, () => steps.take(side), {
         key: KEYS[side], focus: `take-${side}`, className: `choice take-${side}`, title: `Take ${side}`,
     });

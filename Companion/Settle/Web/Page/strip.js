@@ -42,7 +42,7 @@ function makeStripSide(page, steps, item, side) {
     if (!page.canDecide) return make("span", { class: `strip-side chip-${side}` }, name, words);
     const label = make("span", {}, name, words);
     const button = makeButton(label, () => steps.take(side), {
-        key: STRIP_KEYS[side], focus: `strip-${side}`, className: `take-${side}`, title: item.choices[side],
+        key: STRIP_KEYS[side], focus: `strip-${side}`, className: `take-${side}`, title: capital(item.choices[side]),
     });
     button.setAttribute("aria-pressed", String(!item.isOpen && item.decided === side));
     return button;
