@@ -10,6 +10,7 @@ import pathlib
 import random
 import shutil
 import signal
+import sys
 import time
 
 import pytest
@@ -217,6 +218,22 @@ def test_secret_is_no_argument_and_no_variable(page):
         for what in ("cmdline", "environ"):
             with open(f"/proc/{process}/{what}", "rb") as file:
                 assert page.token.encode() not in file.read()
+
+
+@pytest.mark.skipif(os.getuid() != 0 or not shutil.which("setpriv"), reason="needs root to be two users")
+def test_another_user_who_knows_the_address_gets_nothing(user):
+    """Command lines are public, and that of the browser has the address."""
+    user.conflict(*ONE_CONFLICT)
+    here = pathlib.Path(user.here).parent
+    for folder, _, names in os.walk(here):
+        for name in (folder, *(os.path.join(folder, name) for name in names)):
+            os.chown(name, 12345, 12345, follow_symlinks=False)
+    user.fake("as-other", 'exec setpriv --reuid 12345 --regid 12345 --clear-groups "$@"')
+    with Page(user, "settle", "--web", "--no-browser", program=["as-other", "ovrin"]) as page:
+        ask = [sys.executable, "-c", "import sys, urllib.request; urllib.request.urlopen(sys.argv[1])", f"{page.address}api/session"]
+        for other, fails in (("12345", False), ("12346", True)):
+            user.run("setpriv", "--reuid", other, "--regid", other, "--clear-groups", *ask, fails=fails)
+            assert ("403" in user.report) == fails
 
 
 @pytest.mark.parametrize("page", [SCRIPTS], indirect=True)

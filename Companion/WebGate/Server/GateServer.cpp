@@ -53,6 +53,7 @@ std::optional<int> GateServer::Bind(int port) {
     const int bound = port == 0 ? bind_to_any_port(kLoopback) : bind_to_port(kLoopback, port) ? port : -1;
     // The library lets five connections wait, and a browser that is one too many tries again after a second.
     if (bound <= 0 || ::listen(svr_sock_, SOMAXCONN) != 0) return {};
+    m_Peers.emplace(bound);
     return m_Address.port = bound;
 }
 
@@ -74,6 +75,8 @@ void GateServer::ServeRequest(int socket) {
         if (!head) return;
         const std::optional<RequestHead> parsed = ParseRequestHead(*head);
         checked = parsed ? CheckRequest(*parsed, m_Address) : RefusedRequest{400, "This is no request"};
+        if (std::holds_alternative<PassedRequest>(checked) && !m_Peers->IsOurs(socket))
+            checked = RefusedRequest{403, "The page is another user's"};
         if (const auto* passed = std::get_if<PassedRequest>(&checked)) body = reader.Body(passed->bodyLength);
     }
     if (const auto* refused = std::get_if<RefusedRequest>(&checked)) return Refuse(socket, *refused);

@@ -4,9 +4,11 @@
 #include "WebGate/Server/Connections.h"
 #include "WebGate/Server/ModelPipe.h"
 #include "WebGate/Server/OpenPages.h"
+#include "WebGate/Server/PeerCheck.h"
 
 #include <atomic>
 #include <httplib.h>
+#include <optional>
 #include <string>
 
 namespace ovrin {
@@ -32,6 +34,7 @@ private:
     ModelPipe& m_Model;
     OpenPages m_Pages;
     PageAddress m_Address;
+    std::optional<PeerCheck> m_Peers;
     Connections* m_Connections = nullptr; // the library's
     std::atomic<bool> m_IsOver = false;
 };
