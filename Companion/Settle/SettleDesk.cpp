@@ -108,6 +108,11 @@ SettleDesk::Step SettleDesk::TakeAll(Side side) {
     });
 }
 
+SettleDesk::Step SettleDesk::Accept(std::size_t scene) {
+    return MakeStep(
+        [&] { return Scenes()[scene]->TakeAll(Side::Ours, [](const OpenConflict&) { return true; }); });
+}
+
 SettleDesk::Step SettleDesk::TakeProposed() {
     return MakeStep([&] {
         std::map<std::size_t, std::vector<Decision>> proposed;
