@@ -197,8 +197,10 @@ Action DescribeSettle(CLI::App& command) {
                      "put the settled scene in the place of a file that was changed by hand");
     command.add_flag("--prompt", options->withPrompts,
                      "ask line by line instead of on a screen, also where there is no terminal");
-    command.add_flag("--with-tool", options->withTool,
-                     "let the external merge tool settle BASE OURS THEIRS RESULT, as git mergetool calls it");
+    command.add_flag(
+        "--with-tool", options->withTool,
+        "let the external merge tool settle BASE OURS THEIRS RESULT, as git mergetool calls it for "
+        "ovrin-external");
     command.add_option("FILE", options->files, "only these scenes, or those in these folders");
     return [options] { return RunSettle(*options); };
 }

@@ -53,12 +53,12 @@ StyledSpan StateOf(const SettleDesk::Item& item) {
 StyledLine StopRow(const Walk& walk, const Walk::Stop& stop, std::size_t columns, const Letters& letters) {
     const SettleDesk::Item* item = walk.ItemOf(stop);
     const bool isOpen = walk.IsOpen(stop);
-    std::string name = "added by both sides";
+    std::string name = walk.SceneOf(stop).Source().isBothAdded ? "added by both" : "no conflict";
     if (item) {
         const Conflict& words = walk.WordsOf(stop);
-        name = words.property.empty() ? "the object as a whole" : letters.Shown(words.property);
+        name = words.property.empty() ? "whole object" : letters.Shown(words.property);
     }
-    const StyledSpan state = item ? StateOf(*item) : StyledSpan{isOpen ? "" : "accepted", Style::Faint};
+    const StyledSpan state = item ? StateOf(*item) : StyledSpan{isOpen ? "" : "settled", Style::Faint};
     StyledLine row = {{isOpen ? letters.Shown(" • ") : "   ", Style::Warning}};
     Append(row, Row({name, isOpen ? Style::Plain : Style::Faint}, state,
                     columns - std::min(columns, std::size_t{3}), letters));

@@ -99,7 +99,9 @@ void Prompts::TellPlace() {
     if (const SettleDesk::Item* item = m_Walk.ItemOf(here))
         TellConflictHere(*item);
     else
-        Tell("Both sides added this scene, and it has the objects of both: v lists them, o takes it.");
+        Tell(m_Walk.SceneOf(here).Source().isBothAdded
+                 ? "Both sides added this scene, and it has the objects of both: v lists them, o takes it."
+                 : "Nothing in this scene is in conflict.");
     Tell(ProblemLines(m_Walk, m_Letters));
 }
 

@@ -104,9 +104,10 @@ void Screen::Answer(Request request, Key key) {
 void Screen::Confirm() {
     if (m_Walk.CountOpen() == 0) return AskToFinish();
     const Walk::Stop& here = m_Walk.Here();
-    if (!m_Walk.IsOpen(here) && m_Walk.ItemOf(here)->decided == m_Chosen)
+    const SettleDesk::Item* item = m_Walk.ItemOf(here);
+    if (!m_Walk.IsOpen(here) && (!item || item->decided == m_Chosen))
         m_Walk.GoToNextOpen();
-    else if (!here.item || m_Chosen)
+    else if (!item || m_Chosen)
         m_Walk.Take(m_Chosen.value_or(Side::Ours));
     else
         return m_Walk.Say(m_Letters.Shown("Choose a side with ← and → first, or press o, t or b"));

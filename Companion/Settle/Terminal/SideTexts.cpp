@@ -48,7 +48,6 @@ Ranges Joined(const Ranges& a, const Ranges& b) {
 /// The lines of a text whose marked parts stand out.
 SideText Marked(const std::string& text, const Ranges& marks, std::size_t columns) {
     SideText side;
-    bool hasDifference = false;
     auto mark = marks.begin();
     for (std::size_t begin = 0; begin <= text.size();) {
         const std::size_t end = std::min(text.find('\n', begin), text.size());
@@ -60,16 +59,37 @@ SideText Marked(const std::string& text, const Ranges& marks, std::size_t column
             line.push_back(
                 {text.substr(at, std::min(to, end) - at), isMarked ? Style::Difference : Style::Plain});
             at = std::min(to, end);
-            if (isMarked && !hasDifference) side.firstDifference = side.lines.size();
-            hasDifference = hasDifference || isMarked;
         }
         for (StyledLine& wrapped : Wrapped(line, columns)) side.lines.push_back(std::move(wrapped));
         begin = end + 1;
     }
+    const auto first = std::ranges::find_if(side.lines, [](const StyledLine& line) {
+        return std::ranges::any_of(line,
+                                   [](const StyledSpan& span) { return span.style == Style::Difference; });
+    });
+    if (first != side.lines.end())
+        side.firstDifference = static_cast<std::size_t>(first - side.lines.begin());
     return side;
 }
 
-/// The ids of the objects of one version that the other lacks.
+/// The parts of a side's text that others lack, of those that have any.
+Ranges MarksOf(const Conflict& conflict, Side side, const std::array<std::string, 3>& texts) {
+    Ranges marks;
+    const auto compare = [&](Side other) {
+        if (conflict.In(other))
+            marks = Joined(marks, PartsNotIn(texts[static_cast<std::size_t>(side)],
+                                             texts[static_cast<std::size_t>(other)]));
+    };
+    if (side == Side::Base) {
+        compare(Side::Ours);
+        compare(Side::Theirs);
+    } else {
+        compare(conflict.In(Side::Base) ? Side::Base : side == Side::Ours ? Side::Theirs : Side::Ours);
+    }
+    return marks;
+}
+
+/// The names of the objects of one version that the other lacks.
 std::vector<std::string> ObjectsNotIn(const ObjectNames& names, const ObjectNames& other) {
     std::vector<std::string> objects;
     for (const auto& [id, object] : names.Places().Root())
@@ -86,19 +106,12 @@ std::array<SideText, 3> SideTextsOf(const Walk& walk, const Walk::Stop& stop, co
     for (const Side side : kSides)
         texts[static_cast<std::size_t>(side)] =
             TextOfValue(conflict, side, walk.SceneOf(stop).Names(), letters);
-    const auto& [base, ours, theirs] = texts;
-    const bool hasBase = conflict.In(Side::Base) != nullptr;
-    const std::array<Ranges, 3> marks = {Joined(PartsNotIn(base, ours), PartsNotIn(base, theirs)),
-                                         PartsNotIn(ours, hasBase ? base : theirs),
-                                         PartsNotIn(theirs, hasBase ? base : ours)};
     std::array<SideText, 3> sides;
     for (const Side side : kSides) {
         const auto at = static_cast<std::size_t>(side);
-        if (conflict.In(side)) sides[at] = Marked(texts[at], marks[at], columns);
-        if (conflict.In(side) && !conflict.property.empty()) continue;
-        const auto what = Wrapped({{letters.Shown(conflict.WordsOf(side)), Style::Strong}}, columns);
-        sides[at].lines.insert(sides[at].lines.begin(), what.begin(), what.end());
-        sides[at].firstDifference = 0;
+        if (conflict.In(side)) sides[at] = Marked(texts[at], MarksOf(conflict, side, texts), columns);
+        if (!conflict.In(side) || conflict.property.empty())
+            sides[at].what = {{letters.Shown(conflict.WordsOf(side)), Style::Strong}};
     }
     return sides;
 }
@@ -107,14 +120,14 @@ std::array<SideText, 3> AddedObjectsOf(const Walk& walk, const Walk::Stop& stop,
                                        std::size_t columns) {
     const MergeNames& names = walk.SceneOf(stop).Names();
     std::array<SideText, 3> sides;
-    sides[0].lines = {{{"has no such scene", Style::Faint}}};
+    sides[0].what = {
+        {walk.SceneOf(stop).Source().isBothAdded ? "no such scene" : "what both began with", Style::Strong}};
     for (const Side side : {Side::Ours, Side::Theirs}) {
         const Side other = side == Side::Ours ? Side::Theirs : Side::Ours;
         std::vector<StyledLine>& lines = sides[static_cast<std::size_t>(side)].lines;
         const auto objects = ObjectsNotIn(names.In(VersionOf(side)), names.In(VersionOf(other)));
-        lines.push_back({{objects.empty() ? "has no object that the other side lacks"
-                                          : "has these objects, which the other side lacks:",
-                          Style::Faint}});
+        sides[static_cast<std::size_t>(side)].what = {
+            {std::to_string(objects.size()) + " objects of its own", Style::Strong}};
         for (const std::string& name : objects)
             for (StyledLine& wrapped : Wrapped({{letters.Shown(name)}}, columns))
                 lines.push_back(std::move(wrapped));

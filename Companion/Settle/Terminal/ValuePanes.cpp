@@ -4,7 +4,6 @@
 #include "Settle/Terminal/KeyTable.h"
 
 #include <algorithm>
-#include <numeric>
 
 namespace ovrin {
 
@@ -16,6 +15,10 @@ constexpr std::size_t kGap = 2;
 
 Style StyleOf(Side side) {
     return side == Side::Base ? Style::Base : side == Side::Ours ? Style::Ours : Style::Theirs;
+}
+
+bool DidSomething(const SideText& side) {
+    return !side.what.empty();
 }
 
 /// How many lines each gets: what it wants, or an equal share of what others leave.
@@ -33,13 +36,33 @@ std::array<std::size_t, 3> Shares(const std::array<SideText, 3>& sides, std::siz
     return shares;
 }
 
-/// "734813, theirs: Harbour/Lamp" behind the name.
-StyledLine HeadingOf(const Conflict& conflict, const Letters& letters) {
-    if (conflict.object.empty()) return {{kOrderOfFields, Style::Strong}};
-    StyledLine line = {{letters.Shown(conflict.object), Style::Strong}};
-    if (conflict.heading.starts_with(conflict.object))
-        line.push_back({letters.Shown(conflict.heading.substr(conflict.object.size())), Style::Faint});
+/// The name, and behind it the id and the names that other sides have.
+StyledLine HeadingOf(const Walk& walk, const Walk::Stop& stop, const Letters& letters) {
+    const std::string name = walk.ObjectOf(stop), &heading = walk.WordsOf(stop).heading;
+    StyledLine line = {{letters.Shown(name), Style::Strong}};
+    if (heading.starts_with(name)) line.push_back({letters.Shown(heading.substr(name.size())), Style::Faint});
     return line;
+}
+
+std::vector<StyledLine> ConflictHead(const Walk& walk, const Walk::Stop& stop, const Letters& letters) {
+    const Conflict& words = walk.WordsOf(stop);
+    const SettleDesk::Item& item = *walk.ItemOf(stop);
+    StyledLine what;
+    if (!words.property.empty()) what = {{letters.Shown(words.property), Style::Strong}, {": "}};
+    what.push_back({letters.Shown(WhatHappened(words.kind))});
+    std::vector<StyledLine> lines = {HeadingOf(walk, stop, letters), what};
+    if (!item.isOpen && !item.decided)
+        lines.push_back({{"settled by what was decided of another place", Style::Faint}});
+    if (item.isOpen && item.proposed)
+        lines.push_back({{letters.Shown("decided before: " + walk.NameOf(stop, *item.proposed) +
+                                        ", which Enter takes again")}});
+    return lines;
+}
+
+std::string WhyWithoutConflict(const Walk& walk, const Walk::Stop& stop) {
+    if (!walk.SceneOf(stop).Source().isBothAdded) return "Nothing in this scene is in conflict.";
+    return "Both sides added this scene, and it has the objects of both. What one side removed can't be told "
+           "from what the other added: look through it, and take it with Enter.";
 }
 
 } // namespace
@@ -64,23 +87,11 @@ std::vector<StyledLine> ValuePanes::HeadOf(const Walk& walk, const Walk::Stop& s
     const auto add = [&](const StyledLine& line) {
         for (StyledLine& wrapped : Wrapped(line, m_Columns)) lines.push_back(std::move(wrapped));
     };
-    const SettleDesk::Item* item = walk.ItemOf(stop);
-    if (item) {
-        const Conflict& words = walk.WordsOf(stop);
-        add(HeadingOf(words, m_Letters));
-        StyledLine what;
-        if (!words.property.empty()) what = {{m_Letters.Shown(words.property), Style::Strong}, {": "}};
-        what.push_back({m_Letters.Shown(WhatHappened(words.kind))});
-        add(what);
-        if (!item->isOpen && !item->decided)
-            add({{"settled by what was decided of another place", Style::Faint}});
-        if (item->isOpen && item->proposed)
-            add({{"decided before: " + walk.NameOf(stop, *item->proposed) + ", which Enter takes again"}});
-    } else {
+    if (stop.item)
+        for (const StyledLine& line : ConflictHead(walk, stop, m_Letters)) add(line);
+    else
         add({{m_Letters.Shown(walk.SceneOf(stop).Source().path), Style::Strong}});
-        add({{"Both sides added this scene, and it has the objects of both. What one side removed can't be "
-              "told from what the other added: look through it, and take it with Enter."}});
-    }
+    if (!stop.item) add({{WhyWithoutConflict(walk, stop)}});
     std::string sides = TellSides(walk.SceneOf(stop).Source().occasion);
     if (sides.ends_with('\n')) sides.pop_back();
     if (!sides.empty()) add({{m_Letters.Shown(sides), Style::Faint}});
@@ -98,12 +109,14 @@ StyledLine ValuePanes::TitleOf(Side side, std::size_t height, std::size_t from,
             std::to_string(from + 1) + "-" + std::to_string(from + height) + " of " + std::to_string(count);
     if (m_Taken == side) right += (right.empty() ? "" : "  ") + std::string("taken");
     if (chosen == side && m_Taken != side) right += (right.empty() ? "" : "  ") + std::string("Enter takes");
-    const StyledLine left = {{std::string(1, LetterOf(side)), Style::Key},
-                             {std::string(" ") + SideName(side), StyleOf(side)},
-                             {m_Labels[at].empty() ? "" : "  " + m_Labels[at], Style::Plain}};
     const std::size_t columns = m_IsSideBySide ? m_PaneColumns : m_Columns;
     const std::size_t taken = std::min(columns, right.empty() ? 0 : ColumnsOf(right) + 1);
-    StyledLine title = Fitted(left, columns - taken);
+    const StyledLine key = {{std::string(1, LetterOf(side)), Style::Key},
+                            {std::string(" ") + SideName(side), StyleOf(side)}};
+    const std::size_t rest = columns - std::min(columns, taken + ColumnsOf(key));
+    StyledLine title = key;
+    if (!m_Labels[at].empty()) title.push_back({BeginningWithin("  " + m_Labels[at], rest, m_Letters)});
+    title = Fitted(title, columns - taken);
     if (taken) title.push_back({" " + right, Style::Faint});
     if (chosen == side)
         for (StyledSpan& span : title) span.style = Style::Selected;
@@ -115,11 +128,14 @@ std::vector<StyledLine> ValuePanes::Pane(Side side, std::size_t height, std::siz
     const SideText& text = m_Sides[static_cast<std::size_t>(side)];
     const std::size_t from = std::min(scroll, text.lines.size() - std::min(height, text.lines.size()));
     std::vector<StyledLine> lines = {TitleOf(side, height, from, chosen)};
-    for (std::size_t at = from; at < std::min(from + height, text.lines.size()); ++at) {
-        StyledLine line = {{m_IsSideBySide ? "" : std::string(kGap, ' ')}};
-        Append(line, text.lines[at]);
-        lines.push_back(std::move(line));
-    }
+    const StyledLine margin = {{m_IsSideBySide ? "" : std::string(kGap, ' ')}};
+    const auto add = [&](const StyledLine& text) {
+        lines.push_back(margin);
+        Append(lines.back(), text);
+    };
+    if (!text.what.empty())
+        add({{BeginningWithin(TextOf(text.what), m_PaneColumns, m_Letters), text.what.front().style}});
+    for (std::size_t at = from; at < std::min(from + height, text.lines.size()); ++at) add(text.lines[at]);
     return lines;
 }
 
@@ -142,8 +158,9 @@ std::size_t ValuePanes::Settle(Scroll& scroll, const std::array<std::size_t, 3>&
 }
 
 std::vector<StyledLine> ValuePanes::Stacked(std::size_t rows, Scroll& scroll, std::optional<Side> chosen) {
-    const std::size_t ruled = std::min<std::size_t>(rows, 5); // three titles, two blank lines
-    const auto heights = Shares(m_Sides, rows - ruled);
+    // Three titles and two blank lines.
+    const std::size_t ruled = 5 + static_cast<std::size_t>(std::ranges::count_if(m_Sides, DidSomething));
+    const auto heights = Shares(m_Sides, rows - std::min(rows, ruled));
     const std::size_t from = Settle(scroll, heights);
     if (!scroll && from > 0) scroll = from;
     std::vector<StyledLine> lines;
@@ -156,7 +173,8 @@ std::vector<StyledLine> ValuePanes::Stacked(std::size_t rows, Scroll& scroll, st
 }
 
 std::vector<StyledLine> ValuePanes::SideBySide(std::size_t rows, Scroll& scroll, std::optional<Side> chosen) {
-    const std::size_t height = rows - std::min<std::size_t>(rows, 1);
+    const std::size_t ruled = std::ranges::any_of(m_Sides, DidSomething) ? 2 : 1;
+    const std::size_t height = rows - std::min(rows, ruled);
     const std::size_t from = Settle(scroll, {height, height, height});
     if (!scroll && from > 0) scroll = from;
     std::vector<StyledLine> lines(rows);

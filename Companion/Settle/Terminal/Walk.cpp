@@ -150,6 +150,7 @@ void Walk::TellStep(const std::string& what, const SettleDesk::Step& step) {
 }
 
 void Walk::Take(Side side) {
+    if (!Here().item && !IsOpen(Here())) return Say("There is nothing to decide in this scene");
     const std::string what = NameOf(Here()) + ": " + NameOf(Here(), side);
     SettleDesk::Step step;
     const Stop here = Here();

@@ -22,7 +22,7 @@ public:
     explicit Walk(SettleDesk& desk);
 
     const SettleDesk& Desk() const { return m_Desk; }
-    /// What is to be looked at: a conflict, or a scene that both sides added and that has none.
+    /// What is to be looked at: a conflict, or a scene without any, which both sides may have added.
     struct Stop {
         std::size_t scene;
         std::optional<std::size_t> item; ///< among the desk's
