@@ -120,7 +120,7 @@ class Git(System):
 
     def merge_with_tool(self, fails=False):
         self.merge(fails=True)
-        self.mergetool("ovrin", fails)
+        self.mergetool("ovrin-external", fails)
 
     def mergetool(self, tool, fails):
         before = self.read()

@@ -302,7 +302,7 @@ def test_full_disk_loses_nothing(user):
 def test_merge_tool_settles_what_it_is_shown(user):
     user.use_tool('cp "$1" shown; cp "$3" "$4"')
     user.conflict(*CONFLICT_AND_MORE)
-    user.git("mergetool", "--no-prompt", "--tool", "ovrin")
+    user.git("mergetool", "--no-prompt", "--tool", "ovrin-external")
     assert user.read("shown") == scene("1 Lamp 3")
     assert user.read() == scene("5 Lamp 3") and user.records() == []
     user.git("commit", "-qm", "merged")
@@ -315,7 +315,7 @@ def test_merge_tool_that_fails_leaves_the_conflict(user, script):
     before = user.read()
     scratch = user.home / "scratch"
     scratch.mkdir()
-    user.git("mergetool", "--no-prompt", "--tool", "ovrin", fails=True, TMPDIR=str(scratch))
+    user.git("mergetool", "--no-prompt", "--tool", "ovrin-external", fails=True, TMPDIR=str(scratch))
     assert user.read() == before and user.records() == [".merge"]
     assert not any(scratch.iterdir())
 

@@ -8,6 +8,7 @@
 #include "Settle/SceneWords.h"
 #include "Settle/SettleScenes.h"
 #include "Settle/Steps.h"
+#include "Settle/Terminal/SettleInTerminal.h"
 #include "Settle/Wanted.h"
 #include "Systems/WorkingPath.h"
 #include "Words/Failure.h"
@@ -32,9 +33,11 @@ struct SettleOptions {
     std::vector<std::string> set;
     std::string take, under, decisionFile;
     bool isList = false, asJson = false, isUndo = false, isAsIs = false, isForget = false;
-    bool overwrites = false, withTool = false;
+    bool overwrites = false, withTool = false, withPrompts = false;
     bool inBrowser = false, isBrowserLeft = false;
     int port = 0;
+
+    bool Decides() const { return !set.empty() || !decisionFile.empty() || !take.empty() || isUndo; }
 };
 
 void Tell(const Remarks& remarks) {
@@ -121,23 +124,38 @@ bool TellOpen(const SettleScenes& scenes, bool wasDecided) {
     return isAnyOpen;
 }
 
+void TellFinished(const SettleScenes& scenes, const std::vector<std::string>& finished,
+                  const Remarks& refused) {
+    for (const std::string& path : finished) std::cerr << Printable(path) << " is settled.\n";
+    Tell(refused);
+    if (!finished.empty()) TellNext(scenes, scenes.Sessions().front()->Source().occasion.action);
+}
+
 Outcome Settle(SettleScenes& scenes, const SettleOptions& options, bool isAnyUnreadable) {
     if (isAnyUnreadable && scenes.Sessions().empty()) return Outcome::LeftOpen;
     Decide(scenes, options);
-    const bool wasDecided =
-        !options.set.empty() || !options.decisionFile.empty() || !options.take.empty() || options.isUndo;
-    if (wasDecided)
+    if (options.Decides())
         for (const auto& session : scenes.Sessions()) scenes.Keep(*session);
-    const bool isAnyOpen = TellOpen(scenes, wasDecided);
+    const bool isAnyOpen = TellOpen(scenes, options.Decides());
     Remarks refused;
     const std::vector<std::string> finished = scenes.Finish(options.overwrites, refused);
-    for (const std::string& path : finished) std::cerr << Printable(path) << " is settled.\n";
-    Tell(refused);
+    TellFinished(scenes, finished, refused);
     if (finished.empty() && !isAnyOpen && refused.empty() && !isAnyUnreadable)
         std::cerr << "No scene has open conflicts.\n";
-    if (!finished.empty()) TellNext(scenes, scenes.Sessions().front()->Source().occasion.action);
     const bool isAllFinished = finished.size() == scenes.Sessions().size();
     return isAnyUnreadable || !isAllFinished ? Outcome::LeftOpen : Outcome::Done;
+}
+
+/// Lets a person do it, as far as that person likes.
+Outcome LetPersonSettle(SettleScenes& scenes, const SettleOptions& options, bool isAnyUnreadable) {
+    SettleDesk desk(scenes);
+    const TerminalEnd end = SettleInTerminal(desk, options.withPrompts);
+    TellFinished(scenes, end.finished, end.refused);
+    const std::size_t left = scenes.Sessions().size() - end.finished.size();
+    if (left > 0 && end.refused.empty())
+        std::cerr << (desk.IsSettled() ? "All is settled, and " : CountOpen(desk.CountOpen()) + " left, and ")
+                  << "what you decided is kept: \"ovrin settle\" goes on.\n";
+    return left > 0 || isAnyUnreadable ? Outcome::LeftOpen : Outcome::Done;
 }
 
 /// Takes files as they stand, or forgets that they had conflicts.
@@ -176,6 +194,9 @@ Outcome RunSettle(const SettleOptions& options) {
     Tell(unreadable);
     if (options.isList) return List(scenes, options.asJson);
     if (options.inBrowser) return SettleInBrowser(scenes, {options.port, !options.isBrowserLeft}, unreadable);
+    const bool isForPerson =
+        options.withPrompts || (IsPersonThere() && !options.Decides() && !options.overwrites);
+    if (isForPerson && !scenes.Sessions().empty()) return LetPersonSettle(scenes, options, isAnyUnreadable);
     return Settle(scenes, options, isAnyUnreadable);
 }
 
@@ -230,8 +251,12 @@ Action DescribeSettle(CLI::App& command) {
         ->excludes(asIs);
     command.add_flag("--overwrite", options->overwrites,
                      "put the settled scene in the place of a file that was changed by hand");
-    command.add_flag("--with-tool", options->withTool,
-                     "let the external merge tool settle BASE OURS THEIRS RESULT, as git mergetool calls it");
+    command.add_flag("--prompt", options->withPrompts,
+                     "ask line by line instead of on a screen, also where there is no terminal");
+    command.add_flag(
+        "--with-tool", options->withTool,
+        "let the external merge tool settle BASE OURS THEIRS RESULT, as git mergetool calls it for "
+        "ovrin-external");
     DescribeBrowser(command, *options);
     command.add_option("FILE", options->files, "only these scenes, or those in these folders");
     return [options] { return RunSettle(*options); };

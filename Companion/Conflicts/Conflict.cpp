@@ -3,6 +3,7 @@
 #include "Conflicts/DecisionPath.h"
 #include "Conflicts/Requirements.h"
 #include "Names/PrintableText.h"
+#include "Names/ReferenceText.h"
 #include "Names/ValueText.h"
 
 #include "Diff/YAMLMappingDiff.h"
@@ -21,10 +22,6 @@ using nlohmann::json;
 namespace {
 
 constexpr Side kSides[] = {Side::Base, Side::Ours, Side::Theirs};
-
-Version VersionOf(Side side) {
-    return side == Side::Base ? Version::Base : side == Side::Ours ? Version::Ours : Version::Theirs;
-}
 
 struct KindWords {
     const char* code;
@@ -76,6 +73,10 @@ json ToJson(const YAMLNode* value) {
 
 } // namespace
 
+Version VersionOf(Side side) {
+    return side == Side::Base ? Version::Base : side == Side::Ours ? Version::Ours : Version::Theirs;
+}
+
 const char* WhatHappened(ConflictKind kind) {
     return kKindWords[static_cast<std::size_t>(kind)].text;
 }
@@ -109,18 +110,22 @@ Conflict ConflictWords::Describe(const OpenConflict& open) const {
     for (const Side side : kSides) {
         const auto at = static_cast<std::size_t>(side);
         conflict.values[at] = place.In(VersionOf(side));
-        conflict.words[at] = ValueWords(open, conflict, side);
+        conflict.words[at] = ValueWords(open, conflict, place, side);
         conflict.choices[at] = ChoiceWords(open, conflict, side);
     }
     return conflict;
 }
 
-std::string ConflictWords::ValueWords(const OpenConflict& open, const Conflict& conflict, Side side) const {
+std::string ConflictWords::ValueWords(const OpenConflict& open, const Conflict& conflict,
+                                      const RecordPlace& place, Side side) const {
     const YAMLNode* value = conflict.In(side);
     if (open.path.size() < 3) {
         if (side == Side::Base) return value ? "there" : "none";
         return ObjectWords(ChangeOn(open.record, side), value);
     }
+    // An id alone says nothing to a person.
+    const YAMLNode* holder = place.holders[static_cast<std::size_t>(VersionOf(side))];
+    if (value && open.path.back() == YAMLScalar::fileID && IsReference(*holder)) value = holder;
     if (value) return ValueLine(*value, m_Names.In(VersionOf(side)), m_Width);
     return side != Side::Base && conflict.In(Side::Base) ? "removed" : "none";
 }

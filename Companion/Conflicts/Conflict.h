@@ -13,6 +13,9 @@
 
 namespace ovrin {
 
+/// The version of the scene that the side has.
+Version VersionOf(Side side);
+
 /// An open conflict for a person.
 struct Conflict {
     std::string path;     ///< as decisions name it: "734813.MonoBehaviour.m_Brightness"
@@ -60,7 +63,8 @@ public:
     std::vector<Conflict> DescribeOpen(std::size_t most = 0) const;
 
 private:
-    std::string ValueWords(const OpenConflict& open, const Conflict& conflict, Side side) const;
+    std::string ValueWords(const OpenConflict& open, const Conflict& conflict, const RecordPlace& place,
+                           Side side) const;
     std::string ChoiceWords(const OpenConflict& open, const Conflict& conflict, Side side) const;
     std::string RequirementChoice(const OpenConflict& open, Side side) const;
 

@@ -107,7 +107,7 @@ bool RecordPlaces::IsClass(const Search& search, std::size_t at) const {
 
 RecordPlaces::Step RecordPlaces::IntoMapping(const Search& search, std::size_t at, const Step& step) const {
     const YAMLScalar* key = search.path[at];
-    Step next{{step.place.property, {}},
+    Step next{{step.place.property, {}, step.place.values},
               ChangeOfKey(step.theirs, key),
               ChangeOfKey(step.ours, key),
               step.IsAddedInside()};
@@ -120,7 +120,7 @@ RecordPlaces::Step RecordPlaces::IntoMapping(const Search& search, std::size_t a
 RecordPlaces::Step RecordPlaces::IntoList(const Search& search, std::size_t at, const Step& step,
                                           const ListNumbering::Indexes& indexes) const {
     const auto& lists = step.place.values;
-    Step next{{step.place.property, {}},
+    Step next{{step.place.property, {}, lists},
               ChangeOfItem(step.theirs, indexes.theirs),
               ChangeOfItem(step.ours, indexes.ours),
               step.IsAddedInside()};

@@ -21,6 +21,8 @@ struct RecordPlace {
     std::string property;
     /// The value at the place in each version, in the order of Version; null where a version has none.
     std::array<const ovrin_yaml::YAMLNode*, 3> values = {};
+    /// The mapping or list that the value is an entry of; null where there is none.
+    std::array<const ovrin_yaml::YAMLNode*, 3> holders = {};
 
     const ovrin_yaml::YAMLNode* In(Version version) const {
         return values[static_cast<std::size_t>(version)];

@@ -119,6 +119,11 @@ SettleDesk::Step SettleDesk::TakeAll(Side side) {
     });
 }
 
+SettleDesk::Step SettleDesk::Accept(std::size_t scene) {
+    return MakeStep(
+        [&] { return Scenes()[scene]->TakeAll(Side::Ours, [](const OpenConflict&) { return true; }); });
+}
+
 SettleDesk::Step SettleDesk::TakeProposed() {
     return MakeStep([&] {
         std::size_t asked = 0;

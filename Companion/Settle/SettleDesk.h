@@ -71,6 +71,8 @@ public:
     Step TakeUnder(std::size_t item, Side side);
     /// Takes a side for all open conflicts of all scenes.
     Step TakeAll(Side side);
+    /// Takes a scene as it is that both sides added, and in which nothing is open: it was looked through.
+    Step Accept(std::size_t scene);
     /// Takes what is proposed wherever something is.
     Step TakeProposed();
     Step Mend(const SettleProblem& problem, const SettleProblem::Remedy& remedy);

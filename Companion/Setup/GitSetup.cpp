@@ -20,7 +20,8 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr std::string_view kPatterns[] = {"*.ovrin", "*.prefab", "*.meta"};
-constexpr const char* kNames[] = {"merge.ovrin.", "diff.ovrin.", "difftool.ovrin.", "mergetool.ovrin."};
+constexpr const char* kNames[] = {"merge.ovrin.", "diff.ovrin.", "difftool.ovrin.", "mergetool.ovrin.",
+                                  "mergetool.ovrin-external."};
 
 /// A value as a configuration of git holds it.
 std::string ConfigValue(const std::string& value) {
@@ -53,9 +54,10 @@ std::string ConfigLines(const ProgramCall& program) {
                                             " -- %O %A %B %A %P") +
            line("recursive", "binary") + "[diff \"ovrin\"]\n" +
            line("command", call + " diff --external --") + "[difftool \"ovrin\"]\n" +
-           line("cmd", call + " diff -- \"$LOCAL\" \"$REMOTE\"") + "[mergetool \"ovrin\"]\n" +
+           line("cmd", call + " diff -- \"$LOCAL\" \"$REMOTE\"") + "[mergetool \"ovrin-external\"]\n" +
            line("cmd", call + " settle --with-tool -- \"$BASE\" \"$LOCAL\" \"$REMOTE\" \"$MERGED\"") +
-           line("trustExitCode", "true");
+           line("trustExitCode", "true") + "[mergetool \"ovrin\"]\n" +
+           line("cmd", call + " settle -- \"$MERGED\"") + line("trustExitCode", "true");
 }
 
 struct GuardHook {

@@ -1,0 +1,262 @@
+"""Settles the conflicts of real merges in a real terminal, whose screens are compared as text.
+
+    pytest-3 VersionControl/test_terminal.py --installed build/release/installed
+"""
+
+import os
+import shlex
+import shutil
+import signal
+import subprocess
+import time
+
+import pytest
+
+from test_settle import MANY
+from test_systems import CONFLICT_AND_MORE, HEADER, ONE_CONFLICT, game_object, scene
+
+pytestmark = pytest.mark.skipif(not shutil.which("tmux"), reason="tmux is not installed")
+
+SECONDS = 30
+# A name of wide characters and a combining mark, as files have it, and what a lantern's keeper would do to a terminal.
+ODD = [HEADER + game_object(1, layer, r'"\u706F\u53F0 n\u0308 \x1B]0;gone\x07"', 1) for layer in (1, 2, 5)]
+
+
+class Terminal:
+    """A terminal of its own in which the user's shell runs."""
+
+    def __init__(self, user, socket, **environment):
+        self.user = user
+        self.socket = socket
+        settings = user.environment | {"PS1": "$ ", "TERM": "xterm-256color"} | environment
+        self.tmux("-f", "/dev/null", "new-session", "-d", "-x", "80", "-y", "24", "-c", str(user.here),
+                  # The server brings a TERM and variables of its own.
+                  shlex.join(["env", "-i", *(f"{name}={value}" for name, value in settings.items()), "sh"]))
+        self.see("$")
+
+    def tmux(self, *arguments):
+        return subprocess.run(["tmux", "-u", "-S", self.socket, *arguments], env=self.user.environment, check=True,
+                              stdout=subprocess.PIPE, text=True).stdout
+
+    def screen(self, *options):
+        return self.tmux("capture-pane", "-p", *options)
+
+    def see(self, *words):
+        """Waits until all of these are on the screen, and returns it."""
+        until = time.monotonic() + SECONDS
+        while not all(word in (screen := self.screen()) for word in words):
+            assert time.monotonic() < until, f"{words} aren't in\n{screen}"
+            time.sleep(0.02)
+        return screen
+
+    def press(self, *keys):
+        self.tmux("send-keys", *keys)
+
+    def run(self, command):
+        self.tmux("send-keys", "-l", f"clear; {command}; echo status $?")
+        self.press("C-j")  # what was killed may leave a terminal that knows no Enter
+
+    def close(self):
+        self.tmux("kill-server")
+
+
+@pytest.fixture(name="terminal")
+def fixture_terminal(user):
+    opened = []
+
+    def make(**environment):
+        opened.append(Terminal(user, f"{user.home}/terminal{len(opened)}", **environment))
+        return opened[-1]
+
+    yield make
+    for one in opened:
+        one.close()
+
+
+def scenes(user, names, versions):
+    """A merge in which each of these files has the same three versions."""
+    user.start()
+    for branch, text in zip(("main", "topic", "main"), versions):
+        user.git("checkout", "-q", *(("-b", branch) if branch == "topic" else (branch,)))
+        for name in names:
+            user.write(text, name)
+        user.git("add", ".")
+        user.git("commit", "-qm", "change")
+    user.git("merge", "topic", fails=True)
+
+
+def test_walk_ends_with_what_the_script_gives(user, terminal):
+    user.conflict(*CONFLICT_AND_MORE)
+    screen = terminal()
+    screen.run("ovrin settle")
+    shown = screen.see("1 of 1 open · scene.ovrin", "merge: ours is main, theirs is topic", "f Finish")
+    assert "m_Layer: both changed it" in shown and "o ours  main" in shown
+    screen.press("t")
+    screen.see("0 of 1 open", "theirs (topic)", "All is settled: f")
+    screen.press("f")
+    screen.see("scene.ovrin is settled.", "Next: git commit", "status 0")
+    assert user.records() == []
+    user.git("commit", "-qm", "merged")
+    assert user.committed() == scene("2 Lamp 3")
+
+
+def test_fifty_conflicts_of_three_scenes_take_two_keys(user, terminal):
+    parts = [[HEADER + "".join(text.split("--- ")[i] and "--- " + text.split("--- ")[i] for i in part)
+              for text in MANY] for part in (range(1, 18), range(18, 35), range(35, 51))]
+    user.start()
+    for index, branch in enumerate(("main", "topic", "main")):
+        user.git("checkout", "-q", *(("-b", branch) if branch == "topic" else (branch,)))
+        for name, versions in zip("abc", parts):
+            user.write(versions[index], f"{name}.ovrin")
+        user.git("add", ".")
+        user.git("commit", "-qm", "change")
+    user.git("merge", "topic", fails=True)
+    screen = terminal()
+    screen.run("ovrin settle")
+    screen.see("50 of 50 open · a.ovrin")
+    screen.press("T")
+    screen.see("0 of 50 open", "50 conflicts settled")
+    screen.press("f")
+    screen.see("c.ovrin is settled.", "status 0")
+    user.git("commit", "-qm", "merged")
+    assert [user.committed(f"{name}.ovrin") for name in "abc"] == [versions[1] for versions in parts]
+
+
+@pytest.mark.parametrize("number", [signal.SIGKILL, signal.SIGTERM, signal.SIGHUP, None])
+def test_what_was_decided_outlives_the_program(user, terminal, number):
+    scenes(user, ["a.ovrin", "b.ovrin"], ONE_CONFLICT)
+    screen = terminal()
+    screen.run("sh -c 'echo $$ >process; exec ovrin settle'")
+    screen.see("2 of 2 open")
+    screen.press("t")
+    screen.see("1 of 2 open · b.ovrin")
+    if number:
+        os.kill(int(user.read("process")), number)
+    else:
+        screen.press("C-c")
+    if number != signal.SIGKILL:
+        assert "n Next" not in screen.see("what you decided is kept", "$")
+    screen.run("stty sane; ovrin settle")
+    screen.see("1 of 2 open · b.ovrin")
+    screen.press("u")
+    screen.see("2 of 2 open · a.ovrin")
+    screen.press("q")
+    screen.see("2 open conflicts left", "status 1")
+    assert user.read("a.ovrin") == ONE_CONFLICT[2]
+
+
+def test_terminal_is_left_as_it_was(user, terminal):
+    user.conflict(*ONE_CONFLICT)
+    screen = terminal()
+    screen.run("stty -a >before")
+    for end in ("q", "C-c"):
+        screen.run("ovrin settle")
+        screen.see("1 of 1 open")
+        screen.press(end)
+        screen.see("ovrin settle\" goes on")
+        screen.run("stty -a >after; cmp before after && echo alike")
+        assert "1 of 1 open" not in screen.see("alike")
+
+
+def test_screen_follows_the_size_of_its_window(user, terminal):
+    user.conflict(*ONE_CONFLICT)
+    screen = terminal()
+    screen.run("ovrin settle")
+    screen.see("1 of 1 open")
+    screen.tmux("resize-window", "-x", "160", "-y", "50")
+    wide = screen.see("b base", "As before  1-9 Mend  u Undo").splitlines()
+    assert any("b base" in line and "o ours" in line and "t theirs" in line for line in wide)
+    screen.tmux("resize-window", "-x", "60", "-y", "20")
+    screen.see("This window has 60 x 20 characters")
+    screen.tmux("resize-window", "-x", "80", "-y", "24")
+    screen.see("1 of 1 open", "f Finish")
+
+
+@pytest.mark.parametrize("locale", ["C.UTF-8", "C", "de_XX.UTF-8"])
+def test_locale_says_which_characters_are_shown(user, terminal, locale):
+    user.conflict(*ODD)
+    screen = terminal(LC_ALL=locale)
+    screen.run("ovrin settle")
+    shown = screen.see("1 of 1 open", "]0;gone")
+    assert r"\x1b]0;gone\x07" in shown
+    if locale == "C":
+        assert r"\u706f\u53f0 n\u0308" in shown and shown.isascii()
+    else:
+        assert "灯台 n\u0308" in shown and "│" in shown
+
+
+def test_colours_are_left_out_on_request(user, terminal):
+    user.conflict(*ONE_CONFLICT)
+    colours = []
+    for setting in ("", "1"):
+        screen = terminal(NO_COLOR=setting)
+        screen.run("ovrin settle")
+        screen.see("1 of 1 open")
+        colours.append("\x1b[3" in screen.screen("-e").replace("\x1b[39m", ""))
+    assert colours == [True, False]
+
+
+@pytest.mark.parametrize("name", ["dumb", "unheard-of", ""])
+def test_terminal_without_a_screen_is_asked_by_prompts(user, terminal, name):
+    user.conflict(*CONFLICT_AND_MORE)
+    screen = terminal(TERM=name)
+    screen.run("ovrin settle")
+    screen.see("1 of 1 open · scene.ovrin", "    theirs  2    topic", "o ours, t theirs, b base")
+    screen.press("t", "Enter")
+    screen.see("0 of 1 open")
+    screen.press("f", "Enter")
+    screen.see("scene.ovrin is settled.", "status 0")
+    assert user.read() == scene("2 Lamp 3")
+
+
+def test_prompts_take_their_answers_from_a_pipe(user):
+    user.conflict(*CONFLICT_AND_MORE)
+    told = user.run("sh", "-c", "printf 'b\n' | ovrin settle --prompt", fails=True)
+    assert "1 of 1 open" in told and "0 of 1 open" in told
+    assert "settled, base" in user.ovrin("settle", "--list")
+    user.run("sh", "-c", "printf 'u\nt\nf\n' | ovrin settle --prompt")
+    assert user.read() == scene("2 Lamp 3")
+
+
+def test_file_that_was_changed_by_hand_is_asked_about(user, terminal):
+    user.conflict(*ONE_CONFLICT)
+    user.write(scene("7 Lantern 1"))
+    screen = terminal()
+    screen.run("ovrin settle")
+    screen.see("1 of 1 open")
+    screen.press("t", "f")
+    screen.see("was changed by hand", "y yes")
+    screen.press("y")
+    screen.see("scene.ovrin is settled.", "status 0")
+    assert user.read() == ONE_CONFLICT[1]
+
+
+def test_mergetool_of_git_settles_one_scene_after_the_other(user, terminal):
+    scenes(user, ["a.ovrin", "b.ovrin"], ONE_CONFLICT)
+    screen = terminal()
+    screen.run("git mergetool --no-prompt --tool ovrin")
+    screen.see("1 of 1 open · a.ovrin")
+    screen.press("t", "f")
+    screen.see("1 of 1 open · b.ovrin")
+    screen.press("q")
+    screen.see("merge of b.ovrin failed")
+    screen.press("n", "Enter")
+    screen.see("status 1")
+    assert user.read("b.ovrin") == ONE_CONFLICT[2]
+    assert user.git("ls-files", "--unmerged", "a.ovrin") == ""
+    user.ovrin("settle", "--take", "base")
+    user.git("commit", "-qm", "merged")
+    assert user.committed("a.ovrin") == ONE_CONFLICT[1]
+
+
+def test_scene_that_both_added_is_looked_through(user, terminal):
+    user.conflict(None, scene("1 Lantern 1"), HEADER + game_object(20, 7, "Boat", 1))
+    screen = terminal()
+    screen.run("ovrin settle")
+    screen.see("1 of 1 open", "Both sides added this scene", "  Lantern", "  Boat")
+    screen.press("Enter")
+    screen.see("0 of 1 open")
+    screen.press("Enter")
+    screen.see("scene.ovrin is settled.", "status 0")
+    user.git("commit", "-qm", "merged")
+    assert "Lantern" in user.committed() and "Boat" in user.committed()
