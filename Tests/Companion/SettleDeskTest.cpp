@@ -158,7 +158,7 @@ TEST_F(SettleDeskTest, ObjectThatIsKeptAloneIsAProblem) {
     Merge(texts);
     EXPECT_TRUE(Open().Problems().empty()); // the conflict tells it
     desk->Scenes()[0]->Decide({{"12", Side::Ours}}, SettleSession::Follow::No);
-    desk->Scenes()[0]->Keep(*std::make_unique<OpenMerges>(scenes->Where()));
+    scenes->Keep(*desk->Scenes()[0]);
     ASSERT_EQ(Open().Problems().size(), 1);
     EXPECT_EQ(desk->Problems()[0].text,
               "Harbour/Lantern · MonoBehaviour stays, and Harbour/Lantern, which it "
@@ -170,6 +170,52 @@ TEST_F(SettleDeskTest, ObjectThatIsKeptAloneIsAProblem) {
     desk->Undo();
     desk->Mend(desk->Problems()[0], desk->Problems()[0].remedies[1]);
     EXPECT_EQ(Result(), texts.theirs);
+}
+
+/// A car with these of the components Engine, 500, and Wheel, 501, which needs an engine.
+std::string Car(const std::vector<int>& classes) {
+    std::string list, components;
+    for (const int id : classes) {
+        list += "\n  - component: {fileID: " + std::to_string(id) + "}";
+        components += "--- !o!" + std::to_string(id) + " &" + std::to_string(id) + '\n' +
+                      (id == 500 ? "Engine" : "Wheel") + ":\n  m_GameObject: {fileID: 10}\n";
+    }
+    return kHeader + "--- !o!1 &10\nGameObject:\n  m_Component:" + (list.empty() ? " []" : list) +
+           "\n  m_Name: Car\n" + components;
+}
+
+// Theirs removes the engine, and ours adds a wheel.
+TEST_F(SettleDeskTest, RequirementIsSettledByKeepingOrRemovingBoth) {
+    std::ofstream("types")
+        << kHeader
+        << "--- !o!1 &1\nMergeTypeInfo:\n"
+           "- {id: 500, name: Engine, ismulti: 0, baseid: 2, requires: '', conflicts: ''}\n"
+           "- {id: 501, name: Wheel, ismulti: 0, baseid: 2, requires: f4010000, "
+           "conflicts: ''}\n";
+    setenv("OVRIN_TYPE_INFO", "types", 1);
+    Merge({Car({500}), Car({500, 501}), Car({})});
+    Open();
+    unsetenv("OVRIN_TYPE_INFO");
+    ASSERT_EQ(desk->CountOpen(), 1) << (remarks.empty() ? "" : remarks[0]);
+    EXPECT_EQ(desk->Items()[0].about->kind, ConflictKind::BrokenRequirement);
+    EXPECT_EQ(desk->Describe(desk->Items()[0]).choices,
+              (std::array<std::string, 3>{"keep Car · Engine", "keep Car · Engine",
+                                          "remove Car · Engine and what needs it"}));
+    desk->Take(0, Side::Ours);
+    EXPECT_EQ(Result(), Car({500, 501}));
+    desk->Take(0, Side::Theirs);
+    EXPECT_EQ(Result(), Car({}));
+    EXPECT_TRUE(desk->IsSettled() && desk->Problems().empty());
+    EXPECT_TRUE(desk->Undo() && desk->Undo());
+    desk->Scenes()[0]->Decide({{"500", Side::Theirs}}, SettleSession::Follow::No);
+    scenes->Keep(*desk->Scenes()[0]);
+    ASSERT_EQ(Open().Problems().size(), 1);
+    EXPECT_EQ(desk->Problems()[0].text, "Car · Engine was removed by theirs, and Car · Wheel needs it");
+    for (const std::size_t remedy : {0, 1}) {
+        desk->Mend(desk->Problems()[0], desk->Problems()[0].remedies.at(remedy));
+        EXPECT_TRUE(desk->Problems().empty());
+        desk->Undo();
+    }
 }
 
 // The engine looks for loops only where both sides changed a Transform.
