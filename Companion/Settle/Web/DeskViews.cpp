@@ -26,6 +26,13 @@ std::vector<ConflictMark> MarksOf(const SettleDesk& desk, std::size_t scene) {
     return marks;
 }
 
+/// The answer to a request about an object, both as a process hands them on.
+SceneProcess::Texts AnswerInTexts(SceneView& view, const SceneProcess::Texts& asked) {
+    const PageRequest request{"GET", asked.at(0), {{"id", asked.at(1)}, {"all", asked.at(2)}}, ""};
+    const PageAnswer answer = AnswerView(view, request).value();
+    return {std::to_string(answer.status), answer.type, answer.body};
+}
+
 } // namespace
 
 SceneView& DeskViews::View(std::size_t scene) {
@@ -52,10 +59,12 @@ PageAnswer DeskViews::AnswerMerged(std::size_t scene, const PageRequest& request
         process = std::make_unique<SceneProcess>([&] {
             SettleSession& session = *m_Desk.Scenes()[scene];
             MergeHere(session.Merge(), session.Decisions(), session.Source().take);
-            return [&view](const PageRequest& asked) { return AnswerView(view, asked).value(); };
+            return [&view](const SceneProcess::Texts& asked) { return AnswerInTexts(view, asked); };
         });
     try {
-        return process->Ask(request);
+        const SceneProcess::Texts answer =
+            process->Ask({request.path, QueryText(request, "id"), QueryText(request, "all")});
+        return {std::stoi(answer.at(0)), answer.at(1), answer.at(2)};
     } catch (const Failure&) {
         process.reset();
         throw;

@@ -18,7 +18,6 @@ export function makeCard(page, steps, row, follow) {
         make("h2", { id: "card-title" },
             make("span", { class: "above" }, name.above ? `${name.above} / ` : ""), name.own,
             make("span", { class: "property" }, item.property ? ` · ${item.property}` : "")),
-        name.others ? make("p", { class: "aside" }, name.others) : null,
         make("p", { class: "what" }, stateWords(item)),
         make("div", { class: "columns" }, ...SIDES.map((side) => makeColumn(page, steps, side, row, follow))),
         makeResult(item, row, follow),
@@ -27,8 +26,8 @@ export function makeCard(page, steps, row, follow) {
 
 function stateWords(item) {
     const what = `${capital(item.what)}.`;
-    if (!item.isOpen) return `${what} ${item.decided ? `You took ${item.decided}.` : "Another decision settled it, too."}`;
-    return item.proposed ? `${what} Open; the same was decided before: ${item.proposed}.` : `${what} Open.`;
+    if (!item.isOpen) return `${what} ${item.decided ? `You took ${item.decided}.` : "Another decision settled it."}`;
+    return item.proposed ? `${what} Open; it was decided before: ${item.proposed}.` : `${what} Open.`;
 }
 
 function makeColumn(page, steps, side, row, follow) {
@@ -47,7 +46,7 @@ function makeColumn(page, steps, side, row, follow) {
 function makeChoice(page, steps, side, isTaken) {
     const { item } = page;
     const isProposed = item.isOpen && item.proposed === side;
-    const words = make("span", {}, item.choices[side], isProposed ? make("em", {}, " (as before)") : null);
+    const words = make("span", {}, capital(item.choices[side]), isProposed ? make("em", {}, " (as before)") : null);
     const button = makeButton(words, () => steps.take(side), {
         key: KEYS[side], focus: `take-${side}`, className: `choice take-${side}`, title: `Take ${side}`,
     });

@@ -41,7 +41,7 @@ async function startPage() {
         notices.alert(failure.message);
         return;
     }
-    page.source.watch((isThere) => notices.connection(isThere, page.session.mode));
+    notices.watch(page);
     await showFirst(page);
 }
 

@@ -36,7 +36,8 @@ export class Steps {
         return this.inTurn(async () => {
             const { item } = this.page;
             if (!item) return this.notices.happened("No conflict is selected.");
-            await this.step("take", { under: item.index, side }, `${fullName(item.object)} and what stands under it: ${side}.`);
+            const words = `${fullName(item.object)} and what stands under it: ${side}.`;
+            await this.step("take", { under: item.index, side }, words);
         });
     }
 

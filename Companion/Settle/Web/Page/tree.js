@@ -12,7 +12,8 @@ export class TreeView {
      * @param {import("./notice.js").Notices} notices
      */
     constructor(page, notices) {
-        Object.assign(this, { page, notices, filter: "touched", branches: null, isStale: true, focused: null, revealed: null });
+        Object.assign(this, { page, notices, filter: "touched", branches: null, isStale: true });
+        Object.assign(this, { focused: null, revealed: null });
         this.tree = make("div", { id: "tree", role: "tree", "aria-label": "Hierarchy of the scene" });
         this.tree.addEventListener("click", (event) => this.click(event));
         this.tree.addEventListener("dblclick", () => this.page.object && this.page.show("values"));

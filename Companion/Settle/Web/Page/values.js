@@ -63,7 +63,8 @@ export class ValuesView {
             make("span", { class: "sign", "aria-hidden": "true" }, MARKS[object.mark].sign),
             ` ${capital(markWords(object.mark, object.by, page.isComparison))}`);
         return make("section", { class: "object", "aria-labelledby": "object-title" },
-            make("h2", { id: "object-title" }, above ? "Also in " : "", ...headingOf(object)), mark,
+            make("h2", { id: "object-title" }, above ? "Also in " : "", nameOf(object),
+                make("span", { class: "label" }, ` ${object.id}`)), mark,
             makeButton("Show in the hierarchy", () => page.show("hierarchy"), { className: "quiet" }),
             this.makeWay(object), this.makeNames(object), this.makeParts(object),
             rows.length ? this.makeTable(rows) : make("p", { class: "empty" }, none),
@@ -82,14 +83,15 @@ export class ValuesView {
         const names = new Set(columns.map(({ side }) => object.names[side]));
         if (names.size < 2) return null;
         return make("dl", { class: "names" }, ...columns.flatMap(({ side, title }) =>
-            [make("dt", {}, title), make("dd", {}, object.names[side] ?? "isn't there")]));
+            [make("dt", {}, `In ${title.toLowerCase()}`), make("dd", {}, object.names[side] ?? "isn't there")]));
     }
 
     makeParts(object) {
         if (!object.parts.length) return null;
         const links = object.parts.map(({ id, name, mark, open }) => make("li", {},
             makeButton(name, () => this.follow(id), { className: "link" }),
-            mark === "same" ? null : make("span", { class: `mark mark-${mark}` }, ` ${MARKS[mark].sign} ${MARKS[mark].word}`),
+            mark === "same" ? null
+                : make("span", { class: `mark mark-${mark}` }, ` ${MARKS[mark].sign} ${MARKS[mark].word}`),
             open ? make("span", { class: "mark mark-open" }, ` ◆ ${open} open`) : null));
         return make("ul", { class: "parts", "aria-label": "Components" }, ...links);
     }
@@ -125,11 +127,9 @@ export class ValuesView {
     }
 }
 
-/** The name, and behind it the id and what other versions call it. */
-function headingOf({ id, heading }) {
-    const cut = heading.lastIndexOf(` (${id}`);
-    if (cut < 0) return [splitName(heading).own];
-    return [splitName(heading.slice(0, cut)).own, make("span", { class: "label" }, heading.slice(cut))];
+/** The object's name in the version that comes first for people. */
+function nameOf({ names, heading }) {
+    return splitName(names.ours ?? names.theirs ?? names.base ?? heading).own;
 }
 
 /** The row of a conflict. Where it is about the id in a reference people see the whole reference. */
