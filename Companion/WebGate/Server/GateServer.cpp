@@ -60,8 +60,11 @@ std::optional<int> GateServer::Bind(int port) {
 bool GateServer::process_and_close_socket(socket_t socket) {
     const Descriptor closed(socket);
     ServeRequest(socket);
-    FinishSending(socket);
-    if (m_IsOver) _exit(EXIT_SUCCESS); // the page has its last answer
+    {
+        const Connections::Awaiting awaiting(*m_Connections, socket); // nothing that would be missed
+        FinishSending(socket);
+    }
+    if (m_LastAnswerer == std::this_thread::get_id()) _exit(EXIT_SUCCESS); // the page has its last answer
     return true;
 }
 
@@ -103,7 +106,7 @@ void GateServer::Ask(const httplib::Request& request, httplib::Response& respons
     const WebFrame answer = m_Model.Ask(frame);
     response.status = std::atoi(answer[1].c_str());
     response.set_content(answer[3], answer[2]);
-    if (!answer[4].empty()) m_IsOver = true;
+    if (!answer[4].empty()) m_LastAnswerer = std::this_thread::get_id();
 }
 
 /// An event stream, on which nothing but a sign of life is ever sent.

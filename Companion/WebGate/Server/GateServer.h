@@ -10,6 +10,7 @@
 #include <httplib.h>
 #include <optional>
 #include <string>
+#include <thread>
 
 namespace ovrin {
 
@@ -35,8 +36,8 @@ private:
     OpenPages m_Pages;
     PageAddress m_Address;
     std::optional<PeerCheck> m_Peers;
-    Connections* m_Connections = nullptr; // the library's
-    std::atomic<bool> m_IsOver = false;
+    Connections* m_Connections = nullptr;        // the library's
+    std::atomic<std::thread::id> m_LastAnswerer; // who has the answer after which nothing is served
 };
 
 } // namespace ovrin
