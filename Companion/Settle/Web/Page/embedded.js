@@ -20,7 +20,7 @@ export class EmbeddedSource {
         if (name === "tree") return piece("nodes", this.children[query.scene].get(query.parent ?? null) ?? [], query);
         if (name === "find") return this.find(query);
         if (name === "object") return this.object(query);
-        return partOfMap(data.scenes[query.scene], query);
+        return this.map(query);
     }
 
     async post() {
@@ -44,6 +44,12 @@ export class EmbeddedSource {
         return way;
     }
 
+    /** The whole map from one side; of a scene that couldn't be read there is nothing. */
+    map(query) {
+        const { map } = this.data.scenes[query.scene];
+        return map[query.view] ?? map;
+    }
+
     object(query) {
         const object = this.data.scenes[query.scene].objects[query.id];
         if (!object) throw new RequestFailure("It is unchanged, and this file holds only what was changed.", 404);
@@ -64,11 +70,4 @@ function byParent(nodes) {
 function piece(name, all, query) {
     const from = query.from ?? 0;
     return { total: all.length, [name]: all.slice(from, from + (query.count ?? all.length)) };
-}
-
-function partOfMap(scene, query) {
-    const views = scene.map.top ? scene.map : { top: scene.map };
-    const map = views[query.view];
-    if (!map) throw new RequestFailure("This file holds the map from above only.", 404);
-    return map;
 }

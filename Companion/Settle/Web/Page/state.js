@@ -74,12 +74,11 @@ export class PageState extends EventTarget {
 
     /** Selects the first object of the scene that was touched, from the top. */
     async selectTouched() {
-        let query = { scene: this.scene, from: 0, count: 50, changed: 1 };
+        let query = { scene: this.scene, from: 0, count: 1, changed: 1 };
         for (let level = 0; level < DEEPEST_LOOK; ++level) {
             const { nodes } = await this.source.get("tree", query).catch(() => ({ nodes: [] }));
-            const found = nodes.find((node) => node.mark !== "same");
-            if (found) return this.selectObject(this.scene, found.id);
             if (!nodes.length) return undefined;
+            if (nodes[0].mark !== "same") return this.selectObject(this.scene, nodes[0].id);
             query = { ...query, parent: nodes[0].id };
         }
         return undefined;

@@ -85,7 +85,7 @@ export class ValuesView {
         const isPart = !names.has(null) && nameOf(object).includes(" · ");
         if (names.size < 2 || isPart) return null;
         return make("dl", { class: "names" }, ...columns.flatMap(({ side, title }) =>
-            [make("dt", {}, `In ${title.toLowerCase()}`), make("dd", {}, object.names[side] ?? "isn't there")]));
+            [make("dt", {}, this.page.isComparison ? title : `In ${title.toLowerCase()}`), make("dd", {}, object.names[side] ?? "isn't there")]));
     }
 
     makeParts(object) {
