@@ -5,6 +5,7 @@
 
 import json
 import os
+import pathlib
 import re
 import shutil
 import signal
@@ -18,7 +19,7 @@ from systems import Mercurial
 from test_systems import HEADER, game_object, scene
 from user import LEFT_OPEN
 
-ODD_NAME = "the scene's \"$x\" </script> Träger.ovrin"
+ODD_NAME = "the scene's \"$x\" <script> Träger.ovrin"
 HOSTILE = "</script><script>alert(1)</script> <!-- \u2028 & \\"
 
 
@@ -77,7 +78,8 @@ def test_revisions_are_those_of_diff(user):
 
 def test_a_merge_shows_its_sides_whatever_was_committed(user):
     user.conflict(scene("1 Lantern 1"), scene("2 Lantern 3"), scene("5 Lamp 1"))
-    assert "isn't merged yet" in (user.ovrin("review", "--html", "page.html", status=LEFT_OPEN) or user.words())
+    (unmerged,) = review(user, "--staged", status=LEFT_OPEN)["session"]["scenes"]
+    assert "isn't merged yet" in unmerged["problem"] and unmerged["problem"] in user.words()
     user.ovrin("settle", "--take", "theirs")
     user.git("commit", "-qm", "merged")
     data = review(user, "--merge", "HEAD")
@@ -145,9 +147,9 @@ def test_mercurial_is_known(request, tmp_path):
 
 
 @pytest.fixture(name="served")
-def fixture_served(user):
+def fixture_served(request, user):
     """A page of five scenes, as a function that asks for what stands below its address."""
-    if not shutil.which("ovrin-web", path=user.environment["PATH"]):
+    if not (pathlib.Path(request.config.getoption("--installed")) / "lib/ovrinmerge/ovrin-web").exists():
         pytest.skip("ovrin-web is not installed")
     user.start()
     for number in range(5):
@@ -158,10 +160,9 @@ def fixture_served(user):
                           stderr=subprocess.PIPE, text=True) as process:
         address = re.search(r"http\S+", process.stderr.readline()).group()
 
-        def ask(path, method="GET"):
-            request = urllib.request.Request(address + path, method=method)
+        def ask(path):
             try:
-                with urllib.request.urlopen(request, timeout=30) as answer:
+                with urllib.request.urlopen(address + path, timeout=30) as answer:
                     return answer.status, answer.read().decode()
             except urllib.error.HTTPError as error:
                 return error.code, error.read().decode()
@@ -182,7 +183,7 @@ def test_the_page_is_served_with_its_data(served):
             assert (node["name"], node["mark"]) == (f"Lamp{number}", "changed")
     assert json.loads(served("api/object?scene=1&id=10")[1])["rows"][0]["values"]["base"]["text"] == "Lantern"
     assert json.loads(served("api/conflicts")[1]) == {"total": 0, "items": []}
-    assert served("api/tree?scene=5")[0] == served("api/nothing?scene=0")[0] == served("../readme")[0] == 404
+    assert served("api/tree?scene=5")[0] == served("api/nothing?scene=0")[0] == served("readme")[0] == 404
 
 
 def test_a_scene_whose_process_died_is_read_again(served):
