@@ -26,13 +26,6 @@ std::vector<ConflictMark> MarksOf(const SettleDesk& desk, std::size_t scene) {
     return marks;
 }
 
-/// The answer to a request about an object, both as a process hands them on.
-SceneProcess::Texts AnswerInTexts(SceneView& view, const SceneProcess::Texts& asked) {
-    const PageRequest request{"GET", asked.at(0), {{"id", asked.at(1)}, {"all", asked.at(2)}}, ""};
-    const PageAnswer answer = AnswerView(view, request).value();
-    return {std::to_string(answer.status), answer.type, answer.body};
-}
-
 } // namespace
 
 SceneView& DeskViews::View(std::size_t scene) {
@@ -59,12 +52,10 @@ PageAnswer DeskViews::AnswerMerged(std::size_t scene, const PageRequest& request
         process = std::make_unique<SceneProcess>([&] {
             SettleSession& session = *m_Desk.Scenes()[scene];
             MergeHere(session.Merge(), session.Decisions(), session.Source().take);
-            return [&view](const SceneProcess::Texts& asked) { return AnswerInTexts(view, asked); };
+            return [&view](const PageRequest& asked) { return AnswerView(view, asked).value(); };
         });
     try {
-        const SceneProcess::Texts answer =
-            process->Ask({request.path, QueryText(request, "id"), QueryText(request, "all")});
-        return {std::stoi(answer.at(0)), answer.at(1), answer.at(2)};
+        return process->Ask(request);
     } catch (const Failure&) {
         process.reset();
         throw;

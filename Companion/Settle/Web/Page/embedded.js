@@ -23,10 +23,6 @@ export class EmbeddedSource {
         return this.map(query);
     }
 
-    async post() {
-        throw new RequestFailure("This page shows a review, in which nothing can be decided.", 400);
-    }
-
     /** Nobody is at the other end, and nobody is missed. */
     watch() {}
 
