@@ -134,6 +134,18 @@ class Sight:
     def focused_text(self):
         return self.run("return document.activeElement.textContent")
 
+    def views(self, *names):
+        """The words of views, one after the other; all but what a page has that isn't a file."""
+        told = []
+        for name in names:
+            self.click(f"#tab-{name}")
+            self.settle_down()
+            told.append(self.run(f"return document.querySelector('#panel-{name}').innerText.replace(/\\nEverything/, '').trim()"))
+        return told
+
+    def buttons(self):
+        return set(self.run("return [...document.querySelectorAll('button')].map((one) => one.firstChild.textContent)"))
+
     def nameless(self):
         """The controls in sight that a screen reader could call nothing."""
         return self.run(NAMELESS)

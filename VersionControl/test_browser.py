@@ -128,30 +128,56 @@ def test_what_cannot_be_finished_yet_says_why(harbour_user, driver):
         assert page.end()[0] == 1
 
 
-def test_names_and_values_that_are_markup_stay_text(user, driver):
-    def scene(side):
-        made = Scene()
-        for number, text in enumerate(MARKUP, 1):
-            made.place(100 * number, f'"{text}"')
-            made.component(100 * number + 2, 100 * number, "MonoBehaviour", m_Text=f'"{text} {side}"')
-            if side:
-                made[100 * number + 1]["m_LocalPosition"] = f"{{x: {side}, y: 0, z: {number}}}"
-        return made.text()
+def markup_scene(side):
+    scene = Scene()
+    for number, text in enumerate(MARKUP, 1):
+        scene.place(100 * number, f'"{text}"')
+        scene.component(100 * number + 2, 100 * number, "MonoBehaviour", m_Text=f'"{text} {side}"')
+        if side:
+            scene[100 * number + 1]["m_LocalPosition"] = f"{{x: {side}, y: 0, z: {number}}}"
+    return scene.text()
 
-    user.conflict(scene(0), scene(1), scene(2))
+
+def look_for_elements_of_markup(sight):
+    for view in "231":
+        sight.press_on_body(view)
+        sight.settle_down()
+    sight.press("/", "script", sight.settle_down, sight.ENTER, sight.settle_down)
+    assert "<script>window.struck=1" in sight.text("#tree")
+    assert sight.run("return window.struck") is None
+    assert sight.run("return document.querySelectorAll('img, [onload], [onerror], [onfocus]').length") == 0
+    sight.check_errors()
+
+
+def test_names_and_values_that_are_markup_stay_text(user, driver):
+    user.conflict(*map(markup_scene, range(3)))
     with Page(user, *SETTLE) as page:
         sight = Sight(driver, page.address)
+        sight.press("o", "T", "u", sight.settle_down)
         assert "<script>window.struck=1" in sight.text("#conflicts")
-        for view in "123":
-            sight.press(view)
-            sight.settle_down()
-        sight.press("/", "script", sight.settle_down, sight.ENTER)
-        sight.press_on_body("o", "T", "u", "1")
-        sight.settle_down()
-        assert sight.run("return window.struck") is None
-        assert sight.run("return document.querySelectorAll('script, img, [onload], [onerror], [onfocus], [style]'"
-                         ").length - document.querySelectorAll('script[src], .block[style], .row[style], .tip[style]').length") == 0
-        sight.check_errors()
+        look_for_elements_of_markup(sight)
+
+
+def test_markup_stays_text_in_a_page_that_is_a_file(user, driver):
+    user.sides(*map(markup_scene, range(3)))
+    user.ovrin("review", "--html", "review.html", "main", "topic")
+    look_for_elements_of_markup(Sight(driver, (user.here / "review.html").as_uri()))
+
+
+@pytest.mark.parametrize("versions", [("main~1", "topic"), ("--merge", "HEAD")], ids=["comparison", "merge"])
+def test_review_is_the_same_served_and_as_a_file_and_decides_nothing(user, driver, versions):
+    user.conflict(*harbour(), "Harbour.ovrin")
+    user.ovrin("settle", "--take", "theirs")
+    user.git("commit", "-qm", "merged")
+    user.ovrin("review", "--html", "review.html", *versions, status=None)
+    file = Sight(driver, (user.here / "review.html").as_uri())
+    seen = [file.views("values", "hierarchy"), file.buttons()]
+    with Page(user, "review", "--no-browser", *versions) as page:
+        served = Sight(driver, page.address)
+        for shown in zip(seen, [served.views("values", "hierarchy"), served.buttons()]):
+            assert shown[0] == shown[1]
+        assert not seen[1] & {"Finish", "Undo", "Ours", "Theirs", "Leave"}
+        served.check_errors()
 
 
 def test_every_control_has_a_name_and_can_be_reached(harbour_user, driver):

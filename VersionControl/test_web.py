@@ -16,6 +16,7 @@ import time
 import pytest
 
 from page import Page, has_ended, interrupt, seconds_since
+from test_settle import MANY
 from test_systems import CONFLICT_AND_MORE, HEADER, ONE_CONFLICT, game_object, scene
 from user import DONE, FAILED, LEFT_OPEN
 
@@ -74,6 +75,22 @@ def test_result_of_an_object_is_that_of_the_decisions(page):
     rows = page.get(f"object?scene=0&id={item['id']}")["rows"]
     row = next(row for row in rows if row["item"] == 0)
     assert row["values"]["result"]["text"] == row["values"]["base"]["text"] != row["values"]["ours"]["text"]
+
+
+@pytest.mark.parametrize("page", [MANY], indirect=True)
+def test_objects_that_no_decision_is_about_keep_their_result(page):
+    def result(item):
+        rows = page.get(f"object?scene=0&id={item['id']}")["rows"]
+        return next(row["values"]["result"]["text"] for row in rows if row["item"] == item["index"])
+    first, second = page.get("conflicts?count=2")["items"]
+    assert (result(first), result(second)) == ("5", "5")
+    page.step("take", item=0, side="theirs")
+    assert (result(first), result(second)) == ("2", "5")
+    page.step("take", all=True, side="base")
+    assert (result(first), result(second)) == ("2", "1")
+    page.step("undo")
+    page.step("undo")
+    assert (result(first), result(second)) == ("5", "5")
 
 
 @pytest.mark.parametrize("body", [

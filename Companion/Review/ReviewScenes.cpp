@@ -14,8 +14,8 @@ using nlohmann::json;
 
 namespace {
 
-// What a process is asked, ahead of what is asked about.
-constexpr const char *kLook = "look", *kAnswer = "answer", *kAll = "all";
+// What a process is asked besides requests of pages, in the place of their methods.
+constexpr const char *kLook = "LOOK", *kAll = "ALL";
 
 /// In a form that keeps any bytes.
 std::string Packed(const json& value) {
@@ -46,6 +46,14 @@ SceneAnswers::Whole WholeOf(const std::string& packed) {
     const json whole = json::from_cbor(packed);
     if (whole.is_string()) throw Failure(std::string(whole));
     return {whole[0], whole[1], whole[2]};
+}
+
+/// There, for what is asked here. The body says what is known of the scene.
+PageAnswer AnswerThere(SceneAnswers& answers, const PageRequest& request) {
+    if (request.method == kLook) return {200, "", Packed(answers.Look())};
+    const SceneAnswers::Known known = KnownOf(json::from_cbor(request.body));
+    if (request.method == kAll) return {200, "", PackedWhole(answers, known)};
+    return answers.Answer(request, known);
 }
 
 std::string EndOf(const WorkerAnswer& answer) {
@@ -88,7 +96,7 @@ void ReviewScenes::Look(const Progress& progress, const Take<json>& take) {
     for (std::size_t file = 0; file < count; ++file) Hold(file);
     for (std::size_t file = 0; file < count; ++file) {
         try {
-            take(file, json::from_cbor(AskProcess(file, {kLook}).at(0)));
+            take(file, json::from_cbor(AskProcess(file, {kLook, "", {}, ""}).body));
         } catch (const Failure& failure) {
             take(file, {{"problem", failure.what()}});
         }
@@ -96,24 +104,9 @@ void ReviewScenes::Look(const Progress& progress, const Take<json>& take) {
     }
 }
 
-/// There, for what the functions below ask here.
-SceneProcess::Texts ReviewScenes::AnswerThere(SceneAnswers& answers,
-                                              const SceneProcess::Texts& question) const {
-    if (question.at(0) == kLook) return {Packed(answers.Look())};
-    const SceneAnswers::Known known = KnownOf(json::from_cbor(question.at(1)));
-    if (question.at(0) == kAll) return {PackedWhole(answers, known)};
-    PageRequest request{"GET", question.at(2), {}, ""};
-    for (std::size_t i = 3; i + 1 < question.size(); i += 2)
-        request.query.emplace(question[i], question[i + 1]);
-    const PageAnswer answer = answers.Answer(request, known);
-    return {std::to_string(answer.status), answer.type, answer.body};
-}
-
-PageAnswer ReviewScenes::Ask(std::size_t file, const PageRequest& request, const SceneAnswers::Known& known) {
-    SceneProcess::Texts question = {kAnswer, Packed(PackedKnown(known)), request.path};
-    for (const auto& [key, value] : request.query) question.insert(question.end(), {key, value});
-    const SceneProcess::Texts answer = AskProcess(file, question);
-    return {std::stoi(answer.at(0)), answer.at(1), answer.at(2)};
+PageAnswer ReviewScenes::Ask(std::size_t file, PageRequest request, const SceneAnswers::Known& known) {
+    request.body = Packed(PackedKnown(known));
+    return AskProcess(file, request);
 }
 
 void ReviewScenes::All(const std::vector<Wanted>& wanted, const Progress& progress,
@@ -130,7 +123,7 @@ void ReviewScenes::All(const std::vector<Wanted>& wanted, const Progress& progre
     };
     if (AreAllAtHand()) {
         for (std::size_t i = 0; i < wanted.size(); ++i)
-            takePacked(i, AskProcess(wanted[i].file, {kAll, Packed(PackedKnown(wanted[i].known))}).at(0));
+            takePacked(i, Ask(wanted[i].file, {kAll, "", {}, ""}, wanted[i].known).body);
         return;
     }
     WorkOnEach(
@@ -150,17 +143,18 @@ SceneProcess& ReviewScenes::Hold(std::size_t file) {
     }
     if (m_Held.size() == kMostHeld) m_Held.pop_back();
     const auto open = [this, file] {
-        return [this, answers = std::shared_ptr<SceneAnswers>(Open(file))](
-                   const SceneProcess::Texts& question) { return AnswerThere(*answers, question); };
+        return [answers = std::shared_ptr<SceneAnswers>(Open(file))](const PageRequest& request) {
+            return AnswerThere(*answers, request);
+        };
     };
     m_Held.push_front({file, std::make_unique<SceneProcess>(open)});
     return *m_Held.front().process;
 }
 
-SceneProcess::Texts ReviewScenes::AskProcess(std::size_t file, const SceneProcess::Texts& question) {
+PageAnswer ReviewScenes::AskProcess(std::size_t file, const PageRequest& request) {
     SceneProcess& process = Hold(file);
     try {
-        return process.Ask(question);
+        return process.Ask(request);
     } catch (const Failure&) {
         m_Held.pop_front(); // the next question starts another one
         throw;

@@ -28,7 +28,7 @@ public:
     /// Looks at all files (SceneAnswers::Look). A process that came to an end is told as a problem.
     void Look(const Progress& progress, const Take<nlohmann::json>& take);
     /// SceneAnswers::Answer of a file. Throws Failure if its process came to an end.
-    PageAnswer Ask(std::size_t file, const PageRequest& request, const SceneAnswers::Known& known);
+    PageAnswer Ask(std::size_t file, PageRequest request, const SceneAnswers::Known& known);
 
     struct Wanted {
         std::size_t file;
@@ -42,8 +42,7 @@ public:
 private:
     bool AreAllAtHand() const { return m_Sources.files.size() <= kMostHeld; }
     SceneProcess& Hold(std::size_t file);
-    SceneProcess::Texts AskProcess(std::size_t file, const SceneProcess::Texts& question);
-    SceneProcess::Texts AnswerThere(SceneAnswers& answers, const SceneProcess::Texts& question) const;
+    PageAnswer AskProcess(std::size_t file, const PageRequest& request);
     std::unique_ptr<SceneAnswers> Open(std::size_t file) const;
 
     static constexpr std::size_t kMostHeld = 3;

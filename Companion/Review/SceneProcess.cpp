@@ -16,11 +16,25 @@ namespace ovrin {
 
 namespace {
 
+SceneProcess::Answer OpenOrFail(const std::function<SceneProcess::Answer()>& open) {
+    try {
+        return open();
+    } catch (const Failure& failure) {
+        return [answer = PageError(409, failure.what())](const PageRequest&) { return answer; };
+    }
+}
+
+/// A request is {method, path, body, key, value...}, its answer {status, type, body}.
 [[noreturn]] void Serve(int socket, const std::function<SceneProcess::Answer()>& open) {
     try {
-        const SceneProcess::Answer answer = open();
-        while (const auto question = ReceiveFrame(socket, kMostRequestFrame))
-            if (!SendFrame(socket, answer(*question))) break;
+        const SceneProcess::Answer answerTo = OpenOrFail(open);
+        while (const auto frame = ReceiveFrame(socket, kMostRequestFrame)) {
+            PageRequest request{frame->at(0), frame->at(1), {}, frame->at(2)};
+            for (std::size_t i = 3; i + 1 < frame->size(); i += 2)
+                request.query.emplace((*frame)[i], (*frame)[i + 1]);
+            const PageAnswer answer = answerTo(request);
+            if (!SendFrame(socket, {std::to_string(answer.status), answer.type, answer.body})) break;
+        }
     } catch (const std::exception&) {
         _exit(1); // told as the end of the process
     }
@@ -53,11 +67,16 @@ SceneProcess::~SceneProcess() {
     Uninterrupted([&] { return waitpid(m_Process, nullptr, 0); });
 }
 
-SceneProcess::Texts SceneProcess::Ask(const Texts& question) {
-    const bool isSent = SendFrame(m_Socket.Get(), question);
-    std::optional<Texts> answer = isSent ? ReceiveFrame(m_Socket.Get(), kMostAnswerFrame) : std::nullopt;
+PageAnswer SceneProcess::Ask(const PageRequest& request) {
+    WebFrame frame = {request.method, request.path, request.body};
+    for (const auto& [key, value] : request.query) {
+        frame.push_back(key);
+        frame.push_back(value);
+    }
+    const auto answer =
+        SendFrame(m_Socket.Get(), frame) ? ReceiveFrame(m_Socket.Get(), kMostAnswerFrame) : std::nullopt;
     if (!answer) throw Failure("The process for this scene came to its end: ask again");
-    return std::move(*answer);
+    return {std::stoi(answer->at(0)), answer->at(1), answer->at(2)};
 }
 
 } // namespace ovrin

@@ -1,11 +1,11 @@
 #pragma once
 
+#include "Review/PageRequest.h"
+
 #include "Descriptor.h"
 
 #include <functional>
-#include <string>
 #include <sys/types.h>
-#include <vector>
 
 namespace ovrin {
 
@@ -13,12 +13,10 @@ namespace ovrin {
 /// it, and so does whatever ends it. Only for a process without other threads.
 class SceneProcess {
 public:
-    /// What it is asked, and what it answers: texts of any bytes.
-    using Texts = std::vector<std::string>;
-    using Answer = std::function<Texts(const Texts&)>;
+    using Answer = std::function<PageAnswer(const PageRequest&)>;
 
-    /// Calls `open` there, at once, and what it returns for each question from then on. Throws Failure if no
-    /// process can be started.
+    /// Calls `open` there, and what it returns for each request from then on. Where it throws Failure, that
+    /// is the answer to all of them. Throws Failure if no process can be started.
     explicit SceneProcess(const std::function<Answer()>& open);
     SceneProcess(const SceneProcess&) = delete;
     SceneProcess& operator=(const SceneProcess&) = delete;
@@ -26,7 +24,7 @@ public:
     ~SceneProcess();
 
     /// Throws Failure if the process came to its end.
-    Texts Ask(const Texts& question);
+    PageAnswer Ask(const PageRequest& request);
 
 private:
     Descriptor m_Socket;

@@ -1,5 +1,6 @@
 #include "Settle/Problems.h"
 
+#include "Conflicts/Conflict.h"
 #include "Conflicts/DecisionPath.h"
 #include "Conflicts/Requirements.h"
 #include "Names/PropertyName.h"

@@ -109,6 +109,13 @@ std::optional<std::size_t> SettleSession::FindPlain(const Decision& decision) {
     return isPlain->second ? found : std::nullopt;
 }
 
+bool SettleSession::IsAsMerged(MergeNames::ID object) {
+    return std::ranges::all_of(m_Decisions, [&](const Decision& decision) {
+        const std::optional<std::size_t> at = FindPlain(decision);
+        return at && m_Conflicts[*at].path.front() != object;
+    });
+}
+
 /// Makes what follows from decisions, without merging. False if a merge must tell.
 bool SettleSession::DecidePlainly(std::span<const Decision> decisions) {
     std::vector<MetConflicts::State> states = m_Conflicts.States();

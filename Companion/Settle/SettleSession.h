@@ -88,6 +88,10 @@ public:
     /// Writes the decisions down, and the merge itself if nobody has.
     void Keep(OpenMerges& store);
 
+    /// Whether an object is in the result as Merge() has it: every decision so far is about one value of
+    /// another object, and changes nothing else. False where only a merge could tell.
+    bool IsAsMerged(MergeNames::ID object);
+
     /// What `make` returns in a process of its own, where Merge() is merged by the decisions
     /// (Settle/MergedScene.h).
     std::string InMerged(const std::function<std::string()>& make);

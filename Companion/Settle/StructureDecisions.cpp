@@ -1,5 +1,6 @@
 #include "Settle/StructureDecisions.h"
 
+#include "Conflicts/Conflict.h"
 #include "Conflicts/DecisionPath.h"
 
 #include "Diff/YAMLMappingDiff.h"
@@ -21,10 +22,6 @@ const YAMLScalar* ChildrenKey() {
 }
 
 } // namespace
-
-Version VersionOf(Side side) {
-    return side == Side::Base ? Version::Base : side == Side::Ours ? Version::Ours : Version::Theirs;
-}
 
 Side OtherThan(Side side) {
     return side == Side::Ours ? Side::Theirs : Side::Ours;

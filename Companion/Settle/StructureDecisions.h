@@ -79,7 +79,5 @@ private:
 
 /// Ours of theirs, and theirs of ours or base.
 Side OtherThan(Side side);
-/// The version of a side.
-Version VersionOf(Side side);
 
 } // namespace ovrin

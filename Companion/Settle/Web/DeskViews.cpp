@@ -3,6 +3,7 @@
 #include "Review/ViewRequests.h"
 #include "Settle/MergedScene.h"
 #include "Settle/SettleSession.h"
+#include "Values/YAMLScalar.h"
 #include "Words/Failure.h"
 
 #include <algorithm>
@@ -24,13 +25,6 @@ std::vector<ConflictMark> MarksOf(const SettleDesk& desk, std::size_t scene) {
         if (item.scene == scene) marks.push_back({item.about, i, item.isOpen, item.decided, item.proposed});
     }
     return marks;
-}
-
-/// The answer to a request about an object, both as a process hands them on.
-SceneProcess::Texts AnswerInTexts(SceneView& view, const SceneProcess::Texts& asked) {
-    const PageRequest request{"GET", asked.at(0), {{"id", asked.at(1)}, {"all", asked.at(2)}}, ""};
-    const PageAnswer answer = AnswerView(view, request).value();
-    return {std::to_string(answer.status), answer.type, answer.body};
 }
 
 } // namespace
@@ -59,12 +53,10 @@ PageAnswer DeskViews::AnswerMerged(std::size_t scene, const PageRequest& request
         process = std::make_unique<SceneProcess>([&] {
             SettleSession& session = *m_Desk.Scenes()[scene];
             MergeHere(session.Merge(), session.Decisions(), session.Source().take);
-            return [&view](const SceneProcess::Texts& asked) { return AnswerInTexts(view, asked); };
+            return [&view](const PageRequest& asked) { return AnswerView(view, asked).value(); };
         });
     try {
-        const SceneProcess::Texts answer =
-            process->Ask({request.path, QueryText(request, "id"), QueryText(request, "all")});
-        return {std::stoi(answer.at(0)), answer.at(1), answer.at(2)};
+        return process->Ask(request);
     } catch (const Failure&) {
         process.reset();
         throw;
@@ -76,8 +68,9 @@ std::optional<PageAnswer> DeskViews::Answer(const PageRequest& request) {
     if (std::ranges::find(kKnown, request.path) == kKnown.end()) return {};
     const std::size_t scene = QueryNumber(request, "scene", 0, std::numeric_limits<std::size_t>::max());
     if (scene >= m_Views.size()) throw Failure("There is no such scene");
-    // Only the values of an object come from the result, which without decisions is there already.
-    if (request.path == "api/object" && !m_Desk.Scenes()[scene]->Decisions().empty())
+    // Only the values of an object come from the result.
+    const auto* object = ovrin_yaml::YAMLScalar::Lookup(QueryText(request, "id"));
+    if (request.path == "api/object" && !m_Desk.Scenes()[scene]->IsAsMerged(object))
         return AnswerMerged(scene, request);
     return AnswerView(View(scene), request);
 }

@@ -1,5 +1,5 @@
 import { make, part } from "./dom.js";
-import { splitName } from "./words.js";
+import { propertyWords, splitName } from "./words.js";
 
 const ROW_HEIGHT = 48;
 
@@ -83,11 +83,10 @@ export class ConflictList {
     }
 
     makeOption(item) {
-        const property = item.property || "the whole object";
         return make("div", {
             role: "option", id: `item-${item.index}`, "data-index": item.index, class: `option ${stateClass(item)}`,
             "aria-selected": "false", "aria-setsize": this.page.items.total, "aria-posinset": item.index + 1,
-        }, make("span", { class: "option-property" }, property), makeBadge(item),
+        }, make("span", { class: "option-property" }, propertyWords(item.property)), makeBadge(item),
         make("span", { class: "option-what" }, item.what));
     }
 
@@ -144,9 +143,13 @@ function stateClass(item) {
 
 /** The state in words and a shape; "followed" where a decision elsewhere settled it. */
 function makeBadge(item) {
-    const open = item.proposed ? `open, before: ${item.proposed}` : "open";
-    const words = item.isOpen ? open : item.decided ?? "followed";
+    const words = item.isOpen ? openState(item) : item.decided ?? "followed";
     const sign = item.isOpen ? "◆" : "✓";
     return make("span", { class: `badge badge-${item.isOpen ? "open" : item.decided ?? "followed"}` },
         make("span", { "aria-hidden": "true" }, sign), ` ${words}`);
+}
+
+function openState({ decided, proposed }) {
+    if (decided) return `open, took ${decided}`;
+    return proposed ? `open, before: ${proposed}` : "open";
 }

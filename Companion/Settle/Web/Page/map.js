@@ -53,10 +53,10 @@ export class MapView {
     makeLegend() {
         const entry = (mark) => make("span", { class: `mark mark-${mark}` }, `${MARKS[mark].sign} ${MARKS[mark].word}`);
         const arrow = (side, words) => make("span", { class: `legend-arrow legend-${side}` }, `⟶ ${words}`);
-        this.arrows = make("span", {}, arrow("ours", "where ours has it"), arrow("theirs", "where theirs has it"));
+        const arrows = make("span", {}, arrow("ours", "where ours has it"), arrow("theirs", "where theirs has it"));
         return make("p", { class: "legend" }, entry("added"), entry("removed"), entry("changed"),
-            make("span", { class: "mark mark-moved" }, "■ moved"), entry("open"), this.arrows,
-            make("span", { class: "aside" }, "• unchanged"));
+            make("span", { class: "mark mark-moved" }, "■ moved"), this.page.session.total ? entry("open") : null,
+            this.page.isComparison ? null : arrows, make("span", { class: "aside" }, "• unchanged"));
     }
 
     listen() {
@@ -93,7 +93,6 @@ export class MapView {
     async follow() {
         const { page } = this;
         if (page.view !== "map") return;
-        this.arrows.hidden = page.isComparison;
         this.resize();
         if (!this.answer || this.scene !== page.scene) await this.loadAll();
         else if (this.isStale) await this.load();

@@ -1,5 +1,5 @@
 import { make, makeButton, part, refill } from "./dom.js";
-import { SIDES, capital, splitName } from "./words.js";
+import { SIDES, capital, propertyWords, splitName } from "./words.js";
 
 const STRIP_KEYS = { base: "B", ours: "O", theirs: "T" };
 
@@ -28,8 +28,9 @@ function makeObjectLine(page, heading) {
 }
 
 function makeConflict(page, steps, item) {
-    const property = item.property ? ` · ${item.property}` : "";
-    const state = item.isOpen ? "open" : item.decided ? `you took ${item.decided}` : "another decision settled it";
+    const property = item.property ? ` · ${propertyWords(item.property)}` : "";
+    const taken = item.decided ? `you took ${item.decided}` : "";
+    const state = item.isOpen ? ["open", taken].filter(Boolean).join(", ") : taken || "another decision settled it";
     const name = make("strong", {}, `${splitName(item.object).own}${property}`);
     const sides = SIDES.map((side) => makeStripSide(page, steps, item, side));
     return [make("p", {}, name, ` — ${item.what}; ${state}`), make("div", { class: "strip-sides" }, ...sides),
@@ -44,7 +45,7 @@ function makeStripSide(page, steps, item, side) {
     const button = makeButton(label, () => steps.take(side), {
         key: STRIP_KEYS[side], focus: `strip-${side}`, className: `take-${side}`, title: capital(item.choices[side]),
     });
-    button.setAttribute("aria-pressed", String(!item.isOpen && item.decided === side));
+    button.setAttribute("aria-pressed", String(item.decided === side));
     return button;
 }
 

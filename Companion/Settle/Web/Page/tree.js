@@ -26,7 +26,9 @@ export class TreeView {
     }
 
     makeFilter() {
-        const offered = Object.entries(FILTERS).filter(([name]) => name !== "all" || this.page.source.isWhole);
+        const { session, source } = this.page;
+        const filters = session.total ? FILTERS : { touched: "What was changed", all: FILTERS.all };
+        const offered = Object.entries(filters).filter(([name]) => name !== "all" || source.isWhole);
         this.select = make("select", { id: "filter", onchange: () => this.setFilter(this.select.value) },
             ...offered.map(([name, words]) => make("option", { value: name }, words)));
         return make("label", {}, "Show ", this.select);

@@ -1,7 +1,7 @@
 import { makeCard } from "./card.js";
 import { make, makeButton, part, refill } from "./dom.js";
 import { showValue } from "./value.js";
-import { MARKS, capital, markWords, splitName } from "./words.js";
+import { MARKS, capital, markWords, propertyWords, splitName } from "./words.js";
 
 const STATES = {
     same: "unchanged", ours: "ours changed it", theirs: "theirs changed it", both: "both did the same", open: "open",
@@ -57,7 +57,8 @@ export class ValuesView {
     /** The object with all fields but the one that stands above already. */
     makeObject(object, above) {
         const { page } = this;
-        const rows = object.rows.filter((row) => row !== above);
+        const { item } = page;
+        const rows = object.rows.filter((row) => row !== above && (!item || row.item !== item.index));
         const none = above ? "No other field of it differs." : "None of its own fields differs.";
         const mark = make("span", { class: `mark mark-${object.mark}` },
             make("span", { class: "sign", "aria-hidden": "true" }, MARKS[object.mark].sign),
@@ -77,13 +78,14 @@ export class ValuesView {
             "in ", ...links.flatMap((link, at) => (at ? [" / ", link] : [link]))) : null;
     }
 
-    /** The names that other versions have for it. */
+    /** The names that versions have for it; those of a component follow those of what it belongs to. */
     makeNames(object) {
         const columns = this.page.columns.filter(({ side }) => side in object.names);
         const names = new Set(columns.map(({ side }) => object.names[side]));
-        if (names.size < 2) return null;
+        const isPart = !names.has(null) && nameOf(object).includes(" · ");
+        if (names.size < 2 || isPart) return null;
         return make("dl", { class: "names" }, ...columns.flatMap(({ side, title }) =>
-            [make("dt", {}, `In ${title.toLowerCase()}`), make("dd", {}, object.names[side] ?? "isn't there")]));
+            [make("dt", {}, this.page.isComparison ? title : `In ${title.toLowerCase()}`), make("dd", {}, object.names[side] ?? "isn't there")]));
     }
 
     makeParts(object) {
@@ -108,7 +110,7 @@ export class ValuesView {
     makeRow(row, columns) {
         const { page } = this;
         const isSelected = row.item !== null && row.item === page.item?.index;
-        const name = row.property || "The whole object";
+        const name = propertyWords(row.property);
         const title = row.item === null ? name
             : makeButton(name, () => page.selectItem(row.item), { className: "link", focus: `row-${row.item}` });
         const state = page.isComparison ? null : make("span", { class: `state state-${row.state}` }, STATES[row.state]);

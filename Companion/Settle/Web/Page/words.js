@@ -44,6 +44,11 @@ export function splitName(name) {
     return { own: first.slice(cut + 1), above: first.slice(0, Math.max(0, cut)) };
 }
 
+/** What a conflict is about, within its object. That the object's id is what refers to it needn't be said. */
+export function propertyWords(property) {
+    return property ? property.replace(/\.fileID$/, "") : "the whole object";
+}
+
 /** "Harbour/Pier/Lantern · Light", without what other versions call it. */
 export function fullName(name) {
     const { own, above } = splitName(name);
