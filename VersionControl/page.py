@@ -16,10 +16,10 @@ SECONDS_TO_WAIT = 30
 class Page:
     """ovrin with a page that is open, until the end of the "with"."""
 
-    def __init__(self, user, *command, **environment):
+    def __init__(self, user, *command, program=("ovrin",), **environment):
         self.user = user
         self.lines = []
-        self.process = subprocess.Popen(["ovrin", *command], cwd=user.here, env=user.environment | environment,
+        self.process = subprocess.Popen([*program, *command], cwd=user.here, env=user.environment | environment,
                                         stdin=subprocess.DEVNULL, stdout=subprocess.DEVNULL, stderr=subprocess.PIPE,
                                         start_new_session=True)
         self.address = self.find_address()

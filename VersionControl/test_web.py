@@ -10,11 +10,13 @@ import pathlib
 import random
 import shutil
 import signal
+import sys
 import time
 
 import pytest
 
 from page import Page, has_ended, interrupt, seconds_since
+from test_settle import MANY
 from test_systems import CONFLICT_AND_MORE, HEADER, ONE_CONFLICT, game_object, scene
 from user import DONE, FAILED, LEFT_OPEN
 
@@ -73,6 +75,22 @@ def test_result_of_an_object_is_that_of_the_decisions(page):
     rows = page.get(f"object?scene=0&id={item['id']}")["rows"]
     row = next(row for row in rows if row["item"] == 0)
     assert row["values"]["result"]["text"] == row["values"]["base"]["text"] != row["values"]["ours"]["text"]
+
+
+@pytest.mark.parametrize("page", [MANY], indirect=True)
+def test_objects_that_no_decision_is_about_keep_their_result(page):
+    def result(item):
+        rows = page.get(f"object?scene=0&id={item['id']}")["rows"]
+        return next(row["values"]["result"]["text"] for row in rows if row["item"] == item["index"])
+    first, second = page.get("conflicts?count=2")["items"]
+    assert (result(first), result(second)) == ("5", "5")
+    page.step("take", item=0, side="theirs")
+    assert (result(first), result(second)) == ("2", "5")
+    page.step("take", all=True, side="base")
+    assert (result(first), result(second)) == ("2", "1")
+    page.step("undo")
+    page.step("undo")
+    assert (result(first), result(second)) == ("5", "5")
 
 
 @pytest.mark.parametrize("body", [
@@ -217,6 +235,22 @@ def test_secret_is_no_argument_and_no_variable(page):
         for what in ("cmdline", "environ"):
             with open(f"/proc/{process}/{what}", "rb") as file:
                 assert page.token.encode() not in file.read()
+
+
+@pytest.mark.skipif(os.getuid() != 0 or not shutil.which("setpriv"), reason="needs root to be two users")
+def test_another_user_who_knows_the_address_gets_nothing(user):
+    """Command lines are public, and that of the browser has the address."""
+    user.conflict(*ONE_CONFLICT)
+    here = pathlib.Path(user.here).parent
+    for folder, _, names in os.walk(here):
+        for name in (folder, *(os.path.join(folder, name) for name in names)):
+            os.chown(name, 12345, 12345, follow_symlinks=False)
+    user.fake("as-other", 'exec setpriv --reuid 12345 --regid 12345 --clear-groups "$@"')
+    with Page(user, "settle", "--web", "--no-browser", program=["as-other", "ovrin"]) as page:
+        ask = [sys.executable, "-c", "import sys, urllib.request; urllib.request.urlopen(sys.argv[1])", f"{page.address}api/session"]
+        for other, fails in (("12345", False), ("12346", True)):
+            user.run("setpriv", "--reuid", other, "--regid", other, "--clear-groups", *ask, fails=fails)
+            assert ("403" in user.report) == fails
 
 
 @pytest.mark.parametrize("page", [SCRIPTS], indirect=True)

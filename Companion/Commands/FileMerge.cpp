@@ -146,21 +146,13 @@ void ForgetEarlier(const Records& records) {
     merges.Remove(records.path);
 }
 
-/// The name of a file of its own for whoever stands elsewhere later.
-std::string Lasting(const std::string& file, const std::string& byDefault) {
-    if (file == byDefault) return {};
-    std::error_code error;
-    const fs::path absolute = fs::absolute(file, error);
-    return error ? file : absolute.string();
-}
-
 /// What is told of an open merge that can't be written down.
 std::string Record(const Records& records, const FileMerge& files, OpenMerge merge) {
     if (records.path.empty()) return "Nothing is written down: there is no working tree around the file.\n";
     try {
         merge.texts = ReadTexts(files); // as they still are: the result comes later
-        merge.rules = Lasting(files.format.rules, kDefaultRulesFile);
-        merge.typeInfo = Lasting(files.format.typeInfo, kDefaultTypeInfoFile);
+        merge.rules = files.format.LastingRules();
+        merge.typeInfo = files.format.LastingTypeInfo();
         RememberEarlier(records);
         OpenMerges(*records.repository).Add(merge);
         return {};

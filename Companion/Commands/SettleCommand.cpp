@@ -25,6 +25,7 @@ namespace {
 using nlohmann::json;
 
 constexpr const char* kProposed = "proposed";
+constexpr std::size_t kMostTold = 4; // decisions on one line
 
 struct SettleOptions {
     std::vector<std::string> files;
@@ -75,6 +76,24 @@ void Decide(const SettleScenes& scenes, const SettleOptions& options) {
     if (!UndoStep(scenes.Sessions())) throw Failure("There is no decision to take back");
 }
 
+/// What is wrong, and the decisions that would mend it.
+void TellProblems(const SettleSession& session) {
+    const std::string scene = Printable(session.Source().path);
+    for (const Problem& problem : session.Problems()) {
+        std::cerr << "ovrin: " << scene << ": " << problem.text << '\n';
+        for (const Remedy& remedy : problem.remedies) {
+            std::cerr << "    to " << remedy.text << ": ovrin settle";
+            if (remedy.decisions.size() > kMostTold) {
+                std::cerr << " --set, " << remedy.decisions.size() << " times as --list --json tells\n";
+                continue;
+            }
+            for (const Decision& decision : remedy.decisions)
+                std::cerr << " --set '" << Printable(decision.path) << '=' << SideName(decision.side) << "'";
+            std::cerr << '\n';
+        }
+    }
+}
+
 void TellProposed(const SettleScenes& scenes) {
     std::size_t count = 0;
     for (const auto& session : scenes.Sessions()) count += session->CountProposed();
@@ -87,7 +106,7 @@ void TellProposed(const SettleScenes& scenes) {
 bool TellOpen(const SettleScenes& scenes, bool wasDecided) {
     bool isAnyOpen = false;
     for (const auto& session : scenes.Sessions()) {
-        Tell(session->Missing());
+        TellProblems(*session);
         if (session->IsSettled()) continue;
         isAnyOpen = true;
         std::cerr << TellCount(SceneCount::Of(*session)) << '\n';

@@ -1,6 +1,7 @@
 #include "Conflicts/IndexMerges.h"
 
 #include "Names/PrintableText.h"
+#include "Scenes/SceneRules.h"
 #include "Systems/Git.h"
 #include "Systems/Operation.h"
 #include "Systems/Repository.h"
@@ -46,6 +47,9 @@ OpenMerge IndexMerges::Read(const std::string& path) {
     merge.path = path;
     merge.occasion = OccasionOf(m_Repository, git);
     merge.isBothAdded = objects[GitEntry::Base].empty();
+    const FormatFiles format = FormatFiles::OfEnvironment();
+    merge.rules = format.LastingRules();
+    merge.typeInfo = format.LastingTypeInfo();
     merge.texts.ours = m_Blobs.Read(objects[GitEntry::Ours]);
     merge.texts.theirs = m_Blobs.Read(objects[GitEntry::Theirs]);
     if (!merge.isBothAdded) merge.texts.base = m_Blobs.Read(objects[GitEntry::Base]);

@@ -51,7 +51,8 @@ std::string TextOf(const json& value) {
     return value.dump(-1, ' ', false, json::error_handler_t::replace);
 }
 
-void Write(const std::string& file, const std::string& header, const std::vector<const std::string*>& parts) {
+void Write(const std::string& file, const std::string& header, const std::vector<const std::string*>& parts,
+           Durability durability) {
     Content content;
     content.size = header.size();
     for (const std::string* part : parts) content.size += part->size();
@@ -59,8 +60,7 @@ void Write(const std::string& file, const std::string& header, const std::vector
         stream << header;
         for (const std::string* part : parts) stream << *part;
     };
-    // As safe as what version control writes of the merge itself.
-    content.durability = Durability::Unsynced;
+    content.durability = durability;
     if (const int error = Deliver(file, content))
         throw Failure("Cannot write " + file + ": " + std::system_category().message(error));
 }
@@ -182,7 +182,9 @@ void OpenMerges::Add(OpenMerge& merge) {
     if (error) throw Failure("Cannot make the folder " + m_Folder + ": " + error.message());
     merge.identity = NewIdentity();
     const auto parts = PartsOf(merge);
-    Write(PlaceOf(merge.path).file + kMergeExtension, HeaderOf(merge), {parts.begin(), parts.end()});
+    // As safe as what version control writes of the merge itself.
+    Write(PlaceOf(merge.path).file + kMergeExtension, HeaderOf(merge), {parts.begin(), parts.end()},
+          Durability::Unsynced);
 }
 
 std::vector<OpenMerge> OpenMerges::List() const {
@@ -239,7 +241,8 @@ void OpenMerges::SetProgress(const OpenMerge& merge, const Progress& progress) {
         steps.push_back({{"decisions", step.decisions}, {"number", step.number}});
     const json written = {
         {"identity", merge.identity}, {"open", progress.open}, {"decisions", decisions}, {"steps", steps}};
-    Write(PlaceOf(merge.path).file + kProgressExtension, TextOf(written) + "\n", {});
+    // Nobody else has what a person decided.
+    Write(PlaceOf(merge.path).file + kProgressExtension, TextOf(written) + "\n", {}, Durability::Synced);
 }
 
 void OpenMerges::Remove(const std::string& path) {

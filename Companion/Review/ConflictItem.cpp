@@ -10,7 +10,7 @@ using nlohmann::json;
 
 namespace {
 
-constexpr std::size_t kWidth = 200, kChoiceWidth = 40;
+constexpr std::size_t kWidth = 200, kChoiceWidth = 100;
 
 json NameOrNull(const std::optional<Side>& side) {
     return side ? json(SideName(*side)) : json();
@@ -32,10 +32,8 @@ json ConflictItem(const Conflict& conflict, const ItemState& state) {
                  {"decided", NameOrNull(state.decided)},
                  {"proposed", NameOrNull(state.proposed)}};
     for (const Side side : {Side::Base, Side::Ours, Side::Theirs}) {
-        const std::string& words = conflict.WordsOf(side);
-        item["words"][SideName(side)] = ShortenedAtEnd(words, kWidth);
-        item["choices"][SideName(side)] =
-            "Take " + std::string(SideName(side)) + ": " + ShortenedAtEnd(words, kChoiceWidth);
+        item["words"][SideName(side)] = ShortenedAtEnd(conflict.WordsOf(side), kWidth);
+        item["choices"][SideName(side)] = ShortenedAtEnd(conflict.ChoiceOf(side), kChoiceWidth);
     }
     return item;
 }

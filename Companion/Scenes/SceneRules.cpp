@@ -5,7 +5,9 @@
 #include "Values/YAMLError.h"
 
 #include <cstdlib>
+#include <filesystem>
 #include <new>
+#include <system_error>
 
 namespace ovrin {
 
@@ -34,7 +36,22 @@ void TakeVariable(const char* name, std::string& value) {
     if (text && *text) value = text;
 }
 
+std::string Lasting(const std::string& file, const std::string& byDefault) {
+    if (file == byDefault) return {};
+    std::error_code error;
+    const std::filesystem::path absolute = std::filesystem::absolute(file, error);
+    return error ? file : absolute.string();
+}
+
 } // namespace
+
+std::string FormatFiles::LastingRules() const {
+    return Lasting(rules, kDefaultRulesFile);
+}
+
+std::string FormatFiles::LastingTypeInfo() const {
+    return Lasting(typeInfo, kDefaultTypeInfoFile);
+}
 
 FormatFiles FormatFiles::OfEnvironment() {
     FormatFiles files;

@@ -16,6 +16,9 @@ struct FormatFiles {
 
     /// What the environment says by OVRIN_RULES and OVRIN_TYPE_INFO, empty ones aside.
     static FormatFiles OfEnvironment();
+    /// The names for whoever stands elsewhere later; empty for the files that are taken by default.
+    std::string LastingRules() const;
+    std::string LastingTypeInfo() const;
 };
 
 /// What is known of the format of scenes.

@@ -25,6 +25,17 @@ std::string TellState(const SettleSession::Met& met) {
                        : "settled by what was decided of another place";
 }
 
+json ToJson(const Problem& problem) {
+    json remedies = json::array();
+    for (const Remedy& remedy : problem.remedies) {
+        json decisions = json::array();
+        for (const Decision& decision : remedy.decisions)
+            decisions.push_back({{"path", decision.path}, {"side", SideName(decision.side)}});
+        remedies.push_back({{"text", remedy.text}, {"decisions", decisions}});
+    }
+    return {{"text", problem.text}, {"remedies", remedies}};
+}
+
 } // namespace
 
 std::vector<std::string> NextSteps(const Repository& repository, const std::string& action) {
@@ -56,6 +67,7 @@ std::string TellConflicts(SettleSession& session) {
         if (met.proposed) text += std::string("    proposed: ") + SideName(*met.proposed) + '\n';
         text += "    path    " + Printable(conflict.path) + '\n';
     }
+    for (const Problem& problem : session.Problems()) text += "  problem: " + problem.text + '\n';
     return text;
 }
 
@@ -70,6 +82,8 @@ json ToJson(SettleSession& session) {
         conflict["proposed"] = met.proposed ? json(SideName(*met.proposed)) : json();
         conflicts.push_back(std::move(conflict));
     }
+    json& problems = written["problems"] = json::array();
+    for (const Problem& problem : session.Problems()) problems.push_back(ToJson(problem));
     return written;
 }
 

@@ -38,7 +38,7 @@ void SettleDesk::Refresh() {
             if (met.proposed) ++m_Proposed;
         }
         m_Open += session.Open().size();
-        for (const std::string& line : session.Missing()) m_Problems.push_back({scene, line, {}});
+        for (const Problem& problem : session.Problems()) m_Problems.push_back({problem, scene});
     }
 }
 

@@ -42,6 +42,7 @@ SettleSession::SettleSession(OpenMerge merge, Progress progress)
       m_Places(MergedOnce(m_Merge, m_Source.take), m_Names) {
     Meet();
     if (m_Source.identity.empty()) m_Source.conflicts = Open().size();
+    m_Problems = FindProblems(m_Merge, m_Names);
     if (!m_Decisions.empty()) MergeAgain();
 }
 
@@ -84,7 +85,7 @@ std::vector<std::string> SettleSession::MergeAgain() {
         MergeHere(m_Merge, {}, m_Source.take);
     }
     TakeStates(merged.open);
-    m_Missing = std::move(merged.missing);
+    m_Problems = std::move(merged.problems);
     return std::move(merged.unmatched);
 }
 
@@ -104,6 +105,13 @@ std::optional<std::size_t> SettleSession::FindPlain(const Decision& decision) {
     const auto [isPlain, isNew] = m_ArePlain.try_emplace(*found, false);
     if (isNew) isPlain->second = IsPlainValue(m_Conflicts[*found], m_Places);
     return isPlain->second ? found : std::nullopt;
+}
+
+bool SettleSession::IsAsMerged(MergeNames::ID object) {
+    return std::ranges::all_of(m_Decisions, [&](const Decision& decision) {
+        const std::optional<std::size_t> at = FindPlain(decision);
+        return at && m_Conflicts[*at].path.front() != object;
+    });
 }
 
 /// Makes what follows from decisions, without merging. False if a merge must tell.
@@ -154,14 +162,14 @@ template <class Step> auto SettleSession::OrBack(const Step& step) {
     const std::vector<Decision> decisions = m_Decisions;
     const std::vector<DecisionStep> steps = m_Steps;
     const std::vector<MetConflicts::State> states = m_Conflicts.States();
-    const std::vector<std::string> missing = m_Missing;
+    const std::vector<Problem> problems = m_Problems;
     try {
         return step();
     } catch (...) {
         m_Decisions = decisions;
         m_Steps = steps;
         m_Conflicts.SetStates(states);
-        m_Missing = missing;
+        m_Problems = problems;
         throw;
     }
 }

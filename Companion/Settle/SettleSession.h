@@ -42,8 +42,8 @@ public:
     const std::vector<Decision>& Decisions() const { return m_Decisions; }
     /// Nothing is open, and a scene that both sides added was looked through, which a step shows.
     bool IsSettled() const { return Open().empty() && !(m_Merge.IsBothAdded() && m_Steps.empty()); }
-    /// What the result lacks although something in it needs it, a line each.
-    const std::vector<std::string>& Missing() const { return m_Missing; }
+    /// What is wrong with the result.
+    const std::vector<Problem>& Problems() const { return m_Problems; }
 
     using Met = MetConflict;
     /// The conflicts of the merge as it began and those that decisions led to, in the order of the hierarchy.
@@ -88,6 +88,10 @@ public:
     /// Writes the decisions down, and the merge itself if nobody has.
     void Keep(OpenMerges& store);
 
+    /// Whether an object is in the result as Merge() has it: every decision so far is about one value of
+    /// another object, and changes nothing else. False where only a merge could tell.
+    bool IsAsMerged(MergeNames::ID object);
+
     /// What `make` returns in a process of its own, where Merge() is merged by the decisions
     /// (Settle/MergedScene.h).
     std::string InMerged(const std::function<std::string()>& make);
@@ -126,7 +130,7 @@ private:
     const EarlierDecisions* m_Earlier = nullptr;
     MetConflicts m_Conflicts;
     std::map<std::size_t, bool> m_ArePlain; // those conflicts of which it was asked, by their indexes
-    std::vector<std::string> m_Missing;
+    std::vector<Problem> m_Problems;
 };
 
 } // namespace ovrin

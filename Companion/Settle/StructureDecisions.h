@@ -32,8 +32,8 @@ public:
 
     /// For a Transform in a loop, at which `side` is taken: the lists of children follow.
     void EndLoop(ID transform, Side side);
-    /// For objects that `without`, ours or theirs, lacks and the other side has: they are kept, with the whole
-    /// of what was removed or added with them.
+    /// For objects that `without`, ours or theirs, lacks and the other side has: they are kept, with the
+    /// whole of what was removed or added with them.
     void Keep(const std::vector<ID>& ids, Side without);
     /// For such objects the other way round: they go, with what stands under them.
     void Remove(const std::vector<ID>& ids, Side without);

@@ -3,6 +3,7 @@
 #include "Review/ViewRequests.h"
 #include "Settle/MergedScene.h"
 #include "Settle/SettleSession.h"
+#include "Values/YAMLScalar.h"
 #include "Words/Failure.h"
 
 #include <algorithm>
@@ -67,8 +68,9 @@ std::optional<PageAnswer> DeskViews::Answer(const PageRequest& request) {
     if (std::ranges::find(kKnown, request.path) == kKnown.end()) return {};
     const std::size_t scene = QueryNumber(request, "scene", 0, std::numeric_limits<std::size_t>::max());
     if (scene >= m_Views.size()) throw Failure("There is no such scene");
-    // Only the values of an object come from the result, which without decisions is there already.
-    if (request.path == "api/object" && !m_Desk.Scenes()[scene]->Decisions().empty())
+    // Only the values of an object come from the result.
+    const auto* object = ovrin_yaml::YAMLScalar::Lookup(QueryText(request, "id"));
+    if (request.path == "api/object" && !m_Desk.Scenes()[scene]->IsAsMerged(object))
         return AnswerMerged(scene, request);
     return AnswerView(View(scene), request);
 }

@@ -53,14 +53,18 @@ std::optional<int> GateServer::Bind(int port) {
     const int bound = port == 0 ? bind_to_any_port(kLoopback) : bind_to_port(kLoopback, port) ? port : -1;
     // The library lets five connections wait, and a browser that is one too many tries again after a second.
     if (bound <= 0 || ::listen(svr_sock_, SOMAXCONN) != 0) return {};
+    m_Peers.emplace(bound);
     return m_Address.port = bound;
 }
 
 bool GateServer::process_and_close_socket(socket_t socket) {
     const Descriptor closed(socket);
     ServeRequest(socket);
-    FinishSending(socket);
-    if (m_IsOver) _exit(EXIT_SUCCESS); // the page has its last answer
+    {
+        const Connections::Awaiting awaiting(*m_Connections, socket); // nothing that would be missed
+        FinishSending(socket);
+    }
+    if (m_LastAnswerer == std::this_thread::get_id()) _exit(EXIT_SUCCESS); // the page has its last answer
     return true;
 }
 
@@ -74,6 +78,8 @@ void GateServer::ServeRequest(int socket) {
         if (!head) return;
         const std::optional<RequestHead> parsed = ParseRequestHead(*head);
         checked = parsed ? CheckRequest(*parsed, m_Address) : RefusedRequest{400, "This is no request"};
+        if (std::holds_alternative<PassedRequest>(checked) && !m_Peers->IsOurs(socket))
+            checked = RefusedRequest{403, "The page is another user's"};
         if (const auto* passed = std::get_if<PassedRequest>(&checked)) body = reader.Body(passed->bodyLength);
     }
     if (const auto* refused = std::get_if<RefusedRequest>(&checked)) return Refuse(socket, *refused);
@@ -100,7 +106,7 @@ void GateServer::Ask(const httplib::Request& request, httplib::Response& respons
     const WebFrame answer = m_Model.Ask(frame);
     response.status = std::atoi(answer[1].c_str());
     response.set_content(answer[3], answer[2]);
-    if (!answer[4].empty()) m_IsOver = true;
+    if (!answer[4].empty()) m_LastAnswerer = std::this_thread::get_id();
 }
 
 /// An event stream, on which nothing but a sign of life is ever sent.

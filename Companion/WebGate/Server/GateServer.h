@@ -4,10 +4,13 @@
 #include "WebGate/Server/Connections.h"
 #include "WebGate/Server/ModelPipe.h"
 #include "WebGate/Server/OpenPages.h"
+#include "WebGate/Server/PeerCheck.h"
 
 #include <atomic>
 #include <httplib.h>
+#include <optional>
 #include <string>
+#include <thread>
 
 namespace ovrin {
 
@@ -32,8 +35,9 @@ private:
     ModelPipe& m_Model;
     OpenPages m_Pages;
     PageAddress m_Address;
-    Connections* m_Connections = nullptr; // the library's
-    std::atomic<bool> m_IsOver = false;
+    std::optional<PeerCheck> m_Peers;
+    Connections* m_Connections = nullptr;        // the library's
+    std::atomic<std::thread::id> m_LastAnswerer; // who has the answer after which nothing is served
 };
 
 } // namespace ovrin

@@ -3,8 +3,8 @@ const MOST_ASKED_AT_FIRST = 120;
 const MOST_ROWS_AT_FIRST = 400;
 
 /**
- * The branches of one scene's hierarchy that somebody opened: their nodes, fetched by pieces. Filters are "touched", what
- * was changed or is open; "open"; and "all".
+ * The branches of one scene's hierarchy that somebody opened: their nodes, fetched by pieces. Filters are "touched",
+ * what was changed or is open; "open"; and "all".
  */
 export class Branches {
     /**
@@ -28,7 +28,8 @@ export class Branches {
             level.forEach((id) => id !== null && this.opened.add(id));
             const nodes = branches.flatMap((branch) => branch.nodes);
             rows += nodes.length;
-            level = nodes.filter((node) => node.children && node.below.changed + node.below.open > 0).map(({ id }) => id);
+            const isTouched = ({ children, below }) => children && below.changed + below.open > 0;
+            level = nodes.filter(isTouched).map(({ id }) => id);
         }
     }
 

@@ -1,6 +1,6 @@
 import { make, makeButton } from "./dom.js";
 import { showValue } from "./value.js";
-import { SIDES, capital, splitName } from "./words.js";
+import { SIDES, capital, propertyWords, splitName } from "./words.js";
 
 const KEYS = { base: "B", ours: "O", theirs: "T" };
 
@@ -17,8 +17,7 @@ export function makeCard(page, steps, row, follow) {
     return make("article", { class: "card", "aria-labelledby": "card-title" },
         make("h2", { id: "card-title" },
             make("span", { class: "above" }, name.above ? `${name.above} / ` : ""), name.own,
-            make("span", { class: "property" }, item.property ? ` · ${item.property}` : "")),
-        name.others ? make("p", { class: "aside" }, name.others) : null,
+            make("span", { class: "property" }, item.property ? ` · ${propertyWords(item.property)}` : "")),
         make("p", { class: "what" }, stateWords(item)),
         make("div", { class: "columns" }, ...SIDES.map((side) => makeColumn(page, steps, side, row, follow))),
         makeResult(item, row, follow),
@@ -27,15 +26,17 @@ export function makeCard(page, steps, row, follow) {
 
 function stateWords(item) {
     const what = `${capital(item.what)}.`;
-    if (!item.isOpen) return `${what} ${item.decided ? `You took ${item.decided}.` : "Another decision settled it, too."}`;
-    return item.proposed ? `${what} Open; the same was decided before: ${item.proposed}.` : `${what} Open.`;
+    if (!item.isOpen) return `${what} ${item.decided ? `You took ${item.decided}.` : "Another decision settled it."}`;
+    if (item.decided) return `${what} You took ${item.decided}, which alone doesn't settle it.`;
+    return item.proposed ? `${what} Open; it was decided before: ${item.proposed}.` : `${what} Open.`;
 }
 
 function makeColumn(page, steps, side, row, follow) {
     const { item } = page;
     const { title, label } = page.columns.find((column) => column.side === side);
-    const isTaken = !item.isOpen && item.decided === side;
-    const value = row ? showValue(row.values[side], side === "base" ? undefined : row.values.base, row.type, follow)
+    const isTaken = item.decided === side;
+    const before = side === "base" || !item.property ? undefined : row?.values.base;
+    const value = row ? showValue(row.values[side], before, typeOf(item, row), follow)
         : make("div", { class: "value" }, item.words[side]);
     const sign = isTaken ? make("span", { class: "taken" }, "✓ taken") : null;
     return make("div", { class: `side side-${side}${isTaken ? " is-taken" : ""}`, role: "group", "aria-label": title },
@@ -47,7 +48,7 @@ function makeColumn(page, steps, side, row, follow) {
 function makeChoice(page, steps, side, isTaken) {
     const { item } = page;
     const isProposed = item.isOpen && item.proposed === side;
-    const words = make("span", {}, item.choices[side], isProposed ? make("em", {}, " (as before)") : null);
+    const words = make("span", {}, capital(item.choices[side]), isProposed ? make("em", {}, " (as before)") : null);
     const button = makeButton(words, () => steps.take(side), {
         key: KEYS[side], focus: `take-${side}`, className: `choice take-${side}`, title: `Take ${side}`,
     });
@@ -59,7 +60,12 @@ function makeResult(item, row, follow) {
     if (!row) return make("div", { class: "result" }, make("h3", {}, "Result"), item.isOpen ? "not decided" : "…");
     const note = item.isOpen ? make("span", { class: "aside" }, " until it is decided") : null;
     return make("div", { class: `result${item.isOpen ? " is-open" : ""}` }, make("h3", {}, "Result"),
-        showValue(row.values.result, undefined, row.type, follow), note);
+        showValue(row.values.result, undefined, typeOf(item, row), follow), note);
+}
+
+/** Of an object as a whole the values say what happened to it. */
+function typeOf(item, row) {
+    return item.property ? row.type : "text";
 }
 
 function makeUnder(page, steps) {

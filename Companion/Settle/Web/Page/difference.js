@@ -1,6 +1,6 @@
 /**
- * What became of a text: by lines where there are several, within what differs by words, and by characters within a single
- * word. The work is bounded: texts that have too little in common are shown as one removed and one added.
+ * What became of a text: by lines where there are several, within what differs by words, and by characters within a
+ * single word. The work is bounded: texts that have too little in common are shown as one removed and one added.
  */
 
 const MOST_EDITS = 400;

@@ -20,11 +20,7 @@ export class EmbeddedSource {
         if (name === "tree") return piece("nodes", this.children[query.scene].get(query.parent ?? null) ?? [], query);
         if (name === "find") return this.find(query);
         if (name === "object") return this.object(query);
-        return partOfMap(data.scenes[query.scene], query);
-    }
-
-    async post() {
-        throw new RequestFailure("This page shows a review, in which nothing can be decided.", 400);
+        return this.map(query);
     }
 
     /** Nobody is at the other end, and nobody is missed. */
@@ -42,6 +38,12 @@ export class EmbeddedSource {
         for (let above = node.parent; above && !way.includes(above); above = this.nodes[scene].get(above)?.parent)
             way.unshift(above);
         return way;
+    }
+
+    /** The whole map from one side; of a scene that couldn't be read there is nothing. */
+    map(query) {
+        const { map } = this.data.scenes[query.scene];
+        return map[query.view] ?? map;
     }
 
     object(query) {
@@ -64,11 +66,4 @@ function byParent(nodes) {
 function piece(name, all, query) {
     const from = query.from ?? 0;
     return { total: all.length, [name]: all.slice(from, from + (query.count ?? all.length)) };
-}
-
-function partOfMap(scene, query) {
-    const views = scene.map.top ? scene.map : { top: scene.map };
-    const map = views[query.view];
-    if (!map) throw new RequestFailure("This file holds the map from above only.", 404);
-    return map;
 }

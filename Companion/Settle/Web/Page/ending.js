@@ -1,5 +1,5 @@
 import { make, makeButton, part } from "./dom.js";
-import { counted } from "./words.js";
+import { counted, readyScenes } from "./words.js";
 
 /** How a session ends: what is settled is written, or everything is kept for another time. */
 export class Ending {
@@ -15,11 +15,11 @@ export class Ending {
     /** Asks whether the result is to be written. */
     askToFinish(reason) {
         if (reason) return this.notices.happened(reason);
-        const ready = this.page.session.scenes.filter((scene) => scene.open === 0 && !scene.problem);
+        const ready = readyScenes(this.page.session);
         const open = this.page.session.open;
         const words = open ? `${counted(open, "conflict")} in other scenes stay${open === 1 ? "s" : ""} open.` : "";
         return this.ask(`Write ${ready.length === 1 ? "the result" : counted(ready.length, "result")}?`, [
-            make("p", {}, "Each result takes the place of its scene's file, and version control is told that it is settled:"),
+            make("p", {}, "Each takes the place of its scene's file, and version control is told that it is settled:"),
             make("ul", {}, ...ready.map(({ path }) => make("li", {}, path))),
             words ? make("p", {}, words) : null,
         ], makeButton("Write", () => this.finish(false), { className: "primary" }));
@@ -44,12 +44,24 @@ export class Ending {
     finish(overwrite) {
         part("ending").close();
         return this.steps.inTurn(async () => {
-            const answer = await this.steps.post("finish", { overwrite });
+            const answer = await this.askLast(() => this.steps.post("finish", { overwrite }));
             if (answer.isOver) return this.end(finishedWords(answer.finished), answer);
             await this.page.load();
             await this.page.renewItem();
             return this.tellRest(answer, overwrite);
         });
+    }
+
+    /** Asks for what the program may end with, which is no loss of the connection then. */
+    async askLast(ask) {
+        let answer = null;
+        this.page.source.stopWatching();
+        try {
+            answer = await ask();
+        } finally {
+            if (!answer?.isOver) this.notices.watch(this.page);
+        }
+        return answer;
     }
 
     /** What was written, what wasn't and why, where the session goes on. */
@@ -67,8 +79,9 @@ export class Ending {
     leave() {
         part("ending").close();
         return this.steps.inTurn(async () => {
-            const answer = await this.page.source.post("leave", {});
-            this.end("You left; all decisions are kept", { finished: [], remarks: [], ...answer });
+            const leave = async () => ({ ...await this.page.source.post("leave", {}), isOver: true });
+            const { next } = await this.askLast(leave);
+            this.end("You left; all decisions are kept", { finished: [], remarks: [], next });
         });
     }
 
@@ -84,7 +97,8 @@ export class Ending {
 }
 
 function finishedWords(finished) {
-    return finished.length === 1 ? "The scene is settled and written" : `${finished.length} scenes are settled and written`;
+    const what = finished.length === 1 ? "The scene is" : `${finished.length} scenes are`;
+    return `${what} settled and written`;
 }
 
 function listOf(lines) {

@@ -1,5 +1,5 @@
 import { make, makeButton, part, refill } from "./dom.js";
-import { MARKS, SIDES, capital, counted, openWords } from "./words.js";
+import { MARKS, SIDES, capital, counted, openWords, readyScenes } from "./words.js";
 
 /** What sides are whose branch isn't known. */
 const UNNAMED = { base: "before both", ours: "yours", theirs: "what is merged in" };
@@ -35,8 +35,7 @@ export class Header {
         } else {
             const choose = (event) => this.page.selectScene(Number(event.target.value));
             const select = make("select", { "aria-label": "Scene", "data-focus": "scene", onchange: choose },
-                ...session.scenes.map(({ path, open }, at) => make("option", { value: String(at) },
-                    session.total ? `${path} (${open} open)` : path)));
+                ...session.scenes.map((scene, at) => makeSceneOption(session, scene, at)));
             select.value = String(scene);
             refill(part("scenes"), [select]);
         }
@@ -108,10 +107,16 @@ export class Header {
 
     /** Why there is nothing to write; empty if there is. */
     whyNotFinish() {
-        const { isSettled, open, scenes } = this.page.session;
-        if (isSettled || scenes.some((scene) => scene.open === 0 && scene.settled > 0)) return "";
+        const { open } = this.page.session;
+        if (readyScenes(this.page.session).length) return "";
         if (open === 0) return "Both sides added the scene: look through it, and take it as it is, above.";
         return `${counted(open, "conflict")} ${open === 1 ? "is" : "are"} open. Decide ${open === 1 ? "it" : "them"} ` +
             "first, or leave: what is decided is kept.";
     }
+}
+
+/** One that can't be read is told by the problems, and can't be chosen. */
+function makeSceneOption({ total }, { path, open, problem }, at) {
+    const words = total ? `${path} (${open} open)` : path;
+    return make("option", { value: String(at), disabled: Boolean(problem) }, words);
 }

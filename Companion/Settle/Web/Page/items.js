@@ -27,7 +27,8 @@ export class ConflictItems {
         const known = this.pieces.get(number);
         if (known) return known;
         const { pieces } = this;
-        const asked = this.source.get("conflicts", { from: number * LIST_PIECE, count: LIST_PIECE }).then((answer) => answer.items);
+        const query = { from: number * LIST_PIECE, count: LIST_PIECE };
+        const asked = this.source.get("conflicts", query).then((answer) => answer.items);
         pieces.set(number, asked);
         asked.catch(() => pieces.delete(number));
         return asked;

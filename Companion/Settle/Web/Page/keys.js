@@ -7,17 +7,18 @@ import { VIEWS } from "./tabs.js";
  */
 function listKeys(page, steps, ways) {
     const next = (direction) => goToOpen(page, steps, direction);
+    const sides = [["o", "ours"], ["t", "theirs"], ["b", "base"]];
     const views = VIEWS.map(([view, title], at) =>
         ({ keys: [String(at + 1)], words: `the view ${title.toLowerCase()}`, act: () => page.show(view) }));
     return [
         { keys: ["j", "n"], words: "next open conflict", act: () => next(1), isHint: "next open" },
         { keys: ["k", "p"], words: "previous open conflict", act: () => next(-1), isHint: "previous" },
-        { keys: ["o"], words: "take ours", act: () => steps.take("ours"), isStep: true, isHint: "ours" },
-        { keys: ["t"], words: "take theirs", act: () => steps.take("theirs"), isStep: true, isHint: "theirs" },
-        { keys: ["b"], words: "take base", act: () => steps.take("base"), isStep: true, isHint: "base" },
-        { keys: ["O"], words: "ours for this object and all below it", act: () => steps.takeUnder("ours"), isStep: true },
-        { keys: ["T"], words: "theirs for this object and all below it", act: () => steps.takeUnder("theirs"), isStep: true },
-        { keys: ["B"], words: "base for this object and all below it", act: () => steps.takeUnder("base"), isStep: true },
+        ...sides.map(([key, side]) =>
+            ({ keys: [key], words: `take ${side}`, act: () => steps.take(side), isStep: true, isHint: side })),
+        ...sides.map(([key, side]) => ({
+            keys: [key.toUpperCase()], words: `${side} for this object and all below it`,
+            act: () => steps.takeUnder(side), isStep: true,
+        })),
         { keys: ["u"], words: "undo", act: () => steps.undo(), isStep: true, isHint: "undo" },
         { keys: ["r"], words: "redo", act: () => steps.redo(), isStep: true },
         ...views,
@@ -29,7 +30,7 @@ function listKeys(page, steps, ways) {
 
 const ELSEWHERE = [
     ["Tab", "from one control to the next"],
-    ["↑ ↓ Home End", "in the list of conflicts: another conflict, open or not; in the hierarchy: another object"],
+    ["↑ ↓ Home End", "in the list: another conflict, open or not; in the hierarchy: another object"],
     ["← →", "in the hierarchy: close and open a branch; on the map: move it"],
     ["Enter", "in the hierarchy: the object's values; on the map: select"],
     ["+ − 0 , .", "on the map: zoom in, zoom out, show all, previous and next mark"],
@@ -68,7 +69,8 @@ export class Keys {
     showHints() {
         if (part("hints").firstChild) return;
         part("hints").append(...this.offered().filter(({ isHint }) => isHint).flatMap(({ keys, isHint }) =>
-            [make("kbd", {}, keys[0]), ` ${isHint} `]), makeButton("All keys", () => this.help(), { key: "?", className: "quiet" }));
+            [make("kbd", {}, keys[0]), ` ${isHint} `]),
+        makeButton("All keys", () => this.help(), { key: "?", className: "quiet" }));
     }
 
     /** Opens the help, which tells all of them and can switch them off. */
@@ -81,7 +83,8 @@ export class Keys {
             make("dl", { class: "keys" }, ...rows.flatMap(([keys, words]) =>
                 [make("dt", {}, ...keys.split(" ").map((key) => make("kbd", {}, key))), make("dd", {}, words)])),
             make("label", {}, box, " Single letters are keys"),
-            make("p", { class: "dialog-buttons" }, makeButton("Close", () => dialog.close(), { className: "primary" })));
+            make("p", { class: "dialog-buttons" },
+                makeButton("Close", () => dialog.close(), { className: "primary" })));
         dialog.showModal();
     }
 }

@@ -1,11 +1,11 @@
 import { make, part } from "./dom.js";
-import { splitName } from "./words.js";
+import { propertyWords, splitName } from "./words.js";
 
 const ROW_HEIGHT = 48;
 
 /**
- * The list of conflicts, grouped by object. It is made of pieces: those in sight are filled, others are empty and as high
- * as their rows would be, so that any number can be scrolled through.
+ * The list of conflicts, grouped by object. It is made of pieces: those in sight are filled, others are empty and as
+ * high as their rows would be, so that any number can be scrolled through.
  */
 export class ConflictList {
     /** @param {import("./state.js").PageState} page */
@@ -83,11 +83,10 @@ export class ConflictList {
     }
 
     makeOption(item) {
-        const property = item.property || "the whole object";
         return make("div", {
             role: "option", id: `item-${item.index}`, "data-index": item.index, class: `option ${stateClass(item)}`,
             "aria-selected": "false", "aria-setsize": this.page.items.total, "aria-posinset": item.index + 1,
-        }, make("span", { class: "option-property" }, property), makeBadge(item),
+        }, make("span", { class: "option-property" }, propertyWords(item.property)), makeBadge(item),
         make("span", { class: "option-what" }, item.what));
     }
 
@@ -100,7 +99,9 @@ export class ConflictList {
         const total = this.page.items.total;
         const at = this.page.item?.index ?? -1;
         const page = Math.max(1, Math.floor(this.box.clientHeight / ROW_HEIGHT) - 1);
-        const targets = { ArrowDown: at + 1, ArrowUp: at - 1, PageDown: at + page, PageUp: at - page, Home: 0, End: total - 1 };
+        const targets = {
+            ArrowDown: at + 1, ArrowUp: at - 1, PageDown: at + page, PageUp: at - page, Home: 0, End: total - 1,
+        };
         if (!(event.key in targets) || event.ctrlKey || event.altKey || event.metaKey) return;
         event.preventDefault();
         this.page.selectItem(Math.min(total - 1, Math.max(0, targets[event.key])));
@@ -119,7 +120,8 @@ export class ConflictList {
     }
 
     markSelected() {
-        this.box.querySelectorAll('[aria-selected="true"]').forEach((row) => row.setAttribute("aria-selected", "false"));
+        for (const option of this.box.querySelectorAll('[aria-selected="true"]'))
+            option.setAttribute("aria-selected", "false");
         const row = this.page.item && document.getElementById(`item-${this.page.item.index}`);
         if (row) row.setAttribute("aria-selected", "true");
         if (row) this.box.setAttribute("aria-activedescendant", row.id);
@@ -131,7 +133,8 @@ function makeGroup(item) {
     const name = splitName(item.object || "The order of fields");
     return make("div", { role: "group", class: "list-group", "aria-label": item.heading || name.own },
         make("div", { class: "list-object", title: item.heading, "aria-hidden": "true" },
-            make("span", { class: "own" }, name.own), make("span", { class: "above" }, name.above && ` in ${name.above}`)));
+            make("span", { class: "own" }, name.own),
+            make("span", { class: "above" }, name.above && ` in ${name.above}`)));
 }
 
 function stateClass(item) {
@@ -140,8 +143,13 @@ function stateClass(item) {
 
 /** The state in words and a shape; "followed" where a decision elsewhere settled it. */
 function makeBadge(item) {
-    const words = item.isOpen ? (item.proposed ? `open, before: ${item.proposed}` : "open") : item.decided ?? "followed";
+    const words = item.isOpen ? openState(item) : item.decided ?? "followed";
     const sign = item.isOpen ? "◆" : "✓";
     return make("span", { class: `badge badge-${item.isOpen ? "open" : item.decided ?? "followed"}` },
         make("span", { "aria-hidden": "true" }, sign), ` ${words}`);
+}
+
+function openState({ decided, proposed }) {
+    if (decided) return `open, took ${decided}`;
+    return proposed ? `open, before: ${proposed}` : "open";
 }

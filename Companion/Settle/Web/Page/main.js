@@ -18,6 +18,20 @@ import { ValuesView } from "./values.js";
 async function startPage() {
     const page = new PageState(openSource());
     const notices = new Notices();
+    try {
+        await page.load();
+    } catch (failure) {
+        part("title").textContent = "Nothing can be shown";
+        notices.alert(failure.message);
+        return;
+    }
+    buildPage(page, notices);
+    page.tell("session");
+    notices.watch(page);
+    await showFirst(page);
+}
+
+function buildPage(page, notices) {
     const steps = new Steps(page, notices);
     const ending = new Ending(page, steps, notices);
     const ways = {
@@ -34,22 +48,15 @@ async function startPage() {
     new TreeView(page, notices);
     new MapView(page, notices);
     showStrip(page, steps);
-    try {
-        await page.load();
-    } catch (failure) {
-        part("title").textContent = "Nothing can be shown";
-        notices.alert(failure.message);
-        return;
-    }
-    page.source.watch((isThere) => notices.connection(isThere, page.session.mode));
-    await showFirst(page);
 }
 
-/** The first conflict that is open, or the first one; where there are none, the hierarchy. */
+/** The first conflict that is open, or the first one; where there are none, the first object that was touched. */
 async function showFirst(page) {
-    page.show(page.session.total ? "values" : "hierarchy");
-    const first = (await page.items.nextOpen(-1, 1)) ?? (page.session.total ? await page.items.at(0) : null);
+    const { total } = page.session;
+    page.show(total ? "values" : "hierarchy");
+    const first = (await page.items.nextOpen(-1, 1)) ?? (total ? await page.items.at(0) : null);
     if (first) await page.selectItem(first.index);
+    else await page.selectTouched();
     if (!part("list").hidden && page.canDecide) part("conflicts").focus();
 }
 

@@ -1,13 +1,14 @@
 import { Camera } from "./camera.js";
 import { draw, make, makeButton, part } from "./dom.js";
 import { bundleWords, drawBundle, drawDots, drawGrid, drawItem, drawLabels, spotOf, spotWords } from "./mapmarks.js";
+import { watchDrags } from "./drag.js";
 import { MARKS } from "./words.js";
 
 const CELL = 44;
 const MOST_CELLS = 64;
 const WAIT_FOR_MORE = 140;
 const NEAR = 16;
-/** What is asked for reaches beyond what is in sight by this part of it, so that little moves need nothing new. */
+/** By this part of what is in sight more is asked for on each side, so that little moves need nothing new. */
 const BEYOND = 0.25;
 const AXES_OF = { top: ["x", "z"], side: ["x", "y"] };
 
@@ -18,7 +19,8 @@ export class MapView {
      * @param {import("./notice.js").Notices} notices
      */
     constructor(page, notices) {
-        Object.assign(this, { page, notices, view: "top", camera: new Camera(), answer: null, spots: [], at: -1, timer: 0 });
+        Object.assign(this, { page, notices, view: "top", camera: new Camera() });
+        Object.assign(this, { answer: null, dots: [], spots: [], at: -1, timer: 0 });
         this.svg = draw("svg", { id: "chart", role: "listbox", tabindex: "0", "aria-describedby": "map-keys" });
         this.tip = make("p", { class: "tip", "aria-hidden": "true", hidden: true });
         this.frame = make("div", { class: "map-frame" }, this.svg, this.tip, this.makeButtons());
@@ -51,10 +53,10 @@ export class MapView {
     makeLegend() {
         const entry = (mark) => make("span", { class: `mark mark-${mark}` }, `${MARKS[mark].sign} ${MARKS[mark].word}`);
         const arrow = (side, words) => make("span", { class: `legend-arrow legend-${side}` }, `⟶ ${words}`);
-        this.arrows = make("span", {}, arrow("ours", "where ours has it"), arrow("theirs", "where theirs has it"));
+        const arrows = make("span", {}, arrow("ours", "where ours has it"), arrow("theirs", "where theirs has it"));
         return make("p", { class: "legend" }, entry("added"), entry("removed"), entry("changed"),
-            make("span", { class: "mark mark-moved" }, "■ moved"), entry("open"), this.arrows,
-            make("span", { class: "aside" }, "• unchanged"));
+            make("span", { class: "mark mark-moved" }, "■ moved"), this.page.session.total ? entry("open") : null,
+            this.page.isComparison ? null : arrows, make("span", { class: "aside" }, "• unchanged"));
     }
 
     listen() {
@@ -63,7 +65,11 @@ export class MapView {
             event.preventDefault();
             this.zoom(Math.exp(-event.deltaY / 400), [event.offsetX, event.offsetY]);
         }, { passive: false });
-        svg.addEventListener("pointerdown", (event) => this.grab(event));
+        watchDrags(svg, {
+            begin: (event) => this.nearest(event),
+            move: (right, down) => this.pan(right, down),
+            click: (hit) => hit && this.choose(hit),
+        });
         svg.addEventListener("pointermove", (event) => this.hover(event));
         svg.addEventListener("pointerleave", () => (this.tip.hidden = true));
         svg.addEventListener("keydown", (event) => this.press(event));
@@ -87,7 +93,6 @@ export class MapView {
     async follow() {
         const { page } = this;
         if (page.view !== "map") return;
-        this.arrows.hidden = page.isComparison;
         this.resize();
         if (!this.answer || this.scene !== page.scene) await this.loadAll();
         else if (this.isStale) await this.load();
@@ -173,11 +178,12 @@ export class MapView {
         const isDot = (item) => item.mark === "same" && !item.open && item.id !== this.selected;
         const touched = items.filter((item) => !isDot(item));
         this.dots = items.filter(isDot);
-        this.spots = [...touched.map((item) => ({ item, place: spotOf(item) })),
-            ...answer.bundles.map((bundle) => ({ bundle, place: [bundle.x, bundle.y] }))];
+        this.spots = [...answer.bundles.map((bundle) => ({ bundle, place: [bundle.x, bundle.y] })),
+            ...touched.map((item) => ({ item, place: spotOf(item) }))];
         const marks = this.spots.map(({ item, bundle }, at) => bundle ? drawBundle(bundle, camera, `spot-${at}`)
             : drawItem(item, camera, `spot-${at}`, spotWords(item, page.isComparison)));
-        this.moving = draw("g", {}, drawDots(this.dots, camera), ...marks, ...drawLabels(touched, camera));
+        const labels = drawLabels(touched, this.spots, camera);
+        this.moving = draw("g", {}, drawDots(this.dots, camera), ...marks, ...labels);
         this.svg.replaceChildren(drawGrid(camera, AXES_OF[this.view]), this.moving);
         this.svg.setAttribute("aria-label", `Map seen ${this.view === "top" ? "from above" : "from the side"}`);
         this.markSelected();
@@ -193,7 +199,8 @@ export class MapView {
     ring(at, name) {
         const [left, top] = this.camera.toScreen(this.spots[at].place);
         this.svg.querySelector(`.ring-${name}`)?.remove();
-        this.moving.append(draw("circle", { class: `ring ring-${name}`, cx: left, cy: top, r: name === "selected" ? 17 : 21 }));
+        const r = name === "selected" ? 17 : 21;
+        this.moving.append(draw("circle", { class: `ring ring-${name}`, cx: left, cy: top, r }));
     }
 
     /** Brings the keyboard to a mark. */
@@ -249,27 +256,7 @@ export class MapView {
             const distance = away(spot);
             return distance < (best?.distance ?? NEAR) ? { ...spot, distance } : best;
         }, null);
-        return closest(this.spots) ?? closest((this.dots ?? []).map((item) => ({ item, place: spotOf(item) })));
-    }
-
-    grab(event) {
-        if (event.button !== 0) return;
-        const start = [event.clientX, event.clientY];
-        const hit = this.nearest(event);
-        const over = new AbortController();
-        let last = start;
-        this.svg.setPointerCapture(event.pointerId);
-        const move = (moved) => {
-            this.pan(moved.clientX - last[0], moved.clientY - last[1]);
-            last = [moved.clientX, moved.clientY];
-        };
-        const release = (released) => {
-            over.abort();
-            const isClick = Math.hypot(released.clientX - start[0], released.clientY - start[1]) < 4;
-            if (isClick && hit && released.type === "pointerup") this.choose(hit);
-        };
-        this.svg.addEventListener("pointermove", move, over);
-        for (const end of ["pointerup", "pointercancel"]) this.svg.addEventListener(end, release, over);
+        return closest(this.spots) ?? closest(this.dots.map((item) => ({ item, place: spotOf(item) })));
     }
 
     hover(event) {

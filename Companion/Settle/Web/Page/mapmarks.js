@@ -42,9 +42,11 @@ const SHAPES = {
 /** An object that was touched: its mark, and arrows from where it was to where each side has it. */
 export function drawItem(item, camera, id, words) {
     const [left, top] = camera.toScreen(spotOf(item));
-    const spot = draw("g", { transform: `translate(${left.toFixed(1)} ${top.toFixed(1)})`, class: `spot spot-${item.mark}` },
+    const transform = `translate(${left.toFixed(1)} ${top.toFixed(1)})`;
+    const spot = draw("g", { transform, class: `spot spot-${item.mark}` },
         item.open ? draw("path", { class: "open", d: "M0-13L13 0L0 13L-13 0Z" }) : null, ...SHAPES[item.mark]());
-    return draw("g", { id, role: "option", "aria-selected": "false", "aria-label": words }, ...drawArrows(item, camera), spot);
+    return draw("g", { id, role: "option", "aria-selected": "false", "aria-label": words },
+        ...drawArrows(item, camera), spot);
 }
 
 function drawArrows(item, camera) {
@@ -80,12 +82,13 @@ export function drawBundle(bundle, camera, id) {
     const state = bundle.open ? "bundle-open" : bundle.changed ? "bundle-changed" : "";
     return draw("g", { id, role: "option", "aria-selected": "false", "aria-label": bundleWords(bundle),
         class: `bundle ${state}`, transform: `translate(${left.toFixed(1)} ${top.toFixed(1)})` },
-    draw("rect", { x: -width / 2, y: -9, width, height: 18, rx: 9 }), draw("text", { y: 4, "text-anchor": "middle" }, text));
+    draw("rect", { x: -width / 2, y: -9, width, height: 18, rx: 9 }),
+    draw("text", { y: 4, "text-anchor": "middle" }, text));
 }
 
-/** Names beside marks, as many as fit without covering each other. */
-export function drawLabels(items, camera) {
-    const taken = items.map((item) => around(camera.toScreen(spotOf(item)), 22, 22));
+/** The names of items beside their marks, as many as fit without covering each other or any of the spots. */
+export function drawLabels(items, spots, camera) {
+    const taken = spots.map(({ place }) => around(camera.toScreen(place), 22, 22));
     const labels = [];
     for (const item of items) {
         if (labels.length === MOST_LABELS) break;

@@ -1,11 +1,11 @@
 import { make, makeButton, part } from "./dom.js";
 
 const ANEW = {
-    settle: ["The program behind this page has ended. All decisions are kept: call ", "ovrin settle --web", " to go on."],
-    review: ["The program behind this page has ended: call ", "ovrin review", " again to see more."],
+    settle: ["The program behind this page has ended. All decisions are kept: ", "ovrin settle --web", " goes on."],
+    review: ["The program behind this page has ended: ", "ovrin review", " shows more again."],
 };
 
-/** Tells what happened: in the line below, which screen readers read out, or as an alert that stays until it is closed. */
+/** Tells what happened: in the line below, which screen readers read out, or as an alert that stays. */
 export class Notices {
     constructor() {
         this.isOver = false;
@@ -25,6 +25,11 @@ export class Notices {
     clear() {
         if (part("alert").contains(document.activeElement)) part("main").focus();
         part("alert").replaceChildren();
+    }
+
+    /** Tells when the program ends, and when it is there again. */
+    watch(page) {
+        page.source.watch((isThere) => this.connection(isThere, page.session.mode));
     }
 
     /**

@@ -11,8 +11,9 @@ const MOST_HITS = 50;
  */
 export function makeSearch(page, goTo) {
     const input = make("input", {
-        id: "search", type: "search", role: "combobox", placeholder: "Search by name  /", "aria-expanded": "false",
-        "aria-label": "Search the scene by name", "aria-controls": "hits", "aria-autocomplete": "list", autocomplete: "off",
+        id: "search", type: "search", role: "combobox", placeholder: "Search by name  /", autocomplete: "off",
+        "aria-label": "Search the scene by name", "aria-controls": "hits", "aria-autocomplete": "list",
+        "aria-expanded": "false",
     });
     const hits = make("div", { id: "hits", role: "listbox", "aria-label": "Found", hidden: true });
     new Search(page, input, hits, goTo);

@@ -26,10 +26,14 @@ export class ServerSource {
 
     /** Calls `onChange` with whether the program is there, when that changes. */
     watch(onChange) {
-        const alive = new EventSource("api/alive");
-        alive.addEventListener("open", () => onChange(true));
-        alive.addEventListener("error", () => onChange(false));
-        return alive;
+        this.alive = new EventSource("api/alive");
+        this.alive.addEventListener("open", () => onChange(true));
+        this.alive.addEventListener("error", () => onChange(false));
+    }
+
+    /** From now on the program may end. */
+    stopWatching() {
+        this.alive.close();
     }
 
     async ask(address, request) {

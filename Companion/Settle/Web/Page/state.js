@@ -2,6 +2,7 @@ import { ConflictItems } from "./items.js";
 import { capital } from "./words.js";
 
 const MOST_OBJECTS = 60;
+const DEEPEST_LOOK = 30;
 
 /**
  * What the page shows: the session as the program tells it, and what is selected. Views listen to its events:
@@ -71,6 +72,18 @@ export class PageState extends EventTarget {
         if (item && wanted === this.wanted) this.select(scene, id, item);
     }
 
+    /** Selects the first object of the scene that was touched, from the top. */
+    async selectTouched() {
+        let query = { scene: this.scene, from: 0, count: 1, changed: 1 };
+        for (let level = 0; level < DEEPEST_LOOK; ++level) {
+            const { nodes } = await this.source.get("tree", query).catch(() => ({ nodes: [] }));
+            if (!nodes.length) return undefined;
+            if (nodes[0].mark !== "same") return this.selectObject(this.scene, nodes[0].id);
+            query = { ...query, parent: nodes[0].id };
+        }
+        return undefined;
+    }
+
     select(scene, object, item) {
         Object.assign(this, { scene, object, item });
         this.tell("selection");
@@ -81,8 +94,9 @@ export class PageState extends EventTarget {
         const { scenes, total } = this.session;
         const before = scenes.slice(0, scene).reduce((sum, one) => sum + one.open + one.settled, 0);
         const first = before < total ? await this.items.at(before) : undefined;
-        if (first?.scene === scene) await this.selectItem(before);
-        else this.select(scene, null, null);
+        if (first?.scene === scene) return this.selectItem(before);
+        this.select(scene, null, null);
+        return this.selectTouched();
     }
 
     /** Reads the selected conflict again, which a step may have moved. */

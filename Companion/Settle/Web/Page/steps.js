@@ -1,4 +1,4 @@
-import { capital, counted, fullName, openWords } from "./words.js";
+import { capital, counted, fullName, openWords, propertyWords } from "./words.js";
 
 const OUTDATED = "Something was decided elsewhere in the meantime, so nothing was changed now. " +
     "The page shows what holds; please decide again.";
@@ -26,7 +26,8 @@ export class Steps {
             const { item } = this.page;
             if (!item) return this.notices.happened("No conflict is selected.");
             const name = fullName(item.object) || "the scene";
-            const what = `${item.property || "The whole object"} of ${name}: ${side}.`;
+            const about = item.property ? propertyWords(item.property) : "The whole object";
+            const what = `${about} of ${name}: ${side}.`;
             await this.step("take", { item: item.index, side }, what);
         });
     }
@@ -36,7 +37,8 @@ export class Steps {
         return this.inTurn(async () => {
             const { item } = this.page;
             if (!item) return this.notices.happened("No conflict is selected.");
-            await this.step("take", { under: item.index, side }, `${fullName(item.object)} and what stands under it: ${side}.`);
+            const words = `${fullName(item.object)} and what stands under it: ${side}.`;
+            await this.step("take", { under: item.index, side }, words);
         });
     }
 

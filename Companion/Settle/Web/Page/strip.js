@@ -1,5 +1,5 @@
 import { make, makeButton, part, refill } from "./dom.js";
-import { SIDES, capital, splitName } from "./words.js";
+import { SIDES, capital, propertyWords, splitName } from "./words.js";
 
 const STRIP_KEYS = { base: "B", ours: "O", theirs: "T" };
 
@@ -14,7 +14,8 @@ export function showStrip(page, steps) {
         strip.hidden = page.view === "values" || (!page.object && !page.item);
         if (strip.hidden) return;
         const { scene, object, item } = page;
-        const told = item ? null : await page.objectAt(scene, object).catch((failure) => ({ heading: failure.message }));
+        const told = item ? null
+            : await page.objectAt(scene, object).catch((failure) => ({ heading: failure.message }));
         if (page.object !== object || page.item !== item) return;
         refill(strip, item ? makeConflict(page, steps, item) : makeObjectLine(page, told.heading), part("main"));
     };
@@ -27,10 +28,12 @@ function makeObjectLine(page, heading) {
 }
 
 function makeConflict(page, steps, item) {
-    const property = item.property ? ` · ${item.property}` : "";
-    const state = item.isOpen ? "open" : item.decided ? `you took ${item.decided}` : "another decision settled it, too";
-    const name = make("p", {}, make("strong", {}, `${splitName(item.object).own}${property}`), ` — ${item.what}; ${state}`);
-    return [name, make("div", { class: "strip-sides" }, ...SIDES.map((side) => makeStripSide(page, steps, item, side))),
+    const property = item.property ? ` · ${propertyWords(item.property)}` : "";
+    const taken = item.decided ? `you took ${item.decided}` : "";
+    const state = item.isOpen ? ["open", taken].filter(Boolean).join(", ") : taken || "another decision settled it";
+    const name = make("strong", {}, `${splitName(item.object).own}${property}`);
+    const sides = SIDES.map((side) => makeStripSide(page, steps, item, side));
+    return [make("p", {}, name, ` — ${item.what}; ${state}`), make("div", { class: "strip-sides" }, ...sides),
         makeValuesButton(page)];
 }
 
@@ -40,9 +43,9 @@ function makeStripSide(page, steps, item, side) {
     if (!page.canDecide) return make("span", { class: `strip-side chip-${side}` }, name, words);
     const label = make("span", {}, name, words);
     const button = makeButton(label, () => steps.take(side), {
-        key: STRIP_KEYS[side], focus: `strip-${side}`, className: `take-${side}`, title: item.choices[side],
+        key: STRIP_KEYS[side], focus: `strip-${side}`, className: `take-${side}`, title: capital(item.choices[side]),
     });
-    button.setAttribute("aria-pressed", String(!item.isOpen && item.decided === side));
+    button.setAttribute("aria-pressed", String(item.decided === side));
     return button;
 }
 

@@ -12,7 +12,8 @@ export class TreeView {
      * @param {import("./notice.js").Notices} notices
      */
     constructor(page, notices) {
-        Object.assign(this, { page, notices, filter: "touched", branches: null, isStale: true, focused: null, revealed: null });
+        Object.assign(this, { page, notices, filter: "touched", branches: null, isStale: true });
+        Object.assign(this, { focused: null, revealed: null });
         this.tree = make("div", { id: "tree", role: "tree", "aria-label": "Hierarchy of the scene" });
         this.tree.addEventListener("click", (event) => this.click(event));
         this.tree.addEventListener("dblclick", () => this.page.object && this.page.show("values"));
@@ -25,7 +26,9 @@ export class TreeView {
     }
 
     makeFilter() {
-        const offered = Object.entries(FILTERS).filter(([name]) => name !== "all" || this.page.source.isWhole);
+        const { session, source } = this.page;
+        const filters = session.total ? FILTERS : { touched: "What was changed", all: FILTERS.all };
+        const offered = Object.entries(filters).filter(([name]) => name !== "all" || source.isWhole);
         this.select = make("select", { id: "filter", onchange: () => this.setFilter(this.select.value) },
             ...offered.map(([name, words]) => make("option", { value: name }, words)));
         return make("label", {}, "Show ", this.select);

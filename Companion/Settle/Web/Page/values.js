@@ -1,7 +1,7 @@
 import { makeCard } from "./card.js";
 import { make, makeButton, part, refill } from "./dom.js";
 import { showValue } from "./value.js";
-import { MARKS, capital, markWords, splitName } from "./words.js";
+import { MARKS, capital, markWords, propertyWords, splitName } from "./words.js";
 
 const STATES = {
     same: "unchanged", ours: "ours changed it", theirs: "theirs changed it", both: "both did the same", open: "open",
@@ -57,13 +57,15 @@ export class ValuesView {
     /** The object with all fields but the one that stands above already. */
     makeObject(object, above) {
         const { page } = this;
-        const rows = object.rows.filter((row) => row !== above);
+        const { item } = page;
+        const rows = object.rows.filter((row) => row !== above && (!item || row.item !== item.index));
         const none = above ? "No other field of it differs." : "None of its own fields differs.";
         const mark = make("span", { class: `mark mark-${object.mark}` },
             make("span", { class: "sign", "aria-hidden": "true" }, MARKS[object.mark].sign),
             ` ${capital(markWords(object.mark, object.by, page.isComparison))}`);
         return make("section", { class: "object", "aria-labelledby": "object-title" },
-            make("h2", { id: "object-title" }, above ? "Also in " : "", ...headingOf(object)), mark,
+            make("h2", { id: "object-title" }, above ? "Also in " : "", nameOf(object),
+                make("span", { class: "label" }, ` ${object.id}`)), mark,
             makeButton("Show in the hierarchy", () => page.show("hierarchy"), { className: "quiet" }),
             this.makeWay(object), this.makeNames(object), this.makeParts(object),
             rows.length ? this.makeTable(rows) : make("p", { class: "empty" }, none),
@@ -76,20 +78,22 @@ export class ValuesView {
             "in ", ...links.flatMap((link, at) => (at ? [" / ", link] : [link]))) : null;
     }
 
-    /** The names that other versions have for it. */
+    /** The names that versions have for it; those of a component follow those of what it belongs to. */
     makeNames(object) {
         const columns = this.page.columns.filter(({ side }) => side in object.names);
         const names = new Set(columns.map(({ side }) => object.names[side]));
-        if (names.size < 2) return null;
+        const isPart = !names.has(null) && nameOf(object).includes(" · ");
+        if (names.size < 2 || isPart) return null;
         return make("dl", { class: "names" }, ...columns.flatMap(({ side, title }) =>
-            [make("dt", {}, title), make("dd", {}, object.names[side] ?? "isn't there")]));
+            [make("dt", {}, this.page.isComparison ? title : `In ${title.toLowerCase()}`), make("dd", {}, object.names[side] ?? "isn't there")]));
     }
 
     makeParts(object) {
         if (!object.parts.length) return null;
         const links = object.parts.map(({ id, name, mark, open }) => make("li", {},
             makeButton(name, () => this.follow(id), { className: "link" }),
-            mark === "same" ? null : make("span", { class: `mark mark-${mark}` }, ` ${MARKS[mark].sign} ${MARKS[mark].word}`),
+            mark === "same" ? null
+                : make("span", { class: `mark mark-${mark}` }, ` ${MARKS[mark].sign} ${MARKS[mark].word}`),
             open ? make("span", { class: "mark mark-open" }, ` ◆ ${open} open`) : null));
         return make("ul", { class: "parts", "aria-label": "Components" }, ...links);
     }
@@ -106,7 +110,7 @@ export class ValuesView {
     makeRow(row, columns) {
         const { page } = this;
         const isSelected = row.item !== null && row.item === page.item?.index;
-        const name = row.property || "The whole object";
+        const name = propertyWords(row.property);
         const title = row.item === null ? name
             : makeButton(name, () => page.selectItem(row.item), { className: "link", focus: `row-${row.item}` });
         const state = page.isComparison ? null : make("span", { class: `state state-${row.state}` }, STATES[row.state]);
@@ -125,11 +129,9 @@ export class ValuesView {
     }
 }
 
-/** The name, and behind it the id and what other versions call it. */
-function headingOf({ id, heading }) {
-    const cut = heading.lastIndexOf(` (${id}`);
-    if (cut < 0) return [splitName(heading).own];
-    return [splitName(heading.slice(0, cut)).own, make("span", { class: "label" }, heading.slice(cut))];
+/** The object's name in the version that comes first for people. */
+function nameOf({ names, heading }) {
+    return splitName(names.ours ?? names.theirs ?? names.base ?? heading).own;
 }
 
 /** The row of a conflict. Where it is about the id in a reference people see the whole reference. */

@@ -32,8 +32,8 @@ export function openWords(session) {
 }
 
 /**
- * The name of an object without what it stands under, and that: "Lantern · Light" in "Harbour/Pier"; and what other
- * versions call it, "(theirs: Harbour/Lamp · Light)".
+ * The name of an object without what it stands under, and that: "Lantern · Light" in "Harbour/Pier". What other
+ * versions call it, "(theirs: Harbour/Lamp · Light)", is left out.
  * @param {string} name
  */
 export function splitName(name) {
@@ -41,7 +41,12 @@ export function splitName(name) {
     const first = others < 0 ? name : name.slice(0, others);
     const component = first.indexOf(" · ");
     const cut = first.lastIndexOf("/", component < 0 ? first.length : component);
-    return { own: first.slice(cut + 1), above: first.slice(0, Math.max(0, cut)), others: name.slice(first.length).trim() };
+    return { own: first.slice(cut + 1), above: first.slice(0, Math.max(0, cut)) };
+}
+
+/** What a conflict is about, within its object. That the object's id is what refers to it needn't be said. */
+export function propertyWords(property) {
+    return property ? property.replace(/\.fileID$/, "") : "the whole object";
 }
 
 /** "Harbour/Pier/Lantern · Light", without what other versions call it. */
@@ -55,4 +60,10 @@ export function markWords(mark, by, isComparison) {
     const word = MARKS[mark].word;
     if (mark === "same" || !by || isComparison) return word;
     return by === "both" ? `${word} by both` : `${word} by ${by}`;
+}
+
+/** The scenes whose results can be written: everything in them is decided, and they aren't written yet. */
+export function readyScenes({ scenes, isSettled }) {
+    const isDecided = ({ open, settled }) => open === 0 && (settled > 0 || isSettled);
+    return scenes.filter((scene) => isDecided(scene) && !scene.problem && !scene.isFinished);
 }

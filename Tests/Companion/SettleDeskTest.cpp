@@ -1,0 +1,191 @@
+#include "Settle/SettleDesk.h"
+
+#include "Conflicts/DecisionPath.h"
+#include "Systems/Process.h"
+#include "Words/Failure.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <gtest/gtest.h>
+
+namespace {
+
+using namespace ovrin;
+
+const std::string kHeader = "%YAML 1.1\n%TAG !o! tag:ovrin.dev,2011:\n";
+
+/// What stands below Harbour, of Transform 21: a GameObject with a Transform, and a script that has a target.
+std::string Entity(int id, const std::string& name, int father, int target = 0, int range = 1) {
+    const std::string own = std::to_string(id), transform = std::to_string(id + 1),
+                      script = std::to_string(id + 2);
+    return "--- !o!1 &" + own + "\nGameObject:\n  m_Component:\n  - component: {fileID: " + transform +
+           "}\n  - component: {fileID: " + script + "}\n  m_Name: " + name + "\n--- !o!4 &" + transform +
+           "\nTransform:\n  m_GameObject: {fileID: " + own +
+           "}\n  m_Children: []\n  m_Father: {fileID: " + std::to_string(father) + "}\n--- !o!114 &" +
+           script + "\nMonoBehaviour:\n  m_GameObject: {fileID: " + own +
+           "}\n  m_Target: {fileID: " + std::to_string(target) + "}\n  m_Range: " + std::to_string(range) +
+           "\n";
+}
+
+std::string Harbour(const std::string& children) {
+    return "--- !o!1 &20\nGameObject:\n  m_Component:\n  - component: {fileID: 21}\n  m_Name: Harbour\n"
+           "--- !o!4 &21\nTransform:\n  m_GameObject: {fileID: 20}\n  m_Children:" +
+           children + "\n  m_Father: {fileID: 0}\n";
+}
+
+std::string Child(int id) {
+    return "\n  - {fileID: " + std::to_string(id + 1) + "}";
+}
+
+struct SettleDeskTest : testing::Test {
+    static void SetUpTestSuite() { ovrin_yaml::initialize(); }
+    SettleDeskTest() : before(std::filesystem::current_path()) {
+        char folder[] = "/tmp/ovrin-test-XXXXXX";
+        std::filesystem::current_path(mkdtemp(folder));
+        OutputOf({"git", "init", "-q"});
+        setenv("OVRIN_RULES", OVRIN_SOURCE_DIR "/Src/Data/mergerules.txt", 1);
+    }
+    ~SettleDeskTest() override {
+        const auto folder = std::filesystem::current_path();
+        std::filesystem::current_path(before);
+        std::filesystem::remove_all(folder);
+    }
+
+    /// Version control is in the midst of a merge of these, as another program left it.
+    void Merge(const ThreeTexts& texts, const std::string& name = "a.ovrin") {
+        std::ofstream(name) << texts.ours;
+        std::string stages;
+        int stage = 0;
+        for (const std::string& text : {texts.base, texts.ours, texts.theirs}) {
+            const std::string object = OutputOf({"git", "hash-object", "-w", "--stdin"}, {.input = text});
+            stages += "100644 " + object.substr(0, object.find('\n')) + ' ' + std::to_string(++stage) + '\t' +
+                      name + '\n';
+        }
+        OutputOf({"git", "update-index", "--index-info"},
+                 {.input = "0 " + std::string(40, '0') + "\t" + name + "\n" + stages});
+    }
+    SettleDesk& Open() {
+        remarks.clear();
+        desk.reset();
+        scenes = std::make_unique<SettleScenes>(remarks);
+        scenes->Open(remarks);
+        return *(desk = std::make_unique<SettleDesk>(*scenes));
+    }
+    std::string Result() const { return desk->Scenes()[0]->Result(); }
+    std::vector<std::string> Remedies() const {
+        std::vector<std::string> texts;
+        for (const Remedy& remedy : desk->Problems().at(0).remedies) texts.push_back(remedy.text);
+        return texts;
+    }
+
+    const std::filesystem::path before;
+    Remarks remarks;
+    std::unique_ptr<SettleScenes> scenes;
+    std::unique_ptr<SettleDesk> desk;
+};
+
+ThreeTexts Ranges(int base, int ours, int theirs) {
+    const auto scene = [](int range) { return kHeader + Entity(10, "Lantern", 0, 0, range); };
+    return {scene(base), scene(ours), scene(theirs)};
+}
+
+TEST_F(SettleDeskTest, StepsAreTakenUpByTheNextDesk) {
+    Merge(Ranges(1, 2, 3));
+    Merge(Ranges(1, 2, 3), "b.ovrin");
+    EXPECT_EQ(Open().CountOpen(), 2);
+    EXPECT_EQ(desk->Take(1, Side::Theirs).settled, 1);
+    EXPECT_EQ(Open().CountOpen(), 1);
+    EXPECT_EQ(desk->Items()[1].decided, Side::Theirs);
+    EXPECT_EQ(desk->TakeAll(Side::Base).settled, 1);
+    EXPECT_TRUE(desk->IsSettled());
+    EXPECT_TRUE(desk->Undo() && desk->Undo() && !desk->Undo());
+    EXPECT_EQ(Open().CountOpen(), 2);
+}
+
+TEST_F(SettleDeskTest, WhatWasDecidedIsProposedInAnotherMergeOfTheSame) {
+    Merge(Ranges(1, 2, 3));
+    Open().Take(0, Side::Theirs);
+    desk->Finish(false, remarks);
+    Merge(Ranges(1, 3, 2)); // as in a rebase
+    EXPECT_EQ(Open().CountProposed(), 1);
+    EXPECT_EQ(desk->Items()[0].proposed, Side::Ours);
+    EXPECT_EQ(desk->TakeProposed().settled, 1);
+    EXPECT_EQ(desk->CountProposed(), 0);
+    EXPECT_EQ(Result(), Ranges(3, 0, 0).base);
+}
+
+TEST_F(SettleDeskTest, DecisionsOfAMergeThatWasMadeAgainAreProposedAndNotMade) {
+    Merge(Ranges(1, 2, 3));
+    Open().Take(0, Side::Base);
+    ThreeTexts again = Ranges(1, 2, 3);
+    again.theirs += Entity(30, "Boat", 0);
+    Merge(again);
+    EXPECT_EQ(Open().CountOpen(), 1);
+    EXPECT_EQ(desk->Items()[0].proposed, Side::Base);
+    ASSERT_EQ(remarks.size(), 1);
+    EXPECT_NE(remarks[0].find("merged again"), std::string::npos) << remarks[0];
+}
+
+// Theirs removes the buoy, which a light that ours added has for its target.
+TEST_F(SettleDeskTest, ReferenceToWhatTheOtherSideRemovedIsAProblemWithRemedies) {
+    const std::string lamp = Entity(40, "Lamp", 0, 0, 1), buoy = Entity(10, "Buoy", 21);
+    Merge({kHeader + Harbour(Child(10)) + buoy + lamp,
+           kHeader + Harbour(Child(10)) + buoy + Entity(40, "Lamp", 0, 10, 2),
+           kHeader + Harbour(" []") + Entity(40, "Lamp", 0, 0, 3)});
+    ASSERT_EQ(Open().Problems().size(), 1);
+    EXPECT_EQ(desk->Problems()[0].text,
+              "Lamp · MonoBehaviour: m_Target refers to Harbour/Buoy, which was removed by theirs");
+    EXPECT_EQ(Remedies(), (std::vector<std::string>{"keep Harbour/Buoy, too",
+                                                    "take Lamp · MonoBehaviour's m_Target from theirs",
+                                                    "take Lamp · MonoBehaviour's m_Target from base"}));
+    desk->Mend(desk->Problems()[0], desk->Problems()[0].remedies[0]);
+    EXPECT_TRUE(desk->Problems().empty());
+    desk->TakeAll(Side::Theirs);
+    EXPECT_EQ(Result(), kHeader + Harbour(Child(10)) + buoy + Entity(40, "Lamp", 0, 10, 3));
+    desk->Undo();
+    desk->Undo();
+    EXPECT_EQ(desk->Problems().size(), 1);
+}
+
+// Theirs removes the lantern, and ours changes its script: a component is kept without what it belongs to.
+TEST_F(SettleDeskTest, ObjectThatIsKeptAloneIsAProblem) {
+    const std::string kept = kHeader + Harbour(Child(10)) + Entity(10, "Lantern", 21, 0, 2);
+    const ThreeTexts texts = {kHeader + Harbour(Child(10)) + Entity(10, "Lantern", 21), kept,
+                              kHeader + Harbour(" []")};
+    Merge(texts);
+    EXPECT_TRUE(Open().Problems().empty()); // the conflict tells it
+    desk->Scenes()[0]->Decide({{"12", Side::Ours}}, SettleSession::Follow::No);
+    desk->Scenes()[0]->Keep(*std::make_unique<OpenMerges>(scenes->Where()));
+    ASSERT_EQ(Open().Problems().size(), 1);
+    EXPECT_EQ(desk->Problems()[0].text,
+              "Harbour/Lantern · MonoBehaviour stays, and Harbour/Lantern, which it "
+              "belongs to, was removed by theirs");
+    EXPECT_EQ(Remedies().front(), "keep Harbour/Lantern, too");
+    desk->Mend(desk->Problems()[0], desk->Problems()[0].remedies[0]);
+    EXPECT_EQ(Result(), kept);
+    EXPECT_TRUE(desk->Problems().empty());
+    desk->Undo();
+    desk->Mend(desk->Problems()[0], desk->Problems()[0].remedies[1]);
+    EXPECT_EQ(Result(), texts.theirs);
+}
+
+TEST_F(SettleDeskTest, ChoicesBetweenParentsAreNamed) {
+    const std::string none = " []";
+    const auto scene = [&](int ofTen, int ofForty) {
+        return kHeader + Entity(10, "Boat", ofTen) + Entity(40, "Pier", ofForty);
+    };
+    Merge({scene(0, 0), scene(41, 0), scene(0, 11)});
+    const SettleDesk& opened = Open();
+    const auto loop = std::ranges::find_if(opened.Items(), [](const SettleDesk::Item& item) {
+        return item.about->kind == ConflictKind::ParentLoop;
+    });
+    for (const auto& item : opened.Items())
+        std::cout << DecisionPath(item.about->path) << opened.Describe(item).choices[1] << std::endl;
+    ASSERT_NE(loop, opened.Items().end());
+    EXPECT_EQ(opened.Describe(*loop).choices,
+              (std::array<std::string, 3>{"at the top", "below Pier", "at the top"}));
+}
+
+} // namespace
