@@ -46,6 +46,61 @@ def test_next_step_is_that_of_the_operation(user, command):
     assert user.committed() == ONE_CONFLICT[2 if command == "rebase" else 1]
 
 
+def test_what_was_decided_before_is_proposed_in_a_rebase_that_repeats_it(user):
+    user.start()
+    layers = [scene(f"{layer} Lantern 1") for layer in (1, 2, 1, 2, 5)]
+    user.commit(layers[0])
+    user.git("checkout", "-qb", "topic")
+    for text in layers[1:4]:
+        user.commit(text)
+    user.git("checkout", "-q", "main")
+    user.commit(layers[4])
+    user.git("checkout", "-q", "topic")
+    user.git("rebase", "main", fails=True)
+    user.ovrin("settle", "--take", "proposed", status=FAILED)
+    assert "Nothing was decided before" in user.words()
+    user.ovrin("settle", "--take", "ours")
+    user.git("rebase", "--continue", fails=True)  # from 2 back to 1, which is new
+    user.ovrin("settle", "--take", "ours")
+    user.git("rebase", "--continue", fails=True)  # as the first one
+    assert "    proposed: ours\n" in user.ovrin("settle", "--list", status=LEFT_OPEN)
+    listed = json.loads(user.ovrin("settle", "--list", "--json", status=LEFT_OPEN))["scenes"][0]
+    assert [conflict["proposed"] for conflict in listed["conflicts"]] == ["ours"]
+    user.ovrin("settle", status=LEFT_OPEN)
+    assert "--take proposed" in user.words()
+    user.ovrin("settle", "--take", "proposed")
+    user.git("rebase", "--continue")
+    assert user.committed() == layers[4]
+
+
+def test_merge_and_rebase_that_meet_the_same_swap_its_sides(user):
+    user.conflict(*ONE_CONFLICT)
+    user.ovrin("settle", "--take", "theirs")
+    user.git("reset", "-q", "--hard")
+    user.git("rebase", "topic", fails=True)
+    user.ovrin("settle", "--take", "proposed")  # theirs of the merge is ours now
+    assert user.read() == ONE_CONFLICT[1]
+
+
+def test_decisions_of_a_merge_that_was_given_up_are_proposed_in_the_next(user):
+    user.conflict(*(components(name, 1).replace("m_Layer: 0", f"m_Layer: {name[0]}") for name in ("1", "2", "5")))
+    user.ovrin("settle", "--set", "*.GameObject.m_Layer=theirs", status=LEFT_OPEN)
+    user.git("merge", "--abort")
+    user.git("merge", "topic", fails=True)
+    listed = json.loads(user.ovrin("settle", "--list", "--json", status=LEFT_OPEN))["scenes"][0]["conflicts"]
+    assert [(conflict["property"], conflict["state"], conflict["proposed"]) for conflict in listed] == [
+        ("m_Layer", "open", "theirs"), ("m_Name", "open", None)]
+
+
+def test_broken_file_of_earlier_decisions_is_told_once(user):
+    user.conflict(*ONE_CONFLICT)
+    user.write("ovrin decisions 1 what\n", ".git/ovrin/decisions")
+    user.ovrin("settle", "--list", status=LEFT_OPEN)
+    assert ".git/ovrin/decisions can't be made out" in user.words()
+    user.ovrin("settle", "--take", "theirs")
+    assert "made out" not in user.words() and user.read() == ONE_CONFLICT[1]
+
+
 def test_file_that_was_changed_by_hand_is_not_replaced_unasked(user):
     user.conflict(*ONE_CONFLICT)
     by_hand = scene("7 Lantern 1")
@@ -282,7 +337,7 @@ def test_mercurial_is_told_of_the_settled_scene(user):
     assert user.words().endswith("Next: hg commit\n")
     user.run("hg", "commit", "-m", "merged")
     assert user.run("hg", "cat", user.name) == ONE_CONFLICT[1]
-    assert not user.exists(".hg/ovrin")
+    assert [path.name for path in (user.here / ".hg/ovrin").iterdir()] == ["decisions"]
 
 
 @pytest.mark.skipif(not shutil.which("svnadmin"), reason="svn is not installed")

@@ -56,4 +56,4 @@ class User(System):
         return self.git("show", f"HEAD:{name or self.name}")
 
     def records(self):
-        return sorted(path.suffix for path in (self.here / ".git/ovrin").glob("*"))
+        return sorted(path.suffix for path in (self.here / ".git/ovrin").glob("*.*"))

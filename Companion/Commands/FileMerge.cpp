@@ -15,6 +15,7 @@
 #include "Conflicts/TakeSetting.h"
 #include "Names/PrintableText.h"
 #include "Scenes/SceneFile.h"
+#include "Settle/SettleScenes.h"
 #include "Systems/Caller.h"
 #include "Systems/LineMerge.h"
 #include "Systems/Repository.h"
@@ -126,11 +127,23 @@ struct Records {
     std::string path; ///< empty: nowhere
 };
 
+/// What was decided in a record that goes is proposed where it is met again.
+void RememberEarlier(const Records& records) {
+    try {
+        RememberDecisions(*records.repository, records.path);
+    } catch (const std::exception& error) {
+        Tell("ovrin: what was decided of " + Printable(records.path) +
+             " before can't be proposed again: " + error.what() + "\n");
+    }
+}
+
 /// Most often no merge is open, and there is nothing to ask for.
 void ForgetEarlier(const Records& records) {
     if (records.path.empty()) return;
     OpenMerges merges(*records.repository);
-    if (merges.Has(records.path) && !IsWithoutTree(FindCaller())) merges.Remove(records.path);
+    if (!merges.Has(records.path) || IsWithoutTree(FindCaller())) return;
+    RememberEarlier(records);
+    merges.Remove(records.path);
 }
 
 /// The name of a file of its own for whoever stands elsewhere later.
@@ -148,6 +161,7 @@ std::string Record(const Records& records, const FileMerge& files, OpenMerge mer
         merge.texts = ReadTexts(files); // as they still are: the result comes later
         merge.rules = Lasting(files.format.rules, kDefaultRulesFile);
         merge.typeInfo = Lasting(files.format.typeInfo, kDefaultTypeInfoFile);
+        RememberEarlier(records);
         OpenMerges(*records.repository).Add(merge);
         return {};
     } catch (const std::exception& error) {

@@ -24,6 +24,8 @@ namespace {
 
 using nlohmann::json;
 
+constexpr const char* kProposed = "proposed";
+
 struct SettleOptions {
     std::vector<std::string> files;
     std::vector<std::string> set;
@@ -65,16 +67,41 @@ void Decide(const SettleScenes& scenes, const SettleOptions& options) {
     for (const std::string& text : options.set) wanted.push_back(ParseWanted(text));
     if (!wanted.empty()) DecideWanted(scenes.Sessions(), wanted);
     if (!options.decisionFile.empty()) DecideByFile(scenes.Sessions(), options.decisionFile);
-    if (!options.take.empty()) TakeSide(scenes.Sessions(), SideNamed(options.take), options.under);
+    if (options.take == kProposed)
+        TakeProposed(scenes.Sessions(), options.under);
+    else if (!options.take.empty())
+        TakeSide(scenes.Sessions(), SideNamed(options.take), options.under);
     if (!options.isUndo) return;
     if (!UndoStep(scenes.Sessions())) throw Failure("There is no decision to take back");
+}
+
+/// What is wrong, and the decisions that would mend it.
+void TellProblems(const SettleSession& session) {
+    const std::string scene = Printable(session.Source().path);
+    for (const Problem& problem : session.Problems()) {
+        std::cerr << "ovrin: " << scene << ": " << problem.text << '\n';
+        for (const Remedy& remedy : problem.remedies) {
+            std::cerr << "    to " << remedy.text << ": ovrin settle";
+            for (const Decision& decision : remedy.decisions)
+                std::cerr << " --set '" << Printable(decision.path) << '=' << SideName(decision.side) << "'";
+            std::cerr << '\n';
+        }
+    }
+}
+
+void TellProposed(const SettleScenes& scenes) {
+    std::size_t count = 0;
+    for (const auto& session : scenes.Sessions()) count += session->CountProposed();
+    if (count)
+        std::cerr << CountOpen(count) << (count == 1 ? " was" : " were")
+                  << " decided before: \"ovrin settle --take proposed\" takes the same sides.\n";
 }
 
 /// Tells of the sessions that stay, and of what is missing in those that go.
 bool TellOpen(const SettleScenes& scenes, bool wasDecided) {
     bool isAnyOpen = false;
     for (const auto& session : scenes.Sessions()) {
-        Tell(session->Missing());
+        TellProblems(*session);
         if (session->IsSettled()) continue;
         isAnyOpen = true;
         std::cerr << TellCount(SceneCount::Of(*session)) << '\n';
@@ -82,6 +109,7 @@ bool TellOpen(const SettleScenes& scenes, bool wasDecided) {
             std::cerr << "Both sides added the scene: look through the union of the two, and take it with "
                          "\"ovrin settle --take ours\" or, changed by you, with \"ovrin settle --as-is\".\n";
     }
+    TellProposed(scenes);
     if (isAnyOpen)
         std::cerr << (wasDecided ? "The decisions are kept. " : "")
                   << "\"ovrin settle --list\" shows what is open.\n";
@@ -106,7 +134,8 @@ Outcome Settle(SettleScenes& scenes, const SettleOptions& options, bool isAnyUnr
     TellFinished(scenes, finished, refused);
     if (finished.empty() && !isAnyOpen && refused.empty() && !isAnyUnreadable)
         std::cerr << "No scene has open conflicts.\n";
-    return isAnyOpen || isAnyUnreadable || !refused.empty() ? Outcome::LeftOpen : Outcome::Done;
+    const bool isAllFinished = finished.size() == scenes.Sessions().size();
+    return isAnyUnreadable || !isAllFinished ? Outcome::LeftOpen : Outcome::Done;
 }
 
 /// Lets a person do it, as far as that person likes.
@@ -116,8 +145,10 @@ Outcome LetPersonSettle(SettleScenes& scenes, const SettleOptions& options, bool
     TellFinished(scenes, end.finished, end.refused);
     const std::size_t left = scenes.Sessions().size() - end.finished.size();
     if (left > 0 && end.refused.empty())
-        std::cerr << (desk.IsSettled() ? "All is settled, and " : CountOpen(desk.CountOpen()) + " left, and ")
-                  << "what you decided is kept: \"ovrin settle\" goes on.\n";
+        std::cerr << (desk.IsSettled()   ? "All is settled"
+                      : desk.CountOpen() ? CountOpen(desk.CountOpen()) + " left"
+                                         : "A scene that both sides added waits for a look")
+                  << ", and what you decided is kept: \"ovrin settle\" goes on.\n";
     return left > 0 || isAnyUnreadable ? Outcome::LeftOpen : Outcome::Done;
 }
 
@@ -170,8 +201,11 @@ void DescribeDecisions(CLI::App& command, SettleOptions& options) {
             "shows, a pattern with * for any one element, or the name of the object and the property")
         ->type_name("PATH=SIDE")
         ->allow_extra_args(false);
-    auto* take = command.add_option("--take", options.take, "take a side at all open conflicts")
-                     ->check(CLI::IsMember({"ours", "theirs", "base"}))
+    auto* take = command
+                     .add_option("--take", options.take,
+                                 "take a side at all open conflicts; proposed: at each what was decided when "
+                                 "the same one was met before")
+                     ->check(CLI::IsMember({"ours", "theirs", "base", kProposed}))
                      ->type_name("SIDE");
     command.add_option("--under", options.under, "only at those of this object and what stands under it")
         ->needs(take)

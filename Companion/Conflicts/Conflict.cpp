@@ -1,6 +1,7 @@
 #include "Conflicts/Conflict.h"
 
 #include "Conflicts/DecisionPath.h"
+#include "Conflicts/Requirements.h"
 #include "Names/PrintableText.h"
 #include "Names/ReferenceText.h"
 #include "Names/ValueText.h"
@@ -111,6 +112,7 @@ Conflict ConflictWords::Describe(const OpenConflict& open) const {
         const auto at = static_cast<std::size_t>(side);
         conflict.values[at] = place.In(VersionOf(side));
         conflict.words[at] = ValueWords(open, conflict, place, side);
+        conflict.choices[at] = ChoiceWords(open, conflict, side);
     }
     return conflict;
 }
@@ -127,6 +129,29 @@ std::string ConflictWords::ValueWords(const OpenConflict& open, const Conflict& 
     if (value && open.path.back() == YAMLScalar::fileID && IsReference(*holder)) value = holder;
     if (value) return ValueLine(*value, m_Names.In(VersionOf(side)), m_Width);
     return side != Side::Base && conflict.In(Side::Base) ? "removed" : "none";
+}
+
+std::string ConflictWords::ChoiceWords(const OpenConflict& open, const Conflict& conflict, Side side) const {
+    const YAMLNode* value = conflict.In(side);
+    if (open.kind == ConflictKind::KeyOrder) return std::string("the order of ") + SideName(side);
+    if (open.kind == ConflictKind::BrokenRequirement) return RequirementChoice(open, side);
+    if (open.kind == ConflictKind::ParentLoop) {
+        const ObjectNames& names = m_Names.In(VersionOf(side));
+        const YAMLScalar* parent = LocalReference(value);
+        if (!parent) return "at the top";
+        const YAMLScalar* place = names.Places().PlaceIDOf(names.Places().Body(parent), parent);
+        return "below " + names.Name(place ? place : parent);
+    }
+    if (!value) return conflict.In(Side::Base) ? "remove it" : "leave it out";
+    return std::string(open.path.size() < 3 ? "keep that of " : "take ") + SideName(side);
+}
+
+std::string ConflictWords::RequirementChoice(const OpenConflict& open, Side side) const {
+    const YAMLScalar* id = open.path.front();
+    const std::string name = m_Names.Name(id);
+    if (m_Names.Has(VersionOf(side), id)) return "keep " + name;
+    const bool isNeeded = !NeededBy(m_Merge.Session(), id, side).empty();
+    return "remove " + name + (isNeeded ? " and what needs it" : "");
 }
 
 std::vector<Conflict> ConflictWords::DescribeOpen(std::size_t most) const {
@@ -152,6 +177,7 @@ json ToJson(const Conflict& conflict) {
                     {"property", conflict.property}};
     if (!conflict.id.empty()) written["object"] = {{"id", conflict.id}, {"name", conflict.object}};
     for (const Side side : kSides) {
+        written["choices"][SideName(side)] = conflict.ChoiceOf(side);
         json& version = written[SideName(side)];
         if (const YAMLNode* value = conflict.In(side))
             version = {{"value", ToJson(value)}, {"text", conflict.WordsOf(side)}};

@@ -28,9 +28,14 @@ struct Conflict {
     std::array<const ovrin_yaml::YAMLNode*, 3> values;
     /// The same in words on one line, whatever the side has or did: "4.5", "removed", "changed m_Layer".
     std::array<std::string, 3> words;
+    /// What it does to take a side: "take ours", "remove it"; "below Harbour/Pier" or "at the top" for
+    /// objects that were moved below each other; "keep Light", "remove Light and what needs it" where it is
+    /// needed.
+    std::array<std::string, 3> choices;
 
     const ovrin_yaml::YAMLNode* In(Side side) const { return values[static_cast<std::size_t>(side)]; }
     const std::string& WordsOf(Side side) const { return words[static_cast<std::size_t>(side)]; }
+    const std::string& ChoiceOf(Side side) const { return choices[static_cast<std::size_t>(side)]; }
 };
 
 /// "both changed it", "theirs removed it and ours changed it"...
@@ -54,6 +59,8 @@ public:
 private:
     std::string ValueWords(const OpenConflict& open, const Conflict& conflict, const RecordPlace& place,
                            Side side) const;
+    std::string ChoiceWords(const OpenConflict& open, const Conflict& conflict, Side side) const;
+    std::string RequirementChoice(const OpenConflict& open, Side side) const;
 
     SceneMerge& m_Merge;
     const std::size_t m_Width;
@@ -65,7 +72,8 @@ private:
 ///
 ///     {"path": "734813.Light.m_Brightness", "kind": "both-changed",
 ///      "object": {"id": "734813", "name": "Harbour/Lantern · Light"}, "property": "m_Brightness",
-///      "base": {"value": "1", "text": "1"}, "ours": ..., "theirs": ...}
+///      "base": {"value": "1", "text": "1"}, "ours": ..., "theirs": ...,
+///      "choices": {"base": "take base", "ours": ..., "theirs": ...}}
 ///
 /// "object" is null for the order of keys. A value is the tree, of texts alone, and null where there is none.
 nlohmann::json ToJson(const Conflict& conflict);

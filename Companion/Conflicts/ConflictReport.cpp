@@ -10,10 +10,18 @@ namespace ovrin {
 namespace {
 
 constexpr std::size_t kValueWidth = 60;
+constexpr Side kSides[] = {Side::Base, Side::Ours, Side::Theirs};
+
+/// Where a choice isn't one between values it says more than they do.
+const std::string& WordsFor(const Conflict& conflict, Side side) {
+    const bool isChoice =
+        conflict.kind == ConflictKind::ParentLoop || conflict.kind == ConflictKind::BrokenRequirement;
+    return isChoice ? conflict.ChoiceOf(side) : conflict.WordsOf(side);
+}
 
 /// "        ours    5    main", where the labels of all three values stand in one column.
 std::string TellValue(const Conflict& conflict, Side side, const std::string& label, std::size_t width) {
-    const std::string& words = conflict.WordsOf(side);
+    const std::string& words = WordsFor(conflict, side);
     std::string line = std::string(4, ' ') + SideName(side);
     line.resize(4 + sizeof("theirs  ") - 1, ' ');
     line += words;
@@ -48,9 +56,8 @@ std::string TellConflict(const Conflict& conflict, const SideLabels& labels) {
     std::string text = "  " + (conflict.property.empty() ? "" : conflict.property + ": ");
     text += std::string(WhatHappened(conflict.kind)) + '\n';
     std::size_t width = 0;
-    for (const std::string& words : conflict.words) width = std::max(width, CharacterCount(words));
-    for (const Side side : {Side::Base, Side::Ours, Side::Theirs})
-        text += TellValue(conflict, side, labels.Of(side), width);
+    for (const Side side : kSides) width = std::max(width, CharacterCount(WordsFor(conflict, side)));
+    for (const Side side : kSides) text += TellValue(conflict, side, labels.Of(side), width);
     return text;
 }
 

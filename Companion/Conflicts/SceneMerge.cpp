@@ -7,6 +7,7 @@
 #include "Writing/ObjectFileWriter.h"
 
 #include <algorithm>
+#include <map>
 #include <new>
 #include <sstream>
 #include <unordered_set>
@@ -116,16 +117,28 @@ bool Matches(const Path& pattern, const Path& path) {
 /// Those of `decisions` that match no record.
 std::vector<Decision> FindUnmatched(std::span<const Decision> decisions,
                                     const std::vector<MergeSession::Record>& records) {
-    std::vector<std::pair<Path, const Decision*>> left;
-    for (const Decision& decision : decisions) left.emplace_back(PathOfDecision(decision.path), &decision);
+    std::map<Path, std::vector<std::size_t>> exact; // decisions; only looked into
+    std::vector<std::pair<Path, std::size_t>> patterns;
+    for (std::size_t i = 0; i < decisions.size(); ++i) {
+        Path path = PathOfDecision(decisions[i].path);
+        if (std::ranges::count(path, YAMLScalar::star))
+            patterns.emplace_back(std::move(path), i);
+        else
+            exact[std::move(path)].push_back(i);
+    }
+    std::vector<bool> isMatched(decisions.size());
     for (const MergeSession::Record& record : records) {
-        if (left.empty()) break;
         const Path path = record.path.Elements();
-        if (!path.empty()) std::erase_if(left, [&](const auto& one) { return Matches(one.first, path); });
+        if (path.empty()) continue;
+        if (const auto found = exact.find(path); found != exact.end())
+            for (const std::size_t i : found->second) isMatched[i] = true;
+        std::erase_if(patterns, [&](const auto& pattern) {
+            return Matches(pattern.first, path) && (isMatched[pattern.second] = true);
+        });
     }
     std::vector<Decision> unmatched;
-    unmatched.reserve(left.size());
-    for (const auto& [path, decision] : left) unmatched.push_back(*decision);
+    for (std::size_t i = 0; i < decisions.size(); ++i)
+        if (!isMatched[i]) unmatched.push_back(decisions[i]);
     return unmatched;
 }
 
@@ -171,8 +184,8 @@ void SceneMerge::CollectOpen(const ResolveTable& decided) {
         if (IsOpenLoop(record)) record.path = WalkedPath(ParentPath(record)).Keep();
         Path path = record.path.Elements();
         const ConflictKind kind = KindOf(record);
-        // That the requirement stays broken is what the decision says.
-        if (kind == ConflictKind::BrokenRequirement && decided.Find(path)) continue;
+        // What was decided on and is pending again breaks a requirement, and that is what the decision says.
+        if (path.size() == 1 && decided.Find(path)) continue;
         if (!m_Open.empty() && m_Open.back().path == path) continue;
         m_Open.push_back({std::move(path), kind, record});
     }

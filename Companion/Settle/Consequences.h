@@ -14,10 +14,10 @@ namespace ovrin {
 ///
 ///     an object is kept            so are the parts of the removal that it belongs to: the GameObject, its
 ///     that a side removed          components, all that stands under it, and the entry in the owner's list
+///     one that is needed goes      so does what the other side added that needs it
 ///     a loop of parents is ended   the lists of children follow
 ///
-/// A list is left to the merge where the side whose change is dropped changed other entries of it, too, or
-/// alone changed other fields of the owner. What is among `open` is left to its own decision.
+/// What is among `open` is left to its own decision; Settle/StructureDecisions.h tells the limits.
 std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
                                    std::span<const OpenConflict> open,
                                    std::span<const OpenConflict> conflicts, Side side);

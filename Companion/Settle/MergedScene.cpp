@@ -1,11 +1,13 @@
 #include "Settle/MergedScene.h"
 
 #include "Conflicts/DecisionPath.h"
+#include "Scenes/SceneRules.h"
 #include "Systems/WorkerProcesses.h"
 #include "Words/Failure.h"
 
 #include <cstdint>
 #include <nlohmann/json.hpp>
+#include <utility>
 
 namespace ovrin {
 
@@ -16,17 +18,47 @@ namespace {
 
 constexpr char kWorked = '+', kFailed = '-'; // ahead of what was made, or of why nothing was
 
-std::vector<std::string> MissingIn(SceneMerge& merge, const MergeNames& names) {
-    std::vector<std::string> lines;
-    if (!merge.HasBrokenDependencies()) return lines;
-    for (const MergeSession::Record* record : merge.Session().PendingConflicts())
-        if (const YAMLScalar* id = record->path.OnlyElement())
-            lines.push_back(names.NameWithID(id) + " is removed, and something in the scene needs it");
-    if (lines.empty()) lines.emplace_back("Something in the scene needs a component that neither side has");
-    return lines;
+json ToJson(const std::vector<Decision>& decisions) {
+    json written = json::array();
+    for (const Decision& decision : decisions)
+        written.push_back(json::array({decision.path, static_cast<int>(decision.side)}));
+    return written;
+}
+
+json ToJson(const std::vector<Problem>& problems) {
+    json written = json::array();
+    for (const Problem& problem : problems) {
+        json remedies = json::array();
+        for (const Remedy& remedy : problem.remedies)
+            remedies.push_back(json::array({remedy.text, ToJson(remedy.decisions)}));
+        written.push_back(json::array({problem.text, remedies}));
+    }
+    return written;
+}
+
+std::vector<Problem> ProblemsFrom(const json& written) {
+    std::vector<Problem> problems;
+    for (const json& problem : written) {
+        problems.push_back({problem[0], {}});
+        for (const json& remedy : problem[1]) {
+            problems.back().remedies.push_back({remedy[0], {}});
+            for (const json& decision : remedy[1])
+                problems.back().remedies.back().decisions.push_back(
+                    {decision[0], static_cast<Side>(decision[1].get<int>())});
+        }
+    }
+    return problems;
 }
 
 } // namespace
+
+SceneMerge SceneMergeOf(const OpenMerge& merge) {
+    FormatFiles files;
+    if (!merge.rules.empty()) files.rules = merge.rules;
+    if (!merge.typeInfo.empty()) files.typeInfo = merge.typeInfo;
+    SceneRules rules = ReadSceneRules(files);
+    return SceneMerge(merge.texts, std::move(rules.rules), std::move(rules.types));
+}
 
 std::string MergeApartTo(SceneMerge& merge, const std::vector<Decision>& decisions, Side take,
                          const std::function<std::string()>& make) {
@@ -56,11 +88,11 @@ MergedScene MergeApart(SceneMerge& merge, const MergeNames& names, const std::ve
         for (const OpenConflict& conflict : merge.Open()) open.push_back(DecisionPath(conflict.path));
         for (const Decision& decision : merge.Unmatched()) unmatched.push_back(decision.path);
         std::string written;
-        json::to_cbor(json::array({open, unmatched, MissingIn(merge, names)}), written);
+        json::to_cbor(json::array({open, unmatched, ToJson(FindProblems(merge, names))}), written);
         return written;
     });
     const json read = json::from_cbor(merged);
-    return {read[0], read[1], read[2]};
+    return {read[0], read[1], ProblemsFrom(read[2])};
 }
 
 void MergeHere(SceneMerge& merge, const std::vector<Decision>& decisions, Side take) {

@@ -3,6 +3,7 @@
 #include "Conflicts/OpenMerge.h"
 #include "Conflicts/SceneMerge.h"
 #include "Names/MergeNames.h"
+#include "Settle/Problems.h"
 
 #include <functional>
 #include <string>
@@ -10,12 +11,14 @@
 
 namespace ovrin {
 
+/// The merge of these texts, by the rules that they are to be merged by; not merged yet.
+SceneMerge SceneMergeOf(const OpenMerge& merge);
+
 /// What a merge by certain decisions came to, as a text can hold it.
 struct MergedScene {
     std::vector<std::string> open; ///< paths of the conflicts that nothing settles, as decisions name them
     std::vector<std::string> unmatched; ///< paths of decisions that match nothing
-    /// What the result lacks although something in it needs it, a line each.
-    std::vector<std::string> missing;
+    std::vector<Problem> problems;
 };
 
 /// Merges a scene by decisions, in a process of its own, which is a copy of this one: what the engine takes

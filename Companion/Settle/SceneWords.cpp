@@ -53,6 +53,7 @@ std::string TellConflicts(SettleSession& session) {
         else
             text +=
                 "  " + (conflict.property.empty() ? "" : conflict.property + ": ") + TellState(met) + '\n';
+        if (met.proposed) text += std::string("    proposed: ") + SideName(*met.proposed) + '\n';
         text += "    path    " + Printable(conflict.path) + '\n';
     }
     return text;
@@ -66,6 +67,7 @@ json ToJson(SettleSession& session) {
         json conflict = ToJson(words.Describe(*met.conflict));
         conflict["state"] = met.isOpen ? "open" : "settled";
         conflict["decided"] = met.decided ? json(SideName(*met.decided)) : json();
+        conflict["proposed"] = met.proposed ? json(SideName(*met.proposed)) : json();
         conflicts.push_back(std::move(conflict));
     }
     return written;

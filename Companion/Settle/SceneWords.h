@@ -16,7 +16,7 @@ std::vector<std::string> NextSteps(const Repository& repository, const std::stri
 /// All conflicts of the session for people: the open ones with their values, the settled ones with the side.
 std::string TellConflicts(SettleSession& session);
 /// The same for scripts: that of SceneCount, and "conflicts", each as ToJson(Conflict) has it, with "state",
-/// which is "open" or "settled", and "decided", a side or null.
+/// which is "open" or "settled", and "decided" and "proposed", each a side or null.
 nlohmann::json ToJson(SettleSession& session);
 
 } // namespace ovrin

@@ -3,11 +3,21 @@
 #include "Conflicts/DecisionPath.h"
 #include "Settle/Meaning.h"
 #include "Settle/Steps.h"
+#include "Words/Failure.h"
 
 #include <algorithm>
-#include <map>
 
 namespace ovrin {
+
+namespace {
+
+void DecideOrFail(SettleSession& session, const std::vector<Decision>& decisions) {
+    if (!session.Decide(decisions).empty())
+        throw Failure("This can't be decided by itself: a decision about what it belongs to settles it. Take "
+                      "that back, or decide there");
+}
+
+} // namespace
 
 SettleDesk::SettleDesk(SettleScenes& scenes) : m_Scenes(scenes) {
     for (const auto& session : Scenes()) m_Words.push_back(std::make_unique<ConflictWords>(session->Merge()));
@@ -24,10 +34,11 @@ void SettleDesk::Refresh() {
             const bool isSame = !m_Items.empty() && m_Items.back().scene == scene &&
                                 m_Items.back().about->path.front() == met.conflict->path.front();
             const std::size_t object = isSame ? m_Items.back().object : m_Items.size();
-            m_Items.push_back({scene, met.conflict, object, met.isOpen, met.decided, {}});
+            m_Items.push_back({scene, met.conflict, object, met.isOpen, met.decided, met.proposed});
+            if (met.proposed) ++m_Proposed;
         }
         m_Open += session.Open().size();
-        for (const std::string& line : session.Missing()) m_Problems.push_back({scene, line, {}});
+        for (const Problem& problem : session.Problems()) m_Problems.push_back({problem, scene});
     }
 }
 
@@ -85,7 +96,7 @@ template <class Make> SettleDesk::Step SettleDesk::MakeStep(const Make& make) {
 SettleDesk::Step SettleDesk::Take(std::size_t item, Side side) {
     return MakeStep([&] {
         const Item& taken = m_Items[item];
-        SceneOf(taken).Decide({{DecisionPath(taken.about->path), side}});
+        DecideOrFail(SceneOf(taken), {{DecisionPath(taken.about->path), side}});
         return std::size_t{1};
     });
 }
@@ -115,22 +126,17 @@ SettleDesk::Step SettleDesk::Accept(std::size_t scene) {
 
 SettleDesk::Step SettleDesk::TakeProposed() {
     return MakeStep([&] {
-        std::map<std::size_t, std::vector<Decision>> proposed;
-        for (const Item& item : m_Items)
-            if (item.isOpen && item.proposed)
-                proposed[item.scene].push_back({DecisionPath(item.about->path), *item.proposed});
         std::size_t asked = 0;
-        for (const auto& [scene, decisions] : proposed) {
-            Scenes()[scene]->Decide(decisions);
-            asked += decisions.size();
-        }
+        for (const auto& session : Scenes())
+            if (session->CountProposed())
+                asked += session->TakeProposed([](const OpenConflict&) { return true; });
         return asked;
     });
 }
 
 SettleDesk::Step SettleDesk::Mend(const SettleProblem& problem, const SettleProblem::Remedy& remedy) {
     return MakeStep([&] {
-        Scenes()[problem.scene]->Decide(remedy.decisions);
+        DecideOrFail(*Scenes()[problem.scene], remedy.decisions);
         return remedy.decisions.size();
     });
 }

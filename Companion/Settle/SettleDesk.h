@@ -13,15 +13,11 @@
 
 namespace ovrin {
 
-/// What a result lacks, and what would mend it.
-struct SettleProblem {
-    struct Remedy {
-        std::string text; ///< "keep Harbour/Lantern, too"
-        std::vector<Decision> decisions;
-    };
+/// What is wrong with a result, and what would mend it.
+struct SettleProblem : Problem {
+    using Remedy = ovrin::Remedy;
+
     std::size_t scene; ///< as in SettleDesk::Item
-    std::string text;  ///< a sentence without a full stop
-    std::vector<Remedy> remedies;
 };
 
 /// The scenes of a working tree as a person settles them: one list of conflicts over all of them, one row of

@@ -5,6 +5,7 @@
 #include "FileUtils.h"
 #include "Names/PrintableText.h"
 #include "Scenes/SceneFile.h"
+#include "Settle/DecisionTable.h"
 #include "Systems/Git.h"
 #include "Systems/Operation.h"
 #include "Systems/UnmergedFiles.h"
@@ -70,16 +71,64 @@ std::string TellByHand(const std::string& path) {
                              "as it stands, \"ovrin settle --overwrite\" puts the settled scene in its place";
 }
 
+/// That nothing can be proposed later is no reason to stop.
+void KeepEarlier(const EarlierDecisions& earlier, Remarks& remarks) {
+    try {
+        earlier.Keep();
+    } catch (const Failure& failure) {
+        remarks.emplace_back(failure.what());
+    }
+}
+
+/// Adds what was decided in the record of a scene, of the conflicts as they were in the beginning. Returns of
+/// how many.
+std::size_t TellDecidedIn(const OpenMerges& store, const std::string& path, EarlierDecisions& earlier) {
+    const std::optional<OpenMerge> recorded = store.Find(path);
+    const Progress progress = recorded ? store.ProgressOf(*recorded) : Progress();
+    if (progress.decisions.empty()) return 0;
+    SceneMerge merge = SceneMergeOf(*recorded);
+    merge.Merge();
+    const MergeNames names(merge.Session());
+    const RecordPlaces places(merge.Session(), names);
+    const DecisionTable table(progress.decisions);
+    std::size_t told = 0;
+    for (const OpenConflict& conflict : merge.Open()) {
+        const std::optional<Side> decided = table.Find(conflict.path);
+        const auto values = decided ? EarlierDecisions::Values::Of(conflict, places) : std::nullopt;
+        if (!values) continue;
+        earlier.Add(*values, *decided);
+        ++told;
+    }
+    return told;
+}
+
 } // namespace
 
 SettleScenes::SettleScenes(Remarks& remarks)
-    : m_Repository(RepositoryHere()), m_Store(m_Repository), m_Live(LookAtMerges(m_Repository, m_Store)) {
+    : m_Repository(RepositoryHere()), m_Store(m_Repository), m_Earlier(m_Repository),
+      m_Live(LookAtMerges(m_Repository, m_Store)) {
+    try {
+        m_Earlier.Read();
+    } catch (const Failure& failure) {
+        remarks.push_back(failure.what() + std::string("; a new one takes its place"));
+        KeepEarlier(m_Earlier, remarks);
+    }
     for (const OpenMerge& merge : m_Live.stale) {
-        m_Store.Remove(merge.path);
         remarks.push_back(Printable(merge.path) +
                           " is forgotten: its merge was committed, given up or made again without ovrin");
+        Remember(merge.path, remarks);
+        m_Store.Remove(merge.path);
     }
     m_Live.stale.clear();
+}
+
+void SettleScenes::Remember(const std::string& path, Remarks& remarks) {
+    try {
+        if (TellDecidedIn(m_Store, path, m_Earlier)) KeepEarlier(m_Earlier, remarks);
+    } catch (const Failure& failure) {
+        remarks.push_back("What was decided in " + Printable(path) +
+                          " can't be proposed again: " + failure.what());
+    }
 }
 
 void SettleScenes::LimitTo(std::span<const std::string> places) {
@@ -110,9 +159,8 @@ std::vector<std::string> SettleScenes::Paths() const {
 }
 
 SceneCount SettleScenes::CountUnrecorded(IndexMerges& index, const std::string& path) const {
-    Remarks none;
     try {
-        return SceneCount::Of(*Load(index, path, none));
+        return SceneCount::Of(SettleSession(index.Read(path)));
     } catch (const Failure& failure) {
         return {.path = path, .problem = failure.what()};
     }
@@ -133,15 +181,23 @@ bool SettleScenes::IsRecorded(const std::string& path) const {
 }
 
 std::unique_ptr<SettleSession> SettleScenes::Load(IndexMerges& index, const std::string& path,
-                                                  Remarks& remarks) const {
+                                                  Remarks& remarks) {
     std::optional<OpenMerge> merge = IsRecorded(path) ? m_Store.Find(path) : std::nullopt;
+    std::unique_ptr<SettleSession> session;
     if (merge && !index.Confirm(*merge)) {
-        remarks.push_back(Printable(path) + " was merged again without ovrin: earlier decisions don't count");
+        remarks.push_back(Printable(path) + " was merged again without ovrin: earlier decisions don't count, "
+                                            "and are proposed where the same three values meet again");
+        Remember(path, remarks);
         merge.reset();
     }
-    if (!merge) return std::make_unique<SettleSession>(index.Read(path));
-    Progress progress = m_Store.ProgressOf(*merge);
-    return std::make_unique<SettleSession>(std::move(*merge), std::move(progress));
+    if (merge) {
+        Progress progress = m_Store.ProgressOf(*merge);
+        session = std::make_unique<SettleSession>(std::move(*merge), std::move(progress));
+    } else {
+        session = std::make_unique<SettleSession>(index.Read(path));
+    }
+    session->Propose(m_Earlier);
+    return session;
 }
 
 std::size_t SettleScenes::Open(Remarks& remarks) {
@@ -191,8 +247,17 @@ std::vector<std::string> SettleScenes::Finish(bool overwrite, Remarks& remarks) 
         DeliverScene(FileOf(path), result);
         finished.push_back(path);
     }
+    RememberDecided(finished, remarks);
     Conclude(finished);
     return finished;
+}
+
+void SettleScenes::RememberDecided(const std::vector<std::string>& paths, Remarks& remarks) {
+    std::size_t told = 0;
+    for (const auto& session : m_Sessions)
+        if (std::ranges::find(paths, session->Source().path) != paths.end())
+            told += session->TellDecided(m_Earlier);
+    if (told) KeepEarlier(m_Earlier, remarks);
 }
 
 void SettleScenes::Conclude(const std::vector<std::string>& paths) {
@@ -214,6 +279,16 @@ void SettleScenes::TakeAsTheyStand() {
 
 void SettleScenes::Forget() {
     for (const OpenMerge& merge : m_Live.live) m_Store.Remove(merge.path);
+}
+
+std::size_t RememberDecisions(const Repository& repository, const std::string& path) {
+    const OpenMerges store(repository);
+    if (!store.Has(path)) return 0;
+    EarlierDecisions earlier(repository);
+    earlier.Read();
+    const std::size_t told = TellDecidedIn(store, path, earlier);
+    if (told) earlier.Keep();
+    return told;
 }
 
 void ForgetSettledFile(const std::string& given) {

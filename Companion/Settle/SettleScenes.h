@@ -2,6 +2,7 @@
 
 #include "Conflicts/LiveMerges.h"
 #include "Conflicts/OpenMerges.h"
+#include "Settle/EarlierDecisions.h"
 #include "Settle/SceneCount.h"
 #include "Settle/SettleSession.h"
 #include "Systems/Repository.h"
@@ -43,9 +44,10 @@ public:
     /// Writes the decisions of a session down.
     void Keep(SettleSession& session) { session.Keep(m_Store); }
     /// Finishes the sessions in which nothing is open: each result becomes its scene's file, version control
-    /// is told that it is merged, and the record goes. A file that somebody changed since the merge is
-    /// replaced only if `overwrite`. Returns the paths of those that are finished; `remarks` tells of the
-    /// others. Until the record goes, doing it again completes what was interrupted.
+    /// is told that it is merged, what was decided is kept for proposals, and the record goes. A file that
+    /// somebody changed since the merge is replaced only if `overwrite`. Returns the paths of those that are
+    /// finished; `remarks` tells of the others. Until the record goes, doing it again completes what was
+    /// interrupted.
     std::vector<std::string> Finish(bool overwrite, Remarks& remarks);
 
     /// Takes the files of the scenes that are left as they stand, whatever was decided. Throws Failure for
@@ -55,9 +57,11 @@ public:
     void Forget();
 
 private:
-    std::unique_ptr<SettleSession> Load(IndexMerges& index, const std::string& path, Remarks& remarks) const;
+    std::unique_ptr<SettleSession> Load(IndexMerges& index, const std::string& path, Remarks& remarks);
     SceneCount CountUnrecorded(IndexMerges& index, const std::string& path) const;
     void Conclude(const std::vector<std::string>& paths);
+    void Remember(const std::string& path, Remarks& remarks);
+    void RememberDecided(const std::vector<std::string>& paths, Remarks& remarks);
     bool IsRecorded(const std::string& path) const;
     std::string FileOf(const std::string& path) const { return m_Repository.top + "/" + path; }
     bool IsUntouched(SettleSession& session, const std::string& result) const;
@@ -65,9 +69,14 @@ private:
 
     const Repository m_Repository;
     OpenMerges m_Store;
+    EarlierDecisions m_Earlier;
     LiveMerges m_Live;
     std::vector<std::unique_ptr<SettleSession>> m_Sessions;
 };
+
+/// Keeps what was decided in the record of a scene, if there is one, to be proposed where the same is met
+/// again: ahead of whatever replaces or removes it. Returns of how many conflicts. Throws Failure.
+std::size_t RememberDecisions(const Repository& repository, const std::string& path);
 
 /// Forgets the record of a file that was settled in another way, if there is one. The file may be anywhere.
 void ForgetSettledFile(const std::string& given);

@@ -2,11 +2,14 @@
 
 #include "Conflicts/DecisionPath.h"
 #include "Conflicts/OpenMerges.h"
-#include "Scenes/SceneRules.h"
 #include "Settle/Consequences.h"
+#include "Settle/DecisionTable.h"
+#include "Settle/PlainValues.h"
 
 #include <algorithm>
+#include <map>
 #include <set>
+#include <span>
 #include <utility>
 
 namespace ovrin {
@@ -15,86 +18,133 @@ using namespace ovrin_yaml;
 
 namespace {
 
-SceneMerge MergeOf(const OpenMerge& merge) {
-    FormatFiles files;
-    if (!merge.rules.empty()) files.rules = merge.rules;
-    if (!merge.typeInfo.empty()) files.typeInfo = merge.typeInfo;
-    SceneRules rules = ReadSceneRules(files);
-    return SceneMerge(merge.texts, std::move(rules.rules), std::move(rules.types));
+/// As RecordPlaces wants it.
+const MergeSession& MergedOnce(SceneMerge& merge, Side take) {
+    MergeHere(merge, {}, take);
+    return merge.Session();
 }
 
-/// The sides of `decisions` as a table of which the last one that matches counts.
-ResolveTable TableOf(const std::vector<Decision>& decisions) {
-    constexpr MergeResolve kResolves[] = {ResolveBase, ResolveRight, ResolveLeft};
-    std::vector<RecordResolve> resolves;
-    for (auto decision = decisions.rbegin(); decision != decisions.rend(); ++decision)
-        resolves.push_back(
-            {PathOfDecision(decision->path), kResolves[static_cast<std::size_t>(decision->side)]});
-    ResolveTable table;
-    table.Set(resolves);
-    return table;
-}
-
-std::optional<Side> SideOf(std::optional<MergeResolve> resolve) {
-    if (!resolve) return {};
-    return *resolve == ResolveBase ? Side::Base : *resolve == ResolveRight ? Side::Ours : Side::Theirs;
+/// Whether a decision is about something that the path leads through, so that the merge doesn't go on to its
+/// end.
+bool IsCoveredBy(const Decision& decision, const Path& path) {
+    const Path above = PathOfDecision(decision.path);
+    return above.size() < path.size() &&
+           std::equal(above.begin(), above.end(), path.begin(), [](const auto* wanted, const auto* element) {
+               return wanted == YAMLScalar::star || wanted == element;
+           });
 }
 
 } // namespace
 
 SettleSession::SettleSession(OpenMerge merge, Progress progress)
-    : m_Source(std::move(merge)), m_Merge(MergeOf(m_Source)), m_Names(m_Merge.Session()),
-      m_Decisions(std::move(progress.decisions)), m_Steps(std::move(progress.steps)) {
-    MergeHere(m_Merge, {}, m_Source.take);
-    Meet(m_Merge.Open());
-    m_Open = m_Merge.Open();
+    : m_Source(std::move(merge)), m_Merge(SceneMergeOf(m_Source)), m_Names(m_Merge.Session()),
+      m_Decisions(std::move(progress.decisions)), m_Steps(std::move(progress.steps)),
+      m_Places(MergedOnce(m_Merge, m_Source.take), m_Names) {
+    Meet();
     if (m_Source.identity.empty()) m_Source.conflicts = Open().size();
-    if (!m_Decisions.empty()) MergeBy(m_Decisions);
+    m_Problems = FindProblems(m_Merge, m_Names);
+    if (!m_Decisions.empty()) MergeAgain();
 }
 
-void SettleSession::Meet(const std::vector<OpenConflict>& conflicts) {
-    for (const OpenConflict& conflict : conflicts)
-        m_Conflicts.try_emplace(DecisionPath(conflict.path), conflict);
+/// The conflicts of the merge as it is in this process.
+void SettleSession::Meet() {
+    m_Conflicts.Add(m_Merge.Open(), m_Names);
+    if (m_Earlier) Propose(*m_Earlier);
 }
 
-void SettleSession::MergeBy(const std::vector<Decision>& decisions) {
-    MergedScene merged = MergeApart(m_Merge, m_Names, decisions, m_Source.take);
-    const auto isMet = [&](const std::string& path) { return m_Conflicts.contains(path); };
+void SettleSession::Propose(const EarlierDecisions& earlier) {
+    m_Earlier = &earlier;
+    if (earlier.IsEmpty()) return;
+    for (std::size_t i = 0; i < m_Conflicts.size(); ++i)
+        if (const auto values = EarlierDecisions::Values::Of(m_Conflicts[i], m_Places))
+            if (const std::optional<Side> side = earlier.Find(*values)) m_Conflicts.SetProposed(i, *side);
+}
+
+std::size_t SettleSession::TellDecided(EarlierDecisions& earlier) const {
+    std::size_t told = 0;
+    for (std::size_t i = 0; i < m_Conflicts.size(); ++i) {
+        const std::optional<Side> decided = m_Conflicts.StateOf(i).decided;
+        const auto values = decided ? EarlierDecisions::Values::Of(m_Conflicts[i], m_Places) : std::nullopt;
+        if (!values) continue;
+        earlier.Add(*values, *decided);
+        ++told;
+    }
+    return told;
+}
+
+/// Merges by the decisions. Returns those that match nothing.
+std::vector<std::string> SettleSession::MergeAgain() {
+    MergedScene merged = MergeApart(m_Merge, m_Names, m_Decisions, m_Source.take);
+    const auto isMet = [&](const std::string& path) {
+        return m_Conflicts.Find(PathOfDecision(path)).has_value();
+    };
     if (!std::ranges::all_of(merged.open, isMet)) {
         // Its operations are wanted, and stay only with a merge in this process. That is rare enough.
-        MergeHere(m_Merge, decisions, m_Source.take);
-        Meet(m_Merge.Open());
+        MergeHere(m_Merge, m_Decisions, m_Source.take);
+        Meet();
         MergeHere(m_Merge, {}, m_Source.take);
     }
-    std::vector<OpenConflict> open;
-    open.reserve(merged.open.size());
-    for (const std::string& path : merged.open) open.push_back(m_Conflicts.at(path));
-    m_Open = std::move(open);
-    m_Merged = std::move(merged);
+    TakeStates(merged.open);
+    m_Problems = std::move(merged.problems);
+    return std::move(merged.unmatched);
 }
 
-std::vector<SettleSession::Met> SettleSession::Conflicts() const {
-    std::set<Path> open;
-    for (const OpenConflict& conflict : Open()) open.insert(conflict.path);
-    const ResolveTable decided = TableOf(m_Decisions);
-    std::vector<MergeNames::ID> ids;
-    for (const auto& [path, conflict] : m_Conflicts) ids.push_back(conflict.path.front());
-    const std::vector<std::uint32_t> ranks = m_Names.Ranks(ids);
-    std::vector<std::pair<std::uint32_t, Met>> ranked;
-    for (const auto& [path, conflict] : m_Conflicts) {
-        const bool isOpen = open.contains(conflict.path);
-        const auto side = isOpen ? std::nullopt : SideOf(decided.Find(conflict.path));
-        ranked.push_back({ranks[ranked.size()], {&conflict, isOpen, side}});
+void SettleSession::TakeStates(const std::vector<std::string>& open) {
+    const DecisionTable decided(m_Decisions);
+    std::vector<MetConflicts::State> states(m_Conflicts.size(), {false, {}});
+    for (const std::string& path : open) states[*m_Conflicts.Find(PathOfDecision(path))].isOpen = true;
+    for (std::size_t i = 0; i < states.size(); ++i)
+        if (!states[i].isOpen) states[i].decided = decided.Find(m_Conflicts[i].path);
+    m_Conflicts.SetStates(std::move(states));
+}
+
+/// The conflict that a decision is about, if nothing else follows from it.
+std::optional<std::size_t> SettleSession::FindPlain(const Decision& decision) {
+    const std::optional<std::size_t> found = m_Conflicts.Find(PathOfDecision(decision.path));
+    if (!found) return {};
+    const auto [isPlain, isNew] = m_ArePlain.try_emplace(*found, false);
+    if (isNew) isPlain->second = IsPlainValue(m_Conflicts[*found], m_Places);
+    return isPlain->second ? found : std::nullopt;
+}
+
+/// Makes what follows from decisions, without merging. False if a merge must tell.
+bool SettleSession::DecidePlainly(std::span<const Decision> decisions) {
+    std::vector<MetConflicts::State> states = m_Conflicts.States();
+    const auto isCovered = [&](const Path& path) {
+        return std::ranges::any_of(m_Decisions,
+                                   [&](const Decision& made) { return IsCoveredBy(made, path); });
+    };
+    for (const Decision& decision : decisions) {
+        const std::optional<std::size_t> at = FindPlain(decision);
+        if (!at || (!states[*at].isOpen && isCovered(m_Conflicts[*at].path))) return false;
+        states[*at] = {false, decision.side};
     }
-    std::ranges::stable_sort(ranked, {}, &std::pair<std::uint32_t, Met>::first);
-    std::vector<Met> conflicts;
-    conflicts.reserve(ranked.size());
-    for (auto& [rank, conflict] : ranked) conflicts.push_back(std::move(conflict));
-    return conflicts;
+    m_Conflicts.SetStates(std::move(states));
+    return true;
+}
+
+/// The same for decisions that are taken back, those before them being left.
+bool SettleSession::UndoPlainly(std::span<const Decision> decisions) {
+    std::vector<MetConflicts::State> states = m_Conflicts.States();
+    const DecisionTable decided(m_Decisions);
+    for (const Decision& decision : decisions) {
+        const std::optional<std::size_t> at = FindPlain(decision);
+        if (!at) return false;
+        const std::optional<Side> side = decided.Find(m_Conflicts[*at].path);
+        states[*at] = {!side, side};
+    }
+    m_Conflicts.SetStates(std::move(states));
+    return true;
+}
+
+std::size_t SettleSession::CountProposed() const {
+    const std::vector<MetConflict> conflicts = Conflicts();
+    return static_cast<std::size_t>(
+        std::ranges::count_if(conflicts, [](const MetConflict& met) { return met.proposed.has_value(); }));
 }
 
 bool SettleSession::Touches(const std::string& path) {
-    const ResolveTable table = TableOf({{path, Side::Ours}});
+    const DecisionTable table({{path, Side::Ours}});
     return std::ranges::any_of(
         m_Merge.Session().Resolver().Records(),
         [&](const MergeSession::Record& record) { return table.Find(record.path.Elements()).has_value(); });
@@ -104,45 +154,45 @@ bool SettleSession::Touches(const std::string& path) {
 template <class Step> auto SettleSession::OrBack(const Step& step) {
     const std::vector<Decision> decisions = m_Decisions;
     const std::vector<DecisionStep> steps = m_Steps;
-    const MergedScene merged = m_Merged;
-    const std::vector<OpenConflict> open = m_Open;
+    const std::vector<MetConflicts::State> states = m_Conflicts.States();
+    const std::vector<Problem> problems = m_Problems;
     try {
         return step();
     } catch (...) {
         m_Decisions = decisions;
         m_Steps = steps;
-        m_Merged = merged;
-        m_Open = open;
+        m_Conflicts.SetStates(states);
+        m_Problems = problems;
         throw;
     }
 }
 
 std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisions, Follow follow) {
-    return OrBack([&] {
+    return OrBack([&]() -> std::vector<Decision> {
         const std::size_t before = m_Decisions.size();
+        const bool isPlain = DecidePlainly(decisions);
         for (const Decision& decision : decisions) {
             m_Decisions.push_back(decision);
-            const Path path = PathOfDecision(decision.path);
-            const auto open = std::ranges::find(Open(), path, &OpenConflict::path);
-            if (follow == Follow::Yes && open != Open().end()) AddConsequences({*open}, decision.side);
+            if (follow == Follow::No || isPlain) continue;
+            const std::optional<std::size_t> at = m_Conflicts.Find(PathOfDecision(decision.path));
+            if (at && m_Conflicts.StateOf(*at).isOpen) AddConsequences({m_Conflicts[*at]}, decision.side);
         }
-        MergeBy(m_Decisions);
-        std::vector<Decision> unmatched;
+        const std::vector<std::string> unmatched = isPlain ? std::vector<std::string>() : MergeAgain();
+        std::vector<Decision> refused;
         for (const Decision& decision : decisions)
-            if (std::ranges::find(m_Merged.unmatched, decision.path) != m_Merged.unmatched.end())
-                unmatched.push_back(decision);
-        if (unmatched.empty()) {
+            if (std::ranges::find(unmatched, decision.path) != unmatched.end()) refused.push_back(decision);
+        if (refused.empty()) {
             EndStep(before);
         } else {
             m_Decisions.resize(before);
-            MergeBy(m_Decisions);
+            MergeAgain();
         }
-        return unmatched;
+        return refused;
     });
 }
 
 void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, Side side) {
-    const std::vector<Decision> more = Consequences(m_Merge, m_Names, m_Open, conflicts, side);
+    const std::vector<Decision> more = Consequences(m_Merge, m_Names, Open(), conflicts, side);
     m_Decisions.insert(m_Decisions.end(), more.begin(), more.end());
 }
 
@@ -152,18 +202,33 @@ void SettleSession::EndStep(std::size_t decisionsBefore) {
 }
 
 std::size_t SettleSession::TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant) {
+    return TakeEach(
+        [&](const MetConflict& met) { return isMeant(*met.conflict) ? std::optional(side) : std::nullopt; });
+}
+
+std::size_t SettleSession::TakeProposed(const std::function<bool(const OpenConflict&)>& isMeant) {
+    return TakeEach(
+        [&](const MetConflict& met) { return isMeant(*met.conflict) ? met.proposed : std::nullopt; });
+}
+
+/// Decides the open conflicts of which `choose` has a side, and those of them that follow, as one step.
+std::size_t SettleSession::TakeEach(const std::function<std::optional<Side>(const MetConflict&)>& choose) {
     return OrBack([&] {
         std::set<Path> tried;
         const std::size_t before = m_Decisions.size();
         for (;;) {
-            std::vector<OpenConflict> round;
-            for (const OpenConflict& conflict : Open())
-                if (isMeant(conflict) && tried.insert(conflict.path).second) round.push_back(conflict);
+            std::map<Side, std::vector<OpenConflict>> round;
+            const std::size_t decided = m_Decisions.size();
+            for (const MetConflict& met : Conflicts()) {
+                const std::optional<Side> side = met.isOpen ? choose(met) : std::nullopt;
+                if (!side || !tried.insert(met.conflict->path).second) continue;
+                round[*side].push_back(*met.conflict);
+                m_Decisions.push_back({DecisionPath(met.conflict->path), *side});
+            }
             if (round.empty()) break;
-            for (const OpenConflict& conflict : round)
-                m_Decisions.push_back({DecisionPath(conflict.path), side});
-            AddConsequences(round, side);
-            MergeBy(m_Decisions);
+            if (DecidePlainly(std::span(m_Decisions).subspan(decided))) continue;
+            for (const auto& [side, conflicts] : round) AddConsequences(conflicts, side);
+            MergeAgain();
         }
         EndStep(before);
         std::size_t settled = tried.size();
@@ -180,7 +245,7 @@ bool SettleSession::Undo() {
         UndoneStep undone{{begin, m_Decisions.end()}, step.number};
         m_Decisions.erase(begin, m_Decisions.end());
         m_Steps.pop_back();
-        MergeBy(m_Decisions);
+        if (!UndoPlainly(undone.decisions)) MergeAgain();
         m_Undone.push_back(std::move(undone));
         return true;
     });
@@ -190,9 +255,10 @@ bool SettleSession::Redo() {
     if (m_Undone.empty()) return false;
     return OrBack([&] {
         const UndoneStep& step = m_Undone.back();
+        const bool isPlain = DecidePlainly(step.decisions);
         m_Decisions.insert(m_Decisions.end(), step.decisions.begin(), step.decisions.end());
         m_Steps.push_back({step.decisions.size(), step.number});
-        MergeBy(m_Decisions);
+        if (!isPlain) MergeAgain();
         m_Undone.pop_back();
         return true;
     });

@@ -3,13 +3,17 @@
 #include "Conflicts/OpenMerge.h"
 #include "Conflicts/SceneMerge.h"
 #include "Names/MergeNames.h"
+#include "Names/RecordPlace.h"
+#include "Settle/EarlierDecisions.h"
 #include "Settle/MergedScene.h"
+#include "Settle/MetConflicts.h"
 
 #include <cstddef>
 #include <cstdint>
 #include <functional>
 #include <map>
 #include <optional>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -25,8 +29,9 @@ class OpenMerges;
 ///     session.Decide({{"734813.MonoBehaviour.m_Brightness", Side::Theirs}});
 ///     store.SetProgress(session.Source(), session.GetProgress());
 ///
-/// After each step the scene is merged again (Settle/MergedScene.h); it is read and compared once. A later
-/// decision counts more than an earlier one. All functions throw Failure, worded for people, for texts that
+/// After each step the scene is merged again (Settle/MergedScene.h), unless nothing can follow from its
+/// decisions (Settle/PlainValues.h); it is read and compared once. A later decision counts more than an
+/// earlier one. All functions throw Failure, worded for people, for texts that
 /// can't be merged, and leave the session as it was then. Only for a process without other threads.
 class SettleSession {
 public:
@@ -37,18 +42,16 @@ public:
     const std::vector<Decision>& Decisions() const { return m_Decisions; }
     /// Nothing is open, and a scene that both sides added was looked through, which a step shows.
     bool IsSettled() const { return Open().empty() && !(m_Merge.IsBothAdded() && m_Steps.empty()); }
-    /// What the result lacks although something in it needs it, a line each.
-    const std::vector<std::string>& Missing() const { return m_Merged.missing; }
+    /// What is wrong with the result.
+    const std::vector<Problem>& Problems() const { return m_Problems; }
 
-    struct Met {
-        const OpenConflict* conflict; ///< stays as long as the session
-        bool isOpen;
-        std::optional<Side> decided; ///< by the decision that counts there, of a settled one
-    };
+    using Met = MetConflict;
     /// The conflicts of the merge as it began and those that decisions led to, in the order of the hierarchy.
-    std::vector<Met> Conflicts() const;
+    std::vector<Met> Conflicts() const { return m_Conflicts.InOrder(); }
     std::size_t CountMet() const { return m_Conflicts.size(); }
-    const std::vector<OpenConflict>& Open() const { return m_Open; }
+    const std::vector<OpenConflict>& Open() const { return m_Conflicts.Open(); }
+    /// How many open ones something is proposed of.
+    std::size_t CountProposed() const;
     /// Whether a path or pattern matches anything that either side changed.
     bool Touches(const std::string& path);
 
@@ -60,6 +63,8 @@ public:
     /// Decides all open conflicts that `isMeant` accepts, and those of them that follow, for a side, as one
     /// step. What can't be settled by a side stays open. Returns how many conflicts were settled.
     std::size_t TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant);
+    /// The same by what is proposed of each.
+    std::size_t TakeProposed(const std::function<bool(const OpenConflict&)>& isMeant);
     /// Takes the last step back. False if there is none.
     bool Undo();
     /// Makes the step again that was taken back last, unless another was made since. False if there is none.
@@ -73,6 +78,12 @@ public:
     void NumberSteps(std::uint64_t number) { m_NextStep = number; }
     /// Redo has nothing left to make.
     void ForgetUndone() { m_Undone.clear(); }
+
+    /// Looks up what was decided before of conflicts with the same values, and of those that will be met.
+    /// `earlier` must stay.
+    void Propose(const EarlierDecisions& earlier);
+    /// Adds what is decided of conflicts here. Returns of how many.
+    std::size_t TellDecided(EarlierDecisions& earlier) const;
 
     /// Writes the decisions down, and the merge itself if nobody has.
     void Keep(OpenMerges& store);
@@ -91,8 +102,13 @@ public:
 private:
     void AddConsequences(const std::vector<OpenConflict>& conflicts, Side side);
     void EndStep(std::size_t decisionsBefore);
-    void MergeBy(const std::vector<Decision>& decisions);
-    void Meet(const std::vector<OpenConflict>& conflicts);
+    void Meet();
+    std::size_t TakeEach(const std::function<std::optional<Side>(const MetConflict&)>& choose);
+    std::vector<std::string> MergeAgain();
+    void TakeStates(const std::vector<std::string>& open);
+    std::optional<std::size_t> FindPlain(const Decision& decision);
+    bool DecidePlainly(std::span<const Decision> decisions);
+    bool UndoPlainly(std::span<const Decision> decisions);
     template <class Step> auto OrBack(const Step& step);
 
     OpenMerge m_Source;
@@ -106,9 +122,11 @@ private:
     };
     std::vector<UndoneStep> m_Undone; // the one that was taken back last at the end
     std::uint64_t m_NextStep = 0;     // its number; 0 for the one behind the last
-    MergedScene m_Merged;
-    std::vector<OpenConflict> m_Open;
-    std::map<std::string, OpenConflict> m_Conflicts; // by the texts of their paths
+    RecordPlaces m_Places;
+    const EarlierDecisions* m_Earlier = nullptr;
+    MetConflicts m_Conflicts;
+    std::map<std::size_t, bool> m_ArePlain; // those conflicts of which it was asked, by their indexes
+    std::vector<Problem> m_Problems;
 };
 
 } // namespace ovrin

@@ -97,6 +97,27 @@ MergeNames::ID ObjectCalled(const SettleSession& session, const std::string& nam
     throw Failure(text + "\nGive the number instead of the name");
 }
 
+/// Calls take(session, isMeant) for the sessions that have something under an object of that name. Returns
+/// the sum.
+template <class Take> std::size_t TakeUnder(Sessions sessions, const std::string& name, const Take& take) {
+    std::vector<std::pair<SettleSession*, MergeNames::ID>> meant;
+    for (const auto& session : sessions) {
+        const MergeNames::ID above = name.empty() ? nullptr : ObjectCalled(*session, name);
+        if (name.empty() || above) meant.emplace_back(session.get(), above);
+    }
+    if (meant.empty() && !name.empty())
+        throw Failure("No open conflict is about \"" + Printable(name) +
+                      "\" or what stands under it, so nothing was decided: \"ovrin settle --list\" shows the "
+                      "conflicts");
+    std::size_t settled = 0;
+    for (const auto& [session, above] : meant) {
+        UnderObject under(session->Names(), above);
+        settled += take(
+            *session, [&, above = above](const OpenConflict& open) { return !above || under.IsMeant(open); });
+    }
+    return settled;
+}
+
 } // namespace
 
 Wanted ParseWanted(const std::string& text) {
@@ -127,21 +148,19 @@ void DecideByFile(Sessions sessions, const std::string& file) {
 }
 
 std::size_t TakeSide(Sessions sessions, Side side, const std::string& under) {
-    std::vector<std::pair<SettleSession*, MergeNames::ID>> meant;
-    for (const auto& session : sessions) {
-        const MergeNames::ID above = under.empty() ? nullptr : ObjectCalled(*session, under);
-        if (under.empty() || above) meant.emplace_back(session.get(), above);
-    }
-    if (meant.empty() && !under.empty())
-        throw Failure("No open conflict is about \"" + Printable(under) +
-                      "\" or what stands under it, so nothing was decided: \"ovrin settle --list\" shows the "
-                      "conflicts");
-    std::size_t settled = 0;
-    for (const auto& [session, above] : meant) {
-        UnderObject under(session->Names(), above);
-        settled += session->TakeAll(
-            side, [&, above = above](const OpenConflict& open) { return !above || under.IsMeant(open); });
-    }
+    return TakeUnder(sessions, under, [side](SettleSession& session, const auto& isMeant) {
+        return session.TakeAll(side, isMeant);
+    });
+}
+
+std::size_t TakeProposed(Sessions sessions, const std::string& under) {
+    const std::size_t settled = TakeUnder(sessions, under, [](SettleSession& session, const auto& isMeant) {
+        return session.CountProposed() ? session.TakeProposed(isMeant) : 0;
+    });
+    if (!settled)
+        throw Failure(
+            "Nothing was decided before of the conflicts that are open: \"ovrin settle --list\" shows "
+            "them");
     return settled;
 }
 

@@ -36,5 +36,7 @@ void DecideByFile(Sessions sessions, const std::string& file);
 /// it; empty for all. Throws Failure if that name matches nothing, or several objects of one scene. Returns
 /// how many conflicts were settled.
 std::size_t TakeSide(Sessions sessions, Side side, const std::string& under);
+/// The same by what is proposed of each. Throws Failure also if nothing is proposed of any.
+std::size_t TakeProposed(Sessions sessions, const std::string& under);
 
 } // namespace ovrin

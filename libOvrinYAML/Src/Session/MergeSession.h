@@ -60,6 +60,7 @@ public:
     /// What is known of the format of the files; wherever it stands ahead of Diff.
     void SetRules(MergeRules rules, YAMLTypeInfoManager types = {});
     const MergeRules& Rules() const { return m_Rules; }
+    const YAMLTypeInfoManager& Types() const { return m_Types; }
 
     /// Reads base, left and, unless it is a session of two, right.
     void Read(const std::vector<InputFile>& files, StageWatcher* watcher = nullptr,
