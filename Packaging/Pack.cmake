@@ -5,8 +5,9 @@ set(components Unspecified programs)
 if(NOT CPACK_GENERATOR MATCHES "^(DEB|RPM)$")
   if(NOT CPACK_OVRIN_STATIC_LINK)
     message(FATAL_ERROR "An archive for any Linux needs programs that are linked statically, and this build can't link "
-      "so: it is one with sanitizers, or libyaml.a, libstdc++.a or libc.a is missing. Debian has them in libyaml-dev, "
-      "g++ and libc6-dev, Fedora in libyaml-static, libstdc++-static and glibc-static. "
+      "so: it is one with sanitizers, or libyaml.a, libncursesw.a, libstdc++.a or libc.a is missing. Debian has them "
+      "in libyaml-dev, libncurses-dev, g++ and libc6-dev, Fedora in libyaml-static, ncurses-static, libstdc++-static and "
+      "glibc-static. "
       "Install them and configure the build in a new folder.")
   endif()
   set(targets OvrinMerge-static ovrin-static completions)

@@ -153,8 +153,10 @@ Outcome LetPersonSettle(SettleScenes& scenes, const SettleOptions& options, bool
     TellFinished(scenes, end.finished, end.refused);
     const std::size_t left = scenes.Sessions().size() - end.finished.size();
     if (left > 0 && end.refused.empty())
-        std::cerr << (desk.IsSettled() ? "All is settled, and " : CountOpen(desk.CountOpen()) + " left, and ")
-                  << "what you decided is kept: \"ovrin settle\" goes on.\n";
+        std::cerr << (desk.IsSettled()   ? "All is settled"
+                      : desk.CountOpen() ? CountOpen(desk.CountOpen()) + " left"
+                                         : "A scene that both sides added waits for a look")
+                  << ", and what you decided is kept: \"ovrin settle\" goes on.\n";
     return left > 0 || isAnyUnreadable ? Outcome::LeftOpen : Outcome::Done;
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Conflicts/Conflict.h"
 #include "Conflicts/OpenMerge.h"
 #include "Conflicts/SceneMerge.h"
 #include "Names/MergeNames.h"

@@ -16,6 +16,14 @@ using Ranges = std::vector<TextRange>;
 
 constexpr Side kSides[] = {Side::Base, Side::Ours, Side::Theirs};
 
+/// What a side did, or what it comes to take it, where its value doesn't say that.
+std::string WhatIsDone(const Conflict& conflict, Side side) {
+    const bool isChoice =
+        conflict.kind == ConflictKind::ParentLoop || conflict.kind == ConflictKind::BrokenRequirement;
+    if (isChoice) return conflict.ChoiceOf(side);
+    return !conflict.In(side) || conflict.property.empty() ? conflict.WordsOf(side) : "";
+}
+
 /// A value as a text of several lines; empty where there is none.
 std::string TextOfValue(const Conflict& conflict, Side side, const MergeNames& names,
                         const Letters& letters) {
@@ -110,8 +118,8 @@ std::array<SideText, 3> SideTextsOf(const Walk& walk, const Walk::Stop& stop, co
     for (const Side side : kSides) {
         const auto at = static_cast<std::size_t>(side);
         if (conflict.In(side)) sides[at] = Marked(texts[at], MarksOf(conflict, side, texts), columns);
-        if (!conflict.In(side) || conflict.property.empty())
-            sides[at].what = {{letters.Shown(conflict.WordsOf(side)), Style::Strong}};
+        if (const std::string what = WhatIsDone(conflict, side); !what.empty())
+            sides[at].what = {{letters.Shown(what), Style::Strong}};
     }
     return sides;
 }
