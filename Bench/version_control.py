@@ -67,6 +67,7 @@ class Repository:
         seconds = time.perf_counter() - begin
         self.git("reset", "-q", "--hard", "main")
         self.git("prune", "--expire=now")  # the results, which git would not store again
+        shutil.rmtree(self.folder / "tree/.git/ovrin", ignore_errors=True)  # the conflicts that were written down
         return seconds
 
 

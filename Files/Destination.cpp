@@ -72,12 +72,12 @@ int PutNewFile(const std::string& place, const Descriptor* old, const Content& c
     const mode_t mode = old ? 0600 : 0666;
     if (NewFile file(place); file.OpenUnnamed(mode) == 0) {
         if (const int error = Make(file, old, content)) return error;
-        if (file.TakeName() == 0) return file.TakePlace();
+        if (file.TakeName() == 0) return file.TakePlace(content.durability);
     }
     NewFile file(place);
     if (const int error = file.OpenNamed(mode)) return error;
     if (const int error = Make(file, old, content)) return error;
-    return file.TakePlace();
+    return file.TakePlace(content.durability);
 }
 
 int Create(const std::string& path, const Content& content) {
@@ -112,7 +112,7 @@ int WriteFromStart(const Descriptor& file, const Content& content) {
     const off_t end = lseek(file.Get(), 0, SEEK_CUR);
     if (end < 0) return errno;
     const int error = SetSize(file.Get(), end);
-    return error || content.durability == Durability::Unsynced ? error : Sync(file.Get());
+    return error || content.durability != Durability::Synced ? error : Sync(file.Get());
 }
 
 /// As far as the system lets it.

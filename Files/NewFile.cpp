@@ -83,7 +83,7 @@ int NewFile::Fill(const OutputWriter& write, Durability durability) {
     OutputStream stream(m_File.Get());
     write(stream);
     const int error = stream.Finish();
-    return error || durability == Durability::Unsynced ? error : Sync(m_File.Get());
+    return error || durability != Durability::Synced ? error : Sync(m_File.Get());
 }
 
 int NewFile::TakeName() {
@@ -93,9 +93,28 @@ int NewFile::TakeName() {
     });
 }
 
-int NewFile::TakePlace() {
+/// File systems such as ext4 write a file to the disk as soon as its name replaces another, so that a failure
+/// of the machine finds one of them. Whoever removes the file waits for that, longer than the whole merge of
+/// a scene takes. A file that changes places with the other one isn't written.
+int NewFile::TakePlace(Durability durability) {
     if (const int error = m_File.Close()) return error;
+    if (durability == Durability::Passing && ChangePlaces() == 0) return RemoveOther();
     if (rename(m_Name.c_str(), m_Place.c_str()) != 0) return errno;
+    m_Name.clear();
+    return 0;
+}
+
+int NewFile::ChangePlaces() {
+    return renameat2(AT_FDCWD, m_Name.c_str(), AT_FDCWD, m_Place.c_str(), RENAME_EXCHANGE) == 0 ? 0 : errno;
+}
+
+/// The old file, which has the hidden name now. Where that can't be done all is put back.
+int NewFile::RemoveOther() {
+    if (unlink(m_Name.c_str()) != 0) {
+        const int error = errno;
+        ChangePlaces();
+        return error;
+    }
     m_Name.clear();
     return 0;
 }

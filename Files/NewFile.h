@@ -23,10 +23,12 @@ public:
     /// Gives the hidden name to a file without name.
     int TakeName();
     /// Closes the file and puts it into its place. It must have a name.
-    int TakePlace();
+    int TakePlace(Durability durability);
 
 private:
     template <class Take> int FindName(const Take& take);
+    int ChangePlaces();
+    int RemoveOther();
 
     const std::string m_Place;
     Descriptor m_File;

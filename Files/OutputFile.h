@@ -7,9 +7,12 @@
 
 class Descriptor;
 
-/// Whether what is written outlives a failure of the machine too, or the end of the process alone. The first
-/// costs a few milliseconds and more.
-enum class Durability { Synced, Unsynced };
+/// What a file that is written outlives.
+enum class Durability {
+    Synced,   ///< a failure of the machine too, which costs a few milliseconds and more
+    Unsynced, ///< the end of the process; after a failure of the machine the old one may stand there again
+    Passing,  ///< the end of the process alone: what is removed soon, or can be made again
+};
 
 /// Fills a file.
 using OutputWriter = std::function<void(OutputStream&)>;

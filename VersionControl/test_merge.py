@@ -169,7 +169,16 @@ def test_user_chooses_what_stands_at_conflicts(user):
         user.git("merge", "--abort")
     user.git("merge", "topic", fails=True, OVRIN_TAKE="mine")
     assert 'There is no side "mine"' in user.words() and "OVRIN_TAKE" in user.words()
+    assert "put that right" in user.words() and "put a good version" not in user.words()
     assert user.read() == OURS and unmerged(user)
+    user.ovrin("settle", "--take", "theirs")
+    assert user.read() == scene("2 Lamp 3") and not unmerged(user)
+
+
+def test_answers_that_cannot_be_written_are_told(user):
+    for question in ("--version", "--help"):
+        user.run("sh", "-c", f"ovrin {question} >/dev/full", fails=True)
+        assert "Cannot write to standard output: No space left on device" in user.words()
 
 
 def test_later_merge_without_conflicts_forgets_the_earlier(user):

@@ -23,7 +23,7 @@ std::string PaintedLines(const std::string& lines, bool inColour);
 /// The counts of files, one line each, and their sum.
 ///
 ///     scenes/Harbour.ovrin | 1 added, 1 changed, 1 moved
-///     1 scene: 1 object added, 0 removed, 1 changed, 1 moved
+///     1 scene: 1 added, 1 changed, 1 moved
 std::string ChangeStat(std::span<const FileChange> changes, bool inColour);
 
 /// "renamed from a.ovrin", "added"; empty for a file that just changed.

@@ -14,8 +14,8 @@
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
-#include <iostream>
 #include <new>
+#include <sstream>
 
 namespace ovrin {
 
@@ -51,15 +51,6 @@ std::vector<Described> DescribeWanted(CLI::App& program, const std::vector<std::
     return described;
 }
 
-Outcome TellMisuse(const CLI::App& program, const CLI::ParseError& error,
-                   const std::vector<std::string>& arguments) {
-    if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) { // --help and --version
-        return program.exit(error) == 0 && std::cout.flush() ? Outcome::Done : Outcome::Failed;
-    }
-    Tell(PrintableLines(DescribeMisuse(program, error, arguments)));
-    return Outcome::Failed;
-}
-
 /// Names of files and branches, and what other programs said, may stand in it.
 void TellFailure(const std::string& what) {
     Tell("ovrin: " + PrintableLines(what) + '\n');
@@ -75,6 +66,22 @@ Outcome RunAction(const Action& action) {
     } catch (const ovrin_yaml::YAMLError& error) {
         TellFailure(error.what());
     }
+    return Outcome::Failed;
+}
+
+/// What --help and --version ask for.
+Outcome PrintAnswer(const CLI::App& program, const CLI::ParseError& question) {
+    std::ostringstream answer;
+    program.exit(question, answer, answer);
+    PrintResult(answer.str());
+    return Outcome::Done;
+}
+
+Outcome TellMisuse(const CLI::App& program, const CLI::ParseError& error,
+                   const std::vector<std::string>& arguments) {
+    if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success))
+        return RunAction([&] { return PrintAnswer(program, error); });
+    Tell(PrintableLines(DescribeMisuse(program, error, arguments)));
     return Outcome::Failed;
 }
 

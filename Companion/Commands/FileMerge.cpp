@@ -28,6 +28,7 @@
 
 #include <cerrno>
 #include <filesystem>
+#include <future>
 #include <memory>
 #include <system_error>
 
@@ -91,10 +92,15 @@ std::unique_ptr<SceneMerge> Compare(const FileMerge& files, ovrin_yaml::StageWat
     }
 }
 
+/// Whether the file is git's own copy of ours, which it removes as soon as it has read the result there.
+bool IsPassing(const std::string& file) {
+    return fs::path(file).filename().string().starts_with(".merge_file_");
+}
+
 void DeliverResult(const std::string& file, const std::string& text) {
     // Version control doesn't sync the files of a merge either, and would have to start again without them.
     const Content content = {text.size(), [&](OutputStream& stream) { stream << text; },
-                             Durability::Unsynced};
+                             IsPassing(file) ? Durability::Passing : Durability::Unsynced};
     if (const int error = Deliver(file, content))
         throw Failure("cannot write the result, " + Printable(file) + ": " +
                       std::system_category().message(error));
@@ -162,14 +168,12 @@ std::string Record(const Records& records, const FileMerge& files, OpenMerge mer
     }
 }
 
-/// The merge as it is to be told and written down, without its texts.
+/// The merge as it is to be told and written down, without its texts and the side that is taken.
 OpenMerge DescribeOpen(const FileMerge& files, const Records& records, const std::optional<Caller>& caller,
-                       SceneMerge& merge) {
+                       const SceneMerge& merge) {
     OpenMerge open;
     open.path = records.path.empty() ? files.path : records.path;
     open.occasion = FindOccasion(records.repository, caller, files.labels);
-    open.take = SideToTake(records.repository);
-    if (open.take != Side::Ours) merge.Merge({}, open.take);
     open.isBothAdded = merge.IsBothAdded();
     open.conflicts = merge.Open().size();
     return open;
@@ -189,6 +193,26 @@ constexpr const char* kNextStep = "Next: \"ovrin settle --list\" shows the open 
                                   "\"ovrin settle --take theirs\" takes "
                                   "a side at them, \"ovrin settle --set PATH=theirs\" at one.\n";
 
+Outcome LeaveOpen(const FileMerge& files, const Records& records, SceneMerge& merge, ProgressLine& progress) {
+    // Version control takes its time for the answer, which most often is ours.
+    std::future<Side> take = std::async([&] { return SideToTake(records.repository); });
+    const std::optional<Caller> caller = FindCaller();
+    const bool isRecorded = !IsWithoutTree(caller);
+    OpenMerge open = DescribeOpen(files, records, caller, merge);
+    std::string result = merge.Result();
+    open.take = take.get();
+    if (open.take != Side::Ours) {
+        merge.Merge({}, open.take);
+        result = merge.Result();
+    }
+    const std::string complaint = isRecorded ? Record(records, files, open) : "";
+    DeliverResult(files.result, result);
+    const std::string told = TellOpen(merge, open) + complaint + (isRecorded ? kNextStep : "");
+    progress.Wipe();
+    Tell(told);
+    return Outcome::LeftOpen;
+}
+
 } // namespace
 
 Outcome Merge(const FileMerge& files) {
@@ -198,22 +222,11 @@ Outcome Merge(const FileMerge& files) {
     SceneMerge& merge = *compared;
     merge.Merge();
     const Records records(files.path);
-    if (merge.Open().empty() && !merge.IsBothAdded()) {
-        const std::string result = merge.Result();
-        ForgetEarlier(records);
-        DeliverResult(files.result, result);
-        return Outcome::Done;
-    }
-    const std::optional<Caller> caller = FindCaller();
-    const bool isRecorded = !IsWithoutTree(caller);
-    const OpenMerge open = DescribeOpen(files, records, caller, merge);
+    if (!merge.Open().empty() || merge.IsBothAdded()) return LeaveOpen(files, records, merge, progress);
     const std::string result = merge.Result();
-    const std::string complaint = isRecorded ? Record(records, files, open) : "";
+    ForgetEarlier(records);
     DeliverResult(files.result, result);
-    const std::string told = TellOpen(merge, open) + complaint + (isRecorded ? kNextStep : "");
-    progress.Wipe();
-    Tell(told);
-    return Outcome::LeftOpen;
+    return Outcome::Done;
 }
 
 } // namespace ovrin

@@ -15,17 +15,27 @@ namespace {
 
 constexpr std::size_t kWordsOfSubversion = 5;
 
+constexpr const char* kPutScene = "put a good version in its place, and tell version control that it is "
+                                  "settled.";
+constexpr const char* kPutSetting =
+    "put that right, and then, with git, let \"ovrin settle\" merge it again; "
+    "with others, let version control do so.";
+
+Failure NotMerged(const FileMerge& files, const std::exception& error, const char* next) {
+    return Failure(Printable(files.path) + " is not merged: " + error.what() +
+                   "\nIt stays unmerged, and nothing was changed: " + next);
+}
+
 /// What ends a merge names its scene, and what becomes of that.
 Outcome MergeOrTell(const FileMerge& files) {
     try {
         return Merge(files);
     } catch (const std::bad_alloc&) {
         throw;
+    } catch (const BadSetting& error) {
+        throw NotMerged(files, error, kPutSetting);
     } catch (const std::exception& error) {
-        throw Failure(
-            Printable(files.path) + " is not merged: " + error.what() +
-            "\nIt stays unmerged, and nothing was changed: put a good version in its place, and tell "
-            "version control that it is settled.");
+        throw NotMerged(files, error, kPutScene);
     }
 }
 
@@ -39,9 +49,11 @@ Action DescribeMerge(CLI::App& command) {
     command.add_option("--our-label", files->labels.ours, "what ours is called: a branch or commit")
         ->type_name("LABEL");
     command.add_option("--their-label", files->labels.theirs, "what theirs is called")->type_name("LABEL");
-    command.add_option("--rules", files->format.rules,
-                       "the merge rules, in place of those beside the program");
-    command.add_option("--typeInfo", files->format.typeInfo, "the types of components and what they require");
+    command
+        .add_option("--rules", files->format.rules, "the merge rules, in place of those beside the program")
+        ->type_name("FILE");
+    command.add_option("--typeInfo", files->format.typeInfo, "the types of components and what they require")
+        ->type_name("FILE");
     command.add_option("BASE", files->base, "the common ancestor; empty if both sides added the scene")
         ->required();
     command.add_option("OURS", files->ours, "the scene as it is here")->required();

@@ -93,7 +93,7 @@ Action DescribePreview(CLI::App& command) {
         command.add_option("--part", wish->part, "look into part K of N alone, a job's share of the scenes");
     part->type_name("K/N");
     command.add_option("--join", wish->files, "put the answers of all parts together, which are JSON")
-        ->type_name("FILE...")
+        ->type_name("FILE")
         ->excludes(part);
     auto* json = command.add_flag("--json", wish->isJson, "answer in JSON");
     command.add_flag("--markdown", wish->isMarkdown, "answer as a comment on a pull request")->excludes(json);

@@ -126,16 +126,17 @@ OpenMerge Parse(const std::string& bytes, Extent extent) {
 std::string ReadBeginning(const std::string& file, std::size_t most) {
     const Descriptor descriptor = OpenFile(file.c_str(), O_RDONLY);
     if (!descriptor.IsOpen()) throw Failure(std::system_category().message(errno));
-    std::string bytes(most, '\0');
-    std::size_t length = 0;
-    while (length < most) {
-        const ssize_t count =
-            Uninterrupted([&] { return read(descriptor.Get(), bytes.data() + length, most - length); });
-        if (count < 0) throw Failure(std::system_category().message(errno));
-        if (count == 0) break;
-        length += static_cast<std::size_t>(count);
-    }
-    bytes.resize(length);
+    std::string bytes;
+    ssize_t count = 1;
+    bytes.resize_and_overwrite(most, [&](char* buffer, std::size_t) {
+        std::size_t length = 0;
+        while (count > 0 && length < most) {
+            count = Uninterrupted([&] { return read(descriptor.Get(), buffer + length, most - length); });
+            length += static_cast<std::size_t>(std::max<ssize_t>(count, 0));
+        }
+        return length;
+    });
+    if (count < 0) throw Failure(std::system_category().message(errno));
     return bytes;
 }
 
@@ -182,9 +183,9 @@ void OpenMerges::Add(OpenMerge& merge) {
     if (error) throw Failure("Cannot make the folder " + m_Folder + ": " + error.message());
     merge.identity = NewIdentity();
     const auto parts = PartsOf(merge);
-    // As safe as what version control writes of the merge itself.
+    // As safe as what version control writes of the merge itself, also in the place of an earlier one.
     Write(PlaceOf(merge.path).file + kMergeExtension, HeaderOf(merge), {parts.begin(), parts.end()},
-          Durability::Unsynced);
+          Durability::Passing);
 }
 
 std::vector<OpenMerge> OpenMerges::List() const {

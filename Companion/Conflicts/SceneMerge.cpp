@@ -7,10 +7,9 @@
 #include "Writing/ObjectFileWriter.h"
 
 #include <algorithm>
-#include <map>
 #include <new>
+#include <set>
 #include <sstream>
-#include <unordered_set>
 #include <utility>
 
 namespace ovrin {
@@ -106,39 +105,19 @@ ConflictKind KindOf(const MergeSession::Record& record) {
     }
 }
 
-bool Matches(const Path& pattern, const Path& path) {
-    if (pattern.size() != path.size()) return false;
-    if (path.front() == YAMLScalar::underscore && pattern.front() != path.front()) return false;
-    return std::ranges::equal(pattern, path, [](const YAMLScalar* wanted, const YAMLScalar* element) {
-        return wanted == YAMLScalar::star || wanted == element;
-    });
-}
-
-/// Those of `decisions` that match no record.
-std::vector<Decision> FindUnmatched(std::span<const Decision> decisions,
+/// Those of `decisions`, which are those of the table, that match no record.
+std::vector<Decision> FindUnmatched(std::span<const Decision> decisions, const ResolveTable& table,
                                     const std::vector<MergeSession::Record>& records) {
-    std::map<Path, std::vector<std::size_t>> exact; // decisions; only looked into
-    std::vector<std::pair<Path, std::size_t>> patterns;
-    for (std::size_t i = 0; i < decisions.size(); ++i) {
-        Path path = PathOfDecision(decisions[i].path);
-        if (std::ranges::count(path, YAMLScalar::star))
-            patterns.emplace_back(std::move(path), i);
-        else
-            exact[std::move(path)].push_back(i);
-    }
-    std::vector<bool> isMatched(decisions.size());
-    for (const MergeSession::Record& record : records) {
-        const Path path = record.path.Elements();
-        if (path.empty()) continue;
-        if (const auto found = exact.find(path); found != exact.end())
-            for (const std::size_t i : found->second) isMatched[i] = true;
-        std::erase_if(patterns, [&](const auto& pattern) {
-            return Matches(pattern.first, path) && (isMatched[pattern.second] = true);
-        });
-    }
+    if (decisions.empty()) return {};
+    std::vector<bool> isFound(decisions.size());
+    for (const MergeSession::Record& record : records)
+        table.ForEachMatch(record.path.Elements(), [&](std::size_t number) { isFound[number] = true; });
+    std::set<Path> found;
+    for (std::size_t i = 0; i < decisions.size(); ++i)
+        if (isFound[i]) found.insert(table.All()[i].path);
     std::vector<Decision> unmatched;
     for (std::size_t i = 0; i < decisions.size(); ++i)
-        if (!isMatched[i]) unmatched.push_back(decisions[i]);
+        if (!found.contains(table.All()[i].path)) unmatched.push_back(decisions[i]);
     return unmatched;
 }
 
@@ -163,7 +142,7 @@ void SceneMerge::Merge(std::span<const Decision> decisions, Side take) {
     ResolveTable decided;
     decided.Set(resolves);
     CollectOpen(decided);
-    m_Unmatched = FindUnmatched(decisions, m_Session.Resolver().Records());
+    m_Unmatched = FindUnmatched(decisions, decided, m_Session.Resolver().Records());
     BreakLoops(resolves, take);
 }
 

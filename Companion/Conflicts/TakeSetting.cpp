@@ -15,7 +15,7 @@ Side SideOf(const std::string& value, const char* setting) {
     try {
         return SideNamed(value);
     } catch (const Failure& failure) {
-        throw Failure(failure.what() + std::string(" (it stands in ") + setting + ")");
+        throw BadSetting(failure.what() + std::string(" (it stands in ") + setting + ")");
     }
 }
 

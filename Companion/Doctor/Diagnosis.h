@@ -5,7 +5,7 @@
 
 namespace ovrin {
 
-/// How a check ended.
+/// How a check ended. HealthName has the names in this order.
 enum class Health {
     Fine,    ///< nothing is wrong
     Note,    ///< something could be better; no problem

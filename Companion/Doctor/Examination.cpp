@@ -4,6 +4,8 @@
 #include "Doctor/MachineChecks.h"
 #include "Doctor/Patient.h"
 #include "Doctor/SceneChecks.h"
+#include "Systems/Operation.h"
+#include "Words/Failure.h"
 
 #include <exception>
 
@@ -42,10 +44,27 @@ Diagnosis Look(const Check& check, Patient& patient) {
     }
 }
 
+void CheckAtRest(const Patient& patient) {
+    if (patient.Around() && IsAtWork(*patient.Around()))
+        throw Failure("version control is at work here, as " + LockOf(*patient.Around()) +
+                      " says: try again when it is done, or remove that file if it was left behind");
+}
+
+/// What version control is in the midst of looks like something that is wrong.
+Diagnosis LookAtRest(const Check& check, Patient& patient) {
+    CheckAtRest(patient);
+    patient.Forget();
+    Diagnosis diagnosis = Look(check, patient);
+    CheckAtRest(patient);
+    return diagnosis;
+}
+
 /// The diagnosis after the fix, or the old one with the reason why it can't be fixed.
 Diagnosis Fixed(const Check& check, const Diagnosis& problem, Patient& patient) {
     try {
-        const std::string done = problem.fix();
+        const Diagnosis still = LookAtRest(check, patient);
+        if (still.health != Health::Problem || !still.fix) return still;
+        const std::string done = still.fix();
         patient.Forget();
         Diagnosis after = Look(check, patient);
         if (after.health != Health::Fine && after.health != Health::Note && after.health != Health::Skipped)
@@ -71,21 +90,8 @@ std::vector<Examined> Examine(bool fix) {
 }
 
 const char* HealthName(Health health) {
-    switch (health) {
-    case Health::Fine:
-        return "ok";
-    case Health::Note:
-        return "note";
-    case Health::Problem:
-        return "problem";
-    case Health::Fixed:
-        return "fixed";
-    case Health::Skipped:
-        return "skipped";
-    case Health::Unknown:
-        return "unknown";
-    }
-    return "";
+    constexpr const char* kNames[] = {"ok", "note", "problem", "fixed", "skipped", "unknown"};
+    return kNames[static_cast<std::size_t>(health)];
 }
 
 } // namespace ovrin

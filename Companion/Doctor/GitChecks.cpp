@@ -24,12 +24,6 @@ bool HasGit() {
     return !FindProgram("git").empty();
 }
 
-std::string AnswerOf(const CommandWords& command) {
-    std::string answer = RunProcess(command).output;
-    if (answer.ends_with('\n')) answer.pop_back();
-    return answer;
-}
-
 std::string DriverIn(const std::string& scope) {
     CommandWords command = {"git", "config", "--get", "merge.ovrin.driver"};
     if (!scope.empty()) command.insert(command.begin() + 2, scope);
@@ -92,7 +86,7 @@ struct OldLine {
 /// Included files count by the line that includes them.
 std::vector<OldLine> OldLines(const ProcessSetting& setting) {
     const std::vector<std::string> listed =
-        ZeroEndedTexts(RunProcess({"git", "config", "--show-origin", "--null", "--list"}, setting).output);
+        ZeroEndedTexts(OutputOf({"git", "config", "--show-origin", "--null", "--list"}, setting));
     std::vector<OldLine> lines;
     for (std::size_t i = 0; i + 1 < listed.size(); i += 2) { // origin, name and value
         const std::size_t end = listed[i + 1].find('\n');

@@ -63,8 +63,7 @@ std::string RemoveAll(const std::vector<std::string>& files) {
 
 Diagnosis LookAtMercurial(Patient& patient) {
     if (FindProgram("hg").empty()) return {Health::Skipped, "Mercurial is not installed"};
-    std::string arguments = RunProcess({"hg", "config", "merge-tools.ovrin.args"}).output;
-    if (arguments.ends_with('\n')) arguments.pop_back();
+    const std::string arguments = AnswerOf({"hg", "config", "merge-tools.ovrin.args"});
     if (arguments.empty()) return NotSetUp(patient, SystemKind::Mercurial, "hg", "Mercurial");
     const std::size_t end = arguments.find(" merge -- $base ");
     if (end == std::string::npos)

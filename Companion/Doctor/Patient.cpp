@@ -47,7 +47,7 @@ std::vector<std::string> Patient::ListScenes() const {
     case SystemKind::Git:
         return ScenesAmong(Git(*m_Repository).Output({"ls-files", "-z"}));
     case SystemKind::Mercurial:
-        return ScenesAmong(RunProcess({"hg", "files", "-0"}, {.folder = m_Repository->top}).output);
+        return ScenesAmong(AnswerOf({"hg", "files", "-0"}, {.folder = m_Repository->top}));
     case SystemKind::Subversion:
         return ScenesAmong(FilesBelow(m_Repository->top));
     }

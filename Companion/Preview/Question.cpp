@@ -56,9 +56,7 @@ std::string HashOf(const Git& git, const PreviewQuestion& question) {
         for (const std::string& conflict : file.conflicts) text += conflict + '\0';
         text += file.isByObjects ? "objects" : "lines";
     }
-    std::string hash = git.Output({"hash-object", "--stdin"}, std::move(text));
-    while (hash.ends_with('\n')) hash.pop_back();
-    return hash;
+    return WithoutLineEnd(git.Output({"hash-object", "--stdin"}, std::move(text)));
 }
 
 } // namespace

@@ -17,7 +17,7 @@ namespace {
 template <class Read> auto OrFailure(const char* what, const std::string& path, const Read& read) {
     const auto fail = [&](std::string reason) {
         while (reason.ends_with('\n')) reason.pop_back();
-        throw Failure("The " + std::string(what) + " " + path + " can't be used: " + reason);
+        throw BadSetting("The " + std::string(what) + " " + path + " can't be used: " + reason);
     };
     try {
         return read();

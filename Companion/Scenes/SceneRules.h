@@ -27,8 +27,8 @@ struct SceneRules {
     ovrin_yaml::YAMLTypeInfoManager types; ///< not loaded if there is no such file
 };
 
-/// Reads the type information in that file; an empty one if there is no such name. Throws Failure that names
-/// the file and what is wrong with it.
+/// Reads the type information in that file; an empty one if there is no such name. Throws BadSetting that
+/// names the file and what is wrong with it.
 ovrin_yaml::YAMLTypeInfoManager ReadTypeInfo(const std::string& file);
 
 /// Reads both files. Throws Failure likewise.

@@ -4,43 +4,16 @@
 #include "FileUtils.h"
 #include "Names/PrintableText.h"
 #include "Systems/ChildProcess.h"
+#include "Systems/ScratchFolder.h"
 #include "Words/Failure.h"
 
 #include <cerrno>
-#include <cstdlib>
-#include <filesystem>
 #include <system_error>
 #include <unistd.h>
 
 namespace ovrin {
 
 namespace {
-
-namespace fs = std::filesystem;
-
-/// A folder that goes with the object.
-class ScratchFolder {
-public:
-    ScratchFolder() {
-        std::error_code error;
-        const fs::path place = fs::temp_directory_path(error);
-        m_Path = (error ? fs::path("/tmp") : place) / "ovrin-XXXXXX";
-        if (!mkdtemp(m_Path.data()))
-            throw Failure("Cannot make a temporary folder " + m_Path + ": " +
-                          std::system_category().message(errno));
-    }
-    ScratchFolder(const ScratchFolder&) = delete;
-    ScratchFolder& operator=(const ScratchFolder&) = delete;
-    ~ScratchFolder() {
-        std::error_code ignored;
-        fs::remove_all(m_Path, ignored);
-    }
-
-    std::string File(const char* name) const { return m_Path + "/" + name; }
-
-private:
-    std::string m_Path;
-};
 
 std::string Read(const std::string& file) {
     std::string bytes;

@@ -64,7 +64,8 @@ bool NamesAShell(const std::string& line) {
     else
         word = program;
     static const std::set<std::string> kShells = {"sh", "bash", "dash", "ksh", "mksh", "zsh", "ash"};
-    return line.starts_with("#!") && !line.ends_with('\r') && kShells.contains(fs::path(word).filename());
+    return line.starts_with("#!") && line.find('\r') == std::string::npos &&
+           kShells.contains(fs::path(word).filename());
 }
 
 /// Behind the line that names the shell: a script may end anywhere. Throws Failure where the lines would not

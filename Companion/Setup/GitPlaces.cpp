@@ -20,16 +20,6 @@ std::string Absolute(const std::string& path) {
     return fs::absolute(path).lexically_normal().string();
 }
 
-std::string WithoutLineEnd(std::string text) {
-    if (text.ends_with('\n')) text.pop_back();
-    return text;
-}
-
-/// What git answers; empty where it has no answer.
-std::string AnswerOf(const CommandWords& command) {
-    return WithoutLineEnd(RunProcess(command).output);
-}
-
 std::string GitPath(const std::string& name) {
     return Absolute(WithoutLineEnd(OutputOf({"git", "rev-parse", "--git-path", name})));
 }

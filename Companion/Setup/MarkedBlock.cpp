@@ -118,7 +118,9 @@ std::string AddBlock(const std::string& text, std::size_t position, const std::s
 
 std::string ReplaceBlock(const std::string& text, const MarkedBlock& block, const std::string& lines,
                          FirstMark mark) {
-    return text.substr(0, block.begin) + WithLineEndsOf(text, MarkLines(lines, block.origin, mark)) +
+    // The text may have a lone carriage return in front of the line end that the block brought.
+    const std::string_view own = std::string_view(text).substr(block.begin, block.end - block.begin);
+    return text.substr(0, block.begin) + WithLineEndsOf(own, MarkLines(lines, block.origin, mark)) +
            text.substr(block.end);
 }
 

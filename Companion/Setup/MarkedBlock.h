@@ -47,7 +47,7 @@ std::string MarkLines(const std::string& lines, const BlockOrigin& origin, First
 std::string AddBlock(const std::string& text, std::size_t position, const std::string& lines,
                      BlockOrigin origin, FirstMark mark);
 
-/// The text with other lines in the block, which keeps its place and origin.
+/// The text with other lines in the block, which keeps its place, its origin and its kind of line ends.
 std::string ReplaceBlock(const std::string& text, const MarkedBlock& block, const std::string& lines,
                          FirstMark mark);
 

@@ -20,9 +20,7 @@ namespace {
 /// The files that Mercurial reads, the one first that it opens for changes.
 std::vector<std::string> MercurialConfigs(Scope scope) {
     if (scope == Scope::Local) {
-        std::string top = OutputOf({"hg", "root"});
-        if (top.ends_with('\n')) top.pop_back();
-        return {top + "/.hg/hgrc"};
+        return {WithoutLineEnd(OutputOf({"hg", "root"})) + "/.hg/hgrc"};
     }
     std::string ofHome = HomeFor("Mercurial") + "/.hgrc";
     std::string ofSettings = SettingsFolderFor("Mercurial") + "/hg/hgrc";

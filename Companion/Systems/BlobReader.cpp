@@ -46,7 +46,7 @@ void BlobReader::Fill() {
     if (count <= 0) throw Failure("git ended in the middle of a blob");
 }
 
-/// Of a line "ID blob SIZE".
+/// Of a line "ID blob SIZE". An object of another type is passed over: the next answer stands behind it.
 std::size_t BlobReader::ReadSize(const std::string& id) {
     std::string line;
     do {
@@ -55,11 +55,16 @@ std::size_t BlobReader::ReadSize(const std::string& id) {
     } while (line.back() != '\n');
     line.pop_back();
     std::size_t size = 0;
-    const std::string beginning = id + " blob ";
-    const std::size_t at = line.starts_with(beginning) ? beginning.size() : line.size();
+    const std::size_t at = line.rfind(' ') + 1; // npos + 1 is 0
     const auto [end, error] = std::from_chars(line.data() + at, line.data() + line.size(), size);
-    if (error != std::errc() || end != line.data() + line.size())
-        throw Failure("git has no blob " + id + ", it says \"" + line + "\"");
+    const bool hasSize =
+        line.starts_with(id + " ") && error == std::errc() && end == line.data() + line.size();
+    const bool isBlob = hasSize && line.substr(0, at) == id + " blob ";
+    if (hasSize && !isBlob) {
+        Skip(size);
+        Skip(1);
+    }
+    if (!isBlob) throw Failure("git has no blob " + id + ", it says \"" + line + "\"");
     return size;
 }
 

@@ -27,11 +27,6 @@ std::vector<GitEntry> ParseEntries(std::string_view listing) {
     return entries;
 }
 
-std::string WithoutLineEnd(std::string text) {
-    while (text.ends_with('\n')) text.pop_back();
-    return text;
-}
-
 } // namespace
 
 Git::Git(const Repository& repository)
@@ -113,8 +108,12 @@ std::string Git::NameOfCommit(const std::string& commit) const {
     std::string name = WithoutLineEnd(Run({"name-rev", "--name-only", "--no-undefined", "--refs=refs/heads/*",
                                            "--refs=refs/remotes/*", "--refs=refs/tags/*", commit})
                                           .output);
+    if (name.ends_with("^0")) name.resize(name.size() - 2); // a tag with words of its own
     // One that only leads to the commit, "main~3", tells less than the number.
-    if (!name.empty() && name.find_first_of("~^") == std::string::npos) return name;
+    const bool isItsOwn = !name.empty() && name.find_first_of("~^") == std::string::npos;
+    for (const std::string_view kind : {"tags/", "remotes/"})
+        if (isItsOwn && name.starts_with(kind)) return name.substr(kind.size());
+    if (isItsOwn) return name;
     return WithoutLineEnd(Output({"rev-parse", "--short", commit}));
 }
 

@@ -54,7 +54,8 @@ public:
     bool StoresAs(const std::string& path, const std::string& bytes) const;
     /// The commit that a name stands for; empty if it is none.
     std::string Commit(const std::string& name) const;
-    /// What a person would call the commit: a branch or tag, or the first digits of its number.
+    /// What a person would call the commit: a branch or tag, "main", "origin/main", "v1.0", or the first
+    /// digits of its number.
     std::string NameOfCommit(const std::string& commit) const;
     std::optional<std::string> ConfigValue(const std::string& name) const;
     /// Takes the files, as they stand, into the index: whatever was unmerged about them is settled then.

@@ -1,6 +1,7 @@
 #include "Systems/MergeTree.h"
 
 #include "Systems/Git.h"
+#include "Systems/PartialClone.h"
 #include "Systems/Repository.h"
 #include "Systems/ScratchFolder.h"
 #include "Words/Failure.h"
@@ -34,8 +35,8 @@ std::string QuotedFolder(const std::string& path) {
 /// git with the objects of a repository, whose new objects go into a folder of their own.
 Git GitBeside(const Repository& repository, const std::string& tree, const std::string& newObjects) {
     const Git git(repository);
-    std::string objects = git.Output({"rev-parse", "--path-format=absolute", "--git-path", "objects"});
-    if (objects.ends_with('\n')) objects.pop_back();
+    const std::string objects =
+        WithoutLineEnd(git.Output({"rev-parse", "--path-format=absolute", "--git-path", "objects"}));
     std::string alternates = QuotedFolder(objects);
     if (const char* others = std::getenv("GIT_ALTERNATE_OBJECT_DIRECTORIES"))
         alternates += ':' + std::string(others);
@@ -110,8 +111,9 @@ private:
 
     void TakeMessage(std::string_view& text) {
         const std::string count(TakeUntil(text, '\0'));
-        std::vector<std::string> paths(std::strtoul(count.c_str(), nullptr, 10));
-        for (std::string& path : paths) path = OwnPath(TakeUntil(text, '\0'));
+        std::vector<std::string> paths;
+        for (auto left = std::strtoul(count.c_str(), nullptr, 10); left > 0 && !text.empty(); --left)
+            paths.push_back(OwnPath(TakeUntil(text, '\0')));
         const std::string_view kind = TakeUntil(text, '\0');
         TakeUntil(text, '\0');
         const std::size_t open = kind.find('(');
@@ -151,6 +153,13 @@ std::vector<TreeEntry*> BlobsOf(std::vector<UnmergedFile>& files) {
         for (auto* entry : {&file.base, &file.ours, &file.theirs})
             if (*entry && (*entry)->isFile) blobs.push_back(&**entry);
     return blobs;
+}
+
+/// In a partial clone even the size of a blob is only known where the blob is.
+void FetchMissing(const Git& git, std::vector<UnmergedFile>& files) {
+    std::vector<std::string> ids;
+    for (const TreeEntry* blob : BlobsOf(files)) ids.push_back(blob->id);
+    FetchBlobs(git, ids);
 }
 
 void LookUpSizes(const Git& git, std::vector<UnmergedFile>& files) {
@@ -197,6 +206,7 @@ std::vector<UnmergedFile> ListUnmerged(const Repository& repository, const std::
     const Git beside = GitBeside(repository, tree, scratch.NewFolder("objects"));
     std::vector<UnmergedFile> files = Answer(ours, theirs).Read(RunMergeTree(beside, tree, ours, theirs));
     if (files.empty()) return files;
+    FetchMissing(Git(repository), files);
     LookUpSizes(beside, files);
     LookUpAttributes(repository, ours, scratch, files);
     return files;

@@ -61,11 +61,14 @@ Operation OperationIn(const Repository& repository) {
     return {"", "svn commit", "svn revert", ""};
 }
 
+std::string LockOf(const Repository& repository) {
+    return repository.data + (repository.kind == SystemKind::Git ? "/index.lock" : "/wlock");
+}
+
 bool IsAtWork(const Repository& repository) {
-    const char* lock = repository.kind == SystemKind::Git ? "/index.lock" : "/wlock";
     std::error_code error;
     // Mercurial's is a link to nothing.
-    return std::filesystem::exists(std::filesystem::symlink_status(repository.data + lock, error));
+    return std::filesystem::exists(std::filesystem::symlink_status(LockOf(repository), error));
 }
 
 } // namespace ovrin

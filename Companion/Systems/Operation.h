@@ -17,6 +17,9 @@ struct Operation {
 /// Looks at the files that the system keeps of it; no program is started.
 Operation OperationIn(const Repository& repository);
 
+/// The file that is there as long as a process of git or Mercurial changes the working tree.
+std::string LockOf(const Repository& repository);
+
 /// Whether a process of git or Mercurial is changing the working tree: what it has done so far isn't known
 /// from its files yet.
 bool IsAtWork(const Repository& repository);

@@ -44,6 +44,13 @@ void Talk(Descriptor& toChild, std::string_view input, Descriptor& output, Proce
     }
 }
 
+[[noreturn]] void Fail(const CommandWords& command, const ProcessResult& result) {
+    std::string words;
+    for (const std::string& word : command) words += (words.empty() ? "" : " ") + word;
+    throw Failure("\"" + words + "\" failed with status " + std::to_string(result.status) +
+                  (result.errors.empty() ? "" : ":\n" + result.errors));
+}
+
 } // namespace
 
 ProcessResult RunProcess(const CommandWords& command, const ProcessSetting& setting) {
@@ -60,11 +67,21 @@ ProcessResult RunProcess(const CommandWords& command, const ProcessSetting& sett
 
 std::string OutputOf(const CommandWords& command, const ProcessSetting& setting) {
     ProcessResult result = RunProcess(command, setting);
-    if (result.Succeeded()) return std::move(result.output);
-    std::string words;
-    for (const std::string& word : command) words += (words.empty() ? "" : " ") + word;
-    throw Failure("\"" + words + "\" failed with status " + std::to_string(result.status) +
-                  (result.errors.empty() ? "" : ":\n" + result.errors));
+    if (!result.Succeeded()) Fail(command, result);
+    return std::move(result.output);
+}
+
+std::string AnswerOf(const CommandWords& command, const ProcessSetting& setting) {
+    constexpr int kNone = 1;
+    ProcessResult result = RunProcess(command, setting);
+    if (result.status == kNone) return {};
+    if (!result.Succeeded()) Fail(command, result);
+    return WithoutLineEnd(std::move(result.output));
+}
+
+std::string WithoutLineEnd(std::string text) {
+    if (text.ends_with('\n')) text.pop_back();
+    return text;
 }
 
 std::vector<std::string> ZeroEndedTexts(std::string_view listed) {

@@ -34,6 +34,13 @@ ProcessResult RunProcess(const CommandWords& command, const ProcessSetting& sett
 /// The same for a program that must succeed: its output. Throws Failure with what it said on standard error.
 std::string OutputOf(const CommandWords& command, const ProcessSetting& setting = {});
 
+/// The same for a program that is asked for one value: what it says without the end of its last line. Empty
+/// where it ends with status 1, by which git and Mercurial say that there is none.
+std::string AnswerOf(const CommandWords& command, const ProcessSetting& setting = {});
+
+/// A text without the end of its last line.
+std::string WithoutLineEnd(std::string text);
+
 /// The texts that a program lists with a zero byte behind each, as they do with names of any bytes.
 std::vector<std::string> ZeroEndedTexts(std::string_view listed);
 

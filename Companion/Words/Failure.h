@@ -11,4 +11,11 @@ public:
     using std::runtime_error::runtime_error;
 };
 
+/// What fails because of a value that the user set, in an option, a variable or a configuration, and not
+/// because of the scene.
+class BadSetting : public Failure {
+public:
+    using Failure::Failure;
+};
+
 } // namespace ovrin

@@ -1,12 +1,10 @@
 #include "Conflicts/FindOccasion.h"
 
+#include "Support/Surroundings.h"
 #include "Systems/Caller.h"
 #include "Systems/GitFiles.h"
 #include "Systems/Repository.h"
 
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
 #include <gtest/gtest.h>
 
 namespace {
@@ -16,23 +14,14 @@ using namespace ovrin;
 const std::string kCommit(40, 'a');
 
 struct FindOccasionTest : testing::Test {
-    FindOccasionTest() {
-        char folder[] = "/tmp/ovrin-test-XXXXXX";
-        data = mkdtemp(folder);
-    }
-    ~FindOccasionTest() override { std::filesystem::remove_all(data); }
-
-    void Put(const std::string& file, const std::string& text) const {
-        const std::filesystem::path path = data + "/" + file;
-        std::filesystem::create_directories(path.parent_path());
-        std::ofstream(path) << text;
-    }
-    Repository Git() const { return {SystemKind::Git, "/", data}; }
+    void Put(const std::string& file, const std::string& text) const { folder.Write(file, text); }
+    Repository Git() const { return {SystemKind::Git, "/", folder.Path()}; }
     Occasion Found(const Caller& caller, const GivenLabels& given = {"%S", "%X", "%Y"}) const {
         return FindOccasion(Git(), caller, given);
     }
 
-    std::string data;
+    const surroundings::EmptyHome home;
+    const program::WorkingDirectory folder;
 };
 
 TEST_F(FindOccasionTest, HeadIsFoundLooseAndPackedAndDetached) {
@@ -73,15 +62,69 @@ TEST_F(FindOccasionTest, NothingIsRequired) {
     EXPECT_EQ(Found({}).action, "");
 }
 
-TEST(Caller, IsToldFromOtherPrograms) {
-    const auto picked = CallerOf({"/usr/bin/git", "-C", "merge", "--no-pager", "cherry-pick", "-x", "topic"});
-    ASSERT_TRUE(picked);
-    EXPECT_EQ(picked->command, "cherry-pick");
-    EXPECT_EQ(picked->Operands(), std::vector<std::string>{"topic"});
-    EXPECT_EQ(CallerOf({"/usr/lib/git-core/git-stash", "pop"})->command, "stash");
-    EXPECT_EQ(CallerOf({"/usr/bin/python3", "/usr/bin/hg", "--config", "a.b=c", "merge"})->command, "merge");
-    EXPECT_FALSE(CallerOf({"/bin/sh", "-c", "git merge"}));
-    EXPECT_FALSE(CallerOf({}));
+TEST_F(FindOccasionTest, SidesOfEveryCommandAreToldAsItsUserSeesThem) {
+    Put("HEAD", "ref: refs/heads/main\n");
+    Put("refs/heads/main", kCommit + "\n");
+    const struct {
+        Caller caller;
+        const char *action, *base, *ours, *theirs;
+    } cases[] = {
+        {{"git", "merge", {"topic"}}, "merge", "", "main", ""},
+        {{"git", "stash", {"pop"}}, "stash", "", "main", "the stash"},
+        {{"git", "am", {"x.patch"}}, "am", "", "main", "the patch"},
+        {{"git", "am", {"--rebasing"}}, "rebase", "", "main", ""},
+        {{"git", "cherry-pick", {kCommit}}, "cherry-pick", "", "main", "aaaaaaa"},
+        {{"git", "cherry-pick", {"a", "b"}}, "cherry-pick", "", "main", ""},
+        {{"git", "cherry-pick", {"-n", "topic"}}, "", "", "main", "topic"},
+        {{"git", "revert", {"topic"}}, "revert", "topic", "main", "parent of topic"},
+        {{"git", "revert", {"--no-commit", "topic"}}, "", "topic", "main", "parent of topic"},
+        {{"git", "checkout", {"-m", "topic"}}, "", "", "topic", "your changes"},
+        {{"git", "switch", {"-m", "topic"}}, "", "", "topic", "your changes"},
+        {{"git", "merge-tree", {"--write-tree", "a", kCommit}}, "", "", "a", "aaaaaaa"},
+        {{"git", "merge-tree", {"a"}}, "", "", "", ""},
+    };
+    for (const auto& [caller, action, base, ours, theirs] : cases) {
+        const Occasion found = Found(caller);
+        EXPECT_EQ(found.action + "," + found.base + "," + found.ours + "," + found.theirs,
+                  std::string(action) + "," + base + "," + ours + "," + theirs)
+            << caller.command << testing::PrintToString(caller.words);
+    }
+}
+
+TEST_F(FindOccasionTest, MergeNamesWhatItWasGivenEvenBehindAnAlias) {
+    Put("HEAD", kCommit + "\n");
+    const surroundings::Variable name(("GITHEAD_" + kCommit).c_str(), "origin/topic");
+    EXPECT_EQ(Found({"git", "merge", {}}).theirs, "origin/topic");
+    EXPECT_EQ(Found({"git", "an-alias", {}}).action, "merge");
+}
+
+TEST_F(FindOccasionTest, FileThatIsMergedAgainBelongsToWhatIsUnderWay) {
+    Put("HEAD", kCommit + "\n");
+    Put("CHERRY_PICK_HEAD", kCommit + "\n");
+    EXPECT_EQ(Found({"git", "checkout", {"--merge", "a.ovrin"}}).action, "cherry-pick");
+    EXPECT_EQ(Found({"git", "restore", {"--merge", "--", "a.ovrin"}}).action, "cherry-pick");
+}
+
+TEST_F(FindOccasionTest, OtherSystemsHaveTheirOwnWords) {
+    const surroundings::Variable base("HG_BASE_NODE", std::string(40, 'b')),
+        mine("HG_MY_NODE", std::string(40, 'c'));
+    const Occasion graft =
+        FindOccasion(Repository{SystemKind::Mercurial, "/", "/"}, Caller{"hg", "graft", {}}, {});
+    EXPECT_EQ(graft.action + " " + graft.base + " " + graft.ours, "graft bbbbbbbbbbbb cccccccccccc");
+    EXPECT_EQ(
+        FindOccasion(Repository{SystemKind::Mercurial, "/", "/"}, Caller{"hg", "resolve", {}}, {}).action,
+        "");
+    const Occasion update = FindOccasion(Repository{SystemKind::Subversion, "/", "/"},
+                                         Caller{"svn", "update", {}}, {"", "trunk", "base"});
+    EXPECT_EQ(update.action + ", " + update.ours + ", " + update.theirs, "update, trunk, the repository");
+}
+
+TEST(IsWithoutTree, IsSoOfWhatMergesBesideIt) {
+    for (const char* command : {"merge-tree", "replay"})
+        EXPECT_TRUE(IsWithoutTree(Caller{"git", command, {}}));
+    EXPECT_FALSE(IsWithoutTree(Caller{"git", "merge", {}}));
+    EXPECT_FALSE(IsWithoutTree(Caller{"hg", "replay", {}}));
+    EXPECT_FALSE(IsWithoutTree(std::nullopt));
 }
 
 } // namespace

@@ -1,14 +1,10 @@
 #include "Systems/Git.h"
 
+#include "ErrorOf.h"
+#include "Support/GitFolder.h"
 #include "Systems/BlobReader.h"
 #include "Systems/Operation.h"
-#include "Systems/Repository.h"
 #include "Words/Failure.h"
-
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
-#include <gtest/gtest.h>
 
 namespace {
 
@@ -17,35 +13,16 @@ using namespace ovrin;
 const std::string kOddName = "*odd \t\"näme\"\n";
 
 /// A repository in which branch "topic" and the present one changed one file, and which is merging them.
-struct GitTest : testing::Test {
+struct GitTest : GitFolder {
     GitTest() {
-        char made[] = "/tmp/ovrin-test-XXXXXX";
-        folder = mkdtemp(made);
-        RunHere({"git", "init", "-q", "-b", "main"});
-        Commit("base\n");
-        RunHere({"git", "checkout", "-q", "-b", "topic"});
-        Commit("theirs\n");
-        RunHere({"git", "checkout", "-q", "main"});
-        Commit("ours\n");
-        RunProcess(WithUser({"merge", "topic"}), {.folder = folder});
+        const std::string base = Commit({{kOddName, "base\n"}});
+        CommitOn("topic", base, {{kOddName, "theirs\n"}});
+        Git({"checkout", "-q", "main"});
+        Commit({{kOddName, "ours\n"}});
+        RunProcess({"git", "merge", "topic"});
     }
-    ~GitTest() override { std::filesystem::remove_all(folder); }
 
-    CommandWords WithUser(CommandWords words) const {
-        words.insert(words.begin(), {"git", "-c", "user.name=A", "-c", "user.email=a@example.org"});
-        return words;
-    }
-    void RunHere(const CommandWords& words) const { OutputOf(words, {.folder = folder}); }
-    void Write(const std::string& text) const { std::ofstream(folder + "/" + kOddName) << text; }
-    void Commit(const std::string& text) const {
-        Write(text);
-        RunHere({"git", "add", "."});
-        RunHere(WithUser({"commit", "-q", "-m", "change"}));
-    }
-    Repository repository() const { return FindRepository(folder).value(); }
-    Git git() const { return Git(repository()); }
-
-    std::string folder;
+    ovrin::Git git() const { return ovrin::Git(Found()); }
 };
 
 TEST_F(GitTest, ListsTheVersionsOfAnUnmergedPathWithAnyName) {
@@ -57,7 +34,7 @@ TEST_F(GitTest, ListsTheVersionsOfAnUnmergedPathWithAnyName) {
 }
 
 TEST_F(GitTest, TakesAPathForItself) {
-    RunHere({"cp", kOddName, "an odd file"});
+    std::filesystem::copy(kOddName, "an odd file");
     git().Add({kOddName});
     EXPECT_TRUE(git().Unmerged().empty());
     EXPECT_EQ(git().DifferingFromHead({kOddName, "an odd file"}, true), std::vector{kOddName});
@@ -65,25 +42,64 @@ TEST_F(GitTest, TakesAPathForItself) {
 }
 
 TEST_F(GitTest, KnowsWhatIsUnderWay) {
-    EXPECT_EQ(OperationIn(repository()).action, "merge");
-    const std::string incoming = git().Commit(OperationIn(repository()).incoming);
+    EXPECT_EQ(OperationIn(Found()).action, "merge");
+    const std::string incoming = git().Commit(OperationIn(Found()).incoming);
     EXPECT_EQ(git().NameOfCommit(incoming), "topic");
-    RunHere({"git", "merge", "--abort"});
-    EXPECT_EQ(OperationIn(repository()).action, "");
+    Git({"merge", "--abort"});
+    EXPECT_EQ(OperationIn(Found()).action, "");
     EXPECT_EQ(git().Commit("MERGE_HEAD"), "");
 }
 
 TEST_F(GitTest, ComparesFilesAsTheyAreStored) {
-    std::ofstream(folder + "/.gitattributes") << "* text eol=crlf\n";
-    Write("a\r\n");
+    folder.Write(".gitattributes", "* text eol=crlf\n");
+    folder.Write(kOddName, "a\r\n");
     EXPECT_TRUE(git().StoresAs(kOddName, "a\n"));
     EXPECT_FALSE(git().StoresAs(kOddName, "b\n"));
 }
 
 TEST_F(GitTest, FindsConfigurationOrNothing) {
-    RunHere({"git", "config", "ovrin.take", "theirs"});
+    Git({"config", "ovrin.take", "theirs"});
     EXPECT_EQ(git().ConfigValue("ovrin.take"), "theirs");
     EXPECT_FALSE(git().ConfigValue("ovrin.none"));
+}
+
+TEST_F(GitTest, OwnIndexIsThatOfTheTreeWhateverAHookIsGiven) {
+    const surroundings::Variable index("GIT_INDEX_FILE", (folder.Path() / "another").string());
+    EXPECT_TRUE(git().Unmerged().empty());
+    EXPECT_EQ(git().WithOwnIndex().Unmerged().size(), 3u);
+}
+
+TEST_F(GitTest, LaterVariablesTakeThePlaceOfEarlierOnes) {
+    const ProcessSetting setting = git().With({{"A", "1"}, {"B", "2"}}).With({{"A", "3"}}).Setting("input");
+    EXPECT_EQ(setting.environment,
+              (std::vector<std::pair<std::string, std::string>>{{"B", "2"}, {"A", "3"}}));
+    EXPECT_EQ(setting.input, "input");
+    EXPECT_EQ(setting.folder, folder.Path());
+}
+
+TEST_F(GitTest, CommitIsCalledByABranchOrTagOfItsOwn) {
+    Git({"merge", "--abort"});
+    const std::string first = Git({"rev-parse", "HEAD~1"});
+    EXPECT_EQ(git().NameOfCommit(first), Git({"rev-parse", "--short", first}));
+    for (const auto& [command, name] : {std::pair<CommandWords, const char*>{
+                                            {"update-ref", "refs/remotes/origin/a/b", first}, "origin/a/b"},
+                                        {{"tag", "-a", "-m", "words", "v2", first}, "v2"},
+                                        {{"branch", "side", first}, "side"}}) {
+        Git(command);
+        EXPECT_EQ(git().NameOfCommit(first), name);
+        Git({"update-ref", "-d", Git({"rev-parse", "--symbolic-full-name", name})});
+    }
+    EXPECT_TRUE(git().IsSameIn("main", "HEAD", kOddName));
+    EXPECT_FALSE(git().IsSameIn("main", "topic", kOddName));
+}
+
+TEST_F(GitTest, WhatGitRefusesIsToldInItsWords) {
+    const std::string failure = failures::ErrorOf<Failure>([&] { git().Output({"no-such-command"}); });
+    EXPECT_TRUE(failure.starts_with("\"git --literal-pathspecs no-such-command\" failed with status 1:\n"))
+        << failure;
+    surroundings::FakePrograms programs;
+    programs.Say("git", "ls-files", std::string("100644 a 0 path\0", 16));
+    EXPECT_THROW(git().Entries(), Failure);
 }
 
 } // namespace

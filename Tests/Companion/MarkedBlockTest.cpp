@@ -37,6 +37,48 @@ TEST(MarkedBlock, OtherLinesTakeThePlaceAndTheOriginStays) {
     }
 }
 
+/// All texts of up to six of the letters that line ends are made of.
+TEST(MarkedBlock, LineEndsOfEveryKindComeBack) {
+    std::vector<std::string> texts = {""};
+    for (std::size_t i = 0; i < texts.size(); ++i) {
+        const std::string text = texts[i];
+        if (text.size() < 6)
+            for (const char letter : {'a', '\r', '\n'}) texts.push_back(text + letter);
+        std::string with = AddBlock(text, text.size(), kLines, {}, FirstMark::OnItsOwnLine);
+        EXPECT_EQ(RemoveBlock(with, BlockOf(with)), text) << testing::PrintToString(text);
+        with = ReplaceBlock(with, BlockOf(with), "other\n", FirstMark::BehindTheFirstLine);
+        EXPECT_TRUE(BlockOf(with).isUnchanged);
+        EXPECT_EQ(RemoveBlock(with, BlockOf(with)), text) << testing::PrintToString(text);
+    }
+}
+
+TEST(MarkedBlock, LinesInFrontStayWhereTheyAre) {
+    const std::string text = "#!/bin/sh\necho a\n";
+    const std::string with = AddBlock(text, 10, kLines, {}, FirstMark::OnItsOwnLine);
+    EXPECT_EQ(BlockOf(with).begin, 10u);
+    EXPECT_EQ(BlockOf(with).lines, kLines);
+    EXPECT_EQ(RemoveBlock(with, BlockOf(with), "kept\n"), "#!/bin/sh\nkept\necho a\n");
+}
+
+TEST(MarkedBlock, OriginIsReadAsItWasWritten) {
+    for (const unsigned folders : {0u, 1u, 7u})
+        for (const bool madeFile : {false, true}) {
+            const BlockOrigin origin =
+                BlockOf(MarkLines(kLines, {madeFile, folders, true}, FirstMark::OnItsOwnLine)).origin;
+            EXPECT_EQ(origin.madeFile, madeFile);
+            EXPECT_EQ(origin.madeFolders, folders);
+            EXPECT_TRUE(origin.hadNoLineEnd);
+        }
+}
+
+TEST(MarkedBlock, EditorMayChangeAllLineEnds) {
+    std::string changed;
+    for (const char letter : AddBlock("a\n", 2, kLines, {}, FirstMark::OnItsOwnLine))
+        changed += letter == '\n' ? "\r\n" : std::string(1, letter);
+    EXPECT_TRUE(BlockOf(changed).isUnchanged);
+    EXPECT_EQ(RemoveBlock(changed, BlockOf(changed)), "a\r\n");
+}
+
 TEST(MarkedBlock, ChangedLinesAreNoticed) {
     std::string text = AddBlock("a\n", 2, kLines, {}, FirstMark::OnItsOwnLine);
     text.replace(text.find("*.meta"), 6, "*.mata");

@@ -1,24 +1,21 @@
 #include "Conflicts/OpenMerges.h"
 
+#include "ErrorOf.h"
+#include "Support/Program.h"
+#include "Systems/ChildProcess.h"
 #include "Systems/Repository.h"
 #include "Words/Failure.h"
 
-#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 namespace {
 
 using namespace ovrin;
 
 struct OpenMergesTest : testing::Test {
-    OpenMergesTest() {
-        char folder[] = "/tmp/ovrin-test-XXXXXX";
-        data = mkdtemp(folder);
-    }
-    ~OpenMergesTest() override { std::filesystem::remove_all(data); }
-
     OpenMerge Added(const std::string& path) {
         OpenMerge merge;
         merge.path = path;
@@ -30,7 +27,8 @@ struct OpenMergesTest : testing::Test {
     }
     OpenMerges merges() const { return OpenMerges({SystemKind::Git, "", data}); }
 
-    std::string data;
+    const program::WorkingDirectory folder;
+    const std::string data = folder.Path();
 };
 
 TEST_F(OpenMergesTest, KeepsEveryByteOfAMerge) {
@@ -75,6 +73,106 @@ TEST_F(OpenMergesTest, WhatIsBrokenIsToldAndNotTakenForNothing) {
     EXPECT_THROW(merges().Find("a.ovrin"), Failure);
     Added("a.ovrin"); // the scene is merged again
     EXPECT_EQ(merges().List().at(0).path, "a.ovrin");
+}
+
+/// The one file of that extension.
+std::filesystem::path OnlyFile(const std::string& data, const std::string& extension) {
+    for (const auto& entry : std::filesystem::directory_iterator(data + "/ovrin"))
+        if (entry.path().extension() == extension) return entry.path();
+    return {};
+}
+
+void Put(const std::filesystem::path& file, const std::string& bytes) {
+    std::ofstream(file, std::ios::binary) << bytes;
+}
+
+TEST_F(OpenMergesTest, CutOffRecordIsNeverTakenForAMerge) {
+    const OpenMerge added = Added("a.ovrin");
+    const std::filesystem::path file = OnlyFile(data, ".merge");
+    const std::string whole = program::ReadFile(file);
+    for (std::size_t length = 0; length < whole.size(); ++length) {
+        Put(file, whole.substr(0, length));
+        EXPECT_THROW(merges().Find("a.ovrin"), Failure) << length;
+    }
+    Put(file, whole);
+    EXPECT_EQ(merges().Find("a.ovrin")->identity, added.identity);
+}
+
+TEST_F(OpenMergesTest, ChangedRecordIsAMergeOrAFailure) {
+    Added("a.ovrin");
+    const std::filesystem::path file = OnlyFile(data, ".merge");
+    const std::string whole = program::ReadFile(file);
+    for (std::size_t at = 0; at < whole.find('\n'); at += 2)
+        for (const char other : {'9', '"', '\xff'}) {
+            std::string changed = whole;
+            changed[at] = other;
+            Put(file, changed);
+            try {
+                merges().List();
+                merges().Find("a.ovrin");
+            } catch (const Failure& failure) {
+                EXPECT_NE(std::string(failure.what()).find("Remove that file"), std::string::npos);
+            }
+        }
+}
+
+TEST_F(OpenMergesTest, ProgressThatCantBeReadIsToldWithItsCure) {
+    const OpenMerge merge = Added("a.ovrin");
+    merges().SetProgress(merge, {{{"1.Thing.x", Side::Theirs}, {"1.Thing.y", Side::Ours}}, 1, {{2, 7}}});
+    const std::filesystem::path file = OnlyFile(data, ".progress");
+    const std::string whole = program::ReadFile(file);
+    const auto without = [&](const std::string& what, const std::string& with) {
+        std::string changed = whole;
+        Put(file, changed.replace(changed.find(what), what.size(), with));
+        return failures::ErrorOf<Failure>([&] { merges().ProgressOf(merge); });
+    };
+    for (const auto& [what, with] : {std::pair{"\"open\"", "\"shut\""},
+                                     {"theirs", "left"},
+                                     {"\"decisions\":2", "\"decisions\":1"},
+                                     {"}", ""},
+                                     {":1", ":-"}}) {
+        const std::string failure = without(what, with);
+        EXPECT_TRUE(failure.starts_with("Cannot read the decisions in " + file.string()))
+            << what << ": " << failure;
+        EXPECT_TRUE(failure.ends_with("Remove that file to decide anew"));
+    }
+    Put(file, whole);
+    EXPECT_EQ(merges().ProgressOf(merge).steps.at(0).number, 7u);
+}
+
+TEST_F(OpenMergesTest, PathThatFindsItsPlaceTakenGetsAnother) {
+    Added("a.ovrin");
+    const std::filesystem::path ofA = OnlyFile(data, ".merge");
+    merges().Remove("a.ovrin");
+    Added("b.ovrin");
+    std::filesystem::rename(OnlyFile(data, ".merge"), ofA); // as if both had one number
+    EXPECT_FALSE(merges().Has("a.ovrin"));
+    Added("a.ovrin");
+    EXPECT_EQ(merges().Find("a.ovrin")->path, "a.ovrin");
+    EXPECT_EQ(merges().List().size(), 2u);
+}
+
+/// Two processes each write and remove scenes of their own, and read the list all the time.
+TEST_F(OpenMergesTest, ProcessesDontDisturbEachOther) {
+    std::vector<pid_t> children;
+    for (const char* name : {"a", "b"}) {
+        children.push_back(fork());
+        if (children.back() != 0) continue;
+        try {
+            for (int i = 0; i < 60; ++i) {
+                const std::string path = name + std::to_string(i % 5);
+                Added(path);
+                if (!merges().Find(path)) _exit(2);
+                if (i % 5 == 4 && i < 55) merges().Remove(path);
+            }
+        } catch (const std::exception&) {
+            _exit(3);
+        }
+        _exit(0);
+    }
+    for (const pid_t child : children) EXPECT_EQ(WaitForProcess(child), 0);
+    EXPECT_EQ(merges().List().size(), 10u);
+    EXPECT_EQ(std::distance(std::filesystem::directory_iterator(data + "/ovrin"), {}), 10);
 }
 
 } // namespace

@@ -67,6 +67,18 @@ TEST_F(SceneMergeTest, DecisionSettlesAndOneThatMatchesNothingIsTold) {
     EXPECT_EQ(merge.Open().size(), 1u);
 }
 
+TEST_F(SceneMergeTest, DecisionsMatchWhateverTheirShapeAndHoweverOftenTheyAreMade) {
+    SceneMerge merge = Merged(base, ours, theirs);
+    std::vector<Decision> decisions;
+    for (const char* path : {"*.*.m_Layer", layer.c_str(), "*.GameObject.*", layer.c_str(), "*.*.m_Name.*",
+                             "*.*.m_Tag", "11.*", "*.*.m_Tag"})
+        decisions.push_back({path, Side::Theirs});
+    merge.Merge(decisions);
+    std::vector<std::string> unmatched;
+    for (const Decision& decision : merge.Unmatched()) unmatched.push_back(decision.path);
+    EXPECT_EQ(unmatched, (std::vector<std::string>{"*.*.m_Name.*", "*.*.m_Tag", "11.*", "*.*.m_Tag"}));
+}
+
 TEST_F(SceneMergeTest, EmptyBaseIsAUnion) {
     SceneMerge merge = Merged("", base, theirs + Below(20, 0));
     EXPECT_TRUE(merge.IsBothAdded());

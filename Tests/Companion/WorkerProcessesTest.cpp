@@ -3,6 +3,7 @@
 #include <csignal>
 #include <gtest/gtest.h>
 #include <map>
+#include <random>
 #include <stdexcept>
 #include <unistd.h>
 #include <vector>
@@ -47,6 +48,44 @@ TEST(WorkerProcesses, EndOfAProcessCostsOnePiece) {
     EXPECT_EQ(answers.at(3).end, "killed by signal 9");
     EXPECT_EQ(answers.at(5).end, "ended with status 1");
     for (const std::size_t index : {0, 1, 2, 4, 6, 7, 8}) EXPECT_EQ(answers.at(index).text, "done");
+}
+
+/// Whatever the sizes and limits, and whatever pieces end their process.
+TEST(WorkerProcesses, EveryPieceIsAnsweredOnceForItself) {
+    std::mt19937 random(7);
+    for (int round = 0; round < 40; ++round) {
+        std::vector<std::uint64_t> sizes(random() % 12);
+        for (std::uint64_t& size : sizes) size = random() % 20;
+        const WorkLimits limits = {1 + random() % 4, random() % 30, random() % 40};
+        const std::size_t fatal = random() % 15;
+        const auto answers = Answers(sizes, limits, [&](std::size_t index) {
+            if (index == fatal) _exit(3);
+            return "piece " + std::to_string(index);
+        });
+        ASSERT_EQ(answers.size(), sizes.size()) << round;
+        for (const auto& [index, answer] : answers)
+            EXPECT_EQ(answer.text.value_or(answer.end),
+                      index == fatal ? "ended with status 3" : "piece " + std::to_string(index));
+    }
+}
+
+TEST(WorkerProcesses, LargestPieceComesFirst) {
+    const std::vector<std::uint64_t> sizes = {2, 9, 4, 9, 1};
+    std::vector<std::size_t> order;
+    WorkInProcesses(
+        sizes, {1, 100, 100}, [](std::size_t) { return std::string(); },
+        [&](std::size_t index, const WorkerAnswer&) { order.push_back(index); });
+    EXPECT_EQ(order, (std::vector<std::size_t>{1, 3, 2, 0, 4}));
+}
+
+TEST(WorkerProcesses, NoneIsStartedForNothing) {
+    EXPECT_TRUE(Answers({}, {0, 0, 0}, [](std::size_t) { return std::string(); }).empty());
+}
+
+TEST(WorkerProcesses, ChangeNothingHere) {
+    int changed = 0;
+    Answers({1, 1}, {2, 10, 10}, [&](std::size_t) { return std::to_string(++changed); });
+    EXPECT_EQ(changed, 0);
 }
 
 TEST(WorkerProcesses, AreGoneAfterAFailure) {

@@ -28,6 +28,7 @@ WorkingDirectory::~WorkingDirectory() {
 }
 
 void WorkingDirectory::Write(const std::string& name, const std::string& content) const {
+    fs::create_directories((m_Path / name).parent_path());
     std::ofstream(m_Path / name, std::ios::binary) << content;
 }
 

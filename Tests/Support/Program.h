@@ -15,6 +15,7 @@ public:
     ~WorkingDirectory();
 
     const fs::path& Path() const { return m_Path; }
+    /// Makes the folders above the file as well.
     void Write(const std::string& name, const std::string& content) const;
     /// The content of a file; "<missing>" if it isn't there.
     std::string Read(const std::string& name) const;

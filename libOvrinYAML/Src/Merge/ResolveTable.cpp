@@ -29,10 +29,9 @@ void ResolveTable::Set(const std::vector<RecordResolve>& resolves) {
         ShapeOf(resolves[i].path).firstResolve.try_emplace(resolves[i].path, i);
 }
 
-std::optional<MergeResolve> ResolveTable::Find(const Path& path) const {
-    if (path.size() >= m_ShapesByLength.size()) return std::nullopt;
+void ResolveTable::ForEachMatch(const Path& path, const std::function<void(std::size_t)>& visit) const {
+    if (path.size() >= m_ShapesByLength.size()) return;
     const bool inKeyList = !path.empty() && path.front() == YAMLScalar::underscore;
-    std::size_t first = m_Resolves.size();
     Path masked;
     for (const Shape& shape : m_ShapesByLength[path.size()]) {
         if (inKeyList && shape.isStar.front()) continue;
@@ -40,8 +39,13 @@ std::optional<MergeResolve> ResolveTable::Find(const Path& path) const {
         for (std::size_t i = 0; i < masked.size(); ++i)
             if (shape.isStar[i]) masked[i] = YAMLScalar::star;
         const auto found = shape.firstResolve.find(masked);
-        if (found != shape.firstResolve.end()) first = std::min(first, found->second);
+        if (found != shape.firstResolve.end()) visit(found->second);
     }
+}
+
+std::optional<MergeResolve> ResolveTable::Find(const Path& path) const {
+    std::size_t first = m_Resolves.size();
+    ForEachMatch(path, [&](std::size_t number) { first = std::min(first, number); });
     if (first == m_Resolves.size()) return std::nullopt;
     return m_Resolves[first].resolve;
 }

@@ -4,6 +4,7 @@
 #include "Values/YAMLScalar.h"
 
 #include <cstddef>
+#include <functional>
 #include <optional>
 #include <unordered_map>
 #include <vector>
@@ -30,6 +31,10 @@ public:
     /// The decision's handling; nothing if there is none. A pattern reaches into the key lists of mappings,
     /// paths that begin with "_", only if it begins with "_" itself: a star must not tear them apart.
     std::optional<MergeResolve> Find(const Path& path) const;
+
+    /// Calls visit(number) for all decisions that match a path, in no order; of those with one pattern for
+    /// the first alone. The number is that among All().
+    void ForEachMatch(const Path& path, const std::function<void(std::size_t)>& visit) const;
 
 private:
     struct PathHash {

@@ -12,6 +12,7 @@
 #include <algorithm>
 #include <atomic>
 #include <cstring>
+#include <optional>
 
 namespace ovrin_yaml {
 
@@ -191,7 +192,7 @@ void ObjectFile::Finish() {
 void ObjectFile::FinishDocuments() {
     YAMLMapping& root = m_Objects.GetMapping();
     root.Reserve(m_Documents.size());
-    TreeReader reader(End());
+    std::optional<TreeReader> reader; // for what nearly never is
     for (Document& document : m_Documents) {
         const Document* lender = document.lender == kNone ? nullptr : &m_Base->m_Documents[document.lender];
         if (lender && lender->isLendable) {
@@ -202,7 +203,8 @@ void ObjectFile::FinishDocuments() {
         }
         if (lender) {
             document.lender = kNone;
-            ReadDocuments(reader, {&document, 1});
+            if (!reader) reader.emplace(End());
+            ReadDocuments(*reader, {&document, 1});
         }
         if (document.object)
             root.Append(document.fileID, document.object);

@@ -26,7 +26,7 @@ void BatchedBuilder::AddLate(std::string_view text, std::uint32_t hash, ShortTex
                              hash,        static_cast<std::uint32_t>(m_Stack.size()),
                              &entry,      nullptr};
     entry.user = static_cast<std::uint16_t>(m_LateCount);
-    m_Stack.push_back({nullptr, hash, static_cast<std::uint32_t>(m_LateCount)});
+    m_Stack.emplace_back(nullptr, hash, static_cast<std::uint32_t>(m_LateCount));
     if (m_LateCount == kMostLate) InternTexts();
 }
 
@@ -54,7 +54,7 @@ void BatchedBuilder::InternTexts() {
         if (late.place)
             *late.place = scalar;
         else
-            m_Stack[late.index] = {scalar, late.hash, 0};
+            m_Stack[late.index] = Node(scalar, late.hash);
     }
     m_LateCount = m_FirstLate = 0;
 }
@@ -77,7 +77,7 @@ bool BatchedBuilder::CloseMapping(std::size_t mark, bool flow, std::uint32_t lin
     mapping->m_Hash = hash;
     mapping->m_Line = line;
     m_Stack.resize(mark);
-    m_Stack.push_back({mapping, hash, 0});
+    m_Stack.emplace_back(mapping, hash);
     return true;
 }
 
@@ -95,7 +95,7 @@ void BatchedBuilder::CloseSequence(std::size_t mark, bool flow, std::uint32_t li
     sequence->m_Hash = hash;
     sequence->m_Line = line;
     m_Stack.resize(mark);
-    m_Stack.push_back({sequence, hash, 0});
+    m_Stack.emplace_back(sequence, hash);
 }
 
 /// A value may still be missing, so only the key can be asked for.

@@ -34,7 +34,7 @@ public:
 
     static constexpr std::size_t kReadAhead = ShortText::kLongest;
 
-    void AddNode(YAMLNode* node, std::uint32_t hash) { m_Stack.push_back({node, hash, 0}); }
+    void AddNode(YAMLNode* node, std::uint32_t hash) { m_Stack.emplace_back(node, hash); }
     void AddScalar(YAMLScalar* scalar) { AddNode(scalar, scalar->m_Hash); }
     void AddText(std::string_view text) {
         if (text.size() <= ShortText::kLongest) {
@@ -72,7 +72,12 @@ public:
     void Clear();
 
 private:
+    /// Made where it stands: one that was put together elsewhere would be copied as a whole, which has to
+    /// wait for the stores of its parts.
     struct Node {
+        explicit Node(YAMLNode* node = nullptr, std::uint32_t hash = 0, std::uint32_t late = 0)
+            : node(node), hash(hash), late(late) {}
+
         YAMLNode* node;
         std::uint32_t hash;
         std::uint32_t late; // place in m_Late, or 0
