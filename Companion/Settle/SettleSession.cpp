@@ -7,7 +7,6 @@
 #include "Settle/PlainValues.h"
 
 #include <algorithm>
-#include <iterator>
 #include <map>
 #include <set>
 #include <span>
@@ -28,12 +27,10 @@ const MergeSession& MergedOnce(SceneMerge& merge, Side take) {
 
 /// Whether a decision is about something that the path leads through, so that the merge doesn't go on to its
 /// end.
-bool IsCoveredBy(const Decision& decision, const Path& path) {
-    const Path above = PathOfDecision(decision.path);
-    return above.size() < path.size() &&
-           std::equal(above.begin(), above.end(), path.begin(), [](const auto* wanted, const auto* element) {
-               return wanted == YAMLScalar::star || wanted == element;
-           });
+bool IsCovered(Path path, const DecisionTable& decided) {
+    for (path.pop_back(); !path.empty(); path.pop_back())
+        if (decided.Find(path)) return true;
+    return false;
 }
 
 } // namespace
@@ -119,9 +116,10 @@ bool SettleSession::IsAsMerged(MergeNames::ID object) {
 /// Makes what follows from decisions, without merging. False if a merge must tell.
 bool SettleSession::DecidePlainly(std::span<const Decision> decisions) {
     std::vector<MetConflicts::State> states = m_Conflicts.States();
+    std::optional<DecisionTable> made;
     const auto isCovered = [&](const Path& path) {
-        return std::ranges::any_of(m_Decisions,
-                                   [&](const Decision& made) { return IsCoveredBy(made, path); });
+        if (!made) made.emplace(m_Decisions);
+        return IsCovered(path, *made);
     };
     for (const Decision& decision : decisions) {
         const std::optional<std::size_t> at = FindPlain(decision);
@@ -189,8 +187,8 @@ std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisio
         const std::vector<std::string> unmatched = isPlain ? std::vector<std::string>() : MergeAgain();
         const std::set<std::string_view> lost(unmatched.begin(), unmatched.end());
         std::vector<Decision> refused;
-        std::ranges::copy_if(decisions, std::back_inserter(refused),
-                             [&](const Decision& decision) { return lost.contains(decision.path); });
+        for (const Decision& decision : decisions)
+            if (lost.contains(decision.path)) refused.push_back(decision);
         if (refused.empty()) {
             EndStep(before);
         } else {
