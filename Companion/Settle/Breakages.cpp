@@ -115,9 +115,32 @@ void Breakages::LookAtReferences(ID object, const ObjectBody& body) {
     });
 }
 
+/// Whether the way up from a Transform leads back to it. All together take time linear in what is above them.
+bool Breakages::IsInLoop(std::size_t tree, ID transform) {
+    std::unordered_map<ID, bool>& known = m_InLoops[tree];
+    std::vector<ID> way;
+    std::unordered_map<ID, std::size_t> places;
+    ID at = transform;
+    while (at && !known.contains(at) && places.try_emplace(at, way.size()).second) {
+        way.push_back(at);
+        at = LocalReference(Body(tree, at).Field(YAMLScalar::mFather));
+    }
+    const auto met = places.find(at);
+    const std::size_t loop = met == places.end() ? way.size() : met->second;
+    for (std::size_t i = 0; i < way.size(); ++i) known[way[i]] = i >= loop;
+    return known[transform];
+}
+
 /// A parent that is gone is replaced by none in the merge.
 void Breakages::LookAtParent(ID object, const ObjectBody& body) {
-    if (LocalReference(body.Field(YAMLScalar::mFather))) return;
+    if (const ID parent = LocalReference(body.Field(YAMLScalar::mFather))) {
+        const bool isLoop =
+            IsInLoop(kResult, object) && !IsOld([&](std::size_t tree) { return IsInLoop(tree, object); });
+        if (isLoop)
+            m_Found.push_back(
+                {Breakage::Kind::Loop, object, parent, {object, body.className, YAMLScalar::mFather}});
+        return;
+    }
     ID lost = nullptr;
     for (std::size_t tree = 0; tree < kResult; ++tree) {
         if (!Has(tree, object)) continue;

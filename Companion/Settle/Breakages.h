@@ -3,9 +3,9 @@
 #include "Conflicts/SceneMerge.h"
 #include "Names/MergeNames.h"
 
+#include <array>
+#include <cstddef>
 #include <map>
-#include <optional>
-#include <string>
 #include <unordered_map>
 #include <unordered_set>
 #include <utility>
@@ -19,6 +19,7 @@ struct Breakage {
         Dangling,      ///< `object` refers to `other`, which is gone
         LostParent,    ///< `object` stands at the top, since `other`, which it stood under, is gone
         NotListed,     ///< a list of `other` lacks `object`, which says that it belongs there
+        Loop,          ///< `object` stands below `other`, and that, with others between, below it
         WronglyListed, ///< a list of `object` has `other`, which says that it belongs elsewhere
     };
     Kind kind;
@@ -49,12 +50,14 @@ private:
     void LookAt(ID object);
     void LookAtReferences(ID object, const ObjectBody& body);
     void LookAtParent(ID object, const ObjectBody& body);
+    bool IsInLoop(std::size_t tree, ID transform);
     void LookIfListed(ID object, const ObjectBody& body, ID back, ID list);
     void LookAtList(ID owner, const ObjectBody& body, ID list, ID back);
 
     SceneMerge& m_Merge;
     const std::array<const ovrin_yaml::YAMLMapping*, 4> m_Trees;
     std::map<std::pair<std::size_t, const ovrin_yaml::YAMLNode*>, std::unordered_set<ID>> m_Lists;
+    std::array<std::unordered_map<ID, bool>, 4> m_InLoops; // those that were asked for, and what is above
     std::vector<Breakage> m_Found;
 };
 

@@ -17,9 +17,11 @@ namespace ovrin {
 ///     one that is needed goes      so does what the other side added that needs it
 ///     a loop of parents is ended   the lists of children follow
 ///
+/// Of conflicts that were settled before, by another side, what followed from that is taken back.
 /// What is among `open` is left to its own decision; Settle/StructureDecisions.h tells the limits.
 std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
                                    std::span<const OpenConflict> open,
-                                   std::span<const OpenConflict> conflicts, Side side);
+                                   std::span<const OpenConflict> conflicts, Side side,
+                                   bool wereSettled = false);
 
 } // namespace ovrin

@@ -54,7 +54,7 @@ public:
         const bool isGone =
             broken.kind == Breakage::Kind::Dangling || broken.kind == Breakage::Kind::LostParent;
         if (isGone) AddKeep(problem, broken.other);
-        if (broken.kind != Breakage::Kind::WronglyListed) AddRemove(problem, broken.object);
+        if (isGone || broken.kind == Breakage::Kind::NotListed) AddRemove(problem, broken.object);
         AddSides(problem, broken);
         m_Found.push_back(std::move(problem));
     }
@@ -113,6 +113,13 @@ private:
         return LeadingName(place ? place : id);
     }
 
+    /// The name of its place without the way to it.
+    std::string LabelOf(ID transform) const {
+        const Hierarchy& places = m_Names.In(m_Names.Leading(transform).value_or(Version::Ours)).Places();
+        const ID place = places.PlaceIDOf(places.Body(transform), transform);
+        return place ? places.PlaceOf(place).label : LeadingName(transform);
+    }
+
     std::string TextOf(const Breakage& broken) const {
         const std::string object = NameOf(broken.object), other = NameOf(broken.other);
         const YAMLScalar* field = broken.place[2];
@@ -122,6 +129,9 @@ private:
         switch (broken.kind) {
         case Breakage::Kind::LostParent:
             return object + " stands at the top, since " + other + ", which it stood below, was " + gone;
+        case Breakage::Kind::Loop: // whose way up would be a long name
+            return LabelOf(broken.object) + " stands below " + LabelOf(broken.other) + ", and that below " +
+                   LabelOf(broken.object);
         case Breakage::Kind::NotListed:
             return object + " isn't in " + list + other;
         case Breakage::Kind::WronglyListed:

@@ -28,6 +28,7 @@ struct Problem {
 ///     an object stays, and what it belongs to or stood under is gone
 ///     a value refers to an object that is gone
 ///     an object isn't in the list of components or children that should name it, or is in one that shouldn't
+///     objects stand below each other
 ///     a component is gone, and another one needs it
 ///
 /// `merge` is merged by the decisions. What an open conflict is about is left to that. At most `most` are

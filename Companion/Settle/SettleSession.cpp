@@ -182,7 +182,7 @@ std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisio
             m_Decisions.push_back(decision);
             if (follow == Follow::No || isPlain) continue;
             const std::optional<std::size_t> at = m_Conflicts.Find(PathOfDecision(decision.path));
-            if (at && m_Conflicts.StateOf(*at).isOpen) AddConsequences({m_Conflicts[*at]}, decision.side);
+            if (at) AddConsequences({m_Conflicts[*at]}, decision.side, !m_Conflicts.StateOf(*at).isOpen);
         }
         const std::vector<std::string> unmatched = isPlain ? std::vector<std::string>() : MergeAgain();
         std::vector<Decision> refused;
@@ -198,8 +198,8 @@ std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisio
     });
 }
 
-void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, Side side) {
-    const std::vector<Decision> more = Consequences(m_Merge, m_Names, Open(), conflicts, side);
+void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, Side side, bool wereSettled) {
+    const std::vector<Decision> more = Consequences(m_Merge, m_Names, Open(), conflicts, side, wereSettled);
     m_Decisions.insert(m_Decisions.end(), more.begin(), more.end());
 }
 

@@ -55,7 +55,7 @@ public:
     /// Whether a path or pattern matches anything that either side changed.
     bool Touches(const std::string& path);
 
-    /// Whether what follows from decisions about open conflicts (Settle/Consequences.h) is decided with them.
+    /// Whether what follows from decisions about conflicts (Settle/Consequences.h) is decided with them.
     enum class Follow { No, Yes };
     /// Makes these decisions, as one step. Returns those that match nothing; if there are any, nothing is
     /// decided.
@@ -104,7 +104,7 @@ public:
     const MergeNames& Names() const { return m_Names; }
 
 private:
-    void AddConsequences(const std::vector<OpenConflict>& conflicts, Side side);
+    void AddConsequences(const std::vector<OpenConflict>& conflicts, Side side, bool wereSettled = false);
     void EndStep(std::size_t decisionsBefore);
     void Meet();
     std::size_t TakeEach(const std::function<std::optional<Side>(const MetConflict&)>& choose);

@@ -96,13 +96,28 @@ void StructureDecisions::EndLoop(ID transform, Side side) {
     }
 }
 
+void StructureDecisions::EndLoopAgain(ID transform, Side side) {
+    EndLoop(transform, side);
+    if (side == Side::Base) return;
+    for (const ID parent : {ParentIn(Side::Base, transform), ParentIn(side, transform)})
+        if (parent) DecideList(side, side, parent, ChildrenKey(), transform);
+}
+
 void StructureDecisions::Keep(const std::vector<ID>& ids, Side without) {
+    DecideWhole(ids, without, OtherThan(without));
+}
+
+void StructureDecisions::Return(const std::vector<ID>& ids, Side without) {
+    DecideWhole(ids, without, without);
+}
+
+void StructureDecisions::DecideWhole(const std::vector<ID>& ids, Side without, Side wanted) {
     std::unordered_set<ID> tops;
     for (const ID id : ids) {
         const ID top = TopOf(id, without);
         if (!tops.insert(top).second) continue;
-        DecideEntries(top, without, OtherThan(without));
-        DecideBelow(top, without, OtherThan(without), false);
+        DecideEntries(top, without, wanted);
+        DecideBelow(top, without, wanted, false);
     }
 }
 
@@ -164,6 +179,9 @@ ID StructureDecisions::OnlyChange(Side side, ID owner, const YAMLScalar* list) {
 /// Where `changer` changed this entry of a list and no other, the list becomes that of `wanted`.
 void StructureDecisions::DecideList(Side changer, Side wanted, ID owner, const YAMLScalar* list, ID entry) {
     if (OnlyChange(changer, owner, list) != entry) return;
+    // To take the change itself would drop what the other side changed there.
+    if (wanted == changer && Listed(OtherThan(changer), owner, list) != Listed(Side::Base, owner, list))
+        return;
     const Path path = PathOfChange(changer, owner, list);
     if (!path.empty()) m_Decisions.push_back({DecisionPath(path), wanted});
 }

@@ -32,9 +32,13 @@ public:
 
     /// For a Transform in a loop, at which `side` is taken: the lists of children follow.
     void EndLoop(ID transform, Side side);
+    /// The same where another side was taken before, whose lists must not stay.
+    void EndLoopAgain(ID transform, Side side);
     /// For objects that `without`, ours or theirs, lacks and the other side has: they are kept, with the
     /// whole of what was removed or added with them.
     void Keep(const std::vector<ID>& ids, Side without);
+    /// Takes Keep back.
+    void Return(const std::vector<ID>& ids, Side without);
     /// For such objects the other way round: they go, with what stands under them.
     void Remove(const std::vector<ID>& ids, Side without);
     /// The list of an object becomes the one of `side`, if the other side's change of it is this entry alone.
@@ -52,6 +56,7 @@ private:
     ID ParentIn(Side side, ID transform) const;
     ID TransformOf(ID gameObject, Side side) const;
     bool WasInBase(ID id) const { return m_Names.Has(Version::Base, id); }
+    void DecideWhole(const std::vector<ID>& ids, Side without, Side wanted);
     std::set<ID> Listed(Side side, ID owner, const ovrin_yaml::YAMLScalar* list) const;
     ID OnlyChange(Side side, ID owner, const ovrin_yaml::YAMLScalar* list);
     void DecideList(Side changer, Side wanted, ID owner, const ovrin_yaml::YAMLScalar* list, ID entry);

@@ -1,6 +1,8 @@
 #include "Conflicts/DecisionPath.h"
 #include "SceneGenerator.h"
 #include "Settle/SettleSession.h"
+#include "Settle/Wanted.h"
+#include "Support/Program.h"
 #include "Words/Failure.h"
 
 #include <algorithm>
@@ -127,6 +129,41 @@ TEST_P(SettleLaws, WhatOneSideDidAloneIsNoProblem) {
             } catch (const Failure&) {
                 EXPECT_TRUE(GetParam()) << "seed " << seed; // no scene can have parents that aren't there
             }
+    }
+}
+
+// What a person does step by step, a script by paths and by a file, and the engine by that file.
+TEST_P(SettleLaws, SameDecisionsGiveTheSameBytesToEverybody) {
+    constexpr const char* kNames[] = {"Base", "Right", "Left"};
+    const program::WorkingDirectory folder;
+    for (unsigned seed = 0; seed < kSeeds / 10; ++seed) {
+        const ThreeTexts texts = GeneratedTexts(seed, GetParam());
+        const auto session = SessionOf(texts);
+        std::mt19937 random(seed);
+        for (const MetConflict& met : session->Conflicts())
+            session->Decide({{DecisionPath(met.conflict->path), SideBy(random)}});
+        session->TakeAll(Side::Theirs, [](const OpenConflict&) { return true; });
+        std::string file;
+        std::vector<Wanted> wanted;
+        for (const Decision& decision : session->Decisions()) {
+            file.insert(0, kNames[static_cast<std::size_t>(decision.side)] + (" " + decision.path + "\n"));
+            wanted.push_back({decision.path, decision.side});
+        }
+        folder.Write("decisions", "Conflict handling:\n" + file);
+        folder.Write("base", texts.base);
+        folder.Write("left", texts.theirs);
+        folder.Write("right", texts.ours);
+        folder.Run("\"$OVRIN\" merge --force --fallback none -i decisions base left right result --rules " +
+                   std::string(OVRIN_SOURCE_DIR "/Src/Data/mergerules.txt"));
+        EXPECT_EQ(session->Result(), folder.Read("result")) << "seed " << seed;
+        std::vector<std::unique_ptr<SettleSession>> scripts;
+        scripts.push_back(SessionOf(texts));
+        if (wanted.empty()) continue;
+        DecideByFile(scripts, (folder.Path() / "decisions").string());
+        EXPECT_EQ(scripts[0]->Result(), session->Result()) << "seed " << seed;
+        scripts[0] = SessionOf(texts);
+        DecideWanted(scripts, wanted);
+        EXPECT_EQ(scripts[0]->Result(), session->Result()) << "seed " << seed;
     }
 }
 
