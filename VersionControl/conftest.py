@@ -5,6 +5,8 @@ import tempfile
 
 import pytest
 
+from page import Page
+from test_systems import ONE_CONFLICT
 from user import User
 
 SKIPPED = 77
@@ -27,3 +29,20 @@ def fixture_user(request):
     installed = pathlib.Path(request.config.getoption("--installed")).resolve()
     with tempfile.TemporaryDirectory(prefix="a user's ") as folder:
         yield User(installed, pathlib.Path(folder))
+
+
+@pytest.fixture(name="web_user")
+def fixture_web_user(request, user):
+    """The same where ovrin has pages."""
+    program = pathlib.Path(request.config.getoption("--installed"), "bin/ovrin").resolve()
+    if not program.with_name("ovrin-web").exists():
+        pytest.skip("ovrin was built without ovrin-web")
+    return user
+
+
+@pytest.fixture(name="page")
+def fixture_page(request, web_user):
+    """A page that settles the conflict of three scenes, which a test may choose."""
+    web_user.conflict(*getattr(request, "param", ONE_CONFLICT))
+    with Page(web_user, "settle", "--web", "--no-browser") as page:
+        yield page

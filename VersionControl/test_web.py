@@ -5,39 +5,20 @@
 
 import itertools
 import json
-import os
-import pathlib
 import random
-import shutil
-import signal
-import sys
 import time
 
 import pytest
 
-from page import Page, has_ended, interrupt, seconds_since
+from page import Page, seconds_since
 from test_settle import MANY
 from test_systems import CONFLICT_AND_MORE, HEADER, ONE_CONFLICT, game_object, scene
-from user import DONE, FAILED, LEFT_OPEN
+from user import DONE, LEFT_OPEN
 
 POLICY = ("default-src 'none'; script-src 'self'; style-src 'self'; connect-src 'self'; img-src 'self'; base-uri 'none'; "
           "form-action 'none'; frame-ancestors 'none'")
 SCRIPT = "<script>alert(1)</script>"
 SCRIPTS = [HEADER + game_object(7, layer, f"'{SCRIPT}'", 1) for layer in (1, 2, 5)]
-
-
-@pytest.fixture(autouse=True)
-def fixture_server(request):
-    program = pathlib.Path(request.config.getoption("--installed"), "bin/ovrin").resolve()
-    if not program.with_name("ovrin-web").exists():
-        pytest.skip("ovrin was built without ovrin-web")
-
-
-@pytest.fixture(name="page")
-def fixture_page(user, request):
-    user.conflict(*getattr(request, "param", ONE_CONFLICT))
-    with Page(user, "settle", "--web", "--no-browser") as page:
-        yield page
 
 
 def test_page_settles_as_the_terminal_does(page):
@@ -244,22 +225,6 @@ def test_secret_is_no_argument_and_no_variable(page):
                 assert page.token.encode() not in file.read()
 
 
-@pytest.mark.skipif(os.getuid() != 0 or not shutil.which("setpriv"), reason="needs root to be two users")
-def test_another_user_who_knows_the_address_gets_nothing(user):
-    """Command lines are public, and that of the browser has the address."""
-    user.conflict(*ONE_CONFLICT)
-    here = pathlib.Path(user.here).parent
-    for folder, _, names in os.walk(here):
-        for name in (folder, *(os.path.join(folder, name) for name in names)):
-            os.chown(name, 12345, 12345, follow_symlinks=False)
-    user.fake("as-other", 'exec setpriv --reuid 12345 --regid 12345 --clear-groups "$@"')
-    with Page(user, "settle", "--web", "--no-browser", program=["as-other", "ovrin"]) as page:
-        ask = [sys.executable, "-c", "import sys, urllib.request; urllib.request.urlopen(sys.argv[1])", f"{page.address}api/session"]
-        for other, fails in (("12345", False), ("12346", True)):
-            user.run("setpriv", "--reuid", other, "--regid", other, "--clear-groups", *ask, fails=fails)
-            assert ("403" in user.report) == fails
-
-
 @pytest.mark.parametrize("page", [SCRIPTS], indirect=True)
 def test_scripts_for_names_stay_data(page):
     status, headers, text = page.ask(f"/{page.token}/api/conflicts")
@@ -306,19 +271,6 @@ def test_number_of_pages_is_bounded(page):
         stream.close()
 
 
-def test_page_that_is_gone_ends_the_program_and_a_reload_does_not(page):
-    for pause in (2, 0):
-        with page.connect() as stream:
-            stream.sendall(f"GET /{page.token}/api/alive HTTP/1.1\r\nHost: {page.host}\r\n\r\n".encode())
-            assert b"text/event-stream" in stream.recv(4096)
-        time.sleep(pause)
-    begun = time.monotonic()
-    gate = page.gate()
-    status, said = page.end()
-    assert status == LEFT_OPEN and 5 < seconds_since(begun) < 15 and "1 open conflict" in said
-    assert has_ended(gate)
-
-
 def test_garbage_does_no_harm(page):
     chance = random.Random(7)
     words = [b"GET ", b"POST ", b"/", page.token.encode(), b"/api/take", b" HTTP/1.1", b"\r\n", b"\n", b"Host: ",
@@ -329,78 +281,6 @@ def test_garbage_does_no_harm(page):
     assert page.get("session")["open"] == 1
 
 
-@pytest.mark.parametrize("end", [signal.SIGKILL, signal.SIGTERM, signal.SIGSEGV])
-def test_dead_server_is_told_and_nothing_is_lost(page, end):
-    page.step("take", item=0, side="theirs")
-    os.kill(page.gate(), end)
-    status, said = page.end()
-    assert status == FAILED and "ovrin-web" in said and "Nothing is lost" in said
-    page.user.ovrin("settle")
-    assert page.user.read() == ONE_CONFLICT[1]
-
-
-@pytest.mark.parametrize("end", [signal.SIGKILL, signal.SIGINT, signal.SIGTERM, signal.SIGHUP])
-def test_server_does_not_outlive_the_program(page, end):
-    gate = page.gate()
-    page.step("take", item=0, side="theirs")
-    os.kill(page.process.pid, end)
-    status, _ = page.end()
-    assert status == (-end if end == signal.SIGKILL else LEFT_OPEN)
-    assert has_ended(gate)
-    page.user.ovrin("settle")
-
-
-def test_interrupt_ends_both(page):
-    gate = page.gate()
-    interrupt(page)
-    status, said = page.end()
-    assert status == LEFT_OPEN and "kept" in said and has_ended(gate)
-
-
-def test_port_is_the_wanted_one_and_nobody_elses(page):
-    user = page.user
-    user.ovrin("settle", "--web", "--no-browser", "--port", page.port, status=FAILED)
-    assert page.port in user.words() and "--port" in user.words()
-
-
-def test_browser_is_opened_without_a_shell(user):
-    user.conflict(*ONE_CONFLICT)
-    user.fake("my-browser", 'readlink /proc/$$/fd/[0-9] > "$HOME/files"; printf "%s\\n" "$#" "$@" > "$HOME/opened"')
-    with Page(user, "settle", "--web", BROWSER="no-such-program:my-browser --new $(touch x) %s") as page:
-        opened = user.home / "opened"
-        while not (opened.exists() and opened.read_text().endswith("\n")):
-            time.sleep(0.05)
-        assert opened.read_text().splitlines() == ["4", "--new", "$(touch", "x)", page.address]
-    assert not user.exists("x")
-    # Besides what it opened itself it has nothing: neither the server's socket nor the repository's files.
-    own = {str(user.fakes / "my-browser"), str(user.home / "files")}
-    assert set((user.home / "files").read_text().splitlines()) <= {"/dev/null"} | own
-
-
-@pytest.mark.parametrize("browser", ["no-such-program", "false"])
-def test_browser_that_cannot_be_opened_is_told(user, browser):
-    user.conflict(*ONE_CONFLICT)
-    with Page(user, "settle", "--web", BROWSER=browser) as page:
-        assert "Ctrl-C" in page.process.stderr.readline().decode()
-        assert "open the address yourself" in page.process.stderr.readline().decode()
-        assert page.get("session")["open"] == 1
-
-
-def test_nothing_to_settle_serves_nothing(user):
-    user.start()
-    user.ovrin("settle", "--web", "--no-browser")
-    assert "No scene has open conflicts" in user.words()
-
-
-def test_without_the_server_the_other_ways_are_told(user, tmp_path):
-    user.conflict(*ONE_CONFLICT)
-    installed = pathlib.Path(shutil.which("ovrin", path=user.environment["PATH"])).resolve().parent
-    for name in ("ovrin", "mergerules.txt", "mergespecfile.txt"):
-        shutil.copy(installed / name, tmp_path)
-    user.ovrin("settle", "--web", status=FAILED, PATH=f"{tmp_path}:{user.environment['PATH']}")
-    assert "ovrin-web" in user.words() and '"ovrin settle"' in user.words()
-
-
 def test_scene_that_was_changed_by_hand_is_replaced_only_when_asked(page):
     page.user.write(scene("7 Lantern 1"))
     page.step("take", item=0, side="theirs")
@@ -408,3 +288,22 @@ def test_scene_that_was_changed_by_hand_is_replaced_only_when_asked(page):
     assert not answer["isOver"] and page.user.name in answer["remarks"][0]
     assert page.step("finish", overwrite=True)["isOver"]
     assert page.end()[0] == DONE and page.user.read() == ONE_CONFLICT[1]
+
+
+def test_what_is_finished_is_left_alone(web_user):
+    web_user.sides(*ONE_CONFLICT)
+    for branch, text in (("topic", ONE_CONFLICT[1]), ("main", ONE_CONFLICT[2])):
+        web_user.git("checkout", "-q", branch)
+        web_user.commit(text, "other.ovrin")
+    web_user.git("merge", "topic", fails=True)
+    with Page(web_user, "settle", "--web", "--no-browser") as page:
+        page.step("take", all=True, side="theirs")
+        page.step("undo")
+        item = next(item for item in page.get("conflicts")["items"])
+        page.step("take", item=item["index"], side="theirs")
+        name = page.step("finish", overwrite=False)["finished"][0]
+        web_user.write("by hand", name)
+        page.step("take", 400, item=item["index"], side="ours")
+        page.step("undo", 400)
+        page.step("take", all=True, side="theirs")
+        assert page.step("finish", overwrite=True)["isOver"] and web_user.read(name) == "by hand"

@@ -233,8 +233,8 @@ bool SettleScenes::IsUntouched(SettleSession& session, const std::string& result
 std::vector<std::string> SettleScenes::Finish(bool overwrite, Remarks& remarks) {
     std::vector<std::string> finished;
     for (const auto& session : m_Sessions) {
-        if (!session->IsSettled()) continue;
         const std::string& path = session->Source().path;
+        if (!session->IsSettled() || m_Finished.contains(path)) continue;
         const std::string result = session->Result();
         if (IsBehindLink(FileOf(path))) {
             remarks.push_back(TellLink(path));
@@ -249,6 +249,7 @@ std::vector<std::string> SettleScenes::Finish(bool overwrite, Remarks& remarks) 
     }
     RememberDecided(finished, remarks);
     Conclude(finished);
+    m_Finished.insert(finished.begin(), finished.end());
     return finished;
 }
 

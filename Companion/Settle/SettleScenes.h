@@ -8,6 +8,7 @@
 #include "Systems/Repository.h"
 
 #include <memory>
+#include <set>
 #include <span>
 #include <string>
 #include <vector>
@@ -72,6 +73,7 @@ private:
     EarlierDecisions m_Earlier;
     LiveMerges m_Live;
     std::vector<std::unique_ptr<SettleSession>> m_Sessions;
+    std::set<std::string> m_Finished; // paths; their files are nobody's business any more
 };
 
 /// Keeps what was decided in the record of a scene, if there is one, to be proposed where the same is met

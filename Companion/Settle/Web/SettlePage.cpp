@@ -214,10 +214,7 @@ PageAnswer SettlePage::Finish(bool overwrite) {
         isAnyReady = isAnyReady || (m_Desk.Scenes()[scene]->IsSettled() && !IsFinished(scene));
     if (!isAnyReady) throw Failure("No scene is settled yet: " + CountOpen(m_Desk.CountOpen()) + " left");
     Remarks remarks;
-    std::vector<std::string> finished = m_Desk.Finish(overwrite, remarks);
-    std::erase_if(finished, [&](const std::string& path) {
-        return std::ranges::find(m_Finished, path) != m_Finished.end();
-    });
+    const std::vector<std::string> finished = m_Desk.Finish(overwrite, remarks);
     m_Finished.insert(m_Finished.end(), finished.begin(), finished.end());
     ++m_Revision;
     const bool isOver = m_Finished.size() == m_Desk.Scenes().size();
