@@ -37,7 +37,7 @@ export class MapView {
             make("option", { value: "top" }, "from above"), make("option", { value: "side" }, "from the side"));
         return make("div", { class: "view-bar" }, make("label", {}, "Seen ", select),
             make("p", { id: "map-keys", class: "aside" },
-                "Drag or arrow keys: move. Wheel, + and −: zoom. 0: all. , and .: previous and next mark."));
+                "Arrows or drag: move · + − or wheel: zoom · 0: all · , . : marks"));
     }
 
     makeButtons() {
