@@ -26,6 +26,13 @@ SCRIPT = "<script>alert(1)</script>"
 SCRIPTS = [HEADER + game_object(7, layer, f"'{SCRIPT}'", 1) for layer in (1, 2, 5)]
 
 
+@pytest.fixture(autouse=True)
+def fixture_server(request):
+    program = pathlib.Path(request.config.getoption("--installed"), "bin/ovrin").resolve()
+    if not program.with_name("ovrin-web").exists():
+        pytest.skip("ovrin was built without ovrin-web")
+
+
 @pytest.fixture(name="page")
 def fixture_page(user, request):
     user.conflict(*getattr(request, "param", ONE_CONFLICT))
@@ -358,13 +365,16 @@ def test_port_is_the_wanted_one_and_nobody_elses(page):
 
 def test_browser_is_opened_without_a_shell(user):
     user.conflict(*ONE_CONFLICT)
-    user.fake("my-browser", 'printf "%s\\n" "$#" "$@" > "$HOME/opened"')
+    user.fake("my-browser", 'readlink /proc/$$/fd/[0-9] > "$HOME/files"; printf "%s\\n" "$#" "$@" > "$HOME/opened"')
     with Page(user, "settle", "--web", BROWSER="no-such-program:my-browser --new $(touch x) %s") as page:
         opened = user.home / "opened"
         while not (opened.exists() and opened.read_text().endswith("\n")):
             time.sleep(0.05)
         assert opened.read_text().splitlines() == ["4", "--new", "$(touch", "x)", page.address]
     assert not user.exists("x")
+    # Besides what it opened itself it has nothing: neither the server's socket nor the repository's files.
+    own = {str(user.fakes / "my-browser"), str(user.home / "files")}
+    assert set((user.home / "files").read_text().splitlines()) <= {"/dev/null"} | own
 
 
 @pytest.mark.parametrize("browser", ["no-such-program", "false"])
