@@ -93,7 +93,8 @@ std::string ObjectWords(const Operation* operation, const YAMLNode* value) {
 }
 
 ConflictWords::ConflictWords(SceneMerge& merge, std::size_t width, MergeNames::Words versions)
-    : m_Merge(merge), m_Width(width), m_Names(merge.Session(), std::move(versions)), m_Places(merge.Session(), m_Names) {}
+    : m_Merge(merge), m_Width(width), m_Names(merge.Session(), std::move(versions)),
+      m_Places(merge.Session(), m_Names) {}
 
 Conflict ConflictWords::Describe(const OpenConflict& open) const {
     Conflict conflict{};

@@ -58,6 +58,7 @@ public:
         }
         return ranks;
     }
+    std::uint32_t ParentOf(std::uint32_t index) const { return m_Nodes[index].parent; }
     std::uint32_t IndexOf(ID id) {
         const auto [found, isNew] = m_Indexes.try_emplace(id, static_cast<std::uint32_t>(m_Nodes.size()));
         if (isNew) m_Nodes.push_back({.id = id, .tree = TreeOf(id)});
@@ -107,6 +108,20 @@ private:
 };
 
 } // namespace
+
+std::vector<HierarchyPlace> HierarchyPlaces(std::span<const ObjectNames* const> trees,
+                                            std::span<const ID> ids) {
+    const Order order(trees, ids);
+    const std::vector<std::uint32_t> ranks = order.Ranks();
+    std::vector<HierarchyPlace> places;
+    places.reserve(ids.size());
+    // The nodes of the ids come first, in their order.
+    for (std::uint32_t i = 0; i < ids.size(); ++i) {
+        const std::uint32_t parent = order.ParentOf(i);
+        places.push_back({ranks[i], parent < ids.size() ? parent : HierarchyPlace::kNone});
+    }
+    return places;
+}
 
 std::vector<std::uint32_t> HierarchyRanks(std::span<const ObjectNames* const> trees,
                                           std::span<const ID> ids) {

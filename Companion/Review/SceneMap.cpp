@@ -2,6 +2,8 @@
 
 #include "Names/PrintableText.h"
 
+#include "Session/MergeSession.h"
+
 #include <algorithm>
 #include <nlohmann/json.hpp>
 
@@ -171,17 +173,19 @@ private:
     std::optional<MapBox> m_Bounds, m_Box;
 };
 
-SceneMap::SceneMap(const SceneTree& tree, const TreePages& pages, const MergeNames& names)
+SceneMap::SceneMap(const ovrin_yaml::MergeSession& session, const SceneTree& tree, const TreePages& pages,
+                   const MergeNames& names)
     : m_Tree(tree), m_Pages(pages) {
-    const std::array<WorldPlaces, 3> versions = {WorldPlaces(names.In(Version::Base)),
-                                                 WorldPlaces(names.In(Version::Ours)),
-                                                 WorldPlaces(names.In(Version::Theirs))};
+    const WorldPlaces base(names.In(Version::Base));
+    const WorldPlaces ours(base, session.RightDiff(), names.In(Version::Ours));
+    const WorldPlaces theirs(base, session.LeftDiff(), names.In(Version::Theirs));
+    const std::array<const WorldPlaces*, 3> versions = {&base, &ours, &theirs};
     const std::span<const MarkedNode> nodes = tree.Nodes();
     for (SceneTree::Index i = 0; i < nodes.size(); ++i) {
         if (nodes[i].kind != NodeKind::Place) continue;
         Thing thing{i, {}};
         for (std::size_t v = 0; v < versions.size(); ++v)
-            if (const Point* point = versions[v].Find(nodes[i].id)) thing.at[v] = *point;
+            if (const Point* point = versions[v]->Find(nodes[i].id)) thing.at[v] = *point;
         if (std::ranges::any_of(thing.at, [](const auto& point) { return point.has_value(); }))
             m_Things.push_back(thing);
         else

@@ -8,6 +8,10 @@
 #include <optional>
 #include <vector>
 
+namespace ovrin_yaml {
+class MergeSession;
+}
+
 namespace ovrin {
 
 /// From where a scene is looked at.
@@ -37,8 +41,9 @@ class SceneMap {
 public:
     static constexpr std::size_t kMostTouched = 1000, kMostCells = 128;
 
-    /// Tree, pages and names must outlive the map.
-    SceneMap(const SceneTree& tree, const TreePages& pages, const MergeNames& names);
+    /// Tree and pages must outlive the map; names are those of the session.
+    SceneMap(const ovrin_yaml::MergeSession& session, const SceneTree& tree, const TreePages& pages,
+             const MergeNames& names);
 
     ///     {"bounds": [x0, y0, x1, y1] of all, null where there is nothing,
     ///      "unplaced": places that no version has a position for,

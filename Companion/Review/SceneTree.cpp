@@ -17,23 +17,13 @@ namespace {
 using ID = SceneTree::ID;
 using Trees = std::array<const ObjectNames*, 4>;
 
-/// Every object of any tree, once.
-std::vector<ID> AllObjects(const Trees& trees) {
-    std::vector<ID> ids;
-    std::unordered_map<ID, bool> met;
-    met.reserve(trees.front()->Places().Root().RawEntries().size());
-    for (const ObjectNames* tree : trees)
-        for (const YAMLMapping::Entry entry : tree->Places().Root().RawEntries())
-            if (entry.key && met.emplace(entry.key, true).second) ids.push_back(entry.key);
-    return ids;
-}
-
 NodeKind KindOf(const ObjectNames& names, ID id) {
     const ObjectBody body = names.Places().Body(id);
     if (Hierarchy::IsPlace(body)) return NodeKind::Place;
     return names.Places().PlaceIDOf(body, id) ? NodeKind::Component : NodeKind::Other;
 }
 
+/// Of an object that a side touched: of any other all versions have the same.
 Version TellerOf(const MergeSession& session, const MergeNames& names, ID id) {
     const bool isChangedByTheirsAlone = session.LeftDiff().HasKey(id) && !session.RightDiff().HasKey(id);
     const bool hasTheirs = names.Has(Version::Theirs, id);
@@ -43,39 +33,40 @@ Version TellerOf(const MergeSession& session, const MergeNames& names, ID id) {
 
 } // namespace
 
-SceneTree::SceneTree(SceneMerge& merge, const MergeNames& names) : m_Nodes(NodesInOrder(merge, names)) {
-    m_Indexes.reserve(m_Nodes.size());
-    for (Index i = 0; i < m_Nodes.size(); ++i) m_Indexes.emplace(m_Nodes[i].id, i);
+SceneTree::SceneTree(SceneMerge& merge, const MergeNames& names) {
+    PlaceNodes(merge, names);
     Number();
     const MergeSession& session = merge.Session();
-    const auto marks = FindMarks(session, names);
+    for (const YAMLMappingDiff* diff : {&session.LeftDiff(), &session.RightDiff()})
+        for (const auto& [id, operation] : diff->Entries())
+            if (const auto node = Find(id)) m_Nodes[*node].teller = TellerOf(session, names, id);
+    for (const auto& [id, mark] : FindMarks(session, names))
+        if (const auto node = Find(id)) m_Nodes[*node].mark = mark;
     for (MarkedNode& node : m_Nodes) {
-        node.teller = TellerOf(session, names, node.id);
         node.kind = KindOf(names.In(node.teller), node.id);
-        if (const auto mark = marks.find(node.id); mark != marks.end()) node.mark = mark->second;
         m_Counts.Add(node.mark);
     }
     SumBelow();
 }
 
-/// Nodes that know what they stand under by its id's place among them.
-std::vector<MarkedNode> SceneTree::NodesInOrder(SceneMerge& merge, const MergeNames& names) const {
+/// Every object of any tree, once, in order.
+void SceneTree::PlaceNodes(SceneMerge& merge, const MergeNames& names) {
     const ObjectNames result(merge.Session().Result().GetMapping());
     const Trees trees = {&result, &names.In(Version::Ours), &names.In(Version::Theirs),
                          &names.In(Version::Base)};
-    const std::vector<ID> ids = AllObjects(trees);
-    const std::vector<std::uint32_t> ranks = HierarchyRanks(trees, ids);
-    std::unordered_map<ID, Index> rankOf;
-    rankOf.reserve(ids.size());
-    for (std::size_t i = 0; i < ids.size(); ++i) rankOf.emplace(ids[i], ranks[i]);
-    std::vector<MarkedNode> nodes(ids.size());
+    std::vector<ID> ids;
+    m_Indexes.reserve(result.Places().Root().RawEntries().size());
+    for (const ObjectNames* tree : trees)
+        for (const YAMLMapping::Entry entry : tree->Places().Root().RawEntries())
+            if (entry.key && m_Indexes.emplace(entry.key, 0).second) ids.push_back(entry.key);
+    const std::vector<HierarchyPlace> places = HierarchyPlaces(trees, ids);
+    m_Nodes.resize(ids.size());
     for (std::size_t i = 0; i < ids.size(); ++i) {
-        MarkedNode& node = nodes[ranks[i]];
-        node.id = ids[i];
-        const auto tree = std::ranges::find_if(trees, [&](const ObjectNames* t) { return t->Has(node.id); });
-        if (const ID above = (*tree)->Above(node.id)) node.parent = rankOf.at(above);
+        const auto [rank, above] = places[i];
+        m_Indexes[ids[i]] = rank;
+        m_Nodes[rank].id = ids[i];
+        if (above != HierarchyPlace::kNone) m_Nodes[rank].parent = places[above].rank;
     }
-    return nodes;
 }
 
 /// Parents stand ahead of what is below them.

@@ -42,7 +42,7 @@ public:
     void CountOpen(std::span<const ConflictMark> marks);
 
 private:
-    std::vector<MarkedNode> NodesInOrder(SceneMerge& merge, const MergeNames& names) const;
+    void PlaceNodes(SceneMerge& merge, const MergeNames& names);
     void Number();
     void SumBelow();
 

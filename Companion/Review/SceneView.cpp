@@ -48,7 +48,7 @@ json SceneView::Object(std::string_view id, bool all) const {
 }
 
 json SceneView::Map(const MapWish& wish) {
-    if (!m_Map) m_Map = std::make_unique<SceneMap>(m_Tree, m_Pages, m_Names);
+    if (!m_Map) m_Map = std::make_unique<SceneMap>(m_Merge.Session(), m_Tree, m_Pages, m_Names);
     return m_Map->Draw(wish);
 }
 

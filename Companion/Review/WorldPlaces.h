@@ -3,8 +3,13 @@
 #include "Names/ObjectNames.h"
 #include "Review/Affine.h"
 
+#include <cstdint>
 #include <unordered_map>
 #include <vector>
+
+namespace ovrin_yaml {
+class YAMLMappingDiff;
+}
 
 namespace ovrin {
 
@@ -18,20 +23,27 @@ public:
     using ID = ObjectNames::ID;
 
     explicit WorldPlaces(const ObjectNames& names);
+    /// Of a version that `diff` makes of another one, whose places are known: only what it touches is read.
+    WorldPlaces(const WorldPlaces& before, const ovrin_yaml::YAMLMappingDiff& diff, const ObjectNames& after);
 
     /// Null for what has no place.
     const Point* Find(ID place) const;
 
 private:
-    /// A Transform or instance on the way to its place in the world.
-    struct Frame {
+    /// A Transform or instance.
+    struct Part {
         ID id;
-        ID parentID;
-        Affine frame; ///< within the parent, then in the world
-        enum class State : unsigned char { New, OnTheWay, Done } state = State::New;
+        ID parent;    ///< null at the top
+        ID place;     ///< the GameObject or instance that stands where it stands; null for none
+        Affine frame; ///< within the parent
+        bool isGone = false;
     };
     class Frames;
+    void Read(ID id, const ObjectNames& names);
+    void Place();
 
+    std::vector<Part> m_Parts;
+    std::unordered_map<ID, std::uint32_t> m_Indexes; // of the parts
     std::unordered_map<ID, Point> m_Points;
 };
 

@@ -75,8 +75,8 @@ TEST_F(SceneMapTest, ADeepHierarchyNeedsNoStack) {
 
 TEST_F(SceneMapTest, AnInstanceStandsWhereItsOverridesSay) {
     const auto change = [](const char* target, const char* property, const char* value) {
-        return std::string(";   - target: {fileID: ") + target + ", guid: aa};     propertyPath: " + property +
-               ";     value: " + value;
+        return std::string(";   - target: {fileID: ") + target +
+               ", guid: aa};     propertyPath: " + property + ";     value: " + value;
     };
     const std::string scene =
         Place(10, "A", 0, {}, At(1, 0, 0)) +
