@@ -27,7 +27,8 @@ export class MapView {
         part("panel-map").append(this.makeBar(), this.frame, this.makeLegend());
         new ResizeObserver(() => this.resize()).observe(this.frame);
         this.listen();
-        page.addEventListener("session", () => this.renew());
+        // A selection follows each step; what it shows is asked for first.
+        page.addEventListener("session", () => (this.isStale = true));
         page.addEventListener("selection", () => this.follow());
         page.addEventListener("view", () => this.follow());
     }
@@ -82,11 +83,6 @@ export class MapView {
         Object.assign(this.camera, { width: clientWidth, height: clientHeight });
         if (isFirst && this.answer) this.showAll();
         else this.changed();
-    }
-
-    renew() {
-        this.isStale = true;
-        this.follow();
     }
 
     /** Brings the map up to date, and the selected object into sight. */
