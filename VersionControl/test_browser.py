@@ -21,8 +21,8 @@ except ImportError:
     start_browser = None
 
 SETTLE = "settle", "--web", "--no-browser"
-MARKUP = ["<script>window.struck=1</script>", "<img src=x onerror=window.struck=1>", "</script><svg onload=window.struck=1>",
-          "javascript:window.struck=1", "\\\" onfocus=window.struck=1 autofocus x=\\\""]
+MARKUP = ["<script>window.struck=1</script>", "<img src=x onerror=window.struck=1>",
+          "</script><svg onload=window.struck=1>", "javascript:window.struck=1", "\\\" onfocus=window.struck=1 autofocus x=\\\""]
 
 
 @pytest.fixture(name="driver", scope="module")

@@ -17,8 +17,7 @@ export class Ending {
         if (reason) return this.notices.happened(reason);
         const ready = readyScenes(this.page.session);
         const { open, problems } = this.page.session;
-        const left = problems.length ? `${counted(problems.length, "problem")} of the result, told on top of the page, ` +
-            `${problems.length === 1 ? "is" : "are"} left in it.` : "";
+        const left = problems.length ? `Left in it: ${counted(problems.length, "problem")}, told on top of the page.` : "";
         const words = open ? `${counted(open, "conflict")} in other scenes stay${open === 1 ? "s" : ""} open.` : "";
         return this.ask(`Write ${ready.length === 1 ? "the result" : counted(ready.length, "result")}?`, [
             make("p", {}, "Each takes the place of its scene's file, and version control is told that it is settled:"),
