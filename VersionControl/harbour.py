@@ -95,7 +95,7 @@ def our_scene():
     scene[31]["m_LocalPosition"] = vector(2.5, 2, 3)
     scene[32].update({"m_Color": colour(1, 0.8, 0.5), "m_Intensity": 2.5, "m_Range": 12.5})
     scene[40].update({"m_Layer": 2, "m_IsActive": 0})
-    scene[42].update({"m_Description": TALE.replace("evening", "morning"), "m_Target": reference(30), "m_Speed": 4,
+    scene[42].update({"m_Description": TALE.replace("evening", "morning"), "m_Target": reference(70), "m_Speed": 4,
                   "m_Stops": ["Pier", "Sluice", "Sea"]})
     scene.move(50, 60)
     scene[70]["m_Layer"] = 5

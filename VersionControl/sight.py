@@ -107,6 +107,10 @@ class Sight:
     def click(self, selector):
         self.driver.find_element(By.CSS_SELECTOR, selector).click()
 
+    def click_on(self, words):
+        """Clicks a button by what it says."""
+        self.driver.find_element(By.XPATH, f"//button[text()='{words}']").click()
+
     def choose(self, name):
         """Selects the first conflict of an object by the mouse."""
         group = self.driver.find_element(By.XPATH, f"//div[@class='list-group'][div/span[text()='{name}']]")

@@ -1,6 +1,6 @@
 const BRANCH_PIECE = 200;
-const MOST_ASKED_AT_FIRST = 120;
-const MOST_ROWS_AT_FIRST = 400;
+const MOST_ASKED_AT_FIRST = 40;
+const MOST_ROWS_AT_FIRST = 300;
 
 /**
  * The branches of one scene's hierarchy that somebody opened: their nodes, fetched by pieces. Filters are "touched",

@@ -1,4 +1,4 @@
-const MARGIN = 60;
+const MARGIN = 44;
 const LEAST_SPAN = 1e-3;
 
 /** What part of the scene the map shows. Units of the scene are `scale` pixels wide, and y grows to the north. */

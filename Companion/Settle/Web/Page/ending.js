@@ -16,12 +16,13 @@ export class Ending {
     askToFinish(reason) {
         if (reason) return this.notices.happened(reason);
         const ready = readyScenes(this.page.session);
-        const open = this.page.session.open;
+        const { open, problems } = this.page.session;
+        const left = problems.length ? `Left in it: ${counted(problems.length, "problem")}, told on top of the page.` : "";
         const words = open ? `${counted(open, "conflict")} in other scenes stay${open === 1 ? "s" : ""} open.` : "";
         return this.ask(`Write ${ready.length === 1 ? "the result" : counted(ready.length, "result")}?`, [
             make("p", {}, "Each takes the place of its scene's file, and version control is told that it is settled:"),
             make("ul", {}, ...ready.map(({ path }) => make("li", {}, path))),
-            words ? make("p", {}, words) : null,
+            words ? make("p", {}, words) : null, left ? make("p", {}, make("strong", {}, left)) : null,
         ], makeButton("Write", () => this.finish(false), { className: "primary" }));
     }
 

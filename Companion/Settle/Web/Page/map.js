@@ -27,7 +27,8 @@ export class MapView {
         part("panel-map").append(this.makeBar(), this.frame, this.makeLegend());
         new ResizeObserver(() => this.resize()).observe(this.frame);
         this.listen();
-        page.addEventListener("session", () => this.renew());
+        // A selection follows each step; what it shows is asked for first.
+        page.addEventListener("session", () => (this.isStale = true));
         page.addEventListener("selection", () => this.follow());
         page.addEventListener("view", () => this.follow());
     }
@@ -37,7 +38,7 @@ export class MapView {
             make("option", { value: "top" }, "from above"), make("option", { value: "side" }, "from the side"));
         return make("div", { class: "view-bar" }, make("label", {}, "Seen ", select),
             make("p", { id: "map-keys", class: "aside" },
-                "Drag or arrow keys: move. Wheel, + and −: zoom. 0: all. , and .: previous and next mark."));
+                "Arrows or drag: move · + − or wheel: zoom · 0: all · , . : marks"));
     }
 
     makeButtons() {
@@ -82,11 +83,6 @@ export class MapView {
         Object.assign(this.camera, { width: clientWidth, height: clientHeight });
         if (isFirst && this.answer) this.showAll();
         else this.changed();
-    }
-
-    renew() {
-        this.isStale = true;
-        this.follow();
     }
 
     /** Brings the map up to date, and the selected object into sight. */

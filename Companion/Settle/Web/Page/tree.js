@@ -20,7 +20,8 @@ export class TreeView {
         this.tree.addEventListener("keydown", (event) => this.press(event));
         const bar = make("div", { class: "view-bar" }, makeSearch(page, (hit) => this.goTo(hit)), this.makeFilter());
         part("panel-hierarchy").append(bar, this.tree);
-        page.addEventListener("session", () => this.renew());
+        // A selection follows each step; what it shows is asked for first.
+        page.addEventListener("session", () => (this.isStale = true));
         page.addEventListener("selection", () => this.follow());
         page.addEventListener("view", () => this.follow());
     }
@@ -38,11 +39,6 @@ export class TreeView {
         this.filter = this.select.value = filter;
         this.branches = null;
         await this.follow();
-    }
-
-    renew() {
-        this.isStale = true;
-        if (this.page.view === "hierarchy") this.follow();
     }
 
     /** Brings the tree up to date, and the selected object into sight. One call at a time; the last one counts. */

@@ -84,8 +84,9 @@ export class ValuesView {
         const names = new Set(columns.map(({ side }) => object.names[side]));
         const isPart = !names.has(null) && nameOf(object).includes(" · ");
         if (names.size < 2 || isPart) return null;
+        const version = (title) => (this.page.isComparison ? title : `In ${title.toLowerCase()}`);
         return make("dl", { class: "names" }, ...columns.flatMap(({ side, title }) =>
-            [make("dt", {}, this.page.isComparison ? title : `In ${title.toLowerCase()}`), make("dd", {}, object.names[side] ?? "isn't there")]));
+            [make("dt", {}, version(title)), make("dd", {}, object.names[side] ?? "isn't there")]));
     }
 
     makeParts(object) {
