@@ -144,7 +144,10 @@ void Walk::TellStep(const std::string& what, const SettleDesk::Step& step) {
     if (step.followed)
         m_Said +=
             ", with " + Counted(step.followed, "decision that follows", "decisions that follow") + " from it";
-    if (m_Open == 0) m_Said += ". All is settled: f finishes";
+    if (m_Open == 0)
+        m_Said += m_Desk.Problems().empty()
+                      ? ". All is settled: f finishes"
+                      : ". All is settled but for what is told here: f finishes as it is";
     if (!IsOpen(Here()))
         if (const auto next = OpenFrom(m_At, true)) m_At = *next;
 }
