@@ -260,3 +260,21 @@ def test_scene_that_both_added_is_looked_through(user, terminal):
     screen.see("scene.ovrin is settled.", "status 0")
     user.git("commit", "-qm", "merged")
     assert "Lantern" in user.committed() and "Boat" in user.committed()
+
+
+def test_what_follows_from_a_decision_is_told_and_mended(user, terminal):
+    def version(layer, target, *lanterns):
+        return (HEADER + "".join(game_object(10, layer, name, 1) for name in lanterns)
+                + f"--- !o!1 &20\nGameObject:\n  m_Name: Keeper\n  m_Target: {{fileID: {target}}}\n")
+
+    user.conflict(version(1, 0, "Lantern"), version(1, 0), version(5, 10, "Lantern"))
+    screen = terminal()
+    screen.run("ovrin settle")
+    screen.see("theirs removed it and ours changed it")
+    screen.press("t")
+    screen.see("Keeper: m_Target refers to Lantern, which was removed by theirs", "1 keep Lantern, too")
+    screen.press("1")
+    assert " ! " not in screen.see("Done: keep Lantern, too")
+    screen.press("f")
+    screen.see("scene.ovrin is settled.", "status 0")
+    assert "Lantern" in user.read() and "{fileID: 10}" in user.read()

@@ -128,9 +128,10 @@ std::vector<TextRange> PartsNotIn(std::string_view text, std::string_view other)
     const std::size_t least = std::min(words.size(), others.size());
     std::size_t begin = 0, behind = 0;
     while (begin < least && words[begin] == others[begin]) ++begin;
-    while (behind < least - begin && words.rbegin()[behind] == others.rbegin()[behind]) ++behind;
+    while (behind < least - begin && words[words.size() - 1 - behind] == others[others.size() - 1 - behind])
+        ++behind;
     std::vector<bool> isCommon(words.size(), true);
-    std::fill(isCommon.begin() + begin, isCommon.end() - behind, false);
+    for (std::size_t at = begin; at < words.size() - behind; ++at) isCommon[at] = false;
     EditSearch(words, others, begin, words.size() - behind, others.size() - behind).MarkCommon(isCommon);
     CloseGaps(words, isCommon);
     std::vector<TextRange> parts;

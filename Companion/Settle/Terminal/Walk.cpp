@@ -18,7 +18,7 @@ std::string Counted(std::size_t count, const char* one, const char* many) {
 
 bool Contains(std::string_view text, std::string_view part) {
     const auto isSame = [](unsigned char a, unsigned char b) { return std::tolower(a) == std::tolower(b); };
-    return !std::ranges::search(text, part, isSame).empty();
+    return std::search(text.begin(), text.end(), part.begin(), part.end(), isSame) != text.end();
 }
 
 } // namespace
@@ -144,7 +144,10 @@ void Walk::TellStep(const std::string& what, const SettleDesk::Step& step) {
     if (step.followed)
         m_Said +=
             ", with " + Counted(step.followed, "decision that follows", "decisions that follow") + " from it";
-    if (m_Open == 0) m_Said += ". All is settled: f finishes";
+    if (m_Open == 0)
+        m_Said += m_Desk.Problems().empty()
+                      ? ". All is settled: f finishes"
+                      : ". All is settled but for what is told here: f finishes as it is";
     if (!IsOpen(Here()))
         if (const auto next = OpenFrom(m_At, true)) m_At = *next;
 }
@@ -188,8 +191,8 @@ void Walk::TakeProposed() {
 std::vector<const SettleProblem*> Walk::ProblemsInOrder() const {
     std::vector<const SettleProblem*> problems;
     for (const SettleProblem& problem : m_Desk.Problems()) problems.push_back(&problem);
-    std::ranges::stable_partition(problems,
-                                  [](const SettleProblem* problem) { return !problem->remedies.empty(); });
+    std::stable_partition(problems.begin(), problems.end(),
+                          [](const SettleProblem* problem) { return !problem->remedies.empty(); });
     return problems;
 }
 
