@@ -189,9 +189,9 @@ std::string TellOpen(SceneMerge& merge, const OpenMerge& open) {
     return text + TellSides(open.occasion) + TellConflicts(merge, SideLabels::Of(open.occasion), kMostTold);
 }
 
-constexpr const char* kNextStep = "Next: \"ovrin settle --list\" shows the open conflicts of all scenes; "
-                                  "\"ovrin settle --take theirs\" takes "
-                                  "a side at them, \"ovrin settle --set PATH=theirs\" at one.\n";
+constexpr const char* kNextStep =
+    "Next: \"ovrin settle\" settles the open conflicts of all scenes, \"ovrin settle --web\" does so in the "
+    "browser; \"ovrin settle --take theirs\" takes a side at all of them.\n";
 
 Outcome LeaveOpen(const FileMerge& files, const Records& records, SceneMerge& merge, ProgressLine& progress) {
     // Version control takes its time for the answer, which most often is ours.

@@ -29,7 +29,8 @@ struct StatusOptions {
 
 constexpr const char* kWaysOut =
     "What to do:\n"
-    "  ovrin settle --list            shows the conflicts, by the names of objects\n"
+    "  ovrin settle                   settles the conflicts here; with --web in the browser\n"
+    "  ovrin settle --list            shows them, by the names of objects\n"
     "  ovrin settle --take ours       settles all that are open; or theirs, or base\n"
     "  ovrin settle --as-is FILE      you settled it in the editor: takes the file as it stands\n"
     "  ovrin settle --forget FILE     forgets that there were conflicts, and touches nothing\n";
@@ -85,9 +86,9 @@ Outcome Status(bool asJson) {
         for (const SceneCount& count : counts) text += TellCount(count) + '\n';
         PrintResult(counts.empty() ? "No scene has open conflicts.\n" : text);
         if (!counts.empty())
-            std::cerr
-                << "\"ovrin settle --list\" shows the conflicts, \"ovrin settle --take ours\" (or theirs, or "
-                   "base) settles what is open.\n";
+            std::cerr << "\"ovrin settle\" settles what is open, \"ovrin settle --web\" does so in the "
+                         "browser, and "
+                         "\"ovrin settle --take ours\" (or theirs, or base) without a look.\n";
     }
     return counts.empty() ? Outcome::Done : Outcome::LeftOpen;
 }
