@@ -134,6 +134,7 @@ ReviewSources SidesOfMerge(const std::string& revision, const std::vector<std::s
     const Git git(*repository);
     const MergeSides sides = FindSides(git, revision);
     std::vector<std::string> places;
+    places.reserve(paths.size());
     for (const std::string& path : paths) places.push_back(WorkingPath(*repository, path));
     ReviewSources sources;
     sources.isMerge = true;
