@@ -62,7 +62,7 @@ Diagnosis LookAtRest(const Check& check, Patient& patient) {
 /// The diagnosis after the fix, or the old one with the reason why it can't be fixed.
 Diagnosis Fixed(const Check& check, const Diagnosis& problem, Patient& patient) {
     try {
-        const Diagnosis still = LookAtRest(check, patient);
+        Diagnosis still = LookAtRest(check, patient);
         if (still.health != Health::Problem || !still.fix) return still;
         const std::string done = still.fix();
         patient.Forget();

@@ -28,7 +28,7 @@ public:
     nlohmann::json Of(SceneTree::Index node, std::span<const ConflictMark> conflicts, bool all) const;
 
 private:
-    nlohmann::json Head(SceneTree::Index node) const;
+    nlohmann::json Head(SceneTree::Index index) const;
     nlohmann::json Way(SceneTree::Index node, bool& isShortened) const;
     nlohmann::json Parts(SceneTree::Index node, bool& isShortened) const;
 

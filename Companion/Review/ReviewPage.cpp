@@ -115,7 +115,7 @@ PageAnswer ReviewPage::AnswerItems(const PageRequest& request) {
         const std::size_t behind = scene.known.firstItem + scene.known.open;
         if (behind <= from || from >= end) continue;
         const std::size_t count = std::min(end, behind) - from;
-        const PageAnswer answer =
+        PageAnswer answer =
             Ask(scene,
                 {"GET",
                  request.path,

@@ -38,7 +38,7 @@ public:
     nlohmann::json Hits(std::string_view text, PageRange range) const;
 
     /// One node, as Children gives it.
-    nlohmann::json NodeOf(Index node, bool touchedOnly) const;
+    nlohmann::json NodeOf(Index index, bool touchedOnly) const;
 
     static constexpr std::size_t kMostWay = 256;
 
