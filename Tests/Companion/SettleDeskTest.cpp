@@ -172,6 +172,19 @@ TEST_F(SettleDeskTest, ObjectThatIsKeptAloneIsAProblem) {
     EXPECT_EQ(Result(), texts.theirs);
 }
 
+TEST_F(SettleDeskTest, ListFollowsAllThatAreKeptOfItAtOnce) {
+    const auto scene = [](int range) {
+        return kHeader + Harbour(Child(10) + Child(40)) + Entity(10, "Lantern", 21, 0, range) +
+               Entity(40, "Buoy", 21, 0, range);
+    };
+    Merge({scene(1), scene(2), kHeader + Harbour(" []")});
+    EXPECT_EQ(Open().TakeAll(Side::Ours).settled, 2);
+    EXPECT_EQ(Result(), scene(2));
+    desk->Undo();
+    desk->TakeAll(Side::Theirs);
+    EXPECT_EQ(Result(), kHeader + Harbour(" []"));
+}
+
 /// A car with these of the components Engine, 500, and Wheel, 501, which needs an engine.
 std::string Car(const std::vector<int>& classes) {
     std::string list, components;
