@@ -169,6 +169,4 @@ class Sight:
     def check_errors(self):
         """Nothing was refused by the content security policy or failed, as the browser tells."""
         told = [entry["message"] for entry in self.driver.get_log("browser") if entry["level"] != "DEBUG"]
-        # Browsers ask every address for an icon, of their own accord and outside of the page's place.
-        told = [message for message in told if "/favicon.ico" not in message]
         assert not told, told

@@ -61,6 +61,7 @@ def test_twenty_conflicts_are_settled_by_mouse_and_by_keys(harbour_user, driver)
     with Page(user, *SETTLE) as page:
         sight = Sight(driver, page.address)
         assert sight.open_count() == "20 of 20 open"
+        assert not sight.driver.find_element("id", "problems").is_displayed()
         sight.click(".choice.take-ours")
         sight.wait_for_count("19 of 20 open")
         for number, key in enumerate("tbot"):

@@ -64,14 +64,17 @@ json TreePages::Hits(std::string_view text, PageRange range) const {
         if (m_Folded[i].find(wanted) != std::string::npos || nodes[i].id->Value() == text) found.push_back(i);
     json hits = json::array();
     for (const Index hit : Part(found, range)) {
-        json way = json::array();
+        json way = json::array(), names = json::array();
         for (const Index above : m_Tree.Way(hit)) {
             if (way.size() == kMostWay) break;
             way.push_back(Printable(nodes[above].id->Value()));
+            names.push_back(LabelOf(above));
         }
         const bool isShortened = way.size() == kMostWay;
-        hits.push_back(
-            {{"id", Printable(nodes[hit].id->Value())}, {"name", LabelOf(hit)}, {"way", std::move(way)}});
+        hits.push_back({{"id", Printable(nodes[hit].id->Value())},
+                        {"name", LabelOf(hit)},
+                        {"way", std::move(way)},
+                        {"names", std::move(names)}});
         if (isShortened) hits.back()["isShortened"] = true;
     }
     return {{"total", found.size()}, {"hits", std::move(hits)}};

@@ -33,8 +33,8 @@ public:
     nlohmann::json Children(std::optional<Index> parent, PageRange range, bool touchedOnly) const;
 
     /// Nodes whose name holds a text, whatever the case of its Latin letters, or whose id it is, in the order
-    /// of the tree: {"total", "hits": [{"id", "name", "way": [ids]}]}. What stands far down has the upper
-    /// kMostWay ids of its way, and "isShortened".
+    /// of the tree: {"total", "hits": [{"id", "name", "way": [ids], "names": [of the way]}]}. What stands far
+    /// down has the upper kMostWay of its way, and "isShortened".
     nlohmann::json Hits(std::string_view text, PageRange range) const;
 
     /// One node, as Children gives it.

@@ -1,7 +1,10 @@
 #include "Settle/Consequences.h"
 
+#include "Conflicts/Conflict.h"
 #include "Conflicts/Requirements.h"
 #include "Settle/StructureDecisions.h"
+
+#include <unordered_set>
 
 namespace ovrin {
 
@@ -28,6 +31,22 @@ std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
         structure.Remove(removed, without);
     }
     return structure.Take();
+}
+
+std::vector<OpenConflict> LoopsAbove(const MergeNames& names, std::span<const OpenConflict> open,
+                                     MergeNames::ID transform, Side side) {
+    const Hierarchy& places = names.In(VersionOf(side)).Places();
+    std::unordered_set<MergeNames::ID> above;
+    const auto fatherOf = [&](MergeNames::ID id) {
+        return LocalReference(places.Body(id).Field(ovrin_yaml::YAMLScalar::mFather));
+    };
+    for (MergeNames::ID id = fatherOf(transform); id && id != transform && above.insert(id).second;)
+        id = fatherOf(id);
+    std::vector<OpenConflict> found;
+    for (const OpenConflict& conflict : open)
+        if (conflict.kind == ConflictKind::ParentLoop && above.contains(conflict.path.front()))
+            found.push_back(conflict);
+    return found;
 }
 
 } // namespace ovrin

@@ -24,4 +24,9 @@ std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
                                    std::span<const OpenConflict> conflicts, Side side,
                                    bool wereSettled = false);
 
+/// Those of the `open` loops of parents that are about what an object stands below on a side: where the side
+/// is taken for the object, and for them, too, its way up is the side's, and the loop is ended.
+std::vector<OpenConflict> LoopsAbove(const MergeNames& names, std::span<const OpenConflict> open,
+                                     MergeNames::ID transform, Side side);
+
 } // namespace ovrin

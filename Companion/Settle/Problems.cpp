@@ -51,6 +51,7 @@ public:
 
     void AddBroken(const Breakage& broken) {
         if (IsOpen(broken.object) || IsOpen(broken.other) || IsOpenAt(broken.place)) return;
+        if (IsPlaceOpen(broken)) return;
         Problem problem{TextOf(broken), {}};
         const bool isGone =
             broken.kind == Breakage::Kind::Dangling || broken.kind == Breakage::Kind::LostParent;
@@ -93,6 +94,13 @@ private:
         });
     }
     bool IsOpenAt(const Path& place) const { return m_OpenFields.contains({place[0], place[2]}); }
+    /// Whether it is open what the child stands below that a list has or lacks.
+    bool IsPlaceOpen(const Breakage& broken) const {
+        const ID child = broken.kind == Breakage::Kind::NotListed       ? broken.object
+                         : broken.kind == Breakage::Kind::WronglyListed ? broken.other
+                                                                        : nullptr;
+        return child && m_OpenFields.contains({child, YAMLScalar::mFather});
+    }
 
     /// "removed by theirs".
     std::string HowGone(ID id) const {
@@ -214,11 +222,23 @@ private:
     void AddSides(Problem& problem, const Breakage& broken) {
         const Path path = DecidableAt(broken.place);
         if (path.empty()) return;
-        const std::string what = NameOf(path.front()) + (path.size() > 2 ? "'s " + PropertyAt(path) : "");
         for (const Side side : kSides)
             if (m_Names.Has(VersionOf(side), path.front()) && IsSound(side, broken, path))
-                problem.remedies.push_back(
-                    {"take " + what + " from " + SideName(side), {{DecisionPath(path), side}}});
+                problem.remedies.push_back({WordsOfSide(side, broken, path), {{DecisionPath(path), side}}});
+    }
+
+    /// The whole of what is taken is named, since other changes may go with it.
+    std::string WordsOfSide(Side side, const Breakage& broken, const Path& path) const {
+        const std::string name = NameOf(path.front()), from = std::string(" from ") + SideName(side);
+        if (path.size() <= 2) return "take " + name + from;
+        if (path[2] == YAMLScalar::mFather) return "leave " + name + " where " + SideName(side) + " has it";
+        if (path[2] != ChildrenKey() && path[2] != YAMLScalar::mComponent)
+            return "take " + name + "'s " + PropertyAt(path) + from;
+        const bool isWanted = broken.kind == Breakage::Kind::NotListed;
+        const ID listed = isWanted ? broken.object : broken.other;
+        const char* list = path[2] == ChildrenKey() ? "children" : "components";
+        return (isWanted ? "list " : "don't list ") + NameOf(listed) + " there: take all " + list + " of " +
+               name + from;
     }
 
     /// The longest beginning of a place at which the merge decides, or nothing.

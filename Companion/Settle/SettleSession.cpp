@@ -184,7 +184,8 @@ std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisio
             const std::optional<std::size_t> at = m_Conflicts.Find(PathOfDecision(decision.path));
             if (at) AddConsequences({m_Conflicts[*at]}, decision.side, !m_Conflicts.StateOf(*at).isOpen);
         }
-        const std::vector<std::string> unmatched = isPlain ? std::vector<std::string>() : MergeAgain();
+        std::vector<std::string> unmatched = isPlain ? std::vector<std::string>() : MergeAgain();
+        if (follow == Follow::Yes && unmatched.empty() && EndLoops(decisions)) unmatched = MergeAgain();
         const std::set<std::string_view> lost(unmatched.begin(), unmatched.end());
         std::vector<Decision> refused;
         for (const Decision& decision : decisions)
@@ -197,6 +198,25 @@ std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisio
         }
         return refused;
     });
+}
+
+/// A loop of parents ends where one side is taken for all that it has above each other there. Whoever decides
+/// about one object of it means that, unless the same step tells otherwise of the others.
+bool SettleSession::EndLoops(const std::vector<Decision>& decisions) {
+    const DecisionTable told(decisions);
+    const std::size_t before = m_Decisions.size();
+    const std::vector<OpenConflict> open = Open();
+    for (const Decision& decision : decisions) {
+        const std::optional<std::size_t> at = m_Conflicts.Find(PathOfDecision(decision.path));
+        if (!at || !m_Conflicts.StateOf(*at).isOpen || m_Conflicts[*at].kind != ConflictKind::ParentLoop)
+            continue;
+        std::vector<OpenConflict> above =
+            LoopsAbove(m_Names, open, m_Conflicts[*at].path.front(), decision.side);
+        std::erase_if(above, [&](const OpenConflict& one) { return told.Find(one.path).has_value(); });
+        for (const OpenConflict& one : above) m_Decisions.push_back({DecisionPath(one.path), decision.side});
+        AddConsequences(above, decision.side);
+    }
+    return m_Decisions.size() > before;
 }
 
 void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, Side side, bool wereSettled) {

@@ -104,6 +104,7 @@ public:
     const MergeNames& Names() const { return m_Names; }
 
 private:
+    bool EndLoops(const std::vector<Decision>& decisions);
     void AddConsequences(const std::vector<OpenConflict>& conflicts, Side side, bool wereSettled = false);
     void EndStep(std::size_t decisionsBefore);
     void Meet();

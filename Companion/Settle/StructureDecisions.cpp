@@ -125,10 +125,6 @@ void StructureDecisions::Remove(const std::vector<ID>& ids, Side without) {
     }
 }
 
-void StructureDecisions::TakeList(Side side, ID owner, const YAMLScalar* list, ID entry) {
-    DecideList(OtherThan(side), side, owner, list, entry);
-}
-
 /// The lists that name an object follow.
 void StructureDecisions::DecideEntries(ID top, Side without, Side wanted) {
     const Side keeper = OtherThan(without);
@@ -162,20 +158,23 @@ std::set<ID> StructureDecisions::Listed(Side side, ID owner, const YAMLScalar* l
     return ids;
 }
 
-/// The only entry of a list that the side added or removed; null where there are none or several.
-ID StructureDecisions::OnlyChange(Side side, ID owner, const YAMLScalar* list) {
-    const auto [found, isNew] = m_OnlyChanges.try_emplace({side, owner, list}, nullptr);
+/// The entries of a list that the side added or removed.
+const std::set<ID>& StructureDecisions::Changed(Side side, ID owner, const YAMLScalar* list) {
+    const auto [found, isNew] = m_Changed.try_emplace({side, owner, list});
     if (!isNew) return found->second;
     const std::set<ID> before = Listed(Side::Base, owner, list), after = Listed(side, owner, list);
-    std::vector<ID> changed;
-    std::ranges::set_symmetric_difference(before, after, std::back_inserter(changed));
-    if (changed.size() == 1) found->second = changed.front();
+    std::ranges::set_symmetric_difference(before, after, std::inserter(found->second, found->second.end()));
     return found->second;
 }
 
-/// Where `changer` changed this entry of a list and no other, the list becomes that of `wanted`.
+/// Where all entries of a list that `changer` changed are wanted otherwise, the list becomes that of
+/// `wanted`.
 void StructureDecisions::DecideList(Side changer, Side wanted, ID owner, const YAMLScalar* list, ID entry) {
-    if (OnlyChange(changer, owner, list) != entry) return;
+    const std::set<ID>& changed = Changed(changer, owner, list);
+    if (!changed.contains(entry)) return;
+    std::set<ID>& entries = m_WantedEntries[{changer, wanted, owner, list}];
+    entries.insert(entry);
+    if (entries.size() < changed.size()) return;
     // To take the change itself would drop what the other side changed there.
     if (wanted == changer && Listed(OtherThan(changer), owner, list) != Listed(Side::Base, owner, list))
         return;

@@ -22,8 +22,8 @@ namespace ovrin {
 /// components, what stands under it, and the entry in the list that names it. The trees and diffs of a merge
 /// say what that is, however it is merged.
 ///
-/// A list is left to the merge where the side whose change would be dropped changed other entries of it, too,
-/// or alone changed other fields of its owner.
+/// A list is left to the merge where the side whose change would be dropped changed entries of it that
+/// nothing was collected about, or alone changed other fields of its owner.
 class StructureDecisions {
 public:
     using ID = MergeNames::ID;
@@ -42,15 +42,16 @@ public:
     void Return(const std::vector<ID>& ids, Side without);
     /// For such objects the other way round: they go, with what stands under them.
     void Remove(const std::vector<ID>& ids, Side without);
-    /// The list of an object becomes the one of `side`, if the other side's change of it is this entry alone.
-    void TakeList(Side side, ID owner, const ovrin_yaml::YAMLScalar* list, ID entry);
 
     /// Whether the object is there in one of ours and theirs, and not in `without`, the other.
     bool IsWithout(ID id, Side without) const;
     /// The highest object of those that were removed or added with this one, which `without` lacks.
     ID TopOf(ID id, Side without);
     /// What was collected since the last call.
-    std::vector<Decision> Take() { return std::exchange(m_Decisions, {}); }
+    std::vector<Decision> Take() {
+        m_WantedEntries.clear();
+        return std::exchange(m_Decisions, {});
+    }
 
 private:
     ObjectBody Body(Side side, ID id) const;
@@ -59,7 +60,7 @@ private:
     bool WasInBase(ID id) const { return m_Names.Has(Version::Base, id); }
     void DecideWhole(const std::vector<ID>& ids, Side without, Side wanted);
     std::set<ID> Listed(Side side, ID owner, const ovrin_yaml::YAMLScalar* list) const;
-    ID OnlyChange(Side side, ID owner, const ovrin_yaml::YAMLScalar* list);
+    const std::set<ID>& Changed(Side side, ID owner, const ovrin_yaml::YAMLScalar* list);
     void DecideList(Side changer, Side wanted, ID owner, const ovrin_yaml::YAMLScalar* list, ID entry);
     void DecideEntries(ID top, Side without, Side wanted);
     void DecideBelow(ID top, Side without, Side wanted, bool alsoOthers);
@@ -74,7 +75,9 @@ private:
     std::array<std::unordered_map<ID, ID>, 3> m_Tops;
     std::array<std::unordered_map<ID, std::vector<ID>>, 3> m_Below;
     std::array<bool, 3> m_IsBelowKnown = {};
-    std::map<std::tuple<Side, ID, const ovrin_yaml::YAMLScalar*>, ID> m_OnlyChanges; // only looked into
+    // Only looked into.
+    std::map<std::tuple<Side, ID, const ovrin_yaml::YAMLScalar*>, std::set<ID>> m_Changed;
+    std::map<std::tuple<Side, Side, ID, const ovrin_yaml::YAMLScalar*>, std::set<ID>> m_WantedEntries;
     std::vector<Decision> m_Decisions;
 };
 

@@ -73,8 +73,11 @@ TEST_F(SceneViewTest, PagesAndSearchesTakeAStretch) {
     EXPECT_EQ(page["nodes"].size(), 2);
     EXPECT_EQ(page["nodes"][0]["name"], "Post 8");
     const json hits = viewed.view.Find("pOST 3", {0, 5});
-    EXPECT_EQ(hits["hits"], (json::array({{{"id", "30"}, {"name", "Post 3"}, {"way", json::array()}}})));
+    EXPECT_EQ(hits["hits"],
+              (json::array(
+                  {{{"id", "30"}, {"name", "Post 3"}, {"way", json::array()}, {"names", json::array()}}})));
     EXPECT_EQ(viewed.view.Find("31", {0, 5})["hits"][0]["way"], json{"30"});
+    EXPECT_EQ(viewed.view.Find("31", {0, 5})["hits"][0]["names"], json{"Post 3"});
     EXPECT_EQ(viewed.view.Find("transform", {0, 5})["total"], 9);
     EXPECT_EQ(viewed.view.Find("", {0, 5})["total"], 0);
     EXPECT_TRUE(viewed.view.Tree("77", {0, 5}, false).is_null());

@@ -172,6 +172,19 @@ TEST_F(SettleDeskTest, ObjectThatIsKeptAloneIsAProblem) {
     EXPECT_EQ(Result(), texts.theirs);
 }
 
+TEST_F(SettleDeskTest, ListFollowsAllThatAreKeptOfItAtOnce) {
+    const auto scene = [](int range) {
+        return kHeader + Harbour(Child(10) + Child(40)) + Entity(10, "Lantern", 21, 0, range) +
+               Entity(40, "Buoy", 21, 0, range);
+    };
+    Merge({scene(1), scene(2), kHeader + Harbour(" []")});
+    EXPECT_EQ(Open().TakeAll(Side::Ours).settled, 2);
+    EXPECT_EQ(Result(), scene(2));
+    desk->Undo();
+    desk->TakeAll(Side::Theirs);
+    EXPECT_EQ(Result(), kHeader + Harbour(" []"));
+}
+
 /// A car with these of the components Engine, 500, and Wheel, 501, which needs an engine.
 std::string Car(const std::vector<int>& classes) {
     std::string list, components;
@@ -230,10 +243,30 @@ TEST_F(SettleDeskTest, LoopThatNoConflictTellsIsAProblem) {
     EXPECT_TRUE(desk->Problems().empty());
 }
 
+/// Ours puts the boat below the pier, and theirs the pier below the boat.
+ThreeTexts BoatAndPier() {
+    return {kHeader + Entity(10, "Boat", 0) + Entity(40, "Pier", 0),
+            kHeader + Entity(10, "Boat", 41) + Entity(40, "Pier", 0, 0, 1, 1),
+            kHeader + Entity(10, "Boat", 0, 0, 1, 1) + Entity(40, "Pier", 11)};
+}
+
+TEST_F(SettleDeskTest, EitherSideOfEitherObjectEndsALoop) {
+    Merge(BoatAndPier());
+    EXPECT_TRUE(Open().Problems().empty()); // of the lists, before anything is decided
+    const auto& items = desk->Items();
+    for (std::size_t at = 0; at < items.size(); ++at)
+        for (const Side side : {Side::Ours, Side::Theirs}) {
+            if (items[at].about->kind != ConflictKind::ParentLoop) continue;
+            EXPECT_EQ(desk->Take(at, side).settled, 2) << at << SideName(side);
+            EXPECT_EQ(desk->Problems().size(), 0);
+            desk->Take(at, side == Side::Ours ? Side::Theirs : Side::Ours);
+            EXPECT_FALSE(items[at].isOpen);
+            EXPECT_TRUE(desk->Undo() && desk->Undo());
+        }
+}
+
 TEST_F(SettleDeskTest, ChoicesBetweenParentsAreNamed) {
-    Merge({kHeader + Entity(10, "Boat", 0) + Entity(40, "Pier", 0),
-           kHeader + Entity(10, "Boat", 41) + Entity(40, "Pier", 0, 0, 1, 1),
-           kHeader + Entity(10, "Boat", 0, 0, 1, 1) + Entity(40, "Pier", 11)});
+    Merge(BoatAndPier());
     const SettleDesk& opened = Open();
     const auto loop = std::ranges::find_if(opened.Items(), [](const SettleDesk::Item& item) {
         return item.about->kind == ConflictKind::ParentLoop && item.about->path.front()->Value() == "11";

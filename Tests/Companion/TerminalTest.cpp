@@ -165,6 +165,32 @@ TEST_F(TerminalTest, SeveralScenesAreOneListAndFinishedApartOnlyWhenAgreed) {
     EXPECT_EQ(screen->End()->finished, std::vector<std::string>{"A.ovrin"});
 }
 
+// Ours refers to the buoy, which theirs has removed.
+TEST_F(TerminalTest, ProblemsThatAreLeftAreFinishedOnlyWhenAgreed) {
+    Add("Pier.ovrin",
+        {kTwo[0],
+         kHeader + Object(10, "5", "Lantern") + "  m_Target: {fileID: 20}\n" + Object(20, "1", "Buoy"),
+         kTwo[2]});
+    Begin();
+    EXPECT_NE(After("of").find("1 problem is left in what is settled. Finish as it is?"), std::string::npos);
+    After("n");
+    EXPECT_FALSE(screen->End());
+    std::istringstream input("f\nn\nf\ny\n");
+    std::ostringstream output;
+    EXPECT_EQ(SettleByPrompts(*walk, letters, input, output).finished.size(), 1) << output.str();
+}
+
+TEST_F(TerminalTest, OnlyKeysThatMergeAreSteps) {
+    Add("Pier.ovrin", kTwo);
+    Begin();
+    for (const char key : std::string("otbOTBugrf1")) EXPECT_TRUE(screen->IsStep(KeyOf(key))) << key;
+    for (const char key : std::string("np?/wq")) EXPECT_FALSE(screen->IsStep(KeyOf(key))) << key;
+    screen->Press(KeyOf('w'));
+    EXPECT_TRUE(screen->IsStep(KeyOf('t')) && !screen->IsStep(KeyOf('n')));
+    EXPECT_NE(TextOf(screen->DrawWorking(Screen::kLeast)[Screen::kLeast.rows - 3]).find("Working"),
+              std::string::npos);
+}
+
 TEST_F(TerminalTest, FileThatWasChangedByHandIsReplacedOnlyWhenAgreed) {
     for (const char* answer : {"n", "y"}) {
         Add("Pier.ovrin", kTwo);

@@ -25,6 +25,11 @@ void Move(Walk& walk, Request request) {
 
 } // namespace
 
+bool MakesStep(Request request) {
+    return SideOf(request) || request == Request::Proposed || request == Request::Remedy ||
+           request == Request::Undo || request == Request::Redo;
+}
+
 void CarryOut(Walk& walk, Request request, Key key) {
     switch (request) {
     case Request::NextOpen:

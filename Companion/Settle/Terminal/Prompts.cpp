@@ -178,7 +178,7 @@ void Prompts::Search(const std::string& text) {
 }
 
 void Prompts::Finish() {
-    if (m_Walk.CountOpen() > 0) {
+    if (NeedsQuestion(m_Walk)) {
         const std::string question = QuestionToFinish(m_Walk);
         if (question.empty()) return m_Walk.Say(NothingToFinish(m_Walk));
         if (!IsAgreed(question)) return;

@@ -66,6 +66,23 @@ void Screen::Press(Key key) {
     }
 }
 
+bool Screen::IsStep(Key key) const {
+    switch (m_Mode) {
+    case Mode::AskingSide:
+        return SideOf(key).has_value();
+    case Mode::AskingToFinish:
+    case Mode::AskingToOverwrite:
+        return key == KeyOf('y');
+    case Mode::Walking: {
+        const auto request = RequestOf(key);
+        return request &&
+               (MakesStep(*request) || *request == Request::Finish || *request == Request::Confirm);
+    }
+    default:
+        return false;
+    }
+}
+
 void Screen::Answer(Request request, Key key) {
     switch (request) {
     case Request::Help:
@@ -154,7 +171,7 @@ void Screen::Help(Key key) {
 }
 
 void Screen::AskToFinish() {
-    if (m_Walk.CountOpen() == 0) return Finish(false);
+    if (!NeedsQuestion(m_Walk)) return Finish(false);
     if (QuestionToFinish(m_Walk).empty()) return m_Walk.Say(NothingToFinish(m_Walk));
     m_Mode = Mode::AskingToFinish;
 }
@@ -170,6 +187,7 @@ void Screen::Finish(bool overwrite) {
 }
 
 std::string Screen::Question() const {
+    if (m_IsWorking) return "Working…";
     switch (m_Mode) {
     case Mode::AskingSide:
         return QuestionForSide(m_Walk) + ", any other key: none";
@@ -241,6 +259,13 @@ std::vector<StyledLine> Screen::HelpScreen(Extent extent) {
     lines.push_back(
         {{m_Letters.Shown(isMore ? " ↑ and ↓ scroll, any other key goes back" : " Any key goes back"),
           Style::Key}});
+    return lines;
+}
+
+std::vector<StyledLine> Screen::DrawWorking(Extent extent) {
+    m_IsWorking = true;
+    std::vector<StyledLine> lines = Draw(extent);
+    m_IsWorking = false;
     return lines;
 }
 

@@ -25,6 +25,10 @@ public:
     /// Exactly the lines of a terminal of that size.
     std::vector<StyledLine> Draw(Extent extent);
     void Press(Key key);
+    /// Whether the key makes a step or finishes, for which scenes are merged.
+    bool IsStep(Key key) const;
+    /// The lines to be seen during a step that takes long.
+    std::vector<StyledLine> DrawWorking(Extent extent);
     /// What was reached, once there is nothing left to press.
     const std::optional<TerminalEnd>& End() const { return m_End; }
 
@@ -59,6 +63,7 @@ private:
     Walk& m_Walk;
     const Letters m_Letters;
     Mode m_Mode = Mode::Walking;
+    bool m_IsWorking = false;
     std::string m_Typed, m_Searched;
     std::size_t m_ListTop = 0, m_HelpTop = 0;
     ValuePanes::Scroll m_Scroll;

@@ -17,6 +17,15 @@ std::string Scenes(std::size_t count, const char* one, const char* many) {
            (count == 1 ? std::string(" scene ") + one : std::string(" scenes ") + many);
 }
 
+/// How many there are in what would be finished.
+std::size_t ProblemsOfSettled(const Walk& walk) {
+    const Sessions sessions = walk.Desk().Scenes();
+    return static_cast<std::size_t>(
+        std::ranges::count_if(walk.Desk().Problems(), [&](const SettleProblem& problem) {
+            return sessions[problem.scene]->IsSettled();
+        }));
+}
+
 } // namespace
 
 std::string CountLine(const Walk& walk) {
@@ -39,7 +48,9 @@ std::vector<StyledLine> ProblemLines(const Walk& walk, const Letters& letters) {
     std::vector<StyledLine> lines;
     std::size_t number = 0;
     for (const SettleProblem* problem : walk.ProblemsInOrder()) {
-        lines.push_back({{" ! ", Style::Warning}, {letters.Shown(problem->text)}});
+        const bool isHere = problem->scene == walk.Here().scene;
+        const std::string scene = isHere ? "" : walk.Desk().Scenes()[problem->scene]->Source().path + ": ";
+        lines.push_back({{" ! ", Style::Warning}, {letters.Shown(scene + problem->text)}});
         for (const SettleProblem::Remedy& remedy : problem->remedies)
             if (number++ < kMostNumbers)
                 lines.push_back(
@@ -65,12 +76,21 @@ std::string NothingToFinish(const Walk& walk) {
            " of this list are open: q leaves, and keeps what you decided";
 }
 
+bool NeedsQuestion(const Walk& walk) {
+    return walk.CountOpen() > 0 || ProblemsOfSettled(walk) > 0;
+}
+
 std::string QuestionToFinish(const Walk& walk) {
     const Sessions sessions = walk.Desk().Scenes();
     const auto settled = static_cast<std::size_t>(
         std::ranges::count_if(sessions, [](const auto& session) { return session->IsSettled(); }));
     if (settled == 0) return {};
-    return Scenes(settled, "is settled", "are settled") + ", " +
+    std::string question;
+    if (const std::size_t problems = ProblemsOfSettled(walk))
+        question = std::to_string(problems) + (problems == 1 ? " problem is left in what is settled. "
+                                                             : " problems are left in what is settled. ");
+    if (settled == sessions.size()) return question + "Finish as it is? y yes, n no";
+    return question + Scenes(settled, "is settled", "are settled") + ", " +
            Scenes(sessions.size() - settled, "is not", "are not") +
            ". Finish what is settled, and leave? What you decided of the rest is kept. y yes, n no";
 }

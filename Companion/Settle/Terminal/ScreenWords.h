@@ -20,7 +20,10 @@ std::vector<StyledLine> ProblemLines(const Walk& walk, const Letters& letters);
 std::string QuestionForSide(const Walk& walk);
 /// Why there is nothing to finish.
 std::string NothingToFinish(const Walk& walk);
-/// Whether to finish those scenes that are settled where others are not; empty if there are none.
+/// Whether to finish is a question: something is open, or problems are left in what is settled.
+bool NeedsQuestion(const Walk& walk);
+/// Whether to finish those scenes that are settled, with the problems that are left in them; empty if there
+/// are none.
 std::string QuestionToFinish(const Walk& walk);
 /// Whether to replace the files that these remarks are about.
 std::string QuestionToOverwrite(const Remarks& refused);

@@ -1,6 +1,7 @@
 # Writes the C++ source ${OUTPUT}, which holds the files ${FILES}: called with "cmake -P" by the build.
 set(types_html "text/html; charset=utf-8")
 set(types_css "text/css; charset=utf-8")
+set(types_svg "image/svg+xml")
 set(types_js "text/javascript; charset=utf-8")
 
 set(arrays "")

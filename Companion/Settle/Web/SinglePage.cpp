@@ -69,6 +69,7 @@ std::string SinglePage(std::span<const PageFile> files, std::string_view data) {
             R"(<meta charset="utf-8">
 <meta http-equiv="Content-Security-Policy" content="default-src 'none'; script-src 'nonce-)" +
                 number + "'; style-src 'nonce-" + number + R"('; base-uri 'none'; form-action 'none'">)");
+    Replace(page, "<link rel=\"icon\" href=\"icon.svg\">\n", "");
     Replace(page, R"(<link rel="stylesheet" href="style.css">)",
             "<style nonce=\"" + number + "\">\n" +
                 Inside(std::string(FileNamed(files, "style.css")), "style") + "</style>");

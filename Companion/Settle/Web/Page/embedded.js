@@ -29,7 +29,11 @@ export class EmbeddedSource {
     find(query) {
         const text = query.text.toLocaleLowerCase();
         const found = this.data.scenes[query.scene].tree.filter((node) => node.name.toLocaleLowerCase().includes(text));
-        const hits = found.map((node) => ({ id: node.id, name: node.name, way: this.wayTo(query.scene, node) }));
+        const nameOf = (id) => this.nodes[query.scene].get(id)?.name ?? id;
+        const hits = found.map((node) => {
+            const way = this.wayTo(query.scene, node);
+            return { id: node.id, name: node.name, way, names: way.map(nameOf) };
+        });
         return piece("hits", hits, query);
     }
 

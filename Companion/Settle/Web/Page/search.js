@@ -20,6 +20,12 @@ export function makeSearch(page, goTo) {
     return make("div", { class: "search" }, input, hits);
 }
 
+/** What a hit stands under, which tells it from others of its name. */
+function whereOf(hit) {
+    if (hit.names.length === 0) return "";
+    return make("span", { class: "aside" }, ` in ${hit.names.join("/")}${hit.isShortened ? "/…" : ""}`);
+}
+
 class Search {
     constructor(page, input, hits, goTo) {
         Object.assign(this, { page, input, hits, goTo, found: [], at: -1, timer: 0 });
@@ -43,13 +49,13 @@ class Search {
         this.found = answer.hits;
         this.at = answer.hits.length ? 0 : -1;
         const rest = answer.total - answer.hits.length;
-        this.show(answer.failure?.message ?? (answer.total === 0 ? "No object has such a name."
+        this.show(answer.failure?.message ?? (answer.total === 0 ? "No object of this scene has such a name."
             : rest > 0 ? `… and ${counted(rest, "more object")}: type more of the name.` : ""));
     }
 
     show(words) {
         const options = this.found.map((hit, index) => make("div",
-            { role: "option", id: `hit-${index}`, "data-at": index, "aria-selected": "false" }, hit.name));
+            { role: "option", id: `hit-${index}`, "data-at": index, "aria-selected": "false" }, hit.name, whereOf(hit)));
         this.hits.replaceChildren(...options, ...(words ? [make("p", { role: "status", class: "aside" }, words)] : []));
         this.hits.hidden = false;
         this.input.setAttribute("aria-expanded", "true");
