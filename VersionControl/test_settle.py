@@ -92,6 +92,13 @@ def test_decisions_of_a_merge_that_was_given_up_are_proposed_in_the_next(user):
         ("m_Layer", "open", "theirs"), ("m_Name", "open", None)]
 
 
+def test_scene_that_cant_be_read_is_listed_as_open(user):
+    user.conflict(*(text + "--- !o!114 &99\nBehaviour:\n  m_A: [1\n" for text in ONE_CONFLICT))
+    assert "No scene" not in user.ovrin("settle", "--list", status=LEFT_OPEN)
+    listed = json.loads(user.ovrin("settle", "--list", "--json", status=LEFT_OPEN))["scenes"][0]
+    assert "can't be read" in listed["problem"] and listed["conflicts"] == []
+
+
 def test_broken_file_of_earlier_decisions_is_told_once(user):
     user.conflict(*ONE_CONFLICT)
     user.write("ovrin decisions 1 what\n", ".git/ovrin/decisions")

@@ -59,8 +59,13 @@ Outcome List(const SettleScenes& scenes, bool asJson) {
         else
             text += TellCount(SceneCount::Of(*session)) + "\n\n" + TellConflicts(*session) + '\n';
     }
+    for (const SceneCount& scene : scenes.Unreadable()) {
+        all.push_back(ToJson(scene));
+        all.back()["conflicts"] = all.back()["problems"] = json::array();
+        isAnyOpen = true;
+    }
     if (asJson) text = json{{"scenes", all}}.dump(2, ' ', false, json::error_handler_t::replace) + "\n";
-    PrintResult(text.empty() ? "No scene has open conflicts.\n" : text);
+    PrintResult(text.empty() && !isAnyOpen ? "No scene has open conflicts.\n" : text);
     return isAnyOpen ? Outcome::LeftOpen : Outcome::Done;
 }
 
@@ -195,7 +200,7 @@ Outcome RunSettle(const SettleOptions& options) {
     const bool isAnyUnreadable = scenes.Open(unreadable) > 0;
     Tell(unreadable);
     if (options.isList) return List(scenes, options.asJson);
-    if (options.inBrowser) return SettleInBrowser(scenes, {options.port, !options.isBrowserLeft}, unreadable);
+    if (options.inBrowser) return SettleInBrowser(scenes, {options.port, !options.isBrowserLeft});
     const bool isForPerson =
         options.withPrompts || (IsPersonThere() && !options.Decides() && !options.overwrites);
     if (isForPerson && !scenes.Sessions().empty()) return LetPersonSettle(scenes, options, isAnyUnreadable);

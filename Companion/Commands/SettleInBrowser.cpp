@@ -13,18 +13,6 @@ namespace ovrin {
 
 namespace {
 
-std::vector<SettlePage::Unreadable> FindUnreadable(const SettleScenes& scenes, const Remarks& remarks) {
-    std::vector<SettlePage::Unreadable> unreadable;
-    for (const std::string& path : scenes.Paths()) {
-        const auto isOpened = [&](const auto& session) { return session->Source().path == path; };
-        if (std::ranges::any_of(scenes.Sessions(), isOpened)) continue;
-        const auto why = std::ranges::find_if(
-            remarks, [&](const std::string& remark) { return remark.starts_with(Printable(path)); });
-        unreadable.push_back({path, why == remarks.end() ? "" : *why});
-    }
-    return unreadable;
-}
-
 /// What became of the scenes, as the other ways to settle tell it.
 Outcome TellEnd(const SettleScenes& scenes, const SettlePage& page, bool isAnyUnreadable) {
     const std::vector<std::string>& finished = page.Finished();
@@ -44,8 +32,9 @@ Outcome TellEnd(const SettleScenes& scenes, const SettlePage& page, bool isAnyUn
 
 } // namespace
 
-Outcome SettleInBrowser(SettleScenes& scenes, const PageOptions& options, const Remarks& remarks) {
-    const std::vector<SettlePage::Unreadable> unreadable = FindUnreadable(scenes, remarks);
+Outcome SettleInBrowser(SettleScenes& scenes, const PageOptions& options) {
+    std::vector<SettlePage::Unreadable> unreadable;
+    for (const SceneCount& scene : scenes.Unreadable()) unreadable.push_back({scene.path, scene.problem});
     if (scenes.Sessions().empty()) {
         if (unreadable.empty()) std::cerr << "No scene has open conflicts.\n";
         return unreadable.empty() ? Outcome::Done : Outcome::LeftOpen;

@@ -6,8 +6,7 @@
 
 namespace ovrin {
 
-/// Lets the user settle scenes, which are open, on a page in the browser. `remarks` is what opening them came
-/// to. Throws Failure.
-Outcome SettleInBrowser(SettleScenes& scenes, const PageOptions& options, const Remarks& remarks);
+/// Lets the user settle scenes, which are open, on a page in the browser. Throws Failure.
+Outcome SettleInBrowser(SettleScenes& scenes, const PageOptions& options);
 
 } // namespace ovrin

@@ -32,6 +32,8 @@ struct Occasion {
 struct Decision {
     std::string path;
     Side side;
+
+    bool operator==(const Decision&) const = default;
 };
 
 /// A merge of a scene that needs a person: what it was made from, and how.
@@ -51,6 +53,8 @@ struct DecisionStep {
     std::size_t decisions; ///< how many
     /// Counted over all scenes that are settled together: steps of one number are one.
     std::uint64_t number;
+
+    bool operator==(const DecisionStep&) const = default;
 };
 
 /// How far a person has come with an open merge.

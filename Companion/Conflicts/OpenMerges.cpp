@@ -3,6 +3,7 @@
 #include "Descriptor.h"
 #include "Destination.h"
 #include "FileUtils.h"
+#include "Names/PrintableText.h"
 #include "Systems/Repository.h"
 #include "Words/Failure.h"
 
@@ -12,6 +13,7 @@
 #include <filesystem>
 #include <nlohmann/json.hpp>
 #include <random>
+#include <sys/file.h>
 #include <system_error>
 #include <unistd.h>
 
@@ -177,10 +179,14 @@ OpenMerges::Place OpenMerges::PlaceOf(const std::string& path) const {
     }
 }
 
-void OpenMerges::Add(OpenMerge& merge) {
+void OpenMerges::MakeFolder() const {
     std::error_code error;
     fs::create_directories(m_Folder, error);
     if (error) throw Failure("Cannot make the folder " + m_Folder + ": " + error.message());
+}
+
+void OpenMerges::Add(OpenMerge& merge) {
+    MakeFolder();
     merge.identity = NewIdentity();
     const auto parts = PartsOf(merge);
     // As safe as what version control writes of the merge itself, also in the place of an earlier one.
@@ -233,7 +239,25 @@ Progress OpenMerges::ProgressOf(const OpenMerge& merge) const {
     return progress;
 }
 
-void OpenMerges::SetProgress(const OpenMerge& merge, const Progress& progress) {
+bool OpenMerges::IsStill(const OpenMerge& merge, const Progress& known) const {
+    const Place place = PlaceOf(merge.path);
+    if (merge.identity.empty() || !place.isTaken) return merge.identity.empty() && !place.isTaken;
+    if (ReadMerge(place.file + kMergeExtension, Extent::WithoutTexts).identity != merge.identity)
+        return false;
+    const Progress progress = ProgressOf(merge);
+    return progress.decisions == known.decisions && progress.steps == known.steps;
+}
+
+void OpenMerges::SetProgress(OpenMerge& merge, const Progress& known, const Progress& progress) {
+    MakeFolder();
+    // Nobody comes between the look and the step. Where there are no locks, people are slow enough.
+    const Descriptor folder = OpenFile(m_Folder.c_str(), O_RDONLY | O_DIRECTORY);
+    if (folder.IsOpen()) Uninterrupted([&] { return flock(folder.Get(), LOCK_EX); });
+    if (!IsStill(merge, known))
+        throw Failure(Printable(merge.path) +
+                      " was settled elsewhere meanwhile, or its merge was ended or made again: nothing is "
+                      "decided here. End this, and run \"ovrin settle\" again");
+    if (merge.identity.empty()) Add(merge);
     json decisions = json::array();
     for (const Decision& decision : progress.decisions)
         decisions.push_back({{"path", decision.path}, {"side", SideName(decision.side)}});

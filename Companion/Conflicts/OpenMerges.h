@@ -17,8 +17,8 @@ struct Repository;
 ///     NUMBER.progress   JSON; of an earlier merge, and nothing, unless the identity is the merge's
 ///
 /// The number comes from the path. Each file is replaced as a whole, so that any number of processes may work
-/// here, each on its own scenes. All functions throw Failure for what the system refuses and for files that
-/// can't be made out.
+/// here; of two that decide in one scene the second is refused. All functions throw Failure for what the
+/// system refuses and for files that can't be made out.
 class OpenMerges {
 public:
     explicit OpenMerges(const Repository& repository);
@@ -33,7 +33,12 @@ public:
     bool Has(const std::string& path) const { return PlaceOf(path).isTaken; }
     /// How far it has come: nothing settled if nothing is known.
     Progress ProgressOf(const OpenMerge& merge) const;
-    void SetProgress(const OpenMerge& merge, const Progress& progress);
+    /// Whether nobody has made the merge again, ended it or decided in it since its progress was `known`. One
+    /// that has no identity wasn't written down.
+    bool IsStill(const OpenMerge& merge, const Progress& known) const;
+    /// Writes down how far it has come, and the merge itself if it has no identity yet. Throws Failure, and
+    /// writes nothing, unless all IsStill.
+    void SetProgress(OpenMerge& merge, const Progress& known, const Progress& progress);
     /// Forgets the one of a scene, if there is one.
     void Remove(const std::string& path);
 
@@ -43,6 +48,7 @@ private:
         bool isTaken;     ///< by the scene
     };
     Place PlaceOf(const std::string& path) const;
+    void MakeFolder() const;
 
     std::string m_Folder;
 };

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <nlohmann/json.hpp>
+#include <numeric>
 
 namespace ovrin {
 
@@ -52,8 +53,8 @@ struct Square {
 
 json BundleJson(const Square& square) {
     const MapBox& box = *square.box;
-    return {{"x", box.x0 + (box.x1 - box.x0) / 2},
-            {"y", box.y0 + (box.y1 - box.y0) / 2},
+    return {{"x", std::midpoint(box.x0, box.x1)},
+            {"y", std::midpoint(box.y0, box.y1)},
             {"count", square.count},
             {"changed", square.changed},
             {"open", square.open},

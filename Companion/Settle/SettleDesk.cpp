@@ -66,6 +66,36 @@ bool SettleDesk::IsSettled() const {
     return std::ranges::all_of(Scenes(), [](const auto& session) { return session->IsSettled(); });
 }
 
+std::vector<std::uint64_t> SettleDesk::LastSteps() const {
+    std::vector<std::uint64_t> steps;
+    for (const auto& session : Scenes()) steps.push_back(session->LastStep());
+    return steps;
+}
+
+/// Writes down the scenes that were at other steps.
+void SettleDesk::KeepFrom(const std::vector<std::uint64_t>& lastSteps) {
+    for (std::size_t scene = 0; scene < Scenes().size(); ++scene)
+        if (Scenes()[scene]->LastStep() != lastSteps[scene]) m_Scenes.Keep(*Scenes()[scene]);
+}
+
+/// Brings all scenes back to these steps after a failure, which is told anyway: also those that were written
+/// down before the one that failed.
+void SettleDesk::ReturnTo(const std::vector<std::uint64_t>& lastSteps) {
+    for (std::size_t scene = 0; scene < Scenes().size(); ++scene) {
+        SettleSession& session = *Scenes()[scene];
+        if (session.LastStep() == lastSteps[scene]) continue;
+        try {
+            while (session.LastStep() > lastSteps[scene] && session.Undo()) {
+            }
+            while (session.LastStep() < lastSteps[scene] && session.Redo()) {
+            }
+            m_Scenes.Keep(session);
+        } catch (const Failure&) {
+        }
+    }
+    Refresh();
+}
+
 /// Makes a step in any scenes, and keeps it; if that fails anywhere it is taken back everywhere.
 template <class Make> SettleDesk::Step SettleDesk::MakeStep(const Make& make) {
     const auto decisions = [&] {
@@ -74,18 +104,15 @@ template <class Make> SettleDesk::Step SettleDesk::MakeStep(const Make& make) {
         return count;
     };
     const std::size_t openBefore = m_Open, decisionsBefore = decisions();
-    std::vector<std::uint64_t> lastSteps;
-    for (const auto& session : Scenes()) lastSteps.push_back(session->LastStep());
+    const std::vector<std::uint64_t> lastSteps = LastSteps();
     BeginStep(Scenes());
     std::size_t asked = 0;
     try {
         asked = make();
-        for (std::size_t scene = 0; scene < Scenes().size(); ++scene)
-            if (Scenes()[scene]->LastStep() != lastSteps[scene]) m_Scenes.Keep(*Scenes()[scene]);
+        KeepFrom(lastSteps);
     } catch (...) {
-        for (std::size_t scene = 0; scene < Scenes().size(); ++scene)
-            while (Scenes()[scene]->LastStep() != lastSteps[scene]) Scenes()[scene]->Undo();
-        Refresh();
+        ReturnTo(lastSteps);
+        for (const auto& session : Scenes()) session->ForgetUndone();
         throw;
     }
     Refresh();
@@ -141,18 +168,25 @@ SettleDesk::Step SettleDesk::Mend(const SettleProblem& problem, const SettleProb
     });
 }
 
-bool SettleDesk::Undo() {
-    if (!UndoStep(Scenes())) return false;
-    for (const auto& session : Scenes()) m_Scenes.Keep(*session);
+bool SettleDesk::GoBack(bool (*step)(Sessions)) {
+    const std::vector<std::uint64_t> lastSteps = LastSteps();
+    try {
+        if (!step(Scenes())) return false;
+        KeepFrom(lastSteps);
+    } catch (...) {
+        ReturnTo(lastSteps);
+        throw;
+    }
     Refresh();
     return true;
 }
 
+bool SettleDesk::Undo() {
+    return GoBack(UndoStep);
+}
+
 bool SettleDesk::Redo() {
-    if (!RedoStep(Scenes())) return false;
-    for (const auto& session : Scenes()) m_Scenes.Keep(*session);
-    Refresh();
-    return true;
+    return GoBack(RedoStep);
 }
 
 std::vector<std::string> SettleDesk::Finish(bool overwrite, Remarks& remarks) {

@@ -5,6 +5,7 @@
 #include "Settle/Wanted.h"
 
 #include <cstddef>
+#include <cstdint>
 #include <memory>
 #include <optional>
 #include <span>
@@ -84,6 +85,10 @@ public:
 
 private:
     template <class Make> Step MakeStep(const Make& make);
+    std::vector<std::uint64_t> LastSteps() const;
+    void KeepFrom(const std::vector<std::uint64_t>& lastSteps);
+    void ReturnTo(const std::vector<std::uint64_t>& lastSteps);
+    bool GoBack(bool (*step)(Sessions));
     void Refresh();
 
     SettleScenes& m_Scenes;

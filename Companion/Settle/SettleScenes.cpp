@@ -65,6 +65,11 @@ std::string TellLink(const std::string& path) {
                              "link away, and run \"ovrin settle --overwrite\"";
 }
 
+std::string TellOver(const std::string& path) {
+    return Printable(path) + " stays as it is: since it was read here its merge was ended or made again, or "
+                             "somebody else settled it. Run \"ovrin settle\" again";
+}
+
 std::string TellByHand(const std::string& path) {
     return Printable(path) + " was changed by hand since it was merged, and stays as it is: \"ovrin settle "
                              "--as-is\" takes the file "
@@ -188,6 +193,7 @@ std::unique_ptr<SettleSession> SettleScenes::Load(IndexMerges& index, const std:
         remarks.push_back(Printable(path) + " was merged again without ovrin: earlier decisions don't count, "
                                             "and are proposed where the same three values meet again");
         Remember(path, remarks);
+        m_Store.Remove(path);
         merge.reset();
     }
     if (merge) {
@@ -202,17 +208,16 @@ std::unique_ptr<SettleSession> SettleScenes::Load(IndexMerges& index, const std:
 
 std::size_t SettleScenes::Open(Remarks& remarks) {
     IndexMerges index(m_Repository);
-    std::size_t failed = 0;
     for (const std::string& path : Paths()) {
         try {
             m_Sessions.push_back(Load(index, path, remarks));
         } catch (const Failure& failure) {
             remarks.push_back(Printable(path) + " can't be settled by objects: " + failure.what() +
                               "; once you have settled it in another way: \"ovrin settle --as-is\"");
-            ++failed;
+            m_Unreadable.push_back({.path = path, .problem = remarks.back()});
         }
     }
-    return failed;
+    return m_Unreadable.size();
 }
 
 bool SettleScenes::Holds(const std::string& path, const std::string& file, const std::string& bytes) const {
@@ -230,11 +235,37 @@ bool SettleScenes::IsUntouched(SettleSession& session, const std::string& result
            Holds(merge.path, *file, merge.texts.ours);
 }
 
+/// The paths of what is open in the working tree, without sessions that are no longer as they were read.
+std::set<std::string> SettleScenes::PathsStillOpen(const std::vector<SettleSession*>& sessions) const {
+    if (sessions.empty()) return {};
+    const LiveMerges now = LookAtMerges(m_Repository, m_Store);
+    IndexMerges index(m_Repository);
+    std::set<std::string> open(now.unrecorded.begin(), now.unrecorded.end());
+    for (const OpenMerge& merge : now.live) open.insert(merge.path);
+    for (const SettleSession* session : sessions)
+        if (session->IsKeptElsewhere(m_Store) || !index.Confirm(session->Source()))
+            open.erase(session->Source().path);
+    return open;
+}
+
+std::vector<SettleSession*> SettleScenes::ToFinish() const {
+    std::vector<SettleSession*> sessions;
+    for (const auto& session : m_Sessions)
+        if (session->IsSettled() && !m_Finished.contains(session->Source().path))
+            sessions.push_back(session.get());
+    return sessions;
+}
+
 std::vector<std::string> SettleScenes::Finish(bool overwrite, Remarks& remarks) {
+    const std::vector<SettleSession*> sessions = ToFinish();
+    const std::set<std::string> open = PathsStillOpen(sessions);
     std::vector<std::string> finished;
-    for (const auto& session : m_Sessions) {
+    for (SettleSession* session : sessions) {
         const std::string& path = session->Source().path;
-        if (!session->IsSettled() || m_Finished.contains(path)) continue;
+        if (!open.contains(path)) {
+            remarks.push_back(TellOver(path));
+            continue;
+        }
         const std::string result = session->Result();
         if (IsBehindLink(FileOf(path))) {
             remarks.push_back(TellLink(path));

@@ -40,13 +40,18 @@ public:
     /// Reads and merges all that is left, each with its decisions. What can't be is told in `remarks`, stays
     /// out of Sessions, and is counted.
     std::size_t Open(Remarks& remarks);
+    /// What couldn't be read, and why, as it was told.
+    const std::vector<SceneCount>& Unreadable() const { return m_Unreadable; }
     const std::vector<std::unique_ptr<SettleSession>>& Sessions() const { return m_Sessions; }
 
-    /// Writes the decisions of a session down.
-    void Keep(SettleSession& session) { session.Keep(m_Store); }
+    /// Writes the decisions of a session down, unless it is finished.
+    void Keep(SettleSession& session) {
+        if (!m_Finished.contains(session.Source().path)) session.Keep(m_Store);
+    }
     /// Finishes the sessions in which nothing is open: each result becomes its scene's file, version control
     /// is told that it is merged, what was decided is kept for proposals, and the record goes. A file that
-    /// somebody changed since the merge is replaced only if `overwrite`. Returns the paths of those that are
+    /// somebody changed since the merge is replaced only if `overwrite`, and none whose merge was ended, made
+    /// again or settled elsewhere since it was read. Returns the paths of those that are
     /// finished; `remarks` tells of the others. Until the record goes, doing it again completes what was
     /// interrupted.
     std::vector<std::string> Finish(bool overwrite, Remarks& remarks);
@@ -64,6 +69,8 @@ private:
     void Remember(const std::string& path, Remarks& remarks);
     void RememberDecided(const std::vector<std::string>& paths, Remarks& remarks);
     bool IsRecorded(const std::string& path) const;
+    std::vector<SettleSession*> ToFinish() const;
+    std::set<std::string> PathsStillOpen(const std::vector<SettleSession*>& sessions) const;
     std::string FileOf(const std::string& path) const { return m_Repository.top + "/" + path; }
     bool IsUntouched(SettleSession& session, const std::string& result) const;
     bool Holds(const std::string& path, const std::string& file, const std::string& bytes) const;
@@ -73,6 +80,7 @@ private:
     EarlierDecisions m_Earlier;
     LiveMerges m_Live;
     std::vector<std::unique_ptr<SettleSession>> m_Sessions;
+    std::vector<SceneCount> m_Unreadable;
     std::set<std::string> m_Finished; // paths; their files are nobody's business any more
 };
 

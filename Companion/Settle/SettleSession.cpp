@@ -1,7 +1,6 @@
 #include "Settle/SettleSession.h"
 
 #include "Conflicts/DecisionPath.h"
-#include "Conflicts/OpenMerges.h"
 #include "Settle/Consequences.h"
 #include "Settle/DecisionTable.h"
 #include "Settle/PlainValues.h"
@@ -36,8 +35,8 @@ bool IsCovered(Path path, const DecisionTable& decided) {
 } // namespace
 
 SettleSession::SettleSession(OpenMerge merge, Progress progress)
-    : m_Source(std::move(merge)), m_Merge(SceneMergeOf(m_Source)), m_Names(m_Merge.Session()),
-      m_Decisions(std::move(progress.decisions)), m_Steps(std::move(progress.steps)),
+    : m_Source(std::move(merge)), m_Kept(std::move(progress)), m_Merge(SceneMergeOf(m_Source)),
+      m_Names(m_Merge.Session()), m_Decisions(m_Kept.decisions), m_Steps(m_Kept.steps),
       m_Places(MergedOnce(m_Merge, m_Source.take), m_Names) {
     Meet();
     if (m_Source.identity.empty()) m_Source.conflicts = Open().size();
@@ -293,8 +292,9 @@ bool SettleSession::Redo() {
 }
 
 void SettleSession::Keep(OpenMerges& store) {
-    if (m_Source.identity.empty()) store.Add(m_Source);
-    store.SetProgress(m_Source, {m_Decisions, Open().size(), m_Steps});
+    Progress progress{m_Decisions, Open().size(), m_Steps};
+    store.SetProgress(m_Source, m_Kept, progress);
+    m_Kept = std::move(progress);
 }
 
 std::string SettleSession::InMerged(const std::function<std::string()>& make) {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Conflicts/OpenMerge.h"
+#include "Conflicts/OpenMerges.h"
 #include "Conflicts/SceneMerge.h"
 #include "Names/MergeNames.h"
 #include "Names/RecordPlace.h"
@@ -19,15 +20,13 @@
 
 namespace ovrin {
 
-class OpenMerges;
-
 /// A scene's open merge while a person settles it: the three texts, all conflicts that were met, the
 /// decisions so far, and what follows from them. It is what every way to settle is built on, and keeps
 /// nothing on the disk by itself:
 ///
 ///     SettleSession session(merge, store.ProgressOf(merge));
 ///     session.Decide({{"734813.MonoBehaviour.m_Brightness", Side::Theirs}});
-///     store.SetProgress(session.Source(), session.GetProgress());
+///     session.Keep(store);
 ///
 /// After each step the scene is merged again (Settle/MergedScene.h), unless nothing can follow from its
 /// decisions (Settle/PlainValues.h); it is read and compared once. A later decision counts more than an
@@ -85,8 +84,12 @@ public:
     /// Adds what is decided of conflicts here. Returns of how many.
     std::size_t TellDecided(EarlierDecisions& earlier) const;
 
-    /// Writes the decisions down, and the merge itself if nobody has.
+    /// Writes the decisions down, and the merge itself if nobody has. Throws Failure where it
+    /// IsKeptElsewhere.
     void Keep(OpenMerges& store);
+    /// Whether another process made the merge again, ended it or decided in it since the decisions were read
+    /// or written down here.
+    bool IsKeptElsewhere(const OpenMerges& store) const { return !store.IsStill(m_Source, m_Kept); }
 
     /// Whether an object is in the result as Merge() has it: every decision so far is about one value of
     /// another object, and changes nothing else. False where only a merge could tell.
@@ -117,6 +120,7 @@ private:
     template <class Step> auto OrBack(const Step& step);
 
     OpenMerge m_Source;
+    Progress m_Kept; // as it is written down
     SceneMerge m_Merge;
     MergeNames m_Names;
     std::vector<Decision> m_Decisions;

@@ -55,14 +55,28 @@ TEST_F(OpenMergesTest, AreListedByPathAndForgotten) {
 }
 
 TEST_F(OpenMergesTest, DecisionsBelongToTheirMergeAlone) {
-    const OpenMerge first = Added("a.ovrin");
-    merges().SetProgress(first, {{{"1.Thing.x", Side::Theirs}}, 2, {{1, 7}}});
+    OpenMerge first = Added("a.ovrin");
+    merges().SetProgress(first, {}, {{{"1.Thing.x", Side::Theirs}}, 2, {{1, 7}}});
     EXPECT_EQ(merges().ProgressOf(first).decisions.at(0).side, Side::Theirs);
     EXPECT_EQ(merges().ProgressOf(first).open, 2);
     EXPECT_EQ(merges().ProgressOf(first).steps.at(0).number, 7);
     const OpenMerge second = Added("a.ovrin");
     EXPECT_TRUE(merges().ProgressOf(second).decisions.empty());
     EXPECT_EQ(merges().ProgressOf(second).open, 3);
+}
+
+TEST_F(OpenMergesTest, SecondOfTwoWhoDecideIsRefused) {
+    OpenMerge merge = Added("a.ovrin"), unwritten = merge;
+    unwritten.identity.clear();
+    const Progress first{{{"1.Thing.x", Side::Theirs}}, 2, {{1, 1}}};
+    merges().SetProgress(merge, {}, first);
+    EXPECT_THROW(merges().SetProgress(merge, {}, {{{"1.Thing.y", Side::Ours}}, 2, {{1, 1}}}), Failure);
+    EXPECT_THROW(merges().SetProgress(unwritten, {}, {}), Failure);
+    EXPECT_EQ(merges().ProgressOf(merge).decisions, first.decisions);
+    Added("a.ovrin"); // merged again
+    EXPECT_THROW(merges().SetProgress(merge, first, first), Failure);
+    merges().Remove("a.ovrin");
+    EXPECT_THROW(merges().SetProgress(merge, first, first), Failure);
 }
 
 TEST_F(OpenMergesTest, WhatIsBrokenIsToldAndNotTakenForNothing) {
@@ -117,8 +131,8 @@ TEST_F(OpenMergesTest, ChangedRecordIsAMergeOrAFailure) {
 }
 
 TEST_F(OpenMergesTest, ProgressThatCantBeReadIsToldWithItsCure) {
-    const OpenMerge merge = Added("a.ovrin");
-    merges().SetProgress(merge, {{{"1.Thing.x", Side::Theirs}, {"1.Thing.y", Side::Ours}}, 1, {{2, 7}}});
+    OpenMerge merge = Added("a.ovrin");
+    merges().SetProgress(merge, {}, {{{"1.Thing.x", Side::Theirs}, {"1.Thing.y", Side::Ours}}, 1, {{2, 7}}});
     const std::filesystem::path file = OnlyFile(data, ".progress");
     const std::string whole = program::ReadFile(file);
     const auto without = [&](const std::string& what, const std::string& with) {

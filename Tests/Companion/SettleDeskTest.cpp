@@ -1,5 +1,6 @@
 #include "Settle/SettleDesk.h"
 
+#include "Support/Program.h"
 #include "Systems/Process.h"
 #include "Words/Failure.h"
 
@@ -115,6 +116,34 @@ TEST_F(SettleDeskTest, WhatWasDecidedIsProposedInAnotherMergeOfTheSame) {
     EXPECT_EQ(desk->TakeProposed().settled, 1);
     EXPECT_EQ(desk->CountProposed(), 0);
     EXPECT_EQ(Result(), Ranges(3, 0, 0).base);
+}
+
+TEST_F(SettleDeskTest, SceneIsSettledInOnePlaceAtATime) {
+    Merge(Ranges(1, 2, 3));
+    Merge(Ranges(1, 2, 3), "b.ovrin");
+    Open();
+    SettleScenes others(remarks);
+    others.Open(remarks);
+    SettleDesk(others).Take(1, Side::Theirs);
+    EXPECT_THROW(desk->TakeAll(Side::Ours), Failure);
+    EXPECT_EQ(desk->CountOpen(), 2);
+    EXPECT_EQ(Open().CountOpen(), 1); // of the step that was refused nothing is left
+    EXPECT_EQ(desk->Items()[1].decided, Side::Theirs);
+    desk->Take(1, Side::Ours);
+    EXPECT_THROW(SettleDesk(others).Undo(), Failure);
+    EXPECT_TRUE(others.Sessions()[1]->IsSettled());
+}
+
+TEST_F(SettleDeskTest, SceneWhoseMergeIsOverIsNotFinished) {
+    Merge(Ranges(1, 2, 3));
+    Open().Take(0, Side::Theirs);
+    OutputOf({"git", "update-index", "--force-remove", "a.ovrin"}); // the merge is given up
+    EXPECT_TRUE(desk->Finish(true, remarks).empty());
+    ASSERT_EQ(remarks.size(), 1);
+    EXPECT_NE(remarks[0].find("ended or made again"), std::string::npos) << remarks[0];
+    EXPECT_EQ(program::ReadFile("a.ovrin"), Ranges(2, 0, 0).base);
+    Merge(Ranges(1, 2, 4)); // and made again, of other texts
+    EXPECT_TRUE(desk->Finish(true, remarks).empty());
 }
 
 TEST_F(SettleDeskTest, DecisionsOfAMergeThatWasMadeAgainAreProposedAndNotMade) {

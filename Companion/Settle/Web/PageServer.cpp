@@ -23,6 +23,8 @@ using AnswerPage = std::function<PageAnswer(const PageRequest&)>;
 
 /// What a page that is loaded anew has to come back.
 constexpr std::chrono::seconds kTimeWithoutPage{10};
+/// Bytes of an answer; the frame has more around it.
+constexpr std::size_t kMostAnswer = kMostAnswerFrame - 4096;
 /// How often a browser that was started is looked after.
 constexpr std::chrono::milliseconds kBrowserStep{500};
 
@@ -34,7 +36,11 @@ PageRequest RequestOf(const WebFrame& frame) {
 
 PageAnswer AnswerSafely(const AnswerPage& answer, const PageRequest& request) {
     try {
-        return answer(request);
+        const PageAnswer given = answer(request);
+        // The program that serves the page takes no longer ones, and would end with it.
+        if (given.body.size() > kMostAnswer)
+            return PageError(507, "The scene has texts here that are too long for a page");
+        return given;
     } catch (const Failure& failure) {
         return PageError(400, failure.what());
     } catch (const std::exception& error) {
