@@ -10,12 +10,13 @@ namespace ovrin {
 
 std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
                                    std::span<const OpenConflict> open,
-                                   std::span<const OpenConflict> conflicts, Side side, bool wereSettled) {
+                                   std::span<const OpenConflict> conflicts, TakenSide taken) {
+    const Side side = taken.side;
     StructureDecisions structure(merge, names, open);
     for (const OpenConflict& conflict : conflicts)
         if (conflict.kind == ConflictKind::ParentLoop)
-            wereSettled ? structure.EndLoopAgain(conflict.path.front(), side)
-                        : structure.EndLoop(conflict.path.front(), side);
+            taken.wereSettled ? structure.EndLoopAgain(conflict.path.front(), side)
+                              : structure.EndLoop(conflict.path.front(), side);
     for (const Side without : {Side::Ours, Side::Theirs}) {
         std::vector<MergeNames::ID> kept, given, removed;
         for (const OpenConflict& conflict : conflicts) {
@@ -27,7 +28,7 @@ std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
                 if (structure.IsWithout(needing, without)) removed.push_back(needing);
         }
         structure.Keep(kept, without);
-        if (wereSettled) structure.Return(given, without);
+        if (taken.wereSettled) structure.Return(given, without);
         structure.Remove(removed, without);
     }
     return structure.Take();

@@ -9,6 +9,12 @@
 
 namespace ovrin {
 
+/// A side that is taken for conflicts.
+struct TakenSide {
+    Side side;
+    bool wereSettled = false; ///< the conflicts, in another way
+};
+
 /// What follows when `side` is taken for these conflicts: decisions without which the scene would lack what
 /// it refers to, or the other way round.
 ///
@@ -21,8 +27,7 @@ namespace ovrin {
 /// What is among `open` is left to its own decision; Settle/StructureDecisions.h tells the limits.
 std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
                                    std::span<const OpenConflict> open,
-                                   std::span<const OpenConflict> conflicts, Side side,
-                                   bool wereSettled = false);
+                                   std::span<const OpenConflict> conflicts, TakenSide taken);
 
 /// Those of the `open` loops of parents that are about what an object stands below on a side: where the side
 /// is taken for the object, and for them, too, its way up is the side's, and the loop is ended.

@@ -181,7 +181,7 @@ std::vector<Decision> SettleSession::Decide(const std::vector<Decision>& decisio
             m_Decisions.push_back(decision);
             if (follow == Follow::No || isPlain) continue;
             const std::optional<std::size_t> at = m_Conflicts.Find(PathOfDecision(decision.path));
-            if (at) AddConsequences({m_Conflicts[*at]}, decision.side, !m_Conflicts.StateOf(*at).isOpen);
+            if (at) AddConsequences({m_Conflicts[*at]}, {decision.side, !m_Conflicts.StateOf(*at).isOpen});
         }
         std::vector<std::string> unmatched = isPlain ? std::vector<std::string>() : MergeAgain();
         if (follow == Follow::Yes && unmatched.empty() && EndLoops(decisions)) unmatched = MergeAgain();
@@ -213,13 +213,13 @@ bool SettleSession::EndLoops(const std::vector<Decision>& decisions) {
             LoopsAbove(m_Names, open, m_Conflicts[*at].path.front(), decision.side);
         std::erase_if(above, [&](const OpenConflict& one) { return told.Find(one.path).has_value(); });
         for (const OpenConflict& one : above) m_Decisions.push_back({DecisionPath(one.path), decision.side});
-        AddConsequences(above, decision.side);
+        AddConsequences(above, {decision.side});
     }
     return m_Decisions.size() > before;
 }
 
-void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, Side side, bool wereSettled) {
-    const std::vector<Decision> more = Consequences(m_Merge, m_Names, Open(), conflicts, side, wereSettled);
+void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, TakenSide taken) {
+    const std::vector<Decision> more = Consequences(m_Merge, m_Names, Open(), conflicts, taken);
     m_Decisions.insert(m_Decisions.end(), more.begin(), more.end());
 }
 
@@ -254,7 +254,7 @@ std::size_t SettleSession::TakeEach(const std::function<std::optional<Side>(cons
             }
             if (round.empty()) break;
             if (DecidePlainly(std::span(m_Decisions).subspan(decided))) continue;
-            for (const auto& [side, conflicts] : round) AddConsequences(conflicts, side);
+            for (const auto& [side, conflicts] : round) AddConsequences(conflicts, {side});
             MergeAgain();
         }
         EndStep(before);

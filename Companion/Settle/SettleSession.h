@@ -108,7 +108,7 @@ public:
 
 private:
     bool EndLoops(const std::vector<Decision>& decisions);
-    void AddConsequences(const std::vector<OpenConflict>& conflicts, Side side, bool wereSettled = false);
+    void AddConsequences(const std::vector<OpenConflict>& conflicts, TakenSide taken);
     void EndStep(std::size_t decisionsBefore);
     void Meet();
     std::size_t TakeEach(const std::function<std::optional<Side>(const MetConflict&)>& choose);

@@ -27,6 +27,7 @@ constexpr std::size_t kMostItems = 1000;
 
 /// Makes one visitor of functions for the kinds of a variant.
 template <class... Functions> struct Overloaded : Functions... { using Functions::operator()...; };
+template <class... Functions> Overloaded(Functions...) -> Overloaded<Functions...>;
 
 std::vector<std::string> AllPrintable(const std::vector<std::string>& texts) {
     std::vector<std::string> printable;
