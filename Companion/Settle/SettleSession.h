@@ -5,6 +5,7 @@
 #include "Conflicts/SceneMerge.h"
 #include "Names/MergeNames.h"
 #include "Names/RecordPlace.h"
+#include "Settle/Consequences.h"
 #include "Settle/EarlierDecisions.h"
 #include "Settle/MergedScene.h"
 #include "Settle/MetConflicts.h"
