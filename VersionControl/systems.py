@@ -12,6 +12,12 @@ def can_mount():
         ["unshare", "-rm", "mount", "-t", "tmpfs", "none", "/mnt"], stderr=subprocess.DEVNULL, check=False).returncode == 0
 
 
+def has_terminals():
+    return shutil.which("script") and subprocess.run(
+        ["script", "-qc", "true", "/dev/null"], stdin=subprocess.DEVNULL, stdout=subprocess.DEVNULL,
+        stderr=subprocess.DEVNULL, check=False).returncode == 0
+
+
 class System:
     """A repository in a folder, and the user who works on a scene in it."""
 

@@ -11,7 +11,7 @@ import tempfile
 
 import pytest
 
-from systems import Git, Mercurial, Subversion
+from systems import Git, Mercurial, Subversion, has_terminals
 from test_systems import HEADER, game_object, scene
 
 ODD_NAMES = ["the scene's \"$x\".ovrin", "-dash.ovrin", "tab\tand\nline.ovrin", "Träger 港.ovrin", "*.ovrin"]
@@ -179,12 +179,6 @@ def test_two_files_need_no_repository(git):
     assert as_json(git, "/dev/null", "a.ovrin") == {"a.ovrin": ("added", 1, 0, 0)}
     assert as_json(git, "a.ovrin", "a.ovrin") == {}
     diff(git, "a.ovrin", "nowhere.ovrin", fails=True)
-
-
-def has_terminals():
-    return shutil.which("script") and subprocess.run(
-        ["script", "-qc", "true", "/dev/null"], stdin=subprocess.DEVNULL, stdout=subprocess.DEVNULL,
-        stderr=subprocess.DEVNULL, check=False).returncode == 0
 
 
 def test_colour_is_for_those_who_want_it(git):

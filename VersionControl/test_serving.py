@@ -7,6 +7,7 @@ import os
 import pathlib
 import shutil
 import signal
+import subprocess
 import sys
 import time
 
@@ -105,12 +106,16 @@ def test_without_the_server_the_other_ways_are_told(user, tmp_path):
 @pytest.mark.skipif(os.getuid() != 0 or not shutil.which("setpriv"), reason="needs root to be two users")
 def test_another_user_who_knows_the_address_gets_nothing(web_user):
     """Command lines are public, and that of the browser has the address."""
+    as_other = ["setpriv", "--reuid", "12345", "--regid", "12345", "--clear-groups"]
+    installed = pathlib.Path(shutil.which("ovrin", path=web_user.environment["PATH"])).resolve().parent
+    if subprocess.run([*as_other, "test", "-r", installed / "mergerules.txt"], check=False).returncode != 0:
+        pytest.skip("another user can't reach the programs that are tried")
     web_user.conflict(*ONE_CONFLICT)
     here = pathlib.Path(web_user.here).parent
     for folder, _, names in os.walk(here):
         for name in (folder, *(os.path.join(folder, name) for name in names)):
             os.chown(name, 12345, 12345, follow_symlinks=False)
-    web_user.fake("as-other", 'exec setpriv --reuid 12345 --regid 12345 --clear-groups "$@"')
+    web_user.fake("as-other", f'exec {" ".join(as_other)} "$@"')
     with Page(web_user, "settle", "--web", "--no-browser", program=["as-other", "ovrin"]) as page:
         ask = [sys.executable, "-c", "import sys, urllib.request; urllib.request.urlopen(sys.argv[1])", f"{page.address}api/session"]
         for other, fails in (("12345", False), ("12346", True)):

@@ -12,10 +12,12 @@ import time
 
 import pytest
 
+from systems import has_terminals
 from test_settle import MANY
 from test_systems import CONFLICT_AND_MORE, HEADER, ONE_CONFLICT, game_object, scene
 
-pytestmark = pytest.mark.skipif(not shutil.which("tmux"), reason="tmux is not installed")
+pytestmark = [pytest.mark.skipif(not shutil.which("tmux"), reason="tmux is not installed"),
+              pytest.mark.skipif(not has_terminals(), reason="terminals can't be made here")]
 
 SECONDS = 30
 # A name of wide characters and a combining mark, as files have it, and what a lantern's keeper would do to a terminal.
