@@ -36,7 +36,7 @@ PageRequest RequestOf(const WebFrame& frame) {
 
 PageAnswer AnswerSafely(const AnswerPage& answer, const PageRequest& request) {
     try {
-        const PageAnswer given = answer(request);
+        PageAnswer given = answer(request);
         // The program that serves the page takes no longer ones, and would end with it.
         if (given.body.size() > kMostAnswer)
             return PageError(507, "The scene has texts here that are too long for a page");

@@ -31,6 +31,7 @@ template <class... Functions> Overloaded(Functions...) -> Overloaded<Functions..
 
 std::vector<std::string> AllPrintable(const std::vector<std::string>& texts) {
     std::vector<std::string> printable;
+    printable.reserve(texts.size());
     for (const std::string& text : texts) printable.push_back(Printable(text));
     return printable;
 }
