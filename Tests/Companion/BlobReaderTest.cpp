@@ -4,7 +4,6 @@
 #include "Support/GitFolder.h"
 #include "Words/Failure.h"
 
-#include "Descriptor.h"
 
 namespace {
 
@@ -56,7 +55,6 @@ TEST_F(BlobReaderTest, WhatIsNoBlobIsAFailureAndTheNextOneFollows) {
 
 /// A git that says anything to the first request.
 std::string FailureOn(const std::string& answer) {
-    OutliveFailedWrites();
     surroundings::FakePrograms programs;
     programs.Say("git", "--batch", answer);
     return ErrorOf<Failure>([] { BlobReader({}).Read("abc"); });

@@ -5,7 +5,6 @@
 #include "Systems/ChildProcess.h"
 #include "Words/Failure.h"
 
-#include "Descriptor.h"
 
 #include <gtest/gtest.h>
 #include <numeric>
@@ -22,14 +21,12 @@ int StatusOf(const std::string& script) {
 }
 
 TEST(Process, TalksWithMoreThanAPipeHolds) {
-    OutliveFailedWrites();
     const std::string text(std::size_t{1} << 20, 'x');
     EXPECT_EQ(OutputOf({"cat"}, {.input = text}), text);
     EXPECT_EQ(OutputOf({"true"}, {.input = text}), "");
 }
 
 TEST(Process, BothOutputsMayBeLongWhileTheInputIsLongToo) {
-    OutliveFailedWrites();
     std::string text(std::size_t{1} << 20, '\0');
     std::iota(text.begin(), text.end(), '\0');
     const ProcessResult result = RunProcess({"sh", "-c", "tee /dev/stderr"}, {.input = text});
@@ -87,7 +84,6 @@ TEST(Process, ErrorsThatAreShownAreNotKept) {
 
 /// As a shell starts programs, whatever this process does with its signals.
 TEST(Process, ProgramEndsAtAPipeThatNobodyReads) {
-    OutliveFailedWrites();
     EXPECT_EQ(OutputOf({"sh", "-c", "{ yes; echo $? >&2; } | head -n 1"}), "y\n");
 }
 
