@@ -68,6 +68,7 @@ class Bench:
         self.tool = options.binary or os.path.join(options.build, "OvrinMerge")
         self.generator = os.path.join(options.build, "Bench", "GenerateScene")
         self.floor = os.path.join(options.build, "Bench", "LoaderFloor")
+        self.merge_floor = os.path.join(options.build, "Bench", "MergeFloor")
         self.reader = os.path.join(options.build, "Bench", "ReaderBench")
         self.git = shutil.which("git") or "git"
         self.directory = tempfile.mkdtemp(prefix="ovrin-bench-", dir=options.directory)
@@ -107,6 +108,9 @@ class Bench:
 
     def loader(self, paths, *options):
         return Command(" ".join(["loader alone", *options]), [self.floor, *options, *paths])
+
+    def copying(self, scene):
+        return Command("MergeFloor", [self.merge_floor, *scene.sides(), scene.path("floor.ovrin")])
 
     def big(self):
         """Size of the big scenes in MB."""
@@ -184,6 +188,15 @@ class Bench:
         scene = self.sized(self.big())
         self.compare("merge 3 x %d MB, 1 %% of the objects edited on each side" % self.big(), self.merge(scene),
                      [self.line_merge(scene)], ["time 0.5, memory 1.0"], self.big())
+        self.drop_scenes()
+
+    def row_floor(self):
+        """The same against a program that only reads, cuts, compares and writes. Needs MergeFloor likewise."""
+        scene = self.sized(self.big())
+        for state, memory_at_hand in (("", True), (", memory as it comes", False)):
+            ours, floor = self.merge(scene), self.copying(scene)
+            measure([ours, floor], self.runs(self.big()), memory_at_hand)
+            self.finding("merge 3 x %d MB, 1 %% edited%s" % (self.big(), state), ours, floor, "time 3")
         self.drop_scenes()
 
     def row_disjoint(self):
