@@ -16,7 +16,11 @@ std::string CheckMerge(const MergeTexts& texts) {
         ReaderOptions options = DefaultReaderOptions();
         options.fast = fast;
         options.share = share;
+        options.recognise = false;
         return RunMerge({files, options, threads, sessions});
+    };
+    const auto runUnbuilt = [&](Threads threads, Sessions sessions) {
+        return RunMerge({files, DefaultReaderOptions(), threads, sessions, {}, false});
     };
     const MergeOutcome expected = run(false, false, Threads::None, Sessions::OneEach);
     const MergeOutcome unshared = run(true, false, Threads::None, Sessions::One);
@@ -25,6 +29,8 @@ std::string CheckMerge(const MergeTexts& texts) {
     std::string finding = CompareOutcomes(expected, unshared);
     if (finding.empty()) finding = CompareOutcomes(expected, inTurn);
     if (finding.empty()) finding = CompareOutcomes(expected, atOnce);
+    if (finding.empty()) finding = CompareOutcomes(expected, runUnbuilt(Threads::None, Sessions::OneEach));
+    if (finding.empty()) finding = CompareOutcomes(expected, runUnbuilt(Threads::Everywhere, Sessions::One));
     if (finding.empty()) finding = CheckLaws(texts.base, texts.left);
     return finding.empty() ? CheckLaws(texts.base, texts.right) : finding;
 }

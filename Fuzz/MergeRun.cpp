@@ -38,11 +38,27 @@ void Check(const char* when, const OvrinObjects& objects, TreeStage stage) {
     if (!fault.empty()) throw BrokenTree(std::string(when) + ": " + fault);
 }
 
-void CheckFiles(const char* when, MergeSession& session, TreeStage baseStage = TreeStage::Hashed) {
+void CheckFiles(const char* when, MergeSession& session, TreeStage baseStage) {
     Check(when, session.BaseObjects(), baseStage);
     Check(when, session.LeftObjects(), TreeStage::Hashed);
     Check(when, session.RightObjects(), TreeStage::Hashed);
 }
+
+/// After a stage, where stages are checked.
+class StageCheck {
+public:
+    explicit StageCheck(const MergeWay& way) : m_IsOn(way.checksStages) {}
+
+    void Files(const char* stage, MergeSession& session, TreeStage baseStage = TreeStage::Hashed) const {
+        if (m_IsOn) CheckFiles(stage, session, baseStage);
+    }
+    void Result(const char* stage, const OvrinObjects& result) const {
+        if (m_IsOn) Check(stage, result, TreeStage::Changed);
+    }
+
+private:
+    const bool m_IsOn;
+};
 
 void CheckDiff(const char* which, const YAMLMappingDiff& diff, DiffOrigin origin) {
     const std::string fault = CheckDiff(diff, origin);
@@ -54,27 +70,27 @@ std::shared_ptr<MergeSession> Prepare(const MergeWay& way) {
     auto session = std::make_shared<MergeSession>(way.threads);
     session->SetRules(way.rules);
     session->Read(way.files(), nullptr, way.options);
-    CheckFiles("read", *session);
+    StageCheck(way).Files("read", *session);
     session->Prepare();
-    CheckFiles("prepared", *session);
+    StageCheck(way).Files("prepared", *session);
     session->Diff();
     CheckDiff("left", session->LeftDiff(), DiffOrigin::Trees);
     CheckDiff("right", session->RightDiff(), DiffOrigin::Trees);
     return session;
 }
 
-void Merge(MergeSession& session, MergeResolve resolve, MergeSession::Base base) {
+void Merge(MergeSession& session, MergeResolve resolve, MergeSession::Base base, const StageCheck& check) {
     session.Decide({}, resolve);
     session.Merge();
     CheckDiff("merged", session.MergedDiff(), DiffOrigin::Sides);
-    CheckFiles("merged", session);
+    check.Files("merged", session);
     const TreeStage baseStage = base == MergeSession::Base::Kept ? TreeStage::Hashed : TreeStage::Changed;
     session.Apply(base);
-    Check("applied", session.Result(), TreeStage::Changed);
-    CheckFiles("applied", session, baseStage);
+    check.Result("applied", session.Result());
+    check.Files("applied", session, baseStage);
     session.Repair();
-    Check("repaired", session.Result(), TreeStage::Changed);
-    CheckFiles("repaired", session, baseStage);
+    check.Result("repaired", session.Result());
+    check.Files("repaired", session, baseStage);
 }
 
 std::string Written(const OvrinObjects& objects) {
@@ -92,29 +108,31 @@ constexpr MergeResolve kPremerges[] = {ResolveBlank, ResolveRight};
 
 /// One session for everything. An earlier merge of it, which may fail, leaves no trace.
 void MergeInOneSession(const MergeWay& way, MergeOutcome& outcome) {
+    const StageCheck check(way);
     MergeSession& session = *(outcome.session = Prepare(way));
     try {
-        Merge(session, ResolveRight, MergeSession::Base::Kept);
+        Merge(session, ResolveRight, MergeSession::Base::Kept, check);
     } catch (const MergeError&) {
     }
-    Merge(session, ResolveBase, MergeSession::Base::Kept);
+    Merge(session, ResolveBase, MergeSession::Base::Kept, check);
     TakeResult(session, outcome);
     for (std::size_t i = 0; i < std::size(kPremerges); ++i) {
         const std::unique_ptr<OvrinObjects> premerged = session.Premerge(kPremerges[i]);
-        Check("premerged", *premerged, TreeStage::Changed);
+        check.Result("premerged", *premerged);
         outcome.premerged[i] = Written(*premerged);
     }
-    CheckFiles("premerged", session);
+    CheckFiles("premerged", session, TreeStage::Hashed);
 }
 
 /// A session for each result, which is built in its base.
 void MergeInSessions(const MergeWay& way, MergeOutcome& outcome) {
     outcome.session = Prepare(way);
-    Merge(*outcome.session, ResolveBase, MergeSession::Base::UsedUp);
+    const StageCheck check(way);
+    Merge(*outcome.session, ResolveBase, MergeSession::Base::UsedUp, check);
     TakeResult(*outcome.session, outcome);
     for (std::size_t i = 0; i < std::size(kPremerges); ++i) {
         const std::shared_ptr<MergeSession> session = Prepare(way);
-        Merge(*session, kPremerges[i], MergeSession::Base::UsedUp);
+        Merge(*session, kPremerges[i], MergeSession::Base::UsedUp, check);
         outcome.premerged[i] = Written(session->Result());
     }
 }

@@ -32,10 +32,12 @@ struct MergeWay {
     ovrin_yaml::Threads threads = ovrin_yaml::Threads::None;
     Sessions sessions = Sessions::One;
     ovrin_yaml::MergeRules rules = {};
+    /// Looking at a tree builds what is unbuilt.
+    bool checksStages = true;
 };
 
 /// Takes a merge all the way to the result and two premerged files. All trees and diffs are checked after
-/// each stage.
+/// each stage, or all trees at the end.
 MergeOutcome RunMerge(const MergeWay& way);
 
 /// What the second of two outcomes of the same merge has different, or an empty text.

@@ -28,18 +28,19 @@ protected:
             return {FileInput(m_Directory.Path() / "base"), FileInput(m_Directory.Path() / "left"),
                     FileInput(m_Directory.Path() / "right")};
         };
-        return RunMerge({files, options, ThreadsOf(useThreads)});
+        return RunMerge({files, options, ThreadsOf(useThreads), Sessions::One, {}, !options.recognise});
     }
 
     /// Of all options and both orders; the first difference from the library's reading in turn.
     std::string CompareAll() const {
         ReaderOptions options = DefaultReaderOptions();
-        options.fast = options.share = false;
+        options.fast = options.share = options.recognise = false;
         const MergeOutcome expected = Merge(false, options);
         std::string difference;
-        for (const int choice : {1, 2, 3, 4, 5, 6, 7}) {
+        for (const int choice : {1, 2, 3, 4, 5, 6, 7, 11, 15}) {
             options.fast = choice & 1;
             options.share = choice & 2;
+            options.recognise = choice & 8;
             difference += CompareOutcomes(expected, Merge(choice & 4, options));
         }
         return difference;

@@ -79,12 +79,12 @@ bool ScalarsDiffer(const DiffContext& context, const YAMLScalar* base, const YAM
 bool CountAsEqual(const YAMLNode* base, const YAMLNode* dest) {
     if (base == dest) return true;
     if (!base || !dest || base->m_Hash != dest->m_Hash) return false;
-    // A rebuilt hash says nothing of repeated keys, and what they hold must not get lost.
-    if (base->m_Hash == 0) {
-        RequireNormalState(base);
-        RequireNormalState(dest);
-    }
-    return true;
+    if (base->m_Hash != 0) return true;
+    // A rebuilt hash says nothing of repeated keys, and what they hold must not get lost; and who was unbuilt
+    // has a hash only now.
+    RequireNormalState(base);
+    RequireNormalState(dest);
+    return base->m_Hash == dest->m_Hash;
 }
 
 const Operation* CreateDiffOperation(DiffContext& context, const YAMLNode* base, const YAMLNode* dest) {

@@ -3,6 +3,7 @@
 #include "Reading/ChunkWalker.h"
 #include "Reading/DocumentCut.h"
 #include "Reading/Fast/BatchedBuilder.h"
+#include "Reading/Fast/Recogniser.h"
 #include "Reading/Fast/WrittenFormReader.h"
 #include "Values/Arena.h"
 #include "Values/ScalarTable.h"
@@ -23,6 +24,46 @@ namespace {
 constexpr std::size_t kPieceBytes = std::size_t{1} << 20;
 
 } // namespace
+
+/// The readers of one thread, each made when it is needed: they are big, and a small file may do with one.
+class ObjectFile::Readers {
+public:
+    explicit Readers(const char* end) : m_End(end) {}
+
+    TreeReader& Trees() { return m_Trees ? *m_Trees : m_Trees.emplace(m_End); }
+    Recognition& Recognisers() { return m_Recognition ? *m_Recognition : m_Recognition.emplace(m_End); }
+    void InternTexts() {
+        if (m_Trees) m_Trees->InternTexts();
+        if (m_Recognition) m_Recognition->InternTexts();
+    }
+
+private:
+    const char* const m_End;
+    std::optional<TreeReader> m_Trees;
+    std::optional<Recognition> m_Recognition;
+};
+
+/// Builds what was only recognised, with the reader that would have built it.
+class ObjectFile::Maker final : public TreeMaker {
+public:
+    explicit Maker(std::shared_ptr<const std::string> text) : m_Text(std::move(text)) {}
+
+private:
+    YAMLMapping* Make(std::string_view source) override {
+        // Memory may have been lacking half-way through the last one.
+        if (m_IsAtWork) m_Reader.reset();
+        m_IsAtWork = true;
+        if (!m_Reader) m_Reader = std::make_unique<TreeReader>(m_Text->data() + m_Text->size());
+        YAMLMapping* tree = m_Reader->Read(source, kFileHeaderLines).object;
+        m_Reader->InternTexts();
+        m_IsAtWork = false;
+        return tree;
+    }
+
+    const std::shared_ptr<const std::string> m_Text;
+    std::unique_ptr<TreeReader> m_Reader;
+    bool m_IsAtWork = false;
+};
 
 std::string_view ObjectFile::FileIDOf(const Document& document) {
     return ovrin_yaml::FileIDOf({document.begin, document.length});
@@ -47,17 +88,15 @@ void ObjectFile::Cut(ObjectFile* base) {
     if (!m_Options.fast || !HasWrittenHeader(*m_Text)) return;
     if (base && m_Options.share && !base->m_Documents.empty() && m_Header == base->m_Header) {
         m_Base = base;
+        m_TakerBit = static_cast<std::uint8_t>(1u << m_Base->m_TakerCount++);
         CutAlong();
     } else {
         CutAlone();
+        if (m_Options.recognise) m_Maker = std::make_shared<Maker>(m_Text);
     }
-    MakePieces();
 }
 
 void ObjectFile::CutAlone() {
-    // A guess that spares the table most of its growing.
-    constexpr std::size_t kBytesPerScalar = 56;
-    ScalarTable::Instance().Reserve(m_Text->size() / kBytesPerScalar);
     constexpr std::size_t kBytesPerDocument = 400;
     ReserveDocuments(m_Text->size() / kBytesPerDocument);
     for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
@@ -76,7 +115,7 @@ void ObjectFile::AddDocument(const char* begin, std::size_t length, std::size_t 
     m_Documents.push_back({begin, length, lender});
     if (lender == kNone) return;
     // Left and right may want one object at the same time, and say the same.
-    std::atomic_ref(m_Base->m_Documents[lender].isWanted).store(true, std::memory_order_relaxed);
+    std::atomic_ref(m_Base->m_Documents[lender].wantedBy).fetch_or(m_TakerBit, std::memory_order_relaxed);
 }
 
 /// Whether the base's document stands at `position` in the same words and ends there, too.
@@ -130,33 +169,57 @@ std::size_t ObjectFile::IndexOf(std::string_view fileID) const {
     return found == m_Index.end() ? kNone : found->second;
 }
 
-void ObjectFile::MakePieces() {
-    std::size_t bytes = 0;
+std::size_t ObjectFile::MakePieces() {
+    std::size_t bytes = 0, bytesToBuild = 0;
     Piece piece{0, 0};
     for (std::size_t i = 0; i < m_Documents.size(); ++i) {
-        if (m_Documents[i].lender == kNone) bytes += m_Documents[i].length;
+        const Document& document = m_Documents[i];
+        if (document.lender == kNone) bytes += document.length;
+        if (document.lender == kNone && !IsWantedByAll(document)) bytesToBuild += document.length;
         piece.end = i + 1;
         if (bytes < kPieceBytes && piece.end != m_Documents.size()) continue;
         m_Pieces.push_back(piece);
         piece = {piece.end, piece.end};
         bytes = 0;
     }
+    // A guess that spares the table most of its growing.
+    constexpr std::size_t kBytesPerScalar = 56;
+    if (!m_Base) ScalarTable::Instance().Reserve(m_Documents.size() + bytesToBuild / kBytesPerScalar);
+    return m_Pieces.size();
 }
 
 void ObjectFile::ReadPiece(std::size_t piece) {
     constexpr std::size_t kAtOnce = 32;
-    TreeReader reader(End());
+    Readers readers(End());
     for (std::size_t i = m_Pieces[piece].first; i < m_Pieces[piece].end; i += kAtOnce)
-        ReadDocuments(reader, {&m_Documents[i], std::min(kAtOnce, m_Pieces[piece].end - i)});
+        ReadDocuments(readers, {&m_Documents[i], std::min(kAtOnce, m_Pieces[piece].end - i)});
 }
 
 /// Reads those that no other file lends.
-void ObjectFile::ReadDocuments(TreeReader& reader, std::span<Document> documents) const {
+void ObjectFile::ReadDocuments(Readers& readers, std::span<Document> documents) const {
     for (Document& document : documents)
-        if (document.lender == kNone) Read(reader, document);
-    reader.InternTexts();
+        if (document.lender == kNone && !(IsWantedByAll(document) && Recognise(readers, document)))
+            Read(readers.Trees(), document);
+    readers.InternTexts();
     for (Document& document : documents)
-        if (document.object) Complete(document);
+        if (document.object && document.object->IsBuilt()) Complete(document);
+}
+
+bool ObjectFile::IsWantedByAll(const Document& document) const {
+    return m_Maker && m_TakerCount > 0 && document.wantedBy == (1u << m_TakerCount) - 1;
+}
+
+/// False for an object whose tree is needed: one that would be written in another way, which goes by the
+/// tree, or that nobody may share.
+bool ObjectFile::Recognise(Readers& readers, Document& document) const {
+    const std::string_view text(document.begin, document.length);
+    const auto [object, isAsWritten] = readers.Recognisers().Read(text, kFileHeaderLines);
+    if (!object || !isAsWritten || object->Traits() & m_Options.unshared) return false;
+    document.object = YAMLMapping::CreateUnbuilt(text, *m_Maker);
+    document.object->SetTraitsAsRead(object->Traits());
+    document.fileID = YAMLScalar::Lookup(FileIDOf(document));
+    document.isLendable = document.isMarked = true;
+    return true;
 }
 
 void ObjectFile::Read(TreeReader& reader, Document& document) const {
@@ -172,7 +235,7 @@ void ObjectFile::Complete(Document& document) const {
     document.fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
     if (m_Options.inspect) object.SetTraitsAsRead(m_Options.inspect(object));
     document.isLendable = !(object.TraitsAsRead() & m_Options.unshared);
-    document.isMarked = document.isLendable && document.isWanted;
+    document.isMarked = document.isLendable && document.wantedBy;
     if (document.isMarked) object.MarkAsShared();
     if (!m_Base && document.isAsWritten) object.SetSource({document.begin, document.length});
 }
@@ -180,19 +243,21 @@ void ObjectFile::Complete(Document& document) const {
 void ObjectFile::Finish() {
     // What comes before a failure points into it as well.
     if (!m_Base && !m_Documents.empty()) m_Objects.KeepText(m_Text);
+    m_Objects.KeepMaker(m_Base ? m_Base->m_Maker : m_Maker);
     // A text that ends behind the first marker holds no document.
     if (m_Text->size() <= m_Header.size() + 5) return;
     if (m_Documents.empty())
         ReadRestByLibrary(m_Header.size());
     else
         FinishDocuments();
-    m_Objects.GetMapping().RebuildHash(true);
+    // One of objects that are unbuilt has no hash, as they have none.
+    if (!m_Options.recognise) m_Objects.GetMapping().RebuildHash(true);
 }
 
 void ObjectFile::FinishDocuments() {
     YAMLMapping& root = m_Objects.GetMapping();
     root.Reserve(m_Documents.size());
-    std::optional<TreeReader> reader; // for what nearly never is
+    Readers readers(End());
     for (Document& document : m_Documents) {
         const Document* lender = document.lender == kNone ? nullptr : &m_Base->m_Documents[document.lender];
         if (lender && lender->isLendable) {
@@ -203,8 +268,7 @@ void ObjectFile::FinishDocuments() {
         }
         if (lender) {
             document.lender = kNone;
-            if (!reader) reader.emplace(End());
-            ReadDocuments(*reader, {&document, 1});
+            ReadDocuments(readers, {&document, 1});
         }
         if (document.object)
             root.Append(document.fileID, document.object);

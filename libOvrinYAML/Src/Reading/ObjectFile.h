@@ -4,6 +4,7 @@
 #include "Values/OvrinObjects.h"
 #include "Values/SeededHash.h"
 
+#include <atomic>
 #include <cstddef>
 #include <cstdint>
 #include <memory>
@@ -18,6 +19,7 @@ namespace ovrin_yaml {
 
 class BatchedBuilder;
 class ChunkWalker;
+class Recogniser;
 template <class Builder> class WrittenFormReader;
 
 /// How object files are read. What they mean doesn't depend on it: tests and benchmarks switch parts off.
@@ -29,6 +31,9 @@ struct ReaderOptions {
     std::uint8_t (*inspect)(const YAMLMapping& object) = nullptr;
     /// Objects with one of these traits are never shared.
     std::uint8_t unshared = 0;
+    /// Build no tree of an object that all files have in the same words before somebody asks for it. Its
+    /// traits are those of ObjectTrait.
+    bool recognise = false;
 };
 
 /// An object file on its way from text to objects.
@@ -36,8 +41,9 @@ struct ReaderOptions {
 ///  1. `Take` tests the signature, and `Cut` cuts the text at the document headers. A file that is cut along
 ///     another finds that one's documents in it: what stands there in the same words needs no reading.
 ///     Several files may be cut along one at the same time.
-///  2. `ReadPiece` reads some documents that are in written form. Pieces are independent of each other:
-///     any thread may read any piece, each once.
+///  2. `MakePieces`, when all files are cut, tells how many pieces there are, and `ReadPiece` reads the
+///     documents of one that are in written form. Pieces are independent of each other: any thread may read
+///     any piece, each once. With ReaderOptions::recognise what all files have is only recognised.
 ///  3. `Finish` adds the objects to the root in file order. A document that the fast reader wasn't sure of
 ///     goes to libyaml here, so that the first failure in file order is the one that is thrown.
 ///
@@ -63,7 +69,8 @@ public:
     /// Cuts the text, along `base` if it is not null; that must be cut already and stay where it is. Objects
     /// that are wanted before they are read are marked as shared while they are at hand.
     void Cut(ObjectFile* base);
-    std::size_t PieceCount() const { return m_Pieces.size(); }
+    /// Cuts what is to be read into pieces, once, when all files are cut. Returns their number.
+    std::size_t MakePieces();
     void ReadPiece(std::size_t piece);
     /// All pieces must have been read, those of the base too. Throws YAMLError.
     void Finish();
@@ -75,12 +82,13 @@ private:
         std::size_t lender;            // the base's document in the same words, or kNone
         YAMLMapping* object = nullptr; // null: not read, or left to libyaml
         YAMLScalar* fileID = nullptr;  // of the object
-        std::uint8_t isWanted = false; // another file would take the object; set by several threads
+        std::uint8_t wantedBy = 0;     // files that would take the object, a bit each; set by several threads
         bool isLendable = false; // the object may be copied before a change, so another file may take it
         bool isMarked = false;   // the object is marked as shared
         bool isAsWritten = false;
     };
     using TreeReader = WrittenFormReader<BatchedBuilder>;
+    using Recognition = WrittenFormReader<Recogniser>;
     struct Piece {
         std::size_t first, end; // documents
     };
@@ -95,8 +103,12 @@ private:
     void ReserveDocuments(std::size_t count);
     void AddDocument(const char* begin, std::size_t length, std::size_t lender);
     void CutAlone();
-    void MakePieces();
-    void ReadDocuments(TreeReader& reader, std::span<Document> documents) const;
+    class Readers;
+    class Maker;
+
+    void ReadDocuments(Readers& readers, std::span<Document> documents) const;
+    bool IsWantedByAll(const Document& document) const;
+    bool Recognise(Readers& readers, Document& document) const;
     void Read(TreeReader& reader, Document& document) const;
     void Complete(Document& document) const;
     void FinishDocuments();
@@ -107,7 +119,10 @@ private:
     OvrinObjects& m_Objects;
     const ReaderOptions m_Options;
     ObjectFile* m_Base = nullptr;
+    std::atomic<unsigned> m_TakerCount = 0; // files that are cut along this one
+    std::uint8_t m_TakerBit = 0;            // of this one among those of the base
     std::shared_ptr<const std::string> m_Text;
+    std::shared_ptr<TreeMaker> m_Maker; // of the objects that are only recognised
     std::string_view m_Header;
     std::vector<Document> m_Documents; // empty: libyaml reads all of the text
     std::vector<Piece> m_Pieces;

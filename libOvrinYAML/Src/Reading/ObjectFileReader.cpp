@@ -6,7 +6,8 @@ namespace {
 
 void CutAndRead(ObjectFile& file) {
     file.Cut(nullptr);
-    for (std::size_t piece = 0; piece < file.PieceCount(); ++piece) file.ReadPiece(piece);
+    const std::size_t count = file.MakePieces();
+    for (std::size_t piece = 0; piece < count; ++piece) file.ReadPiece(piece);
     file.Finish();
 }
 

@@ -1,6 +1,7 @@
 #include "Repair/FileIDCollisions.h"
 
 #include "Repair/ObjectAccess.h"
+#include "Repair/UnbuiltReferences.h"
 #include "Values/AlignedLookup.h"
 #include "Values/Hash.h"
 #include "Values/OvrinObjects.h"
@@ -57,9 +58,9 @@ public:
         for (const NewID& newID : newIDs) m_Remap.emplace(newID.from, newID.to);
     }
 
+    bool IsMoved(const YAMLScalar* id) const { return m_Remap.contains(id); }
     bool RefersToMoved(const YAMLMapping& mapping) const {
-        return m_Remap.contains(AsScalar(mapping.Get(YAMLScalar::fileID))) &&
-               !mapping.HasKey(YAMLScalar::guid);
+        return IsMoved(AsScalar(mapping.Get(YAMLScalar::fileID))) && !mapping.HasKey(YAMLScalar::guid);
     }
 
     /// Rewrites the references in an object.
@@ -101,7 +102,10 @@ void RewriteReferences(const std::vector<NewID>& newIDs, YAMLMapping& root) {
     const auto refersToMoved = [&](const YAMLScalar*, const YAMLMapping& mapping) {
         return rewriter.RefersToMoved(mapping);
     };
-    const auto isOfInterest = [&](std::uint8_t) { return !newIDs.empty(); };
+    const auto isMoved = [&](const YAMLScalar* id) { return rewriter.IsMoved(id); };
+    const auto isOfInterest = [&](const YAMLMapping& object) {
+        return !newIDs.empty() && MayRefer(object, *YAMLScalar::fileID, isMoved);
+    };
     ForEachObject(root, isOfInterest, [&](const YAMLScalar* id, YAMLNode* object) {
         if (!FindMappings(id, object, refersToMoved).empty()) rewriter.RewriteObject(Editable(root, id));
     });

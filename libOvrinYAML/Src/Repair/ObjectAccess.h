@@ -27,8 +27,8 @@ struct RepairRoots {
 };
 
 /// Calls visit(id, value) for the objects of a root, but for those of which a look at what was found when
-/// they were read tells that they are of no interest: isOfInterest(traits) is only asked for objects that
-/// were looked at. A YAMLError from there learns of the object.
+/// they were read tells that they are of no interest: isOfInterest(object) is only asked for objects that
+/// have traits (YAMLMapping::TraitsAsRead). A YAMLError from there learns of the object.
 template <class IsOfInterest, class Visit>
 void ForEachObject(const YAMLMapping& root, const IsOfInterest& isOfInterest, const Visit& visit) {
     // The objects lie far from each other in memory: ask for those that come next.
@@ -40,7 +40,7 @@ void ForEachObject(const YAMLMapping& root, const IsOfInterest& isOfInterest, co
         const auto& [id, value] = entries[i];
         if (!id) continue;
         const YAMLMapping* object = AsMapping(value);
-        if (object && object->TraitsAsRead() && !isOfInterest(object->TraitsAsRead())) continue;
+        if (object && object->TraitsAsRead() && !isOfInterest(*object)) continue;
         try {
             visit(id, value);
         } catch (YAMLError& error) {

@@ -26,6 +26,13 @@ bool IsPrefabLink(const YAMLScalar* key, const YAMLMapping& mapping) {
     return target && target != YAMLScalar::zero;
 }
 
+const YAMLScalar* InstanceOf(const YAMLMapping& fields) {
+    for (const YAMLScalar* key :
+         {YAMLScalar::mPrefabInstance, YAMLScalar::mPrefabInternal, YAMLScalar::mPrefab})
+        if (const YAMLScalar* link = GetMappingPath(&fields, {key, YAMLScalar::fileID})) return link;
+    return nullptr;
+}
+
 const YAMLNode* TransitionsOf(const YAMLMapping& object) {
     static const YAMLScalar* const machine = YAMLScalar::Lookup("AnimatorStateMachine");
     static const YAMLScalar* const key = YAMLScalar::Lookup("m_StateMachineTransitions");
@@ -39,7 +46,9 @@ std::uint8_t InspectObject(const YAMLMapping& object) {
     if (HasPrefabLink(nullptr, &object)) traits |= kHasPrefabLink;
     if (const YAMLMapping* fields = GetTransform(&object).fields) {
         traits |= kIsTransform;
-        if (!fields->HasKey(YAMLScalar::mFather)) traits |= kLacksFather;
+        const bool lacksFather = !fields->HasKey(YAMLScalar::mFather);
+        if (lacksFather) traits |= kLacksFather;
+        if (lacksFather && !InstanceOf(*fields)) traits |= kLacksInstance;
     }
     return traits;
 }

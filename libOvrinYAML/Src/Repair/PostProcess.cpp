@@ -5,18 +5,25 @@
 #include "Repair/ObjectTraits.h"
 #include "Repair/PreProcess.h"
 #include "Repair/TransformCycles.h"
+#include "Repair/UnbuiltReferences.h"
 
 namespace ovrin_yaml {
 
 namespace {
 
-bool MayHavePrefabLink(std::uint8_t traits) {
-    return traits & kHasPrefabLink;
+/// The objects that may have a prefab link to what isMeant(const YAMLScalar*) tells of.
+template <class IsMeant> auto MayHaveLinkTo(const IsMeant& isMeant) {
+    return [isMeant](const YAMLMapping& object) {
+        return object.TraitsAsRead() & kHasPrefabLink &&
+               MayRefer(object, *YAMLScalar::mPrefabInternal, isMeant);
+    };
 }
 
 void RepairPrefabLinks(RepairRoots& roots) {
     std::vector<const YAMLScalar*> orphans;
-    ForEachObject(roots.merged, MayHavePrefabLink, [&](const YAMLScalar* id, const YAMLNode* object) {
+    const auto isOfInterest =
+        MayHaveLinkTo([&](const YAMLScalar* prefab) { return roots.IsRemoved(prefab); });
+    ForEachObject(roots.merged, isOfInterest, [&](const YAMLScalar* id, const YAMLNode* object) {
         const auto [classKey, fields] = GetTransform(object);
         const YAMLScalar* prefab = GetMappingPath(fields, {YAMLScalar::mPrefabInternal, YAMLScalar::fileID});
         if (IsNoReference(prefab) || !roots.IsRemoved(prefab)) return;
@@ -46,12 +53,14 @@ bool IsPlaceHolderOfNothing(const YAMLMapping& object, const IsDangling& isDangl
     return false;
 }
 
-/// Goes through all that the merge touched or that has a prefab link, and so is also what notices repeated
-/// keys that came through the merge unseen.
+/// Goes through all that the merge touched or that may have a dangling link, and so is also what notices
+/// repeated keys that came through the merge unseen.
 void RepairDanglingLinks(RepairRoots& roots) {
     const IsDangling isDangling{roots.merged};
     std::vector<const YAMLScalar*> placeHolders;
-    ForEachObject(roots.merged, MayHavePrefabLink, [&](const YAMLScalar* id, YAMLNode* value) {
+    const auto isOfInterest = MayHaveLinkTo(
+        [&](const YAMLScalar* prefab) { return prefab != YAMLScalar::zero && !roots.merged.HasKey(prefab); });
+    ForEachObject(roots.merged, isOfInterest, [&](const YAMLScalar* id, YAMLNode* value) {
         const YAMLMapping* object = AsMapping(value);
         if (!object || FindMappings(id, value, isDangling).empty()) return;
         if (IsPlaceHolderOfNothing(*object, isDangling)) {

@@ -17,7 +17,9 @@ template <class Replace, class Replaced>
 void ReplaceTransitions(YAMLMapping& root, const Replace& replace, const Replaced& replaced) {
     const YAMLScalar* const machine = YAMLScalar::Lookup("AnimatorStateMachine");
     const YAMLScalar* const key = YAMLScalar::Lookup("m_StateMachineTransitions");
-    const auto isOfInterest = [](std::uint8_t traits) { return traits & kHasTransitions; };
+    const auto isOfInterest = [](const YAMLMapping& object) {
+        return object.TraitsAsRead() & kHasTransitions;
+    };
     ForEachObject(root, isOfInterest, [&](const YAMLScalar* id, const YAMLNode* value) {
         const YAMLMapping* object = AsMapping(value);
         const YAMLNode* transitions = object ? TransitionsOf(*object) : nullptr;

@@ -1,6 +1,7 @@
 #include "Repair/TransformCycles.h"
 
 #include "Repair/ObjectTraits.h"
+#include "Repair/UnbuiltReferences.h"
 
 #include <stdexcept>
 #include <unordered_map>
@@ -14,10 +15,7 @@ constexpr int kMaxAncestors = 100;
 
 /// The parent of a stripped Transform, which its prefab instance stores.
 const YAMLScalar* PrefabParent(const YAMLMapping& merged, const YAMLScalar* id, const YAMLMapping& fields) {
-    const YAMLScalar* link = nullptr;
-    for (const YAMLScalar* key :
-         {YAMLScalar::mPrefabInstance, YAMLScalar::mPrefabInternal, YAMLScalar::mPrefab})
-        if (!link) link = GetMappingPath(&fields, {key, YAMLScalar::fileID});
+    const YAMLScalar* link = InstanceOf(fields);
     if (!link) throw YAMLError("Could not determine the transform parent of " + std::string(id->Value()));
 
     const YAMLMapping* instance = AsMapping(merged.Get(link));
@@ -38,8 +36,11 @@ public:
     /// link.
     explicit TransformParents(const RepairRoots& roots) : m_Merged(roots.merged) {
         const bool anyRemoved = !roots.removed.empty();
-        const auto isOfInterest = [anyRemoved](std::uint8_t traits) {
-            return (traits & kLacksFather) || (anyRemoved && (traits & kIsTransform));
+        const auto isRemoved = [&](const YAMLScalar* parent) { return roots.IsRemoved(parent); };
+        const auto isOfInterest = [&](const YAMLMapping& object) {
+            const std::uint8_t traits = object.TraitsAsRead();
+            if (traits & kLacksFather) return (traits & kLacksInstance) != 0;
+            return anyRemoved && traits & kIsTransform && MayRefer(object, *YAMLScalar::mFather, isRemoved);
         };
         ForEachObject(roots.merged, isOfInterest, [&](const YAMLScalar* id, const YAMLNode* object) {
             const TransformFields transform = GetTransform(object);

@@ -99,7 +99,8 @@ void RunTasks(const std::vector<std::function<void()>>& tasks, bool isLittle) {
 }
 
 void ReadPieces(FileInWork& work) {
-    for (std::size_t piece = 0; piece < work.file.PieceCount(); ++piece) work.file.ReadPiece(piece);
+    const std::size_t count = work.file.MakePieces();
+    for (std::size_t piece = 0; piece < count; ++piece) work.file.ReadPiece(piece);
 }
 
 /// First the bytes of all files. Then the others are cut along the first; by then it is known which of its
@@ -118,9 +119,11 @@ void ReadOnThreads(std::deque<FileInWork>& files, bool isLittle, StageWatcher* w
     }
     RunTasks(takes, isLittle);
     RunTasks(cuts, isLittle);
-    for (FileInWork& work : files)
-        for (std::size_t piece = 0; !work.failure && piece < work.file.PieceCount(); ++piece)
+    for (FileInWork& work : files) {
+        const std::size_t count = work.failure ? 0 : work.file.MakePieces();
+        for (std::size_t piece = 0; piece < count; ++piece)
             pieces.emplace_back([&work, piece] { work.file.ReadPiece(piece); });
+    }
     RunTasks(pieces, isLittle);
 
     for (FileInWork& work : files) work.Try([&] { work.file.Finish(); });
@@ -128,14 +131,22 @@ void ReadOnThreads(std::deque<FileInWork>& files, bool isLittle, StageWatcher* w
         if (work.failure) std::rethrow_exception(work.failure);
 }
 
+void CutAll(std::deque<FileInWork>& files) {
+    FileInWork& first = files.front();
+    for (FileInWork& work : files) {
+        work.Take();
+        work.Try([&] { work.file.Cut(&work == &first ? nullptr : &first.file); });
+    }
+}
+
+/// All are cut in the first step, since it depends on the others what of the first must be read.
 void ReadInOrder(std::deque<FileInWork>& files, const std::vector<FileReading>& readings,
                  StageWatcher* watcher) {
     for (std::size_t i = 0; i < files.size(); ++i) {
         const WatchedStep step(watcher, readings[i].step);
+        if (i == 0) CutAll(files);
         FileInWork& work = files[i];
-        work.Take();
         work.Try([&] {
-            work.file.Cut(i == 0 ? nullptr : &files.front().file);
             ReadPieces(work);
             work.file.Finish();
         });
@@ -150,6 +161,7 @@ ReaderOptions DefaultReaderOptions() {
     options.inspect = InspectObject;
     // Pre-processing changes them in every file.
     options.unshared = kHasTransitions;
+    options.recognise = true;
     return options;
 }
 

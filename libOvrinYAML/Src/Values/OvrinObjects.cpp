@@ -6,6 +6,7 @@ OvrinObjects* OvrinObjects::Clone() {
     auto copy = std::make_unique<OvrinObjects>();
     m_Root.ShareInto(copy->m_Root);
     copy->m_Text = m_Text;
+    copy->m_Maker = m_Maker;
     return copy.release();
 }
 

@@ -31,10 +31,13 @@ public:
 
     /// Keeps the text that objects point into with their source bytes.
     void KeepText(std::shared_ptr<const std::string> text) { m_Text = std::move(text); }
+    /// Keeps what makes the trees of objects that are unbuilt.
+    void KeepMaker(std::shared_ptr<TreeMaker> maker) { m_Maker = std::move(maker); }
 
 private:
     YAMLMapping m_Root;
     std::shared_ptr<const std::string> m_Text;
+    std::shared_ptr<TreeMaker> m_Maker;
 };
 
 } // namespace ovrin_yaml

@@ -5,6 +5,7 @@
 #include "Values/YAMLSequence.h"
 
 #include <algorithm>
+#include <mutex>
 
 namespace ovrin_yaml {
 
@@ -19,8 +20,35 @@ YAMLMapping::Extra& YAMLMapping::NeedExtra() {
     return *m_Extra;
 }
 
+YAMLMapping* YAMLMapping::CreateUnbuilt(std::string_view source, TreeMaker& maker) {
+    YAMLMapping* object = Create(false, nullptr, 0);
+    object->SetSource(source);
+    object->m_Extra->maker = &maker;
+    object->m_State = kShared | kUnbuilt;
+    return object;
+}
+
+void YAMLMapping::BuildTree() const {
+    TreeMaker& maker = *m_Extra->maker;
+    const std::lock_guard lock(maker.m_Lock);
+    if (!IsBuilt()) const_cast<YAMLMapping*>(this)->TakeTree(*maker.Make(m_Extra->source));
+}
+
+/// Takes the pairs of a tree that is nobody's.
+void YAMLMapping::TakeTree(YAMLMapping& tree) {
+    assert(!tree.m_HasDuplicates);
+    m_Hash = tree.m_Hash;
+    m_Line = tree.m_Line;
+    m_Keys = tree.m_Keys;
+    m_Size = tree.m_Size;
+    m_Extra->values = tree.Values();
+    m_Extra->room = tree.m_Size;
+    m_Extra->index = tree.Index();
+    __atomic_store_n(&m_State, std::uint8_t{kShared}, __ATOMIC_RELEASE);
+}
+
 void YAMLMapping::RequireNormalState() const {
-    if (m_HasDuplicates) throw YAMLError("Cannot perform this operation on a YAML file with duplicate keys");
+    if (HasDuplicates()) throw YAMLError("Cannot perform this operation on a YAML file with duplicate keys");
 }
 
 void YAMLMapping::MoveTo(std::size_t room) {
@@ -59,6 +87,7 @@ const YAMLScalar* const* YAMLMapping::KeysForCopy() const {
 }
 
 std::uint32_t YAMLMapping::Find(const YAMLScalar* key) const {
+    NeedTree();
     if (const KeyIndex* index = Index()) {
         // The index keeps keys that were removed since; their positions hold null or, after a move, others.
         const std::uint32_t position = index->Find(key);
@@ -176,7 +205,7 @@ YAMLNode* YAMLMapping::GetForChange(const YAMLScalar* key) {
     YAMLNode* value = Get(key);
     YAMLMapping* object = AsMapping(value);
     if (!object) return value;
-    if (object->m_IsShared) {
+    if (object->IsShared()) {
         object = AsMapping(CopyExactly(object));
         Change(key, object);
     }
@@ -197,7 +226,8 @@ YAMLMapping::Iterator YAMLMapping::begin() const {
 
 YAMLMapping::Iterator YAMLMapping::end() const {
     RequireNormalState();
-    return {RawEntries(), m_Size};
+    const Pairs pairs = RawEntries();
+    return {pairs, pairs.size()};
 }
 
 YAMLMapping::Iterator YAMLMapping::FindKey(const YAMLScalar* key) const {
@@ -277,6 +307,7 @@ YAMLSequence* YAMLMapping::ToSequence() const {
 }
 
 YAMLMapping* YAMLMapping::CopyWith(YAMLNode* (*copyValue)(const YAMLNode*)) const {
+    NeedTree();
     // An index finds no key that is there twice.
     YAMLMapping* copy = Create(m_Flow, KeysForCopy(), m_Size - RemovedCount());
     copy->m_HasDuplicates = m_HasDuplicates;
@@ -309,7 +340,7 @@ YAMLNode* YAMLMapping::Clone() const {
 }
 
 void YAMLMapping::Clear() {
-    assert(!m_IsShared);
+    assert(!IsShared());
     for (const Entry entry : RawEntries())
         if (entry.value) entry.value->Free();
     m_Size = 0;
@@ -318,6 +349,8 @@ void YAMLMapping::Clear() {
 }
 
 bool YAMLMapping::Equals(const YAMLNode* other) const {
+    NeedTree();
+    if (const YAMLMapping* mapping = AsMapping(other)) mapping->NeedTree();
     if (m_Hash && other->m_Hash) return m_Hash == other->m_Hash;
     return EqualsExpensive(other);
 }
@@ -327,8 +360,8 @@ bool YAMLMapping::EqualsExpensive(const YAMLNode* node) const {
     if (!mapping) return false;
     // In the duplicate state there are no keys to tell two mappings apart by.
     static const YAMLMapping none;
-    const YAMLMapping& left = m_HasDuplicates ? none : *this;
-    const YAMLMapping& right = mapping->m_HasDuplicates ? none : *mapping;
+    const YAMLMapping& left = HasDuplicates() ? none : *this;
+    const YAMLMapping& right = mapping->HasDuplicates() ? none : *mapping;
     if (left.Size() != right.Size()) return false;
     Iterator other = right.begin();
     for (const Entry entry : left) {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Values/KeyIndex.h"
+#include "Values/TreeMaker.h"
 #include "Values/YAMLAlloc.h"
 #include "Values/YAMLError.h"
 #include "Values/YAMLNode.h"
@@ -32,6 +33,9 @@ class YAMLSequence;
 ///
 /// A change of the keys gives the mapping a list of its own, and new pairs give it new arrays for both. At
 /// most kMostPairs: what would bring more throws YAMLError "Mapping is too long".
+///
+/// An object of which nobody has asked for a pair yet may be unbuilt: its bytes and traits are known, and its
+/// tree is made when somebody asks. Until then it has no hash either.
 class YAMLMapping final : public YAMLNode {
 public:
     static constexpr Kind kKind = Kind::Mapping;
@@ -121,8 +125,16 @@ public:
         if (count > KeyIndex::kSearchLimit) mapping->BuildIndex();
         return mapping;
     }
+    /// A new object that is unbuilt: `source` are its bytes, as SetSource has them, of which `maker` makes
+    /// the tree. Both must stay as long as somebody may ask for it. It is shared from the start.
+    static YAMLMapping* CreateUnbuilt(std::string_view source, TreeMaker& maker);
+    /// Whether the tree is there: who can do without it may spare its cost.
+    bool IsBuilt() const { return !(State() & kUnbuilt); }
     /// The values, in the order of RawEntries.
-    YAMLNode** Values() { return m_Extra && m_Extra->values ? m_Extra->values : ValuesBehind(); }
+    YAMLNode** Values() {
+        NeedTree();
+        return m_Extra && m_Extra->values ? m_Extra->values : ValuesBehind();
+    }
 
     /// The bytes that the writer would give for this object, or nothing where they aren't known. Valid until
     /// the object is changed; they belong to whoever read the file.
@@ -136,18 +148,24 @@ public:
 
     /// Whether several trees hold this mapping, an object: it is never freed, and copied before it is
     /// changed.
-    bool IsShared() const { return m_IsShared; }
-    void MarkAsShared() { m_IsShared = true; }
+    bool IsShared() const { return State() & kShared; }
+    void MarkAsShared() { m_State |= kShared; }
 
     /// Whether the object is known to be as it was when its hashes were built. What changes one first gets it
     /// from GetForChange, which ends this state.
-    bool IsKnownUnchanged() const { return m_IsShared || m_Traits || !Source().empty(); }
+    bool IsKnownUnchanged() const { return IsShared() || m_Traits || !Source().empty(); }
 
-    bool HasDuplicates() const { return m_HasDuplicates; }
+    bool HasDuplicates() const {
+        NeedTree();
+        return m_HasDuplicates;
+    }
     /// Throws the duplicate-keys YAMLError in the duplicate state.
     void RequireNormalState() const;
     /// All pairs, in either state. In the normal state some may have been removed (their key is null).
-    Pairs RawEntries() const { return {m_Keys, const_cast<YAMLMapping*>(this)->Values(), m_Size}; }
+    Pairs RawEntries() const {
+        YAMLNode* const* values = const_cast<YAMLMapping*>(this)->Values();
+        return {m_Keys, values, m_Size};
+    }
 
     /// Makes room for `count` pairs in all.
     void Reserve(std::size_t count);
@@ -199,7 +217,7 @@ public:
     void Clear();
 
     void Free() {
-        if (!m_IsShared) YAMLAlloc<YAMLMapping>::free(this);
+        if (!IsShared()) YAMLAlloc<YAMLMapping>::free(this);
     }
     YAMLNode* Clone() const;
     bool Equals(const YAMLNode* other) const;
@@ -211,6 +229,7 @@ private:
     /// What few mappings have.
     struct Extra {
         std::string_view source;
+        TreeMaker* maker = nullptr;  // of an object that was unbuilt at first
         KeyIndex* index = nullptr;   // positions, once there are more than KeyIndex::kSearchLimit
         YAMLNode** values = nullptr; // where they went when there was no more room behind the mapping
         std::uint32_t room = 0;      // for values there, and for keys that are the mapping's own
@@ -218,6 +237,17 @@ private:
         bool leftOut = false;        // the hash covers pairs that were not kept: it can't be checked
     };
     friend class TreeCheck;
+
+    enum State : std::uint8_t { kShared = 1, kUnbuilt = 2 };
+
+    /// What is there for threads that see the tree as built.
+    std::uint8_t State() const { return __atomic_load_n(&m_State, __ATOMIC_ACQUIRE); }
+    void NeedTree() const {
+        if (!IsBuilt()) [[unlikely]]
+            BuildTree();
+    }
+    void BuildTree() const;
+    void TakeTree(YAMLMapping& tree);
 
     Extra& NeedExtra();
     KeyIndex* Index() const { return m_Extra ? m_Extra->index : nullptr; }
@@ -241,7 +271,7 @@ private:
     void AssertMayChange() const { assert(!IsKnownUnchanged() && "an object that GetForChange didn't give"); }
 
     std::uint8_t m_Traits = 0;
-    bool m_IsShared = false;
+    std::uint8_t m_State = 0;
     std::uint32_t m_HasDuplicates : 1 = 0;
     std::uint32_t m_OwnsKeys : 1 = 0;
     std::uint32_t m_Size : 30 = 0; // pairs, those removed included

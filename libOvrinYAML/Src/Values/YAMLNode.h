@@ -31,7 +31,8 @@ public:
     enum class Kind : std::uint8_t { Scalar, Mapping, Sequence };
 
     /// Content hash. 0 means that no hash is known, and is also the hash of an empty container. It goes stale
-    /// when a container is changed; only the reader and pre-processing build it.
+    /// when a container is changed; only the reader and pre-processing build it. Of an object that is unbuilt
+    /// (YAMLMapping) it is unknown.
     std::uint32_t m_Hash = 0;
     /// Zero-based line of the node's start in the text its document was parsed from. Of a scalar, which
     /// stands in many places, the place where its text was first met.
