@@ -14,6 +14,7 @@
 #include <atomic>
 #include <cstring>
 #include <optional>
+#include <utility>
 
 namespace ovrin_yaml {
 
@@ -81,6 +82,7 @@ void ObjectFile::Take(std::string bytes) {
 
 void ObjectFile::TakeText(std::string text) {
     m_Text = std::make_shared<const std::string>(std::move(text));
+    m_Length = m_Text->size();
     m_Header = FileHeaderOf(*m_Text);
 }
 
@@ -90,6 +92,7 @@ void ObjectFile::Cut(ObjectFile* base) {
         m_Base = base;
         m_TakerBit = static_cast<std::uint8_t>(1u << m_Base->m_TakerCount++);
         CutAlong();
+        DropSharedText();
     } else {
         CutAlone();
         if (m_Options.recognise) m_Maker = std::make_shared<Maker>(m_Text);
@@ -142,6 +145,42 @@ void ObjectFile::CutAlong() {
             AddDocument(begin, static_cast<std::size_t>(end - begin), FindLender(begin, end, expected));
         }
         begin += m_Documents.back().length;
+    }
+}
+
+/// Where most documents stand in the base in the same words, the others alone are kept.
+void ObjectFile::DropSharedText() {
+    std::size_t ownBytes = 0;
+    for (const Document& document : m_Documents)
+        if (document.lender == kNone) ownBytes += document.length;
+    if (ownBytes > m_Length / 2) return;
+    std::string own;
+    own.reserve(ownBytes);
+    for (Document& document : m_Documents)
+        if (document.lender == kNone) own.append(document.begin, document.length);
+    m_Text = std::make_shared<const std::string>(std::move(own));
+    m_Header = m_Base->m_Header;
+    m_HasWholeText = false;
+    const char* position = m_Text->data();
+    for (Document& document : m_Documents) {
+        const bool isOwn = document.lender == kNone;
+        document.begin = isOwn ? position : m_Base->m_Documents[document.lender].begin;
+        if (isOwn) position += document.length;
+    }
+}
+
+/// For what goes by the place in the file.
+void ObjectFile::NeedWholeText() {
+    if (m_HasWholeText) return;
+    std::string whole(m_Header);
+    whole.reserve(m_Length);
+    for (const Document& document : m_Documents) whole.append(document.begin, document.length);
+    m_Text = std::make_shared<const std::string>(std::move(whole));
+    m_HasWholeText = true;
+    const char* position = m_Text->data() + m_Header.size();
+    for (Document& document : m_Documents) {
+        document.begin = position;
+        position += document.length;
     }
 }
 
@@ -245,7 +284,7 @@ void ObjectFile::Finish() {
     if (!m_Base && !m_Documents.empty()) m_Objects.KeepText(m_Text);
     m_Objects.KeepMaker(m_Base ? m_Base->m_Maker : m_Maker);
     // A text that ends behind the first marker holds no document.
-    if (m_Text->size() <= m_Header.size() + 5) return;
+    if (m_Length <= m_Header.size() + 5) return;
     if (m_Documents.empty())
         ReadRestByLibrary(m_Header.size());
     else
@@ -257,7 +296,7 @@ void ObjectFile::Finish() {
 void ObjectFile::FinishDocuments() {
     YAMLMapping& root = m_Objects.GetMapping();
     root.Reserve(m_Documents.size());
-    Readers readers(End());
+    Readers readers(m_Base ? m_Base->End() : End());
     for (Document& document : m_Documents) {
         const Document* lender = document.lender == kNone ? nullptr : &m_Base->m_Documents[document.lender];
         if (lender && lender->isLendable) {
@@ -268,7 +307,9 @@ void ObjectFile::FinishDocuments() {
         }
         if (lender) {
             document.lender = kNone;
+            const char* const begin = std::exchange(document.begin, lender->begin);
             ReadDocuments(readers, {&document, 1});
+            document.begin = begin;
         }
         if (document.object)
             root.Append(document.fileID, document.object);
@@ -292,6 +333,7 @@ bool ObjectFile::ReadNext(ChunkWalker& walker, std::size_t offset) const {
 /// Reads a single document with libyaml. If it doesn't end where the next one begins, all that follows goes
 /// the same way, and false is returned.
 bool ObjectFile::ReadByLibrary(const Document& document, bool isLast) {
+    NeedWholeText();
     const auto offset = static_cast<std::size_t>(document.begin - m_Text->data());
     std::string chunk(m_Header);
     chunk.append(document.begin, document.length);

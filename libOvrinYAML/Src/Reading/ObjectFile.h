@@ -100,6 +100,8 @@ private:
     std::size_t FindLender(const char* begin, const char* end, std::size_t& expected) const;
     std::size_t IndexOf(std::string_view fileID) const;
     void CutAlong();
+    void DropSharedText();
+    void NeedWholeText();
     void ReserveDocuments(std::size_t count);
     void AddDocument(const char* begin, std::size_t length, std::size_t lender);
     void CutAlone();
@@ -119,9 +121,11 @@ private:
     OvrinObjects& m_Objects;
     const ReaderOptions m_Options;
     ObjectFile* m_Base = nullptr;
-    std::atomic<unsigned> m_TakerCount = 0; // files that are cut along this one
-    std::uint8_t m_TakerBit = 0;            // of this one among those of the base
-    std::shared_ptr<const std::string> m_Text;
+    std::atomic<unsigned> m_TakerCount = 0;    // files that are cut along this one
+    std::uint8_t m_TakerBit = 0;               // of this one among those of the base
+    std::shared_ptr<const std::string> m_Text; // the documents of its own alone, or the whole
+    std::size_t m_Length = 0;                  // of the whole
+    bool m_HasWholeText = true;
     std::shared_ptr<TreeMaker> m_Maker; // of the objects that are only recognised
     std::string_view m_Header;
     std::vector<Document> m_Documents; // empty: libyaml reads all of the text
