@@ -1,0 +1,168 @@
+#include "Repair/ObjectTraits.h"
+#include "Repair/UnbuiltReferences.h"
+#include "Session/MergeSession.h"
+#include "Support/Documents.h"
+
+#include <gtest/gtest.h>
+
+#include <thread>
+
+namespace {
+
+using namespace documents;
+
+/// Three files that have all of `shared` in common, around which each has what is its own.
+struct UnbuiltTest : testing::Test {
+    UnbuiltTest() { initialize(); }
+
+    /// Reads them, with the trees of all objects where `recognise` is off.
+    std::unique_ptr<MergeSession> Read(bool recognise = true, Threads threads = Threads::None) const {
+        auto session = std::make_unique<MergeSession>(threads);
+        ReaderOptions options = DefaultReaderOptions();
+        options.recognise = recognise;
+        session->Read({TextInput("base", ObjectText(shared + base)),
+                       TextInput("left", ObjectText(shared + left)),
+                       TextInput("right", ObjectText(shared + right))},
+                      nullptr, options);
+        return session;
+    }
+    /// The whole merge. "b" and "u" for each object of the result that is built or isn't, in file order,
+    /// ahead of its text.
+    std::string Merge(bool recognise = true) const {
+        const auto session = Read(recognise);
+        session->Prepare();
+        session->Diff();
+        session->Merge();
+        session->Apply(MergeSession::Base::UsedUp);
+        session->Repair();
+        const std::string built = Built(session->Result().GetMapping());
+        return built + "\n" + Written(session->Result());
+    }
+    static std::string Built(const YAMLMapping& root) {
+        std::string built;
+        for (const YAMLMapping::Entry entry : root) built += AsMapping(entry.value)->IsBuilt() ? 'b' : 'u';
+        return built;
+    }
+    /// The merge is that of objects that are all built, and these objects had to be.
+    void ExpectBuilt(const std::string& built) const {
+        const std::string merged = Merge(), expected = Merge(false);
+        EXPECT_EQ(merged.substr(0, merged.find('\n')), built);
+        EXPECT_EQ(merged.substr(merged.find('\n')), expected.substr(expected.find('\n')));
+    }
+
+    std::string shared, base, left, right;
+};
+
+std::string Transform(int id, int father) {
+    return "--- !o!4 &" + std::to_string(id) +
+           "\nTransform:\n  m_Father: {fileID: " + std::to_string(father) + "}\n";
+}
+
+TEST_F(UnbuiltTest, WhatNobodyTouchesIsNeverBuilt) {
+    shared = Transform(1, 0) + "--- !o!1 &2\nGameObject:\n  m_Name: 'a: b'\n";
+    base = "--- !o!1 &3\nGameObject:\n  m_Name: a\n";
+    left = "--- !o!1 &3\nGameObject:\n  m_Name: b\n";
+    right = base + "--- !o!1 &4\nGameObject:\n  m_Name: c\n";
+    ExpectBuilt("uubb");
+}
+
+TEST_F(UnbuiltTest, ChildrenOfARemovedTransformAreFoundInTheirBytes) {
+    shared = Transform(1, 9) + Transform(2, 90) + Transform(3, 0) +
+             "--- !o!4 &4\nTransform:\n  m_Name: m_Father\n  m_Father: {fileID: 0}\n";
+    base = right = Transform(9, 0);
+    ExpectBuilt("buub");
+}
+
+TEST_F(UnbuiltTest, LinksToARemovedPrefabAreFoundInTheirBytes) {
+    const auto linked = [](int id, const std::string& target) {
+        return "--- !o!1 &" + std::to_string(id) +
+               "\nGameObject:\n  a:\n  - m_PrefabInternal: {fileID: " + target + "}\n";
+    };
+    shared = linked(1, "9") + linked(2, "2") + linked(3, "0") + linked(4, "9, guid: a") +
+             "--- !o!1001 &5\nPrefab:\n  a: 1\n";
+    base = left = "--- !o!1001 &9\nPrefab:\n  a: 1\n";
+    ExpectBuilt("buubu");
+}
+
+TEST_F(UnbuiltTest, AnIDThatMovedIsFollowedInTheBytes) {
+    shared = "--- !o!1 &1\nGameObject:\n  a: {fileID: 90}\n--- !o!1 &2\nGameObject:\n  a: {fileID: 9}\n";
+    left = Transform(9, 0);
+    right = "--- !o!1 &9\nGameObject:\n  a: 1\n";
+    ExpectBuilt("ubbb");
+}
+
+/// A Transform of a prefab instance, which has to name it.
+TEST_F(UnbuiltTest, AStrippedTransformWithoutALinkIsAFailureStill) {
+    const auto failure = [this](bool recognise) { return ErrorOf([&] { Merge(recognise); }); };
+    shared = "--- !o!4 &1 stripped\nTransform:\n  m_PrefabInstance: {fileID: 7}\n";
+    EXPECT_EQ(failure(true), "none");
+    shared += "--- !o!4 &2 stripped\nTransform:\n  m_Other: {fileID: 7}\n";
+    EXPECT_NE(failure(false), "none");
+    EXPECT_EQ(failure(true), failure(false));
+}
+
+/// Where most is shared only the rest of left and right is kept, and a failure needs the whole.
+TEST_F(UnbuiltTest, FailuresHaveTheirPlaceInTheWholeFile) {
+    const auto place = [this](bool recognise) {
+        try {
+            Read(recognise);
+        } catch (const MergeError& error) {
+            return error.what() + ", " + error.Object() + ", " + std::to_string(error.Line());
+        }
+        return std::string("none");
+    };
+    for (int id = 10; id < 60; ++id) shared += Transform(id, 0);
+    left = "--- !o!1 &1\nA: 1\n--- !o!1 &2\nA: [\n" + Transform(3, 0);
+    EXPECT_TRUE(place(true).ends_with(", 2, 155")) << place(true);
+    EXPECT_EQ(place(true), place(false));
+    left = "--- !o!1 &1\n# only libyaml reads this\nA: 1\n" + Transform(3, 0);
+    EXPECT_EQ(place(true), "none");
+    EXPECT_EQ(Written(Read()->LeftObjects()), ObjectText(shared + "--- !o!1 &1\nA: 1\n" + Transform(3, 0)));
+}
+
+/// Transitions are changed in every file, so none may be shared.
+TEST_F(UnbuiltTest, WhatMayNotBeSharedIsReadOfTheBasesBytes) {
+    for (int id = 10; id < 60; ++id) shared += Transform(id, 0);
+    shared += "--- !o!1107 &1\nAnimatorStateMachine:\n  m_StateMachineTransitions:\n    first: {fileID: 1}\n";
+    right = Transform(2, 0);
+    ExpectBuilt(std::string(50, 'u') + "bb");
+}
+
+TEST_F(UnbuiltTest, AnyNumberOfThreadsMayAskForAnObject) {
+    for (int id = 1; id < 300; ++id) shared += Transform(id, id + 1);
+    const auto session = Read(true, Threads::Everywhere);
+    const YAMLMapping& root = session->BaseObjects().GetMapping();
+    ASSERT_EQ(Built(root), std::string(299, 'u'));
+    std::vector<std::string> seen(4);
+    std::vector<std::thread> threads;
+    for (std::string& text : seen)
+        threads.emplace_back([&] {
+            for (const YAMLMapping::Entry entry : root) text += Show(entry.value);
+        });
+    for (std::thread& thread : threads) thread.join();
+    EXPECT_EQ(seen, std::vector<std::string>(4, seen.front()));
+    EXPECT_EQ(Built(root), std::string(299, 'b'));
+}
+
+TEST_F(UnbuiltTest, WhatStandsOtherwiseThanUsualMayReferToAnything) {
+    const auto mayRefer = [](const std::string& fields) {
+        OvrinObjects objects;
+        struct NoTrees : TreeMaker {
+            YAMLMapping* Make(std::string_view) override { throw YAMLError("built"); }
+        } maker;
+        const YAMLMapping& object = *YAMLMapping::CreateUnbuilt(fields, maker);
+        return MayRefer(object, *YAMLScalar::mFather,
+                        [](const YAMLScalar* id) { return id == YAMLScalar::Lookup("12"); });
+    };
+    for (const char* no :
+         {"a: 12\n", "m_Father: {fileID: 1}\n", "m_Father: {fileID: 123}\n", "{m_Father: {fileID: 2, a: 12}}",
+          "m_Father: {fileID: 0}\nm_Father: {fileID: 1}\n"})
+        EXPECT_FALSE(mayRefer(no)) << no;
+    for (const char* yes : {"m_Father: {fileID: 12}\n", "m_Father: {fileID: 12, guid: a}\n",
+                            "m_Father: {fileID: -1}\n", "m_Father: {fileID: 1\n", "m_Father: {fileID: 1",
+                            "m_Father: {fileID: 0x}\n", "m_Father: {fileID: '1'}\n", "m_Father: {a: 1}\n",
+                            "m_Father:\n", "'m_Father': {fileID: 1}\n", "a: m_Father\n", "m_Father"})
+        EXPECT_TRUE(mayRefer(yes)) << yes;
+}
+
+} // namespace
