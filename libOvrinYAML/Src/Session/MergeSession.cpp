@@ -80,6 +80,8 @@ void MergeSession::Read(const std::vector<InputFile>& files, StageWatcher* watch
         m_Names.push_back(files[i].name);
         readings.push_back({kSteps[i], &files[i], objects[i]});
     }
+    // The check of component dependencies looks into every object.
+    if (m_Types.IsLoaded()) options.recognise = false;
     ReadInputs(readings, m_Threads, watcher, options);
 }
 

@@ -57,7 +57,7 @@ public:
     MergeSession(const MergeSession&) = delete;
     MergeSession& operator=(const MergeSession&) = delete;
 
-    /// What is known of the format of the files; wherever it stands ahead of Diff.
+    /// What is known of the format of the files; wherever it stands ahead of Diff, best ahead of Read.
     void SetRules(MergeRules rules, YAMLTypeInfoManager types = {});
     const MergeRules& Rules() const { return m_Rules; }
     const YAMLTypeInfoManager& Types() const { return m_Types; }
