@@ -67,6 +67,17 @@ TEST_F(SceneMapTest, WhatIsBrokenHasNoPlaceAndStopsNothing) {
     EXPECT_NE(PlacesIn(scene, {"70"}), "-");
 }
 
+TEST_F(SceneMapTest, RotationsTurnAlikeWhateverTheirLength) {
+    for (const std::string length : {"1", "3", "1e300", "1e-200", "-1e-300"}) {
+        const std::string turn = "; m_LocalRotation: {x: 0, y: " + length + ", z: 0, w: " + length + "}";
+        EXPECT_EQ(PlacesIn(Place(10, "A", 0, {}, turn) + Place(20, "B", 11, {}, At(1, 2, 0)), {"20"}),
+                  "0 200 -100")
+            << length;
+    }
+    const std::string none = "; m_LocalRotation: {x: 0, y: 0, z: 0, w: nan}";
+    EXPECT_EQ(PlacesIn(Place(10, "A", 0, {}, none) + Place(20, "B", 11), {"10", "20"}), "0 0 0, -");
+}
+
 TEST_F(SceneMapTest, ADeepHierarchyNeedsNoStack) {
     std::string scene;
     for (int i = 1; i <= 20000; ++i) scene += Place(10 * i, "D", i > 1 ? 10 * i - 9 : 0, {}, At(1, 0, 0));
