@@ -163,6 +163,20 @@ TEST_F(SceneViewTest, HostileScenesGetBoundedAnswers) {
     viewed.view.Map({});
 }
 
+TEST_F(SceneViewTest, WayIsShortenedWhereSomethingIsLeftOut) {
+    std::string deep;
+    for (int i = 1; i <= 258; ++i) deep += Place(10 * i, "D" + std::to_string(i), 10 * i - 9);
+    Viewed viewed(deep, deep, deep);
+    for (const int depth : {255, 256, 257}) {
+        const json hit = viewed.view.Find(std::to_string(10 * depth + 10), {0, 1})["hits"][0];
+        const json page = viewed.view.Object(std::to_string(10 * depth + 10), false);
+        EXPECT_EQ(hit.value("isShortened", false), depth > 256) << depth;
+        EXPECT_EQ(page.value("isShortened", false), depth > 256) << depth;
+        EXPECT_EQ(hit["way"].size(), std::min(depth, 256));
+        EXPECT_EQ(hit["names"].back(), "D" + std::to_string(std::min(depth, 256)));
+    }
+}
+
 TEST_F(SceneViewTest, RequestsThatMakeNoSenseAreRefused) {
     Viewed viewed(Place(10, "A"), Place(10, "A"), Place(10, "A"));
     const auto status = [&](const std::string& path, const std::map<std::string, std::string>& query) {
