@@ -120,6 +120,18 @@ TEST_F(ReviewPageTest, EndOfAProcessIsAProblemOfItsSceneAlone) {
     }
 }
 
+TEST_F(ReviewPageTest, SceneWhoseProcessEndedIsReadAgain) {
+    bool ends = false;
+    const Read mortal = [&] { return ends ? kAllEnds[0]() : Conflicts(1)(); };
+    Reviewed review({mortal, Conflicts(1), Conflicts(1), Conflicts(1)});
+    ends = true;
+    for (int time = 0; time < 2; ++time)
+        EXPECT_NE(review.Ask("tree").body.find("came to its end: ask again"), std::string::npos);
+    EXPECT_EQ(review.Ask("tree", {{"scene", "1"}}).status, 200);
+    ends = false;
+    EXPECT_EQ(review.Ask("tree").status, 200);
+}
+
 TEST_F(ReviewPageTest, ConflictsAreOneListOverAllScenes) {
     Reviewed review({Conflicts(0), Conflicts(3), kAllKinds[1], Conflicts(1), Conflicts(0), Conflicts(4)});
     const json all = review.Get("conflicts")["items"];

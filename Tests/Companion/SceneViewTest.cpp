@@ -46,6 +46,24 @@ TEST_F(SceneViewTest, MarksTellWhoDidWhat) {
     EXPECT_EQ(other.Tree(true), "Lantern changed by both\n");
 }
 
+TEST_F(SceneViewTest, WhatIsSeenFromFarthestIsTheMark) {
+    const auto scene = [](const std::string& boat) { return kHarbour + boat; };
+    const std::string here = scene(Place(20, "Boat", 11)), changed = scene(Place(20, "Boot", 11)),
+                      moved = scene(Place(20, "Boat")), both = scene(Place(20, "Boot")), gone = scene("");
+    const std::tuple<std::string, std::string, std::string, const char*> cases[] = {
+        {here, moved, changed, "moved by both"},     {here, gone, changed, "removed by ours"},
+        {here, moved, gone, "removed by theirs"},    {here, gone, gone, "removed by both"},
+        {gone, here, here, "added by both"},         {gone, here, gone, "added by ours"},
+        {here, here, both, "moved by theirs"},       {here, both, here, "moved by ours"},
+        {here, changed, changed, "changed by both"}, {here, here, here, "same"}};
+    for (const auto& [base, ours, theirs, mark] : cases) {
+        Viewed viewed(base, ours, theirs);
+        const json page = viewed.view.Object("20", false);
+        const std::string by = page["by"].is_null() ? "" : " by " + page["by"].get<std::string>();
+        EXPECT_EQ(page["mark"].get<std::string>() + by, mark);
+    }
+}
+
 TEST_F(SceneViewTest, WhatTheirsAloneRenamedHasItsNewName) {
     Viewed viewed(Place(10, "Pier"), Place(10, "Pier"), Place(10, "Quay"));
     EXPECT_EQ(viewed.Tree(), "Quay changed by theirs\n Transform same\n");
