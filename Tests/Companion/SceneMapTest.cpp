@@ -148,6 +148,18 @@ TEST_F(SceneMapTest, EveryObjectIsToldOrCountedOnceAtAnySizeOfSquares) {
     }
 }
 
+TEST_F(SceneMapTest, SquaresShareTheBoxEvenlyAndItsEdgesAreIn) {
+    std::string scene;
+    for (int i = 0; i < 4; ++i) scene += Place(10 * i + 10, "Post", 0, {}, At(i, 0, 0));
+    Viewed viewed(scene, scene, scene);
+    EXPECT_EQ(viewed.view.Map({MapView::Top, {}, 4})["items"].size(), 4);
+    const json bundles = viewed.view.Map({MapView::Top, {}, 2})["bundles"];
+    ASSERT_EQ(bundles.size(), 2);
+    EXPECT_EQ(bundles[0]["box"], json({0.0, 0.0, 1.0, 0.0}));
+    EXPECT_EQ(bundles[1]["x"], 2.5);
+    EXPECT_EQ(viewed.view.Map({MapView::Top, MapBox{1, 0, 2, 0}, 4})["items"].size(), 2);
+}
+
 TEST_F(SceneMapTest, ABoxShowsWhatIsInIt) {
     Viewed viewed = Field(1500, 10);
     std::size_t count = 0;
