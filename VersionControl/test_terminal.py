@@ -187,6 +187,24 @@ def test_locale_says_which_characters_are_shown(user, terminal, locale):
         assert "灯台 n\u0308" in shown and "│" in shown
 
 
+# As a keyboard or a paste of another locale brings them, and what is cut in the midst of a character.
+@pytest.mark.parametrize("locale", ["C.UTF-8", "C"])
+def test_bytes_that_are_no_characters_do_no_harm(user, terminal, locale):
+    user.conflict(*ONE_CONFLICT)
+    screen = terminal(LC_ALL=locale)
+    screen.run("ovrin settle")
+    screen.see("1 of 1 open")
+    for stray in (["e4"], ["80"], ["e2", "9a"], ["f4", "90", "80", "80"], ["e0", "81", "b4"], ["ff"]):
+        screen.tmux("send-keys", "-H", *stray)
+        screen.see("That key does nothing here")
+        screen.press("n")
+    screen.press("/", "x")
+    screen.tmux("send-keys", "-H", "e2", "9a", "93", "e4")
+    screen.see("Search: x⚓_" if locale == "C.UTF-8" else "Search: x\\u2693_")
+    screen.press("Escape", "t")
+    screen.see("0 of 1 open")
+
+
 def test_colours_are_left_out_on_request(user, terminal):
     user.conflict(*ONE_CONFLICT)
     colours = []
