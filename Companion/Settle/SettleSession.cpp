@@ -269,6 +269,8 @@ std::size_t SettleSession::TakeEach(const std::function<std::optional<Side>(cons
             for (const auto& [side, conflicts] : round) AddConsequences(conflicts, {side});
             MergeAgain();
         }
+        // Nothing is no step, save that what both sides added was looked through.
+        if (m_Decisions.size() == before && !m_Merge.IsBothAdded()) return std::size_t{0};
         EndStep(before);
         std::size_t settled = tried.size();
         for (const OpenConflict& conflict : Open()) settled -= tried.count(conflict.path);
