@@ -195,17 +195,6 @@ TEST_F(GateServerTest, LastAnswerArrivesWholeAheadOfTheEnd) {
     EXPECT_EQ(End(), 0);
 }
 
-TEST_F(GateServerTest, PagesAreCountedAsTheyComeAndGo) {
-    Descriptor first = Asked(Request("GET", "api/alive"));
-    EXPECT_EQ(Heard(), (WebFrame{"pages", "1"}));
-    Descriptor second = Asked(Request("GET", "api/alive"));
-    EXPECT_EQ(Heard(), (WebFrame{"pages", "2"}));
-    first.Close();
-    EXPECT_EQ(Heard(), (WebFrame{"pages", "1"}));
-    second.Close();
-    EXPECT_EQ(Heard(), (WebFrame{"pages", "0"}));
-}
-
 TEST_F(GateServerTest, EndOfTheModelEndsTheServerWithAllThatWait) {
     const Descriptor page = Asked(Request("GET", "api/alive")), waiting = Asked(Request("GET", "api/slow"));
     while (Heard().at(0) != "request") {
@@ -219,13 +208,6 @@ TEST_F(GateServerTest, EndOfTheModelEndsTheServerWithAllThatWait) {
 TEST_F(GateServerTest, AnswerThatNobodyAskedForEndsTheServer) {
     Answer("unasked");
     EXPECT_EQ(End(), 0);
-}
-
-TEST_F(GateServerTest, PortIsOneServersAlone) {
-    Served other;
-    other.Send({"serve", kToken, port});
-    EXPECT_EQ(other.Heard(), (WebFrame{"failed", "port " + port + " of 127.0.0.1 can't be had"}));
-    EXPECT_EQ(other.End(), 1);
 }
 
 TEST(GateServer, OrderThatIsNoneEndsIt) {

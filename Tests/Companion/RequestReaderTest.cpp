@@ -116,17 +116,4 @@ TEST_F(RequestReaderTest, AnswerArrivesWholeOrIsGivenUp) {
     EXPECT_FALSE(SendInTime(here.Get(), "x", 1, Clock::now() + std::chrono::seconds(30)));
 }
 
-TEST_F(RequestReaderTest, WhoSendsOnIsNotReadForEver) {
-    Connect(SOCK_STREAM);
-    std::thread sender([&] {
-        while (send(there.Get(), kBody.data(), kBody.size(), MSG_NOSIGNAL) > 0) {
-        }
-    });
-    const auto begun = Clock::now();
-    FinishSending(here.Get());
-    EXPECT_LT(Clock::now() - begun, std::chrono::seconds(10));
-    here.Close();
-    sender.join();
-}
-
 } // namespace
