@@ -61,7 +61,8 @@ public:
     /// decided.
     std::vector<Decision> Decide(const std::vector<Decision>& decisions, Follow follow = Follow::Yes);
     /// Decides all open conflicts that `isMeant` accepts, and those of them that follow, for a side, as one
-    /// step. What can't be settled by a side stays open. Returns how many conflicts were settled.
+    /// step. What can't be settled by a side stays open. Returns how many conflicts were settled. Where none
+    /// is meant there is no step, save in a scene that both sides added.
     std::size_t TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant);
     /// The same by what is proposed of each.
     std::size_t TakeProposed(const std::function<bool(const OpenConflict&)>& isMeant);
