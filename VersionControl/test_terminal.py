@@ -311,7 +311,6 @@ WITH_A_SMALL_DISK = """
     ovrin settle"""
 
 
-
 def wait_for(path):
     until = time.monotonic() + SECONDS
     while not path.exists():

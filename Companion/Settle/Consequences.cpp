@@ -4,6 +4,8 @@
 #include "Conflicts/Requirements.h"
 #include "Settle/StructureDecisions.h"
 
+#include <algorithm>
+#include <iterator>
 #include <unordered_set>
 
 namespace ovrin {
@@ -27,6 +29,10 @@ std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
             for (const MergeNames::ID needing : NeededBy(merge.Session(), id, side))
                 if (structure.IsWithout(needing, without)) removed.push_back(needing);
         }
+        std::vector<MergeNames::ID> before;
+        std::ranges::copy_if(taken.alreadyKept, std::back_inserter(before),
+                             [&](MergeNames::ID id) { return structure.IsWithout(id, without); });
+        structure.AlreadyKept(before, without);
         structure.Keep(kept, without);
         if (taken.wereSettled) structure.Return(given, without);
         structure.Remove(removed, without);

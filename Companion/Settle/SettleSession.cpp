@@ -43,6 +43,19 @@ bool IsSoAlready(const Decision& decision, const DecisionTable& decided, const M
     return side && isIn(VersionOf(*side)) == isIn(VersionOf(decision.side));
 }
 
+/// The objects that a side removed, and that are kept by a decision about a conflict.
+std::vector<MergeNames::ID> KeptBy(const DecisionTable& decided, const MetConflicts& conflicts,
+                                   const MergeNames& names) {
+    std::vector<MergeNames::ID> kept;
+    for (std::size_t i = 0; i < conflicts.size(); ++i) {
+        const Path& path = conflicts[i].path;
+        if (path.size() != 1) continue;
+        const std::optional<Side> side = decided.Find(path);
+        if (side && names.Has(VersionOf(*side), path.front())) kept.push_back(path.front());
+    }
+    return kept;
+}
+
 } // namespace
 
 SettleSession::SettleSession(OpenMerge merge, Progress progress)
@@ -231,6 +244,8 @@ bool SettleSession::EndLoops(const std::vector<Decision>& decisions) {
 
 void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, TakenSide taken) {
     const DecisionTable decided(m_Decisions);
+    const std::vector<MergeNames::ID> kept = KeptBy(decided, m_Conflicts, m_Names);
+    taken.alreadyKept = kept;
     for (const Decision& more : Consequences(m_Merge, m_Names, Open(), conflicts, taken))
         if (!IsSoAlready(more, decided, m_Names)) m_Decisions.push_back(more);
 }

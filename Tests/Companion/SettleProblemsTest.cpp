@@ -149,14 +149,27 @@ TEST_F(SettleProblemsTest, KeptObjectThatItsListLacksIsToldAndMended) {
     session->Decide({{"20", Side::Ours}});
     EXPECT_EQ(Told(), "Harbour/Lantern isn't in the list of children of Harbour\n  remove Harbour/Lantern, "
                       "too\n  take Harbour from ours\n  take Harbour from base\n");
-    Mend(0);
-    EXPECT_EQ(Told(), "");
-    session->Undo();
-    session->Decide({{"30", Side::Ours}});
-    EXPECT_EQ(session->Problems().size(), 2);
     Mend(1);
     EXPECT_EQ(Told(), "");
+    session->Decide({{"30", Side::Ours}});
     EXPECT_EQ(session->Result(), kHeader + HarbourWith(both, 5));
+}
+
+TEST_F(SettleProblemsTest, ListFollowsAllThatAreKeptOfItOneByOne) {
+    const std::map<int, std::string> both = {{20, "Lantern"}, {30, "Buoy"}};
+    Settle(HarbourWith(both), HarbourWith(both, 5), HarbourWith({}));
+    const std::vector<Decision> decisions = {{"20", Side::Ours}, {"30", Side::Base}};
+    session->Decide({decisions[0]});
+    session->Decide({decisions[1]});
+    EXPECT_EQ(Told(), "");
+    const std::string result = session->Result();
+    EXPECT_NE(result.find("m_Children: [{fileID: 21}, {fileID: 31}]"), std::string::npos) << result;
+    EXPECT_TRUE(session->Undo() && session->Undo());
+    session->Decide(decisions); // as one step
+    EXPECT_EQ(session->Result(), result);
+    session->Undo();
+    session->TakeAll(Side::Theirs, [](const OpenConflict&) { return true; });
+    EXPECT_EQ(session->Result(), kHeader + HarbourWith({}));
 }
 
 TEST_F(SettleProblemsTest, AnotherSideTakesBackWhatFollowedFromTheFirst) {

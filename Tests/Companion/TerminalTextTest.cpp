@@ -4,6 +4,7 @@
 #include "Settle/Terminal/TextDifference.h"
 #include "Support/Surroundings.h"
 
+#include <algorithm>
 #include <clocale>
 #include <gtest/gtest.h>
 #include <random>
