@@ -61,7 +61,7 @@ void WritePage(const std::string& file, ReviewPage& review, const ReviewPage::Pr
 
 void Serve(const PageOptions& options, ReviewPage& review) {
     ServePages(options, [&](const PageRequest& request) {
-        if (std::optional<PageAnswer> file = AnswerFile(request)) return std::move(*file);
+        if (std::optional<PageAnswer> file = AnswerPageFile(request)) return std::move(*file);
         return review.Answer(request);
     });
 }
