@@ -1,6 +1,6 @@
 #include "Commands/ReviewCommand.h"
 
-#include "Commands/PathArguments.h"
+#include "Commands/DiffArguments.h"
 #include "Commands/ReviewVersions.h"
 #include "Destination.h"
 #include "Names/PrintableText.h"
@@ -92,17 +92,10 @@ Outcome RunReview(const ReviewWish& wish) {
 
 Action DescribeReview(CLI::App& command) {
     const auto wish = std::make_shared<ReviewWish>();
-    command
-        .add_option("REVISION", wish->operands.words,
-                    "none: the working tree against the last commit; one: against the working tree; two, or "
-                    "A..B, A...B: against each other; or two files, or three: BASE OURS THEIRS")
-        ->expected(0, -1);
-    command.add_option(kPathOption, wish->operands.paths, "only these files or folders; also behind --")
-        ->type_name("PATH")
-        ->expected(1)
-        ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
-    auto* staged =
-        command.add_flag("--staged,--cached", wish->operands.isStaged, "show what is to be committed");
+    auto* staged = AddDiffOperands(
+        command, wish->operands,
+        "none: the working tree against the last commit; one: against the working tree; two, or "
+        "A..B, A...B: against each other; or two files, or three: BASE OURS THEIRS");
     command.add_option("--merge", wish->merge, "show the two sides of a merge, and what came of them")
         ->type_name("COMMIT")
         ->excludes(staged);
