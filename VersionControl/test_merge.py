@@ -271,3 +271,4 @@ def test_full_working_tree_loses_nothing(user, kilobytes):
     done = subprocess.run(["unshare", "-rm", "sh", "-c", ON_FULL_TREE, "sh", str(kilobytes)], cwd=user.here.parent,
                           env=user.environment, stdout=subprocess.PIPE, stderr=subprocess.PIPE, check=False)
     assert done.stdout.decode() in (scene("2 Lamp 1"), OTHER_FIELDS[2] + scene("2 Lamp 1")), done.stderr.decode()
+    assert "is not merged" not in done.stderr.decode() or "Make room there" in done.stderr.decode()

@@ -22,6 +22,7 @@
 #include "Systems/WorkingPath.h"
 #include "Words/Failure.h"
 #include "Words/ProgressLine.h"
+#include "Words/WriteFailure.h"
 
 #include "Destination.h"
 #include "FileUtils.h"
@@ -102,8 +103,8 @@ void DeliverResult(const std::string& file, const std::string& text) {
     const Content content = {text.size(), [&](OutputStream& stream) { stream << text; },
                              IsPassing(file) ? Durability::Passing : Durability::Unsynced};
     if (const int error = Deliver(file, content))
-        throw Failure("cannot write the result, " + Printable(file) + ": " +
-                      std::system_category().message(error));
+        throw WriteFailure("cannot write the result, " + Printable(file) + ": " +
+                           std::system_category().message(error));
 }
 
 /// As version control would have done it if the file had another name.
@@ -164,7 +165,8 @@ std::string Record(const Records& records, const FileMerge& files, OpenMerge mer
         return {};
     } catch (const std::exception& error) {
         return std::string("The merge could not be written down: ") + error.what() +
-               "\nNothing is lost: version control keeps all three versions until the file is settled.\n";
+               "\nNothing is lost: version control keeps all three versions until the file is settled, and "
+               "with git \"ovrin settle\" merges them again.\n";
     }
 }
 

@@ -10,11 +10,11 @@
 #include "Settle/Web/SinglePage.h"
 #include "Words/Failure.h"
 #include "Words/ProgressCount.h"
+#include "Words/WriteFailure.h"
 
 #include <CLI/CLI.hpp>
 #include <iostream>
 #include <memory>
-#include <system_error>
 
 namespace ovrin {
 
@@ -56,7 +56,7 @@ void WritePage(const std::string& file, ReviewPage& review, const ReviewPage::Pr
     const std::string path = file == "-" ? "" : file;
     if (const int error = Deliver(
             path, {page.size(), [&page](OutputStream& stream) { stream << page; }, Durability::Synced}))
-        throw Failure("Cannot write " + Printable(file) + ": " + std::system_category().message(error));
+        throw Failure("Cannot write " + Printable(file) + ": " + WhyNotWritten(error));
 }
 
 void Serve(const PageOptions& options, ReviewPage& review) {

@@ -6,6 +6,7 @@
 #include "Names/PrintableText.h"
 #include "Systems/Repository.h"
 #include "Words/Failure.h"
+#include "Words/WriteFailure.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -64,7 +65,7 @@ void Write(const std::string& file, const std::string& header, const std::vector
     };
     content.durability = durability;
     if (const int error = Deliver(file, content))
-        throw Failure("Cannot write " + file + ": " + std::system_category().message(error));
+        throw Failure("Cannot write " + file + ": " + WhyNotWritten(error));
 }
 
 std::string HeaderOf(const OpenMerge& merge) {

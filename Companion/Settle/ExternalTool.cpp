@@ -7,6 +7,7 @@
 #include "Systems/ScratchFolder.h"
 #include "Words/Failure.h"
 
+#include "Words/WriteFailure.h"
 #include <cerrno>
 #include <system_error>
 #include <unistd.h>
@@ -25,7 +26,7 @@ std::string Read(const std::string& file) {
 void Write(const std::string& file, const std::string& bytes, Durability durability) {
     const Content content{bytes.size(), [&](OutputStream& stream) { stream << bytes; }, durability};
     if (const int error = Deliver(file, content))
-        throw Failure(Printable(file) + " can't be written: " + std::system_category().message(error));
+        throw Failure(Printable(file) + " can't be written: " + WhyNotWritten(error));
 }
 
 /// The file, or one that stands for it where it is missing or empty: a scene without objects, with the header
