@@ -27,6 +27,7 @@ using nlohmann::json;
 
 constexpr const char* kMergeExtension = ".merge";
 constexpr const char* kProgressExtension = ".progress";
+constexpr std::uint64_t kPlaces = 4;                      // of a path; more where all of them are taken
 constexpr std::size_t kMostHeader = std::size_t{1} << 20; // bytes
 
 /// FNV-1a, of 64 bits, in hexadecimal digits. Paths of one number are told apart by what the files say.
@@ -173,13 +174,18 @@ bool IsOfAnother(const std::string& file, const std::string& path) {
 OpenMerges::OpenMerges(const Repository& repository) : m_Folder(repository.data + "/ovrin/") {}
 
 OpenMerges::Place OpenMerges::PlaceOf(const std::string& path) const {
-    for (std::uint64_t attempt = 0;; ++attempt) {
+    std::string free;
+    for (std::uint64_t attempt = 0; attempt < kPlaces || free.empty(); ++attempt) {
+/// Its record may stand behind a gap, which is left where that of another path of the same number was
+/// removed.
         const std::string file = m_Folder + NumberOf(path, attempt);
-        if (IsMissing(file + kMergeExtension)) return {file, false};
-        if (!IsOfAnother(file + kMergeExtension, path)) return {file, true};
+        const bool isMissing = IsMissing(file + kMergeExtension);
+        if (!isMissing && !IsOfAnother(file + kMergeExtension, path)) return {file, true};
+        if (isMissing && free.empty()) free = file;
     }
 }
 
+    return {free, false};
 void OpenMerges::MakeFolder() const {
     std::error_code error;
     fs::create_directories(m_Folder, error);
