@@ -205,16 +205,9 @@ def test_file_of_decisions_gives_what_the_engine_gives(user):
 
 
 def test_only_the_named_files_are_settled_from_where_the_user_is(user):
-    user.start()
     (user.here / "inner").mkdir()
     files = ("one.ovrin", "inner/two.ovrin", "inner/three.ovrin")
-    for branch, text in zip(("main", "topic", "main"), ONE_CONFLICT):
-        user.git("checkout", "-q", *(("-b", branch) if branch == "topic" else (branch,)))
-        for name in files:
-            user.write(text, name)
-        user.git("add", ".")
-        user.git("commit", "-qm", "change")
-    user.git("merge", "topic", fails=True)
+    user.conflicts(dict.fromkeys(files, ONE_CONFLICT))
     top, user.here = user.here, user.here / "inner"
     user.ovrin("settle", "--take", "theirs", "two.ovrin")
     assert "Still unmerged: inner/three.ovrin and 1 more" in user.words()

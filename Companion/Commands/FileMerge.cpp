@@ -176,6 +176,7 @@ OpenMerge DescribeOpen(const FileMerge& files, const Records& records, const std
     OpenMerge open;
     open.path = records.path.empty() ? files.path : records.path;
     open.occasion = FindOccasion(records.repository, caller, files.labels);
+    if (caller) open.process = caller->process;
     open.isBothAdded = merge.IsBothAdded();
     open.conflicts = merge.Open().size();
     return open;
@@ -195,6 +196,12 @@ constexpr const char* kNextStep =
     "Next: \"ovrin settle\" settles the open conflicts of all scenes, \"ovrin settle --web\" does so in the "
     "browser; \"ovrin settle --take theirs\" takes a side at all of them.\n";
 
+/// Once for all scenes that version control merges at one go, ahead of its record.
+std::string TellNext(const Records& records, const OpenMerge& open) {
+    const bool isTold = !records.path.empty() && OpenMerges(*records.repository).HasFellowOf(open);
+    return isTold ? "" : kNextStep;
+}
+
 Outcome LeaveOpen(const FileMerge& files, const Records& records, SceneMerge& merge, ProgressLine& progress) {
     // Version control takes its time for the answer, which most often is ours.
     std::future<Side> take = std::async([&] { return SideToTake(records.repository); });
@@ -207,9 +214,10 @@ Outcome LeaveOpen(const FileMerge& files, const Records& records, SceneMerge& me
         merge.Merge({}, open.take);
         result = merge.Result();
     }
-    const std::string complaint = isRecorded ? Record(records, files, open) : "";
+    std::string behind = isRecorded ? TellNext(records, open) : "";
+    if (isRecorded) behind.insert(0, Record(records, files, open));
     DeliverResult(files.result, result);
-    const std::string told = TellOpen(merge, open) + complaint + (isRecorded ? kNextStep : "");
+    const std::string told = TellOpen(merge, open) + behind;
     progress.Wipe();
     Tell(told);
     return Outcome::LeftOpen;

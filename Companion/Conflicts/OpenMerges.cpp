@@ -74,6 +74,7 @@ std::string HeaderOf(const OpenMerge& merge) {
     const json header = {
         {"version", 1},
         {"identity", merge.identity},
+        {"process", merge.process},
         {"action", occasion.action},
         {"base", occasion.base},
         {"ours", occasion.ours},
@@ -101,6 +102,7 @@ constexpr std::size_t kPartsWithoutTexts = 3;
 void TakeHeader(const json& header, OpenMerge& merge) {
     if (header.at("version") != 1) throw Failure("written by a newer version of ovrin");
     merge.identity = header.at("identity");
+    merge.process = header.value("process", "");
     merge.occasion = {header.at("action"), header.at("base"), header.at("ours"), header.at("theirs"),
                       header.at("head")};
     merge.take = SideNamed(header.at("take").get<std::string>());
@@ -173,19 +175,19 @@ bool IsOfAnother(const std::string& file, const std::string& path) {
 
 OpenMerges::OpenMerges(const Repository& repository) : m_Folder(repository.data + "/ovrin/") {}
 
+/// Its record may stand behind a gap, which is left where that of another path of the same number was
+/// removed.
 OpenMerges::Place OpenMerges::PlaceOf(const std::string& path) const {
     std::string free;
     for (std::uint64_t attempt = 0; attempt < kPlaces || free.empty(); ++attempt) {
-/// Its record may stand behind a gap, which is left where that of another path of the same number was
-/// removed.
         const std::string file = m_Folder + NumberOf(path, attempt);
         const bool isMissing = IsMissing(file + kMergeExtension);
         if (!isMissing && !IsOfAnother(file + kMergeExtension, path)) return {file, true};
         if (isMissing && free.empty()) free = file;
     }
+    return {free, false};
 }
 
-    return {free, false};
 void OpenMerges::MakeFolder() const {
     std::error_code error;
     fs::create_directories(m_Folder, error);
@@ -211,6 +213,21 @@ std::vector<OpenMerge> OpenMerges::List() const {
         throw Failure("Cannot look into " + m_Folder + ": " + error.message());
     std::ranges::sort(merges, {}, &OpenMerge::path);
     return merges;
+}
+
+bool OpenMerges::HasFellowOf(const OpenMerge& merge) const {
+    if (merge.process.empty()) return false;
+    std::error_code error;
+    const fs::directory_iterator files(m_Folder, error);
+    return std::any_of(begin(files), end(files), [&](const fs::directory_entry& entry) {
+        if (entry.path().extension() != kMergeExtension) return false;
+        try {
+            const OpenMerge other = ReadMerge(entry.path().string(), Extent::WithoutTexts);
+            return other.process == merge.process && other.occasion.head == merge.occasion.head;
+        } catch (const Failure&) {
+            return false;
+        }
+    });
 }
 
 std::optional<OpenMerge> OpenMerges::Find(const std::string& path) const {
