@@ -41,7 +41,10 @@ SettleSession::SettleSession(OpenMerge merge, Progress progress)
     Meet();
     if (m_Source.identity.empty()) m_Source.conflicts = Open().size();
     m_Problems = FindProblems(m_Merge, m_Names);
-    if (!m_Decisions.empty()) MergeAgain();
+    if (m_Decisions.empty()) return;
+    // What later decisions took the place of isn't met any more, but is in the merge without them.
+    for (const std::string& path : MergeAgain())
+        if (!Touches(path)) m_Idle.push_back(path);
 }
 
 /// The conflicts of the merge as it is in this process.
