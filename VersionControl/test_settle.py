@@ -218,6 +218,34 @@ def test_only_the_named_files_are_settled_from_where_the_user_is(user):
     user.git("commit", "-qm", "merged")
 
 
+def test_kept_decision_that_matches_nothing_is_told(user):
+    user.conflict(scene("1 Lantern 1"), scene("2 Lantern 3"), scene("5 Lantern 4"))
+    user.ovrin("settle", "--set", "10.GameObject.m_Layer=theirs", status=LEFT_OPEN)
+    progress, = (user.here / ".git/ovrin").glob("*.progress")
+    progress.write_text(progress.read_text(encoding="utf-8").replace("m_Layer", "m_Other"), encoding="utf-8")
+    user.ovrin("settle", "--list", status=LEFT_OPEN)
+    assert "match nothing in this merge have no effect: 10.GameObject.m_Other;" in user.words()
+
+
+def test_sides_that_contradict_each_other_in_a_loop_of_parents_are_told(user):
+    def objects(boat, pier, order=(0, 0)):
+        return HEADER + "".join(
+            f"--- !o!1 &{number}\nGameObject:\n  m_Component:\n  - component: {{fileID: {number + 1}}}\n"
+            f"  m_Name: {name}\n--- !o!4 &{number + 1}\nTransform:\n  m_GameObject: {{fileID: {number}}}\n"
+            f"  m_Father: {{fileID: {father}}}\n  m_RootOrder: {place}\n"
+            for number, name, father, place in ((10, "Boat", boat, order[0]), (40, "Pier", pier, order[1])))
+
+    user.conflict(objects(0, 0), objects(0, 11, (1, 0)), objects(41, 0, (0, 1)))
+    contradiction = ("--set", "11.Transform.m_Father=ours", "--set", "41.Transform.m_Father=theirs")
+    user.ovrin("settle", *contradiction, status=LEFT_OPEN)
+    words = "would still be below each other: take one side for all of them"
+    assert f"taken: ours, but with the sides that are taken, the objects {words}" in user.ovrin(
+        "settle", "--list", status=LEFT_OPEN)
+    assert f"you took theirs (topic), but with the sides that are taken, the objects {words}" in user.run(
+        "sh", "-c", "ovrin settle --prompt </dev/null", fails=True)
+    user.ovrin("settle", "--take", "theirs")
+
+
 def test_merge_without_the_driver_is_settled_as_well(user):
     user.sides(*CONFLICT_AND_MORE)
     user.git("-c", "merge.ovrin.driver=false", "merge", "topic", fails=True)

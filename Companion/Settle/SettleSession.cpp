@@ -94,8 +94,7 @@ void SettleSession::TakeStates(const std::vector<std::string>& open) {
     const DecisionTable decided(m_Decisions);
     std::vector<MetConflicts::State> states(m_Conflicts.size(), {false, {}});
     for (const std::string& path : open) states[*m_Conflicts.Find(PathOfDecision(path))].isOpen = true;
-    for (std::size_t i = 0; i < states.size(); ++i)
-        if (!states[i].isOpen) states[i].decided = decided.Find(m_Conflicts[i].path);
+    for (std::size_t i = 0; i < states.size(); ++i) states[i].decided = decided.Find(m_Conflicts[i].path);
     m_Conflicts.SetStates(std::move(states));
 }
 

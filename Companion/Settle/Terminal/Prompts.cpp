@@ -113,6 +113,8 @@ void Prompts::TellConflictHere(const SettleDesk::Item& item) {
     Tell(TellConflict(words, SideLabels::Of(m_Walk.SceneOf(here).Source().occasion)));
     if (!item.isOpen)
         Tell("  settled" + (item.decided ? ": " + m_Walk.NameOf(here, *item.decided) : ""));
+    else if (item.decided)
+        Tell("  you took " + m_Walk.NameOf(here, *item.decided) + ", but " + kStillLoop);
     else if (item.proposed)
         Tell("  decided before: " + m_Walk.NameOf(here, *item.proposed) + ", which Enter takes again");
 }
