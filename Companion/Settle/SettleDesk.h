@@ -83,6 +83,7 @@ public:
 
     /// SettleScenes::Finish, after which finished scenes stay in the list.
     std::vector<std::string> Finish(bool overwrite, Remarks& remarks);
+    const Remarks& ChangedByHand() const { return m_Scenes.ChangedByHand(); }
 
 private:
     template <class Make> Step MakeStep(const Make& make);

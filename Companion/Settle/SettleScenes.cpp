@@ -268,6 +268,7 @@ std::vector<std::string> SettleScenes::Finish(bool overwrite, Remarks& remarks) 
     const std::vector<SettleSession*> sessions = ToFinish();
     const std::set<std::string> open = PathsStillOpen(sessions);
     std::vector<std::string> finished;
+    m_ChangedByHand.clear();
     for (SettleSession* session : sessions) {
         const std::string& path = session->Source().path;
         if (!open.contains(path)) {
@@ -280,7 +281,8 @@ std::vector<std::string> SettleScenes::Finish(bool overwrite, Remarks& remarks) 
             continue;
         }
         if (!overwrite && !IsUntouched(*session, result)) {
-            remarks.push_back(TellByHand(path));
+            m_ChangedByHand.push_back(TellByHand(path));
+            remarks.push_back(m_ChangedByHand.back());
             continue;
         }
         DeliverScene(FileOf(path), result);

@@ -191,7 +191,8 @@ void Prompts::Finish() {
         m_End.finished.insert(m_End.finished.end(), finished->paths.begin(), finished->paths.end());
         m_End.refused = finished->refused;
         m_IsOver = true;
-        if (overwrite || m_End.refused.empty() || !IsAgreed(QuestionToOverwrite(m_End.refused))) return;
+        const Remarks& changed = finished->changedByHand;
+        if (overwrite || changed.empty() || !IsAgreed(QuestionToOverwrite(changed))) return;
     }
 }
 

@@ -182,7 +182,8 @@ void Screen::Finish(bool overwrite) {
     if (!finished) return; // which was said
     m_Ended.finished.insert(m_Ended.finished.end(), finished->paths.begin(), finished->paths.end());
     m_Ended.refused = finished->refused;
-    if (finished->refused.empty() || overwrite) return Leave();
+    m_ChangedByHand = finished->changedByHand;
+    if (m_ChangedByHand.empty() || overwrite) return Leave();
     m_Mode = Mode::AskingToOverwrite;
 }
 
@@ -196,7 +197,7 @@ std::string Screen::Question() const {
     case Mode::AskingToFinish:
         return QuestionToFinish(m_Walk);
     case Mode::AskingToOverwrite:
-        return QuestionToOverwrite(m_Ended.refused);
+        return QuestionToOverwrite(m_ChangedByHand);
     default:
         return m_Walk.Said();
     }

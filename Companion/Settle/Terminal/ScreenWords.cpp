@@ -95,9 +95,9 @@ std::string QuestionToFinish(const Walk& walk) {
            ". Finish what is settled, and leave? What you decided of the rest is kept. y yes, n no";
 }
 
-std::string QuestionToOverwrite(const Remarks& refused) {
+std::string QuestionToOverwrite(const Remarks& changedByHand) {
     std::string question;
-    for (const std::string& remark : refused) question += remark + ". ";
+    for (const std::string& remark : changedByHand) question += remark + ". ";
     return question + "Put the settled scene in place there, too? y yes, n leave the file as it is";
 }
 

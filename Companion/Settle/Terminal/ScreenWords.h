@@ -26,7 +26,7 @@ bool NeedsQuestion(const Walk& walk);
 /// are none.
 std::string QuestionToFinish(const Walk& walk);
 /// Whether to replace the files that these remarks are about.
-std::string QuestionToOverwrite(const Remarks& refused);
+std::string QuestionToOverwrite(const Remarks& changedByHand);
 /// A whole screen that is too small for anything else.
 std::vector<StyledLine> TooSmall(Extent extent, Extent least);
 

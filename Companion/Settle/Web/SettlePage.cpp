@@ -222,6 +222,7 @@ PageAnswer SettlePage::Finish(bool overwrite) {
     const bool isOver = m_Finished.size() == m_Desk.Scenes().size();
     return LastAnswer(isOver, {{"finished", AllPrintable(finished)},
                                {"remarks", remarks},
+                               {"changedByHand", m_Desk.ChangedByHand().size()},
                                {"next", isOver ? Next() : std::vector<std::string>()},
                                {"isOver", isOver}});
 }
