@@ -12,6 +12,7 @@ import socket
 
 import pytest
 
+from car import car, merge_cars
 from harbour import HEADER, Scene, harbour
 from page import Page
 from user import LEFT_OPEN
@@ -124,6 +125,19 @@ def test_focus_stays_on_the_button_that_was_pressed(harbour_user, driver):
         assert sight.focused("data-focus") == "undo" and sight.focused("aria-disabled") == "true"
         sight.press(sight.ENTER)
         sight.wait_until(lambda: "nothing to take back" in sight.text("#happened"))
+
+
+def test_component_goes_with_what_it_requires(user, driver):
+    merge_cars(user)
+    with Page(user, *SETTLE) as page:
+        sight = Sight(driver, page.address)
+        assert "Remove Car · Engine and what needs it" in sight.text("#panel-values")
+        sight.press("t")
+        sight.wait_for_count("Settled")
+        sight.press("f", sight.ENTER)
+        assert "settled and written" in sight.heading("main.over h1")
+        sight.check_errors()
+    assert user.read() == car()
 
 
 def test_what_cannot_be_finished_yet_says_why(harbour_user, driver):
