@@ -40,7 +40,7 @@ private:
 
     void Answer(const std::string& answer);
     void Confirm();
-    void TakeWhole();
+    void TakeAll();
     void Search(const std::string& text);
     void Finish();
 
@@ -145,8 +145,8 @@ void Prompts::Answer(const std::string& answer) {
         return Tell(HelpLines(kColumns, m_Letters, true));
     case Request::ViewOn:
         return TellValues();
-    case Request::Whole:
-        return TakeWhole();
+    case Request::All:
+        return TakeAll();
     case Request::Finish:
         return Finish();
     case Request::Leave:
@@ -164,11 +164,11 @@ void Prompts::Confirm() {
     m_Walk.GoToNextOpen();
 }
 
-void Prompts::TakeWhole() {
+void Prompts::TakeAll() {
     const auto answer = Ask(QuestionForSide(m_Walk) + ": ");
     const auto side = answer && answer->size() == 1 ? SideOf(KeyOf(answer->front())) : std::nullopt;
     if (side)
-        m_Walk.TakeWhole(*side);
+        m_Walk.TakeAll(*side);
     else
         m_Walk.Say("Nothing was decided");
 }

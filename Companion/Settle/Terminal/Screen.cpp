@@ -93,7 +93,7 @@ void Screen::Answer(Request request, Key key) {
         m_Typed.clear();
         m_Mode = Mode::Searching;
         return;
-    case Request::Whole:
+    case Request::All:
         m_Mode = Mode::AskingSide;
         return;
     case Request::Finish:
@@ -142,7 +142,7 @@ void Screen::AskSide(Key key) {
     m_Mode = Mode::Walking;
     const auto side = SideOf(key);
     if (!side) return m_Walk.Say("Nothing was decided");
-    m_Walk.TakeWhole(*side);
+    m_Walk.TakeAll(*side);
     Arrive();
 }
 

@@ -16,7 +16,7 @@ std::string CountLine(const Walk& walk);
 std::string SidesLine(const Walk& walk);
 /// What is missing, and what can be done about it under which number.
 std::vector<StyledLine> ProblemLines(const Walk& walk, const Letters& letters);
-/// "Which side for ... ? o ours (main), t theirs (topic), b base".
+/// "Which side for all that is open, in all scenes? o ours, t theirs, b base".
 std::string QuestionForSide(const Walk& walk);
 /// Why there is nothing to finish.
 std::string NothingToFinish(const Walk& walk);
