@@ -1,13 +1,14 @@
 #include "Settle/ExternalTool.h"
 
 #include "Destination.h"
+#include "Fallback.h"
 #include "FileUtils.h"
 #include "Names/PrintableText.h"
 #include "Systems/ChildProcess.h"
 #include "Systems/ScratchFolder.h"
 #include "Words/Failure.h"
-
 #include "Words/WriteFailure.h"
+
 #include <cerrno>
 #include <system_error>
 #include <unistd.h>
@@ -41,9 +42,18 @@ std::string ObjectsOf(const std::string& file, const std::string& other, const S
     return standIn;
 }
 
+void WantToolList() {
+    const std::string file = GetSpecFilename(kDefaultSpecFile);
+    if (!FileExists(file.c_str()))
+        throw Failure(Printable(file) + ", which names the merge tools, is missing or can't be read: install "
+                                        "the program whole, or write ~/.mergespecfile.txt, as "
+                                        "mergespecfile(5) tells");
+}
+
 } // namespace
 
 void MergeWithTool(const ToolFiles& files) {
+    WantToolList();
     const ScratchFolder scratch;
     const std::string result = scratch.File("result");
     // A path that looks like an option is none to a program that gets it from here.
