@@ -4,7 +4,6 @@
 #include "Support/GitFolder.h"
 #include "Words/Failure.h"
 
-
 namespace {
 
 using namespace ovrin;

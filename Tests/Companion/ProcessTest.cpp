@@ -5,7 +5,6 @@
 #include "Systems/ChildProcess.h"
 #include "Words/Failure.h"
 
-
 #include <gtest/gtest.h>
 #include <numeric>
 
