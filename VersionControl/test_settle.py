@@ -18,6 +18,20 @@ NAMES = ["a b.ovrin", "'quoted\" $x.ovrin", "tab\there.ovrin", "line\nfeed.ovrin
 MANY = [HEADER + "".join(game_object(number, layer, "Boat", 1) for number in range(1, 51)) for layer in (1, 2, 5)]
 
 
+def places(boat, pier, order=(0, 0)):
+    """A boat and a pier, which stand below these Transforms, 11 being the boat's and 41 the pier's."""
+    return HEADER + "".join(
+        f"--- !o!1 &{number}\nGameObject:\n  m_Component:\n  - component: {{fileID: {number + 1}}}\n"
+        f"  m_Name: {name}\n--- !o!4 &{number + 1}\nTransform:\n  m_GameObject: {{fileID: {number}}}\n"
+        f"  m_Father: {{fileID: {father}}}\n  m_RootOrder: {place}\n"
+        for number, name, father, place in ((10, "Boat", boat, order[0]), (40, "Pier", pier, order[1])))
+
+
+# Theirs puts the pier below the boat, and ours the boat below the pier.
+LOOP = places(0, 0), places(0, 11, (1, 0)), places(41, 0, (0, 1))
+CONTRADICTION = "--set", "11.Transform.m_Father=ours", "--set", "41.Transform.m_Father=theirs"
+
+
 def test_fifty_conflicts_take_three_commands(user):
     user.sides(*MANY)
     user.git("merge", "topic", fails=True)
@@ -228,16 +242,8 @@ def test_kept_decision_that_matches_nothing_is_told(user):
 
 
 def test_sides_that_contradict_each_other_in_a_loop_of_parents_are_told(user):
-    def objects(boat, pier, order=(0, 0)):
-        return HEADER + "".join(
-            f"--- !o!1 &{number}\nGameObject:\n  m_Component:\n  - component: {{fileID: {number + 1}}}\n"
-            f"  m_Name: {name}\n--- !o!4 &{number + 1}\nTransform:\n  m_GameObject: {{fileID: {number}}}\n"
-            f"  m_Father: {{fileID: {father}}}\n  m_RootOrder: {place}\n"
-            for number, name, father, place in ((10, "Boat", boat, order[0]), (40, "Pier", pier, order[1])))
-
-    user.conflict(objects(0, 0), objects(0, 11, (1, 0)), objects(41, 0, (0, 1)))
-    contradiction = ("--set", "11.Transform.m_Father=ours", "--set", "41.Transform.m_Father=theirs")
-    user.ovrin("settle", *contradiction, status=LEFT_OPEN)
+    user.conflict(*LOOP)
+    user.ovrin("settle", *CONTRADICTION, status=LEFT_OPEN)
     words = "would still be below each other: take one side for all of them"
     assert f"taken: ours, but with the sides that are taken, the objects {words}" in user.ovrin(
         "settle", "--list", status=LEFT_OPEN)
