@@ -13,7 +13,7 @@ import time
 import pytest
 
 from car import car, merge_cars
-from systems import has_terminals
+from systems import can_mount, has_terminals
 from test_settle import MANY
 from test_systems import CONFLICT_AND_MORE, HEADER, ONE_CONFLICT, game_object, scene
 
@@ -186,6 +186,24 @@ def test_locale_says_which_characters_are_shown(user, terminal, locale):
         assert "灯台 n\u0308" in shown and "│" in shown
 
 
+# As a keyboard or a paste of another locale brings them, and what is cut in the midst of a character.
+@pytest.mark.parametrize("locale", ["C.UTF-8", "C"])
+def test_bytes_that_are_no_characters_do_no_harm(user, terminal, locale):
+    user.conflict(*ONE_CONFLICT)
+    screen = terminal(LC_ALL=locale)
+    screen.run("ovrin settle")
+    screen.see("1 of 1 open")
+    for stray in (["e4"], ["80"], ["e2", "9a"], ["f4", "90", "80", "80"], ["e0", "81", "b4"], ["ff"]):
+        screen.tmux("send-keys", "-H", *stray)
+        screen.see("That key does nothing here")
+        screen.press("n")
+    screen.press("/", "x")
+    screen.tmux("send-keys", "-H", "e2", "9a", "93", "e4")
+    screen.see("Search: x⚓_" if locale == "C.UTF-8" else "Search: x\\u2693_")
+    screen.press("Escape", "t")
+    screen.see("0 of 1 open")
+
+
 def test_colours_are_left_out_on_request(user, terminal):
     user.conflict(*ONE_CONFLICT)
     colours = []
@@ -279,3 +297,49 @@ def test_what_follows_from_a_decision_is_told_and_mended(user, terminal):
     screen.press("f")
     screen.see("scene.ovrin is settled.", "status 0")
     assert "Lantern" in user.read() and "{fileID: 10}" in user.read()
+
+
+# Outside of the small disk files say when it is to be full.
+WITH_A_SMALL_DISK = """
+    mount -t tmpfs -o size=600k none "$HOME/full"
+    cp -R . "$HOME/full"
+    cd "$HOME/full"
+    await() { while [ ! -e "$HOME/$1" ]; do sleep 0.05; done; }
+    (await fill; cat /dev/zero >rest 2>/dev/null; touch "$HOME/filled"
+     await empty; rm rest; touch "$HOME/emptied") >/dev/null 2>&1 &
+    ovrin settle"""
+
+
+
+def wait_for(path):
+    until = time.monotonic() + SECONDS
+    while not path.exists():
+        assert time.monotonic() < until, path
+        time.sleep(0.02)
+
+
+@pytest.mark.skipif(not can_mount(), reason="disks can't be mounted here")
+def test_full_disk_under_the_screen_is_told_and_keeps_no_step(user, terminal):
+    user.conflict(*MANY)
+    for sample in (user.here / ".git/hooks").glob("*.sample"):
+        sample.unlink()
+    (user.home / "full").mkdir()
+    user.write(WITH_A_SMALL_DISK, "run")
+    screen = terminal()
+    screen.tmux("resize-window", "-x", "200", "-y", "50")  # long paths are told
+    screen.run("unshare -rm sh run")
+    screen.see("50 of 50 open")
+    screen.press("t")
+    screen.see("49 of 50 open")
+    (user.home / "fill").touch()
+    wait_for(user.home / "filled")
+    for key in ("t", "T", "u"):
+        screen.press(key)
+        screen.see("49 of 50 open", "No space left on device", "stays as it was")
+        screen.press("n")
+    (user.home / "empty").touch()
+    wait_for(user.home / "emptied")
+    screen.press("a", "o")
+    screen.see("0 of 50 open")
+    screen.press("u", "q")
+    screen.see("49 open conflicts left", "status 1")

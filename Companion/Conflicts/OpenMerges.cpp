@@ -69,11 +69,11 @@ void Write(const std::string& file, const std::string& header, const std::vector
         throw Failure("Cannot write " + file + ": " + WhyNotWritten(error));
 }
 
-std::string HeaderOf(const OpenMerge& merge) {
+std::string HeaderOf(const OpenMerge& merge, const std::string& identity) {
     const Occasion& occasion = merge.occasion;
     const json header = {
         {"version", 1},
-        {"identity", merge.identity},
+        {"identity", identity},
         {"process", merge.process},
         {"action", occasion.action},
         {"base", occasion.base},
@@ -171,6 +171,16 @@ bool IsOfAnother(const std::string& file, const std::string& path) {
     }
 }
 
+json ToJson(const Progress& progress, const std::string& identity) {
+    json decisions = json::array();
+    for (const Decision& decision : progress.decisions)
+        decisions.push_back({{"path", decision.path}, {"side", SideName(decision.side)}});
+    json steps = json::array();
+    for (const DecisionStep& step : progress.steps)
+        steps.push_back({{"decisions", step.decisions}, {"number", step.number}});
+    return {{"identity", identity}, {"open", progress.open}, {"decisions", decisions}, {"steps", steps}};
+}
+
 } // namespace
 
 OpenMerges::OpenMerges(const Repository& repository) : m_Folder(repository.data + "/ovrin/") {}
@@ -196,11 +206,12 @@ void OpenMerges::MakeFolder() const {
 
 void OpenMerges::Add(OpenMerge& merge) {
     MakeFolder();
-    merge.identity = NewIdentity();
+    std::string identity = NewIdentity();
     const auto parts = PartsOf(merge);
     // As safe as what version control writes of the merge itself, also in the place of an earlier one.
-    Write(PlaceOf(merge.path).file + kMergeExtension, HeaderOf(merge), {parts.begin(), parts.end()},
+    Write(PlaceOf(merge.path).file + kMergeExtension, HeaderOf(merge, identity), {parts.begin(), parts.end()},
           Durability::Passing);
+    merge.identity = std::move(identity);
 }
 
 std::vector<OpenMerge> OpenMerges::List() const {
@@ -281,17 +292,15 @@ void OpenMerges::SetProgress(OpenMerge& merge, const Progress& known, const Prog
         throw Failure(Printable(merge.path) +
                       " was settled elsewhere meanwhile, or its merge was ended or made again: nothing is "
                       "decided here. End this, and run \"ovrin settle\" again");
-    if (merge.identity.empty()) Add(merge);
-    json decisions = json::array();
-    for (const Decision& decision : progress.decisions)
-        decisions.push_back({{"path", decision.path}, {"side", SideName(decision.side)}});
-    json steps = json::array();
-    for (const DecisionStep& step : progress.steps)
-        steps.push_back({{"decisions", step.decisions}, {"number", step.number}});
-    const json written = {
-        {"identity", merge.identity}, {"open", progress.open}, {"decisions", decisions}, {"steps", steps}};
-    // Nobody else has what a person decided.
-    Write(PlaceOf(merge.path).file + kProgressExtension, TextOf(written) + "\n", {}, Durability::Synced);
+    try {
+        if (merge.identity.empty()) Add(merge);
+        // Nobody else has what a person decided.
+        Write(PlaceOf(merge.path).file + kProgressExtension, TextOf(ToJson(progress, merge.identity)) + "\n",
+              {}, Durability::Synced);
+    } catch (const Failure& failure) {
+        throw Failure(failure.what() + (". What is decided in " + Printable(merge.path)) +
+                      " stays as it was: set that right, and decide again");
+    }
 }
 
 void OpenMerges::Remove(const std::string& path) {

@@ -1,5 +1,6 @@
 #include "Settle/SettleSession.h"
 
+#include "Conflicts/Conflict.h"
 #include "Conflicts/DecisionPath.h"
 #include "Settle/Consequences.h"
 #include "Settle/DecisionTable.h"
@@ -30,6 +31,16 @@ bool IsCovered(Path path, const DecisionTable& decided) {
     for (path.pop_back(); !path.empty(); path.pop_back())
         if (decided.Find(path)) return true;
     return false;
+}
+
+/// Whether an object that one side lacks is there, or isn't, by a decision already, as it would be by this
+/// one: then the side stays that a person took for it.
+bool IsSoAlready(const Decision& decision, const DecisionTable& decided, const MergeNames& names) {
+    const Path path = PathOfDecision(decision.path);
+    const auto isIn = [&](Version version) { return names.Has(version, path.front()); };
+    if (path.size() != 1 || isIn(Version::Ours) == isIn(Version::Theirs)) return false;
+    const std::optional<Side> side = decided.Find(path);
+    return side && isIn(VersionOf(*side)) == isIn(VersionOf(decision.side));
 }
 
 } // namespace
@@ -221,8 +232,9 @@ bool SettleSession::EndLoops(const std::vector<Decision>& decisions) {
 }
 
 void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, TakenSide taken) {
-    const std::vector<Decision> more = Consequences(m_Merge, m_Names, Open(), conflicts, taken);
-    m_Decisions.insert(m_Decisions.end(), more.begin(), more.end());
+    const DecisionTable decided(m_Decisions);
+    for (const Decision& more : Consequences(m_Merge, m_Names, Open(), conflicts, taken))
+        if (!IsSoAlready(more, decided, m_Names)) m_Decisions.push_back(more);
 }
 
 void SettleSession::EndStep(std::size_t decisionsBefore) {
