@@ -13,7 +13,6 @@ import subprocess
 import pytest
 
 from test_systems import HEADER, game_object
-from test_terminal import scenes
 from user import LEFT_OPEN
 
 THREE = [HEADER + "".join(game_object(number, layer, "Boat", 1) for number in (10, 20, 30)) for layer in (1, 2, 5)]
@@ -77,7 +76,7 @@ def test_killed_decision_is_made_or_not(user, decided):
 
 @pytest.mark.skipif(not can_trace(), reason="system calls can't be traced here")
 def test_killed_finish_is_completed_by_the_next(user):
-    scenes(user, ["a.ovrin", "b.ovrin"], THREE)
+    user.conflicts({"a.ovrin": THREE, "b.ovrin": THREE})
     for moment in killed_everywhere(user, "settle", "--take", "theirs"):
         for name in ("a.ovrin", "b.ovrin"):
             assert user.read(name) in (THREE[1], THREE[2]), moment

@@ -12,6 +12,7 @@ import time
 
 import pytest
 
+from car import car, merge_cars
 from systems import can_mount, has_terminals
 from test_settle import MANY
 from test_systems import CONFLICT_AND_MORE, HEADER, ONE_CONFLICT, game_object, scene
@@ -75,18 +76,6 @@ def fixture_terminal(user):
         one.close()
 
 
-def scenes(user, names, versions):
-    """A merge in which each of these files has the same three versions."""
-    user.start()
-    for branch, text in zip(("main", "topic", "main"), versions):
-        user.git("checkout", "-q", *(("-b", branch) if branch == "topic" else (branch,)))
-        for name in names:
-            user.write(text, name)
-        user.git("add", ".")
-        user.git("commit", "-qm", "change")
-    user.git("merge", "topic", fails=True)
-
-
 def test_walk_ends_with_what_the_script_gives(user, terminal):
     user.conflict(*CONFLICT_AND_MORE)
     screen = terminal()
@@ -102,31 +91,41 @@ def test_walk_ends_with_what_the_script_gives(user, terminal):
     assert user.committed() == scene("2 Lamp 3")
 
 
-def test_fifty_conflicts_of_three_scenes_take_two_keys(user, terminal):
-    parts = [[HEADER + "".join(text.split("--- ")[i] and "--- " + text.split("--- ")[i] for i in part)
-              for text in MANY] for part in (range(1, 18), range(18, 35), range(35, 51))]
-    user.start()
-    for index, branch in enumerate(("main", "topic", "main")):
-        user.git("checkout", "-q", *(("-b", branch) if branch == "topic" else (branch,)))
-        for name, versions in zip("abc", parts):
-            user.write(versions[index], f"{name}.ovrin")
-        user.git("add", ".")
-        user.git("commit", "-qm", "change")
-    user.git("merge", "topic", fails=True)
+def test_component_comes_back_with_what_it_requires(user, terminal):
+    merge_cars(user)
+    screen = terminal()
+    screen.run("ovrin settle")
+    screen.see("Car · Engine", "remove Car · Engine and what needs it")
+    screen.press("t")
+    screen.see("0 of 1 open", "f finishes")
+    screen.press("o")
+    assert " ! " not in screen.see("Engine: ours (main)", "f finishes")
+    screen.press("f")
+    screen.see("status 0")
+    assert user.read() == car("Engine", "Wheel")
+
+
+def test_fifty_conflicts_of_three_scenes_take_three_keys(user, terminal):
+    parts = [[HEADER + "".join("--- " + text.split("--- ")[i] for i in part) for text in MANY]
+             for part in (range(1, 18), range(18, 35), range(35, 51))]
+    names = ["a.ovrin", "b.ovrin", "c.ovrin"]
+    user.conflicts(dict(zip(names, parts)))
     screen = terminal()
     screen.run("ovrin settle")
     screen.see("50 of 50 open · a.ovrin")
-    screen.press("T")
+    screen.press("a")
+    screen.see("Which side for all that is open, in all scenes?")
+    screen.press("t")
     screen.see("0 of 50 open", "50 conflicts settled")
     screen.press("f")
     screen.see("c.ovrin is settled.", "status 0")
     user.git("commit", "-qm", "merged")
-    assert [user.committed(f"{name}.ovrin") for name in "abc"] == [versions[1] for versions in parts]
+    assert [user.committed(name) for name in names] == [versions[1] for versions in parts]
 
 
 @pytest.mark.parametrize("number", [signal.SIGKILL, signal.SIGTERM, signal.SIGHUP, None])
 def test_what_was_decided_outlives_the_program(user, terminal, number):
-    scenes(user, ["a.ovrin", "b.ovrin"], ONE_CONFLICT)
+    user.conflicts({"a.ovrin": ONE_CONFLICT, "b.ovrin": ONE_CONFLICT})
     screen = terminal()
     screen.run("sh -c 'echo $$ >process; exec ovrin settle'")
     screen.see("2 of 2 open")
@@ -166,7 +165,7 @@ def test_screen_follows_the_size_of_its_window(user, terminal):
     screen.run("ovrin settle")
     screen.see("1 of 1 open")
     screen.tmux("resize-window", "-x", "160", "-y", "50")
-    wide = screen.see("b base", "As before  1-9 Mend  u Undo").splitlines()
+    wide = screen.see("b base", "a All open  g As before").splitlines()
     assert any("b base" in line and "o ours" in line and "t theirs" in line for line in wide)
     screen.tmux("resize-window", "-x", "60", "-y", "20")
     screen.see("This window has 60 x 20 characters")
@@ -252,7 +251,7 @@ def test_file_that_was_changed_by_hand_is_asked_about(user, terminal):
 
 
 def test_mergetool_of_git_settles_one_scene_after_the_other(user, terminal):
-    scenes(user, ["a.ovrin", "b.ovrin"], ONE_CONFLICT)
+    user.conflicts({"a.ovrin": ONE_CONFLICT, "b.ovrin": ONE_CONFLICT})
     screen = terminal()
     screen.run("git mergetool --no-prompt --tool ovrin")
     screen.see("1 of 1 open · a.ovrin")
@@ -339,7 +338,7 @@ def test_full_disk_under_the_screen_is_told_and_keeps_no_step(user, terminal):
         screen.press("n")
     (user.home / "empty").touch()
     wait_for(user.home / "emptied")
-    screen.press("O")
+    screen.press("a", "o")
     screen.see("0 of 50 open")
     screen.press("u", "q")
     screen.see("49 open conflicts left", "status 1")

@@ -6,6 +6,7 @@
 #include "Names/PrintableText.h"
 #include "Systems/Repository.h"
 #include "Words/Failure.h"
+#include "Words/WriteFailure.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -26,6 +27,7 @@ using nlohmann::json;
 
 constexpr const char* kMergeExtension = ".merge";
 constexpr const char* kProgressExtension = ".progress";
+constexpr std::uint64_t kPlaces = 4;                      // of a path; more where all of them are taken
 constexpr std::size_t kMostHeader = std::size_t{1} << 20; // bytes
 
 /// FNV-1a, of 64 bits, in hexadecimal digits. Paths of one number are told apart by what the files say.
@@ -64,7 +66,7 @@ void Write(const std::string& file, const std::string& header, const std::vector
     };
     content.durability = durability;
     if (const int error = Deliver(file, content))
-        throw Failure("Cannot write " + file + ": " + std::system_category().message(error));
+        throw Failure("Cannot write " + file + ": " + WhyNotWritten(error));
 }
 
 std::string HeaderOf(const OpenMerge& merge, const std::string& identity) {
@@ -72,6 +74,7 @@ std::string HeaderOf(const OpenMerge& merge, const std::string& identity) {
     const json header = {
         {"version", 1},
         {"identity", identity},
+        {"process", merge.process},
         {"action", occasion.action},
         {"base", occasion.base},
         {"ours", occasion.ours},
@@ -99,6 +102,7 @@ constexpr std::size_t kPartsWithoutTexts = 3;
 void TakeHeader(const json& header, OpenMerge& merge) {
     if (header.at("version") != 1) throw Failure("written by a newer version of ovrin");
     merge.identity = header.at("identity");
+    merge.process = header.value("process", "");
     merge.occasion = {header.at("action"), header.at("base"), header.at("ours"), header.at("theirs"),
                       header.at("head")};
     merge.take = SideNamed(header.at("take").get<std::string>());
@@ -181,12 +185,17 @@ json ToJson(const Progress& progress, const std::string& identity) {
 
 OpenMerges::OpenMerges(const Repository& repository) : m_Folder(repository.data + "/ovrin/") {}
 
+/// Its record may stand behind a gap, which is left where that of another path of the same number was
+/// removed.
 OpenMerges::Place OpenMerges::PlaceOf(const std::string& path) const {
-    for (std::uint64_t attempt = 0;; ++attempt) {
+    std::string free;
+    for (std::uint64_t attempt = 0; attempt < kPlaces || free.empty(); ++attempt) {
         const std::string file = m_Folder + NumberOf(path, attempt);
-        if (IsMissing(file + kMergeExtension)) return {file, false};
-        if (!IsOfAnother(file + kMergeExtension, path)) return {file, true};
+        const bool isMissing = IsMissing(file + kMergeExtension);
+        if (!isMissing && !IsOfAnother(file + kMergeExtension, path)) return {file, true};
+        if (isMissing && free.empty()) free = file;
     }
+    return {free, false};
 }
 
 void OpenMerges::MakeFolder() const {
@@ -215,6 +224,21 @@ std::vector<OpenMerge> OpenMerges::List() const {
         throw Failure("Cannot look into " + m_Folder + ": " + error.message());
     std::ranges::sort(merges, {}, &OpenMerge::path);
     return merges;
+}
+
+bool OpenMerges::HasFellowOf(const OpenMerge& merge) const {
+    if (merge.process.empty()) return false;
+    std::error_code error;
+    const fs::directory_iterator files(m_Folder, error);
+    return std::any_of(begin(files), end(files), [&](const fs::directory_entry& entry) {
+        if (entry.path().extension() != kMergeExtension) return false;
+        try {
+            const OpenMerge other = ReadMerge(entry.path().string(), Extent::WithoutTexts);
+            return other.process == merge.process && other.occasion.head == merge.occasion.head;
+        } catch (const Failure&) {
+            return false;
+        }
+    });
 }
 
 std::optional<OpenMerge> OpenMerges::Find(const std::string& path) const {

@@ -65,7 +65,10 @@ SettleSession::SettleSession(OpenMerge merge, Progress progress)
     Meet();
     if (m_Source.identity.empty()) m_Source.conflicts = Open().size();
     m_Problems = FindProblems(m_Merge, m_Names);
-    if (!m_Decisions.empty()) MergeAgain();
+    if (m_Decisions.empty()) return;
+    // What later decisions took the place of isn't met any more, but is in the merge without them.
+    for (const std::string& path : MergeAgain())
+        if (!Touches(path)) m_Idle.push_back(path);
 }
 
 /// The conflicts of the merge as it is in this process.
@@ -115,8 +118,7 @@ void SettleSession::TakeStates(const std::vector<std::string>& open) {
     const DecisionTable decided(m_Decisions);
     std::vector<MetConflicts::State> states(m_Conflicts.size(), {false, {}});
     for (const std::string& path : open) states[*m_Conflicts.Find(PathOfDecision(path))].isOpen = true;
-    for (std::size_t i = 0; i < states.size(); ++i)
-        if (!states[i].isOpen) states[i].decided = decided.Find(m_Conflicts[i].path);
+    for (std::size_t i = 0; i < states.size(); ++i) states[i].decided = decided.Find(m_Conflicts[i].path);
     m_Conflicts.SetStates(std::move(states));
 }
 

@@ -42,6 +42,8 @@ public:
     const std::vector<Decision>& Decisions() const { return m_Decisions; }
     /// Nothing is open, and a scene that both sides added was looked through, which a step shows.
     bool IsSettled() const { return Open().empty() && !(m_Merge.IsBothAdded() && m_Steps.empty()); }
+    /// The paths of those decisions it began with that match nothing in the merge, and have no effect.
+    const std::vector<std::string>& Idle() const { return m_Idle; }
     /// What is wrong with the result.
     const std::vector<Problem>& Problems() const { return m_Problems; }
 
@@ -126,6 +128,7 @@ private:
     SceneMerge m_Merge;
     MergeNames m_Names;
     std::vector<Decision> m_Decisions;
+    std::vector<std::string> m_Idle;
     std::vector<DecisionStep> m_Steps;
     struct UndoneStep {
         std::vector<Decision> decisions;

@@ -32,9 +32,9 @@ TEST_F(PromptsTest, AnswersThatAreNoneDecideNothing) {
              {"\x1b[A\n", "\"\\x1b[A\" is no answer"},
              {"\xc3\xb6\n", "\"ö\" is no answer"},
              {std::string("\0\n", 2), "is no answer"},
-             {"w\nx\n", "Nothing was decided"},
-             {"w\ntt\n", "Nothing was decided"},
-             {"w", "2 of 2 open"},
+             {"a\nx\n", "Nothing was decided"},
+             {"a\ntt\n", "Nothing was decided"},
+             {"a", "2 of 2 open"},
              {"u\n", "There is no step to take back"},
              {"r\n", "No step was taken back"},
              {"9\n", "Nothing is offered under that number"},
@@ -85,7 +85,7 @@ TEST_F(PromptsTest, SceneThatBothAddedIsLookedThrough) {
 TEST_F(PromptsTest, FileThatWasChangedByHandIsReplacedOnlyWhenAgreed) {
     Record("a.ovrin", TwoConflicts());
     folder.Write("a.ovrin", "by hand\n");
-    for (const char* answers : {"T\nf\n", "f\nn\n", "f\nY\n", "f\n\n"}) {
+    for (const char* answers : {"a\nt\nf\n", "f\nn\n", "f\nY\n", "f\n\n"}) {
         EXPECT_NE(Told(answers).find("was changed by hand"), std::string::npos);
         EXPECT_EQ(end.refused.size(), 1);
         EXPECT_EQ(folder.Read("a.ovrin"), "by hand\n") << answers;

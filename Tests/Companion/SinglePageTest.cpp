@@ -155,11 +155,11 @@ TEST(SinglePage, EveryFileThatThePageNamesIsThere) {
 }
 
 TEST(SinglePage, FilesAreAnsweredByTheirNamesAlone) {
-    EXPECT_EQ(AnswerFile({"GET", "", {}, ""})->type, "text/html; charset=utf-8");
-    EXPECT_EQ(AnswerFile({"GET", "main.js", {}, ""})->type, "text/javascript; charset=utf-8");
-    EXPECT_FALSE(AnswerFile({"POST", "main.js", {}, ""}));
+    EXPECT_EQ(AnswerPageFile({"GET", "", {}, ""})->type, "text/html; charset=utf-8");
+    EXPECT_EQ(AnswerPageFile({"GET", "main.js", {}, ""})->type, "text/javascript; charset=utf-8");
+    EXPECT_FALSE(AnswerPageFile({"POST", "main.js", {}, ""}));
     for (const char* path : {"../main.js", "./main.js", "/etc/passwd", "Page/main.js", "api/session"})
-        EXPECT_FALSE(AnswerFile({"GET", path, {}, ""})) << path;
+        EXPECT_FALSE(AnswerPageFile({"GET", path, {}, ""})) << path;
 }
 
 } // namespace

@@ -50,9 +50,19 @@ TEST_F(TerminalTest, DecisionGoesOnToTheNextAndUndoComesBack) {
     text = After("u");
     EXPECT_NE(text.find("m_Layer: both changed it"), std::string::npos) << text;
     EXPECT_EQ(desk->CountOpen(), 2);
-    After("rT");
+    After("rat");
     EXPECT_TRUE(desk->IsSettled());
     EXPECT_NE(After("").find("f finishes"), std::string::npos);
+}
+
+TEST_F(TerminalTest, CapitalsAreForOneObjectAndAllIsAskedFor) {
+    Record("Pier.ovrin", kTwo);
+    Begin();
+    EXPECT_NE(After("T").find("Took theirs (topic) for Lantern and what stands under it"), std::string::npos);
+    EXPECT_EQ(desk->CountOpen(), 1);
+    EXPECT_NE(After("a").find("Which side for all that is open? o ours"), std::string::npos);
+    EXPECT_NE(After("n").find("Nothing was decided"), std::string::npos);
+    EXPECT_EQ(desk->CountOpen(), 1);
 }
 
 TEST_F(TerminalTest, ArrowsAndEnterAreEnough) {
@@ -105,8 +115,8 @@ TEST_F(TerminalTest, OnlyKeysThatMergeAreSteps) {
     Record("Pier.ovrin", kTwo);
     Begin();
     for (const char key : std::string("otbOTBugrf1")) EXPECT_TRUE(screen->IsStep(KeyOf(key))) << key;
-    for (const char key : std::string("np?/wq")) EXPECT_FALSE(screen->IsStep(KeyOf(key))) << key;
-    screen->Press(KeyOf('w'));
+    for (const char key : std::string("np?/aq")) EXPECT_FALSE(screen->IsStep(KeyOf(key))) << key;
+    screen->Press(KeyOf('a'));
     EXPECT_TRUE(screen->IsStep(KeyOf('t')) && !screen->IsStep(KeyOf('n')));
     EXPECT_NE(TextOf(screen->DrawWorking(Screen::kLeast)[Screen::kLeast.rows - 3]).find("Working"),
               std::string::npos);
@@ -117,11 +127,24 @@ TEST_F(TerminalTest, FileThatWasChangedByHandIsReplacedOnlyWhenAgreed) {
         Record("Pier.ovrin", kTwo);
         folder.Write("Pier.ovrin", "by hand\n");
         Begin();
-        EXPECT_NE(After("Tf").find("was changed by hand"), std::string::npos);
+        EXPECT_NE(After("atf").find("was changed by hand"), std::string::npos);
         After(answer);
         ASSERT_TRUE(screen->End());
         EXPECT_EQ(screen->End()->finished.size(), *answer == 'y' ? 1 : 0);
     }
+}
+
+TEST_F(TerminalTest, OnlyFilesThatWereChangedByHandAreAskedAbout) {
+    for (const char* name : {"A.ovrin", "Over.ovrin", "Pier.ovrin"}) Record(name, kTwo);
+    folder.Write("Pier.ovrin", "by hand\n");
+    Begin();
+    After("at");
+    OpenMerges(Found()).Remove("Over.ovrin");
+    const std::string asked = After("f");
+    EXPECT_NE(asked.find("Pier.ovrin was changed by hand"), std::string::npos) << asked;
+    EXPECT_EQ(asked.find("Over.ovrin stays"), std::string::npos) << asked;
+    EXPECT_EQ(screen->Reached().finished, std::vector<std::string>{"A.ovrin"});
+    EXPECT_EQ(screen->Reached().refused.size(), 2);
 }
 
 TEST_F(TerminalTest, SceneThatBothAddedIsLookedThrough) {
@@ -183,13 +206,13 @@ TEST_F(TerminalTest, ASCIIIsEnough) {
 TEST_F(TerminalTest, PromptsAskTheSameThings) {
     Record("Pier.ovrin", kTwo);
     Begin();
-    std::istringstream answers("x\nf\no\nw\nt\nf\n");
+    std::istringstream answers("x\nf\no\na\nt\nf\n");
     std::ostringstream told;
     EXPECT_EQ(SettleByPrompts(*walk, letters, answers, told).finished.size(), 1);
     for (const char* words : {"2 of 2 open · Pier.ovrin\nLantern (10)\n  m_Layer: both changed it\n    base  "
                               "  1\n    ours    5    main\n",
                               "\"x\" is no answer", "No scene is settled yet",
-                              "Which side for Buoy and what stands under it?", "0 of 2 open"})
+                              "Which side for all that is open? o ours", "0 of 2 open"})
         EXPECT_NE(told.str().find(words), std::string::npos) << words << "\n" << told.str();
 }
 
@@ -225,10 +248,10 @@ TEST_F(TerminalTest, QuestionsStayUntilTheyAreAnsweredAndDecideNothingByOtherKey
     Record("Pier.ovrin", kTwo);
     Record("Quay.ovrin", kTwo);
     Begin();
-    for (const Key key : {Key::Enter, Key::Escape, Key::Unknown, KeyOf('O'), KeyOf('w'), KeyOf('y')}) {
-        EXPECT_NE(After("w").find("Which side for Lantern"), std::string::npos);
+    for (const Key key : {Key::Enter, Key::Escape, Key::Unknown, KeyOf('O'), KeyOf('a'), KeyOf('y')}) {
+        EXPECT_NE(After("a").find("Which side for all that is open"), std::string::npos);
         screen->Press(Key::Redraw);
-        EXPECT_NE(After("").find("Which side for Lantern"), std::string::npos);
+        EXPECT_NE(After("").find("Which side for all that is open"), std::string::npos);
         screen->Press(key);
         EXPECT_NE(After("").find("Nothing was decided"), std::string::npos);
     }
@@ -290,7 +313,7 @@ TEST_F(TerminalTest, NamesAndValuesOfOthersCannotSpeakToTheTerminal) {
     OpenMerges(Found()).Add(merge);
     Begin();
     std::string seen = After("") + After("?") + After("nw") + After("x/[2J\n") + After("f") + After("of");
-    std::istringstream input("v\nn\nv\n?\nw\nx\nT\nq\n");
+    std::istringstream input("v\nn\nv\n?\na\nx\na\nt\nq\n");
     std::ostringstream output;
     SettleByPrompts(*walk, letters, input, output);
     seen += output.str();

@@ -39,7 +39,7 @@ TEST_F(WalkTest, GoesRoundOverWhatIsOpen) {
     EXPECT_EQ(walk->At(), 4);
     Press("j");
     EXPECT_EQ(walk->At(), 4);
-    Press("T");
+    walk->TakeAll(Side::Theirs);
     CarryOut(*walk, Request::First, {});
     Press("n");
     EXPECT_TRUE(Says("Nothing is open") && walk->At() == 0);
@@ -87,8 +87,8 @@ TEST_F(WalkTest, WhatThereIsNotIsToldAndMakesNoStep) {
     EXPECT_TRUE(Says("Nothing is proposed"));
     Press("9");
     EXPECT_TRUE(Says("Nothing is offered under that number"));
-    Press("T");
-    Press("O");
+    walk->TakeAll(Side::Theirs);
+    walk->TakeAll(Side::Ours);
     EXPECT_TRUE(Says("Nothing is open any more"));
     walk->TakeWhole(Side::Ours);
     EXPECT_TRUE(Says("Nothing is open about"));
@@ -111,7 +111,7 @@ TEST_F(WalkTest, StepThatCannotBeKeptIsToldAndTakenBack) {
         EXPECT_EQ(walk->CountOpen(), 3) << step;
         EXPECT_EQ(sessions[0]->Result() + sessions[1]->Result(), before) << step;
     }
-    Press("T"); // once there is room
+    walk->TakeAll(Side::Theirs); // once there is room
     EXPECT_EQ(walk->CountOpen(), 0) << walk->Said();
     Begin();
     EXPECT_EQ(walk->CountOpen(), 0);
@@ -122,7 +122,7 @@ TEST_F(WalkTest, StepThatCannotBeKeptIsToldAndTakenBack) {
 TEST_F(WalkTest, FinishThatFailsIsToldAndTheNextOneCompletesIt) {
     Record("a.ovrin", TwoConflicts());
     Begin();
-    Press("T");
+    walk->TakeAll(Side::Theirs);
     {
         const surroundings::FileLimit full(0);
         EXPECT_FALSE(walk->Finish(false));

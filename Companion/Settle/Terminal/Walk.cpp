@@ -238,6 +238,7 @@ void Walk::Redo() {
 std::optional<Walk::Finished> Walk::Finish(bool overwrite) {
     Finished finished;
     if (!Do([&] { finished.paths = m_Desk.Finish(overwrite, finished.refused); })) return {};
+    finished.changedByHand = m_Desk.ChangedByHand();
     return finished;
 }
 

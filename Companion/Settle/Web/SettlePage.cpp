@@ -76,7 +76,7 @@ PageAnswer SettlePage::Get(const PageRequest& request) {
     if (request.path == "api/session") return JsonAnswer(Session());
     if (request.path == "api/conflicts") return JsonAnswer(Conflicts(request));
     if (std::optional<PageAnswer> answer = m_Views.Answer(request)) return *std::move(answer);
-    if (std::optional<PageAnswer> answer = AnswerFile(request)) return *std::move(answer);
+    if (std::optional<PageAnswer> answer = AnswerPageFile(request)) return *std::move(answer);
     return PageError(404, "There is nothing of that name");
 }
 
@@ -230,6 +230,7 @@ PageAnswer SettlePage::Finish(bool overwrite) {
     const bool isOver = m_Finished.size() == m_Desk.Scenes().size();
     return LastAnswer(isOver, {{"finished", AllPrintable(finished)},
                                {"remarks", remarks},
+                               {"changedByHand", m_Desk.ChangedByHand().size()},
                                {"next", isOver ? Next() : std::vector<std::string>()},
                                {"isOver", isOver}});
 }
