@@ -12,8 +12,10 @@ import socket
 
 import pytest
 
+from car import car, merge_cars
 from harbour import HEADER, Scene, harbour
 from page import Page
+from test_settle import CONTRADICTION, LOOP
 from user import LEFT_OPEN
 
 try:
@@ -124,6 +126,29 @@ def test_focus_stays_on_the_button_that_was_pressed(harbour_user, driver):
         assert sight.focused("data-focus") == "undo" and sight.focused("aria-disabled") == "true"
         sight.press(sight.ENTER)
         sight.wait_until(lambda: "nothing to take back" in sight.text("#happened"))
+
+
+def test_component_goes_with_what_it_requires(user, driver):
+    merge_cars(user)
+    with Page(user, *SETTLE) as page:
+        sight = Sight(driver, page.address)
+        assert "Remove Car · Engine and what needs it" in sight.text("#panel-values")
+        sight.press("t")
+        sight.wait_for_count("Settled")
+        sight.press("f", sight.ENTER)
+        assert "settled and written" in sight.heading("main.over h1")
+        sight.check_errors()
+    assert user.read() == car()
+
+
+def test_loop_of_parents_that_is_left_open_says_why(user, driver):
+    user.conflict(*LOOP)
+    user.ovrin("settle", *CONTRADICTION, status=LEFT_OPEN)
+    with Page(user, *SETTLE) as page:
+        sight = Sight(driver, page.address)
+        sight.wait_until(lambda: "would still be below each other" in sight.text("#panel-values"))
+        sight.wait_until(lambda: "Show in the hierarchy" in sight.text("#panel-values"))
+        assert "Unchanged" not in sight.text("#panel-values")
 
 
 def test_what_cannot_be_finished_yet_says_why(harbour_user, driver):

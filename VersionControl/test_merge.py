@@ -36,6 +36,14 @@ def test_report_tells_object_values_and_branches(user):
     assert unmerged(user) and user.records() == [".merge"]
 
 
+def test_what_to_do_next_is_told_once_for_all_scenes_of_a_merge(user):
+    user.conflicts(dict.fromkeys(("a.ovrin", "b.ovrin"), ONE_CONFLICT))
+    for _ in range(2):  # also of what the first merge has left
+        assert user.words().count("open conflict, where") == 2 and user.words().count("Next: ") == 1
+        user.git("merge", "--abort")
+        user.git("merge", "topic", fails=True)
+
+
 def test_merge_without_conflicts_says_nothing_and_leaves_nothing(user):
     user.sides(*OTHER_FIELDS)
     user.git("merge", "-q", "topic")
@@ -271,3 +279,4 @@ def test_full_working_tree_loses_nothing(user, kilobytes):
     done = subprocess.run(["unshare", "-rm", "sh", "-c", ON_FULL_TREE, "sh", str(kilobytes)], cwd=user.here.parent,
                           env=user.environment, stdout=subprocess.PIPE, stderr=subprocess.PIPE, check=False)
     assert done.stdout.decode() in (scene("2 Lamp 1"), OTHER_FIELDS[2] + scene("2 Lamp 1")), done.stderr.decode()
+    assert "is not merged" not in done.stderr.decode() or "Make room there" in done.stderr.decode()

@@ -18,6 +18,20 @@ NAMES = ["a b.ovrin", "'quoted\" $x.ovrin", "tab\there.ovrin", "line\nfeed.ovrin
 MANY = [HEADER + "".join(game_object(number, layer, "Boat", 1) for number in range(1, 51)) for layer in (1, 2, 5)]
 
 
+def places(boat, pier, order=(0, 0)):
+    """A boat and a pier, which stand below these Transforms, 11 being the boat's and 41 the pier's."""
+    return HEADER + "".join(
+        f"--- !o!1 &{number}\nGameObject:\n  m_Component:\n  - component: {{fileID: {number + 1}}}\n"
+        f"  m_Name: {name}\n--- !o!4 &{number + 1}\nTransform:\n  m_GameObject: {{fileID: {number}}}\n"
+        f"  m_Father: {{fileID: {father}}}\n  m_RootOrder: {place}\n"
+        for number, name, father, place in ((10, "Boat", boat, order[0]), (40, "Pier", pier, order[1])))
+
+
+# Theirs puts the pier below the boat, and ours the boat below the pier.
+LOOP = places(0, 0), places(0, 11, (1, 0)), places(41, 0, (0, 1))
+CONTRADICTION = "--set", "11.Transform.m_Father=ours", "--set", "41.Transform.m_Father=theirs"
+
+
 def test_fifty_conflicts_take_three_commands(user):
     user.sides(*MANY)
     user.git("merge", "topic", fails=True)
@@ -205,16 +219,9 @@ def test_file_of_decisions_gives_what_the_engine_gives(user):
 
 
 def test_only_the_named_files_are_settled_from_where_the_user_is(user):
-    user.start()
     (user.here / "inner").mkdir()
     files = ("one.ovrin", "inner/two.ovrin", "inner/three.ovrin")
-    for branch, text in zip(("main", "topic", "main"), ONE_CONFLICT):
-        user.git("checkout", "-q", *(("-b", branch) if branch == "topic" else (branch,)))
-        for name in files:
-            user.write(text, name)
-        user.git("add", ".")
-        user.git("commit", "-qm", "change")
-    user.git("merge", "topic", fails=True)
+    user.conflicts(dict.fromkeys(files, ONE_CONFLICT))
     top, user.here = user.here, user.here / "inner"
     user.ovrin("settle", "--take", "theirs", "two.ovrin")
     assert "Still unmerged: inner/three.ovrin and 1 more" in user.words()
@@ -223,6 +230,26 @@ def test_only_the_named_files_are_settled_from_where_the_user_is(user):
     user.ovrin("settle", "--take", "ours", str(top / "one.ovrin"))
     assert [user.read(name) for name in files] == [ONE_CONFLICT[2], ONE_CONFLICT[1], ONE_CONFLICT[0]]
     user.git("commit", "-qm", "merged")
+
+
+def test_kept_decision_that_matches_nothing_is_told(user):
+    user.conflict(scene("1 Lantern 1"), scene("2 Lantern 3"), scene("5 Lantern 4"))
+    user.ovrin("settle", "--set", "10.GameObject.m_Layer=theirs", status=LEFT_OPEN)
+    progress, = (user.here / ".git/ovrin").glob("*.progress")
+    progress.write_text(progress.read_text(encoding="utf-8").replace("m_Layer", "m_Other"), encoding="utf-8")
+    user.ovrin("settle", "--list", status=LEFT_OPEN)
+    assert "match nothing in this merge have no effect: 10.GameObject.m_Other;" in user.words()
+
+
+def test_sides_that_contradict_each_other_in_a_loop_of_parents_are_told(user):
+    user.conflict(*LOOP)
+    user.ovrin("settle", *CONTRADICTION, status=LEFT_OPEN)
+    words = "would still be below each other: take one side for all of them"
+    assert f"taken: ours, but with the sides that are taken, the objects {words}" in user.ovrin(
+        "settle", "--list", status=LEFT_OPEN)
+    assert f"you took theirs (topic), but with the sides that are taken, the objects {words}" in user.run(
+        "sh", "-c", "ovrin settle --prompt </dev/null", fails=True)
+    user.ovrin("settle", "--take", "theirs")
 
 
 def test_merge_without_the_driver_is_settled_as_well(user):
@@ -325,6 +352,21 @@ def test_merge_tool_that_fails_leaves_the_conflict(user, script):
     user.git("mergetool", "--no-prompt", "--tool", "ovrin-external", fails=True, TMPDIR=str(scratch))
     assert user.read() == before and user.records() == [".merge"]
     assert not any(scratch.iterdir())
+
+
+@pytest.mark.parametrize("base", ["", None])
+def test_merge_tool_is_shown_no_objects_where_there_is_no_base(user, base):
+    user.start()
+    user.use_tool('cp "$1" shown; cp "$2" "$4"')
+    versions = {"-ours": scene("5 Lantern 1"), "-theirs": scene("2 Lantern 1"), "-result": "before\n"}
+    for name, text in versions.items():
+        user.write(text, name)
+    if base is not None:
+        user.write(base, "-base")
+    user.ovrin("settle", "--with-tool", "--", "-base", "-ours", "-theirs", "-result")
+    assert "m_Layer" not in user.read("shown") and user.read("-result") == versions["-theirs"]
+    user.ovrin("settle", "--with-tool", "--", "-base", "-nothing", "-theirs", "-result", status=FAILED)
+    assert user.read("-result") == versions["-theirs"] and "-result is as it was" in user.words()
 
 
 @pytest.mark.skipif(not shutil.which("hg"), reason="hg is not installed")

@@ -105,6 +105,15 @@ def test_other_files_are_merged_by_lines(system):
     assert system.read("numbers.txt") == NUMBERS.replace("1", "one").replace("9", "nine")
 
 
+def settle_conflict_and_objects(system):
+    """Takes theirs after a merge of CONFLICT_AND_OBJECTS that left ours."""
+    assert system.read() == scene("5 Lamp 3 20") + game_object(30, 0, "Boat", 1)
+    system.run("ovrin", "settle", "--take", "theirs")
+    assert not system.is_open()
+    assert system.read() == scene("2 Lamp 3 20") + game_object(30, 0, "Boat", 1)
+    system.conclude()
+
+
 @holds_for(Mercurial, Subversion)
 @pytest.mark.parametrize("name", ["a b.ovrin", "'quoted\" $x.ovrin", "-dash.ovrin", "Hafen \u2693=1.ovrin", "*[a].ovrin"])
 def test_any_name_is_merged_recorded_and_settled(system, name):
@@ -112,11 +121,7 @@ def test_any_name_is_merged_recorded_and_settled(system, name):
     system.sides(*CONFLICT_AND_OBJECTS)
     system.merge(fails=True)
     assert system.is_open()
-    assert system.read() == scene("5 Lamp 3 20") + game_object(30, 0, "Boat", 1)
-    system.run("ovrin", "settle", "--take", "theirs")
-    assert not system.is_open()
-    assert system.read() == scene("2 Lamp 3 20") + game_object(30, 0, "Boat", 1)
-    system.conclude()
+    settle_conflict_and_objects(system)
 
 
 # What is set up for all repositories of a user meets files of other programs, too.
@@ -168,11 +173,7 @@ def test_what_subversion_leaves_is_merged_and_settled_in_the_same_way(system):
     assert f"ovrin: {system.name}: 1 open conflict" in system.report
     assert system.is_open()
     assert system.versions() == CONFLICT_AND_OBJECTS
-    assert system.read() == scene("5 Lamp 3 20") + game_object(30, 0, "Boat", 1)
-    system.run("ovrin", "settle", "--take", "theirs")
-    assert not system.is_open()
-    assert system.read() == scene("2 Lamp 3 20") + game_object(30, 0, "Boat", 1)
-    system.conclude()
+    settle_conflict_and_objects(system)
 
 
 @holds_for(Git, Mercurial)

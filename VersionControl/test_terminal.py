@@ -12,7 +12,8 @@ import time
 
 import pytest
 
-from systems import has_terminals
+from car import car, merge_cars
+from systems import can_mount, has_terminals
 from test_settle import MANY
 from test_systems import CONFLICT_AND_MORE, HEADER, ONE_CONFLICT, game_object, scene
 
@@ -75,18 +76,6 @@ def fixture_terminal(user):
         one.close()
 
 
-def scenes(user, names, versions):
-    """A merge in which each of these files has the same three versions."""
-    user.start()
-    for branch, text in zip(("main", "topic", "main"), versions):
-        user.git("checkout", "-q", *(("-b", branch) if branch == "topic" else (branch,)))
-        for name in names:
-            user.write(text, name)
-        user.git("add", ".")
-        user.git("commit", "-qm", "change")
-    user.git("merge", "topic", fails=True)
-
-
 def test_walk_ends_with_what_the_script_gives(user, terminal):
     user.conflict(*CONFLICT_AND_MORE)
     screen = terminal()
@@ -102,31 +91,41 @@ def test_walk_ends_with_what_the_script_gives(user, terminal):
     assert user.committed() == scene("2 Lamp 3")
 
 
-def test_fifty_conflicts_of_three_scenes_take_two_keys(user, terminal):
-    parts = [[HEADER + "".join(text.split("--- ")[i] and "--- " + text.split("--- ")[i] for i in part)
-              for text in MANY] for part in (range(1, 18), range(18, 35), range(35, 51))]
-    user.start()
-    for index, branch in enumerate(("main", "topic", "main")):
-        user.git("checkout", "-q", *(("-b", branch) if branch == "topic" else (branch,)))
-        for name, versions in zip("abc", parts):
-            user.write(versions[index], f"{name}.ovrin")
-        user.git("add", ".")
-        user.git("commit", "-qm", "change")
-    user.git("merge", "topic", fails=True)
+def test_component_comes_back_with_what_it_requires(user, terminal):
+    merge_cars(user)
+    screen = terminal()
+    screen.run("ovrin settle")
+    screen.see("Car · Engine", "remove Car · Engine and what needs it")
+    screen.press("t")
+    screen.see("0 of 1 open", "f finishes")
+    screen.press("o")
+    assert " ! " not in screen.see("Engine: ours (main)", "f finishes")
+    screen.press("f")
+    screen.see("status 0")
+    assert user.read() == car("Engine", "Wheel")
+
+
+def test_fifty_conflicts_of_three_scenes_take_three_keys(user, terminal):
+    parts = [[HEADER + "".join("--- " + text.split("--- ")[i] for i in part) for text in MANY]
+             for part in (range(1, 18), range(18, 35), range(35, 51))]
+    names = ["a.ovrin", "b.ovrin", "c.ovrin"]
+    user.conflicts(dict(zip(names, parts)))
     screen = terminal()
     screen.run("ovrin settle")
     screen.see("50 of 50 open · a.ovrin")
-    screen.press("T")
+    screen.press("a")
+    screen.see("Which side for all that is open, in all scenes?")
+    screen.press("t")
     screen.see("0 of 50 open", "50 conflicts settled")
     screen.press("f")
     screen.see("c.ovrin is settled.", "status 0")
     user.git("commit", "-qm", "merged")
-    assert [user.committed(f"{name}.ovrin") for name in "abc"] == [versions[1] for versions in parts]
+    assert [user.committed(name) for name in names] == [versions[1] for versions in parts]
 
 
 @pytest.mark.parametrize("number", [signal.SIGKILL, signal.SIGTERM, signal.SIGHUP, None])
 def test_what_was_decided_outlives_the_program(user, terminal, number):
-    scenes(user, ["a.ovrin", "b.ovrin"], ONE_CONFLICT)
+    user.conflicts({"a.ovrin": ONE_CONFLICT, "b.ovrin": ONE_CONFLICT})
     screen = terminal()
     screen.run("sh -c 'echo $$ >process; exec ovrin settle'")
     screen.see("2 of 2 open")
@@ -166,7 +165,7 @@ def test_screen_follows_the_size_of_its_window(user, terminal):
     screen.run("ovrin settle")
     screen.see("1 of 1 open")
     screen.tmux("resize-window", "-x", "160", "-y", "50")
-    wide = screen.see("b base", "As before  1-9 Mend  u Undo").splitlines()
+    wide = screen.see("b base", "a All open  g As before").splitlines()
     assert any("b base" in line and "o ours" in line and "t theirs" in line for line in wide)
     screen.tmux("resize-window", "-x", "60", "-y", "20")
     screen.see("This window has 60 x 20 characters")
@@ -185,6 +184,24 @@ def test_locale_says_which_characters_are_shown(user, terminal, locale):
         assert r"\u706f\u53f0 n\u0308" in shown and shown.isascii()
     else:
         assert "灯台 n\u0308" in shown and "│" in shown
+
+
+# As a keyboard or a paste of another locale brings them, and what is cut in the midst of a character.
+@pytest.mark.parametrize("locale", ["C.UTF-8", "C"])
+def test_bytes_that_are_no_characters_do_no_harm(user, terminal, locale):
+    user.conflict(*ONE_CONFLICT)
+    screen = terminal(LC_ALL=locale)
+    screen.run("ovrin settle")
+    screen.see("1 of 1 open")
+    for stray in (["e4"], ["80"], ["e2", "9a"], ["f4", "90", "80", "80"], ["e0", "81", "b4"], ["ff"]):
+        screen.tmux("send-keys", "-H", *stray)
+        screen.see("That key does nothing here")
+        screen.press("n")
+    screen.press("/", "x")
+    screen.tmux("send-keys", "-H", "e2", "9a", "93", "e4")
+    screen.see("Search: x⚓_" if locale == "C.UTF-8" else "Search: x\\u2693_")
+    screen.press("Escape", "t")
+    screen.see("0 of 1 open")
 
 
 def test_colours_are_left_out_on_request(user, terminal):
@@ -234,7 +251,7 @@ def test_file_that_was_changed_by_hand_is_asked_about(user, terminal):
 
 
 def test_mergetool_of_git_settles_one_scene_after_the_other(user, terminal):
-    scenes(user, ["a.ovrin", "b.ovrin"], ONE_CONFLICT)
+    user.conflicts({"a.ovrin": ONE_CONFLICT, "b.ovrin": ONE_CONFLICT})
     screen = terminal()
     screen.run("git mergetool --no-prompt --tool ovrin")
     screen.see("1 of 1 open · a.ovrin")
@@ -280,3 +297,48 @@ def test_what_follows_from_a_decision_is_told_and_mended(user, terminal):
     screen.press("f")
     screen.see("scene.ovrin is settled.", "status 0")
     assert "Lantern" in user.read() and "{fileID: 10}" in user.read()
+
+
+# Outside of the small disk files say when it is to be full.
+WITH_A_SMALL_DISK = """
+    mount -t tmpfs -o size=600k none "$HOME/full"
+    cp -R . "$HOME/full"
+    cd "$HOME/full"
+    await() { while [ ! -e "$HOME/$1" ]; do sleep 0.05; done; }
+    (await fill; cat /dev/zero >rest 2>/dev/null; touch "$HOME/filled"
+     await empty; rm rest; touch "$HOME/emptied") >/dev/null 2>&1 &
+    ovrin settle"""
+
+
+def wait_for(path):
+    until = time.monotonic() + SECONDS
+    while not path.exists():
+        assert time.monotonic() < until, path
+        time.sleep(0.02)
+
+
+@pytest.mark.skipif(not can_mount(), reason="disks can't be mounted here")
+def test_full_disk_under_the_screen_is_told_and_keeps_no_step(user, terminal):
+    user.conflict(*MANY)
+    for sample in (user.here / ".git/hooks").glob("*.sample"):
+        sample.unlink()
+    (user.home / "full").mkdir()
+    user.write(WITH_A_SMALL_DISK, "run")
+    screen = terminal()
+    screen.tmux("resize-window", "-x", "200", "-y", "50")  # long paths are told
+    screen.run("unshare -rm sh run")
+    screen.see("50 of 50 open")
+    screen.press("t")
+    screen.see("49 of 50 open")
+    (user.home / "fill").touch()
+    wait_for(user.home / "filled")
+    for key in ("t", "T", "u"):
+        screen.press(key)
+        screen.see("49 of 50 open", "No space left on device", "stays as it was")
+        screen.press("n")
+    (user.home / "empty").touch()
+    wait_for(user.home / "emptied")
+    screen.press("a", "o")
+    screen.see("0 of 50 open")
+    screen.press("u", "q")
+    screen.see("49 open conflicts left", "status 1")

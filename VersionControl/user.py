@@ -41,6 +41,17 @@ class User(System):
         self.sides(base, theirs, ours, name)
         self.git("merge", "topic", fails=True)
 
+    def conflicts(self, scenes):
+        """A merge of several scenes: base, theirs and ours of each name."""
+        self.start()
+        for side, branch in enumerate((("main",), ("-b", "topic"), ("main",))):
+            self.git("checkout", "-q", *branch)
+            for name, versions in scenes.items():
+                self.write(versions[side], name)
+            self.git("add", ".")
+            self.git("commit", "-qm", "change")
+        self.git("merge", "topic", fails=True)
+
     def ovrin(self, *arguments, status=DONE, **environment):
         """What it prints; what it says besides is in `words`. With "status" as None it may end in any way."""
         with self.log.open("w", encoding="utf-8") as errors:

@@ -2,6 +2,7 @@
 
 #include "Changes/ScenePair.h"
 #include "Names/PrintableText.h"
+#include "Scenes/SceneFile.h"
 
 #include "Session/MergeSession.h"
 
@@ -33,6 +34,7 @@ FileChange CompareFile(const ChangedFile& changed, const MergeRules& rules, cons
         change.scene = Compare(changed.file, std::move(pair), rules, wish);
     } catch (const MergeError& error) {
         change.reason = Printable(error.what());
+        if (error.stage == MergeError::Stage::Read) change.reason += kCureOfUnreadable;
     }
     return change;
 }

@@ -11,9 +11,9 @@ constexpr CodeInfo kTable[] = {
     {Code::Unreadable, "unreadable", Severity::Error, "The scene can't be read",
      "The text isn't what a scene may be from the named place on, so that neither the editor nor a merge can "
      "use "
-     "it. Most often somebody edited it by hand, or a merge by lines broke it. Repair the text there, or "
-     "take "
-     "the file from an earlier version."},
+     "it. Most often somebody edited it by hand, or a merge by lines broke it. Letters that "
+     "aren't ASCII stand escaped in scenes: where they don't, let the editor save the file again. Otherwise "
+     "repair the text there, or take the file from an earlier version."},
     {Code::ConflictMarkers, "conflict-markers", Severity::Error, "Conflict markers of a merge by lines",
      "A merge by lines stopped here and nobody settled it. Take the merge back and merge again with ovrin as "
      "the driver (\"ovrin setup\"), or take one side's whole file. Deleting the markers alone leaves both "

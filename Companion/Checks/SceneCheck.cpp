@@ -44,7 +44,7 @@ Finding TellNoScene(const std::string& bytes, SceneKind kind) {
 Finding TellUnreadable(const YAMLError& error, const std::string& reason) {
     Finding finding{Code::Unreadable, error.Line(), error.Object()};
     finding.detail = reason;
-    finding.message = "can't be read: " + reason;
+    finding.message = "can't be read: " + reason + kCureOfUnreadable;
     return finding;
 }
 

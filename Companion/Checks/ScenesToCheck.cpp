@@ -107,7 +107,7 @@ std::vector<SceneToCheck> AllScenes(const Repository& repository) {
 }
 
 std::vector<SceneToCheck> ChangedScenes(const Repository& repository) {
-    return InWorkingTree(repository, ChangedFiles(repository));
+    return InWorkingTree(repository, DifferingFiles(repository));
 }
 
 } // namespace ovrin

@@ -1,8 +1,8 @@
 #include "Commands/DiffCommand.h"
 
+#include "Commands/DiffArguments.h"
 #include "Commands/DiffOutput.h"
 #include "Commands/DiffVersions.h"
-#include "Commands/PathArguments.h"
 #include "Scenes/SceneRules.h"
 
 #include <CLI/CLI.hpp>
@@ -59,17 +59,9 @@ void DescribeLook(CLI::App& command, const std::shared_ptr<DiffWish>& wish) {
 
 Action DescribeDiff(CLI::App& command) {
     const auto wish = std::make_shared<DiffWish>();
-    command
-        .add_option("REVISION", wish->operands.words,
+    AddDiffOperands(command, wish->operands,
                     "none: the working tree; one: against the working tree; two, or A..B, A...B: against "
-                    "each other; or two files")
-        ->expected(0, -1);
-    command
-        .add_option(kPathOption, wish->operands.paths, "compare these files or folders only; also behind --")
-        ->type_name("PATH")
-        ->expected(1)
-        ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
-    command.add_flag("--staged,--cached", wish->operands.isStaged, "compare with what is to be committed");
+                    "each other; or two files");
     DescribeLook(command, wish);
     command.add_flag("--exit-code", wish->tellsByStatus, "end with status 1 if anything differs");
     command.add_flag("--external", wish->isExternal,

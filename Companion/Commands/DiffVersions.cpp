@@ -86,8 +86,14 @@ ComparisonWish Sorted(const DiffOperands& operands, const Repository& repository
         if (areRevisions && !areMarked && mayBeFile) FailForBoth(word);
         (areRevisions ? wish.revisions : wish.paths).push_back(word);
     }
-    if (wish.revisions.empty() && !operands.otherwise.empty() && repository.kind == SystemKind::Git)
+    const bool hasDefault = !operands.otherwise.empty() && repository.kind == SystemKind::Git;
+    // What is to be committed is compared with the last commit anyway, and with nothing ahead of the first.
+    if (wish.revisions.empty() && hasDefault && !operands.isStaged) {
+        if (!IsGitRevision(operands.otherwise))
+            throw Failure("There is no commit here yet to compare with: --staged takes what is to become the "
+                          "first one");
         wish.revisions.push_back(operands.otherwise);
+    }
     return wish;
 }
 

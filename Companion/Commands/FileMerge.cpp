@@ -22,6 +22,7 @@
 #include "Systems/WorkingPath.h"
 #include "Words/Failure.h"
 #include "Words/ProgressLine.h"
+#include "Words/WriteFailure.h"
 
 #include "Destination.h"
 #include "FileUtils.h"
@@ -102,8 +103,8 @@ void DeliverResult(const std::string& file, const std::string& text) {
     const Content content = {text.size(), [&](OutputStream& stream) { stream << text; },
                              IsPassing(file) ? Durability::Passing : Durability::Unsynced};
     if (const int error = Deliver(file, content))
-        throw Failure("cannot write the result, " + Printable(file) + ": " +
-                      std::system_category().message(error));
+        throw WriteFailure("cannot write the result, " + Printable(file) + ": " +
+                           std::system_category().message(error));
 }
 
 /// As version control would have done it if the file had another name.
@@ -164,7 +165,8 @@ std::string Record(const Records& records, const FileMerge& files, OpenMerge mer
         return {};
     } catch (const std::exception& error) {
         return std::string("The merge could not be written down: ") + error.what() +
-               "\nNothing is lost: version control keeps all three versions until the file is settled.\n";
+               "\nNothing is lost: version control keeps all three versions until the file is settled, and "
+               "with git \"ovrin settle\" merges them again.\n";
     }
 }
 
@@ -174,6 +176,7 @@ OpenMerge DescribeOpen(const FileMerge& files, const Records& records, const std
     OpenMerge open;
     open.path = records.path.empty() ? files.path : records.path;
     open.occasion = FindOccasion(records.repository, caller, files.labels);
+    if (caller) open.process = caller->process;
     open.isBothAdded = merge.IsBothAdded();
     open.conflicts = merge.Open().size();
     return open;
@@ -193,6 +196,12 @@ constexpr const char* kNextStep =
     "Next: \"ovrin settle\" settles the open conflicts of all scenes, \"ovrin settle --web\" does so in the "
     "browser; \"ovrin settle --take theirs\" takes a side at all of them.\n";
 
+/// Once for all scenes that version control merges at one go, ahead of its record.
+std::string TellNext(const Records& records, const OpenMerge& open) {
+    const bool isTold = !records.path.empty() && OpenMerges(*records.repository).HasFellowOf(open);
+    return isTold ? "" : kNextStep;
+}
+
 Outcome LeaveOpen(const FileMerge& files, const Records& records, SceneMerge& merge, ProgressLine& progress) {
     // Version control takes its time for the answer, which most often is ours.
     std::future<Side> take = std::async([&] { return SideToTake(records.repository); });
@@ -205,9 +214,10 @@ Outcome LeaveOpen(const FileMerge& files, const Records& records, SceneMerge& me
         merge.Merge({}, open.take);
         result = merge.Result();
     }
-    const std::string complaint = isRecorded ? Record(records, files, open) : "";
+    std::string behind = isRecorded ? TellNext(records, open) : "";
+    if (isRecorded) behind.insert(0, Record(records, files, open));
     DeliverResult(files.result, result);
-    const std::string told = TellOpen(merge, open) + complaint + (isRecorded ? kNextStep : "");
+    const std::string told = TellOpen(merge, open) + behind;
     progress.Wipe();
     Tell(told);
     return Outcome::LeftOpen;

@@ -3,6 +3,7 @@
 #include "Commands/FileMerge.h"
 #include "Names/PrintableText.h"
 #include "Words/Failure.h"
+#include "Words/WriteFailure.h"
 
 #include <CLI/CLI.hpp>
 #include <memory>
@@ -20,6 +21,9 @@ constexpr const char* kPutScene = "put a good version in its place, and tell ver
 constexpr const char* kPutSetting =
     "put that right, and then, with git, let \"ovrin settle\" merge it again; "
     "with others, let version control do so.";
+constexpr const char* kMakeRoom =
+    "version control keeps all three versions. Make room there, or let it be written to, and then, with git, "
+    "let \"ovrin settle\" merge it again; with others, let version control do so.";
 
 Failure NotMerged(const FileMerge& files, const std::exception& error, const char* next) {
     return Failure(Printable(files.path) + " is not merged: " + error.what() +
@@ -34,6 +38,8 @@ Outcome MergeOrTell(const FileMerge& files) {
         throw;
     } catch (const BadSetting& error) {
         throw NotMerged(files, error, kPutSetting);
+    } catch (const WriteFailure& error) {
+        throw NotMerged(files, error, kMakeRoom);
     } catch (const std::exception& error) {
         throw NotMerged(files, error, kPutScene);
     }

@@ -3,17 +3,16 @@
 #include "Descriptor.h"
 #include "OutputFile.h"
 #include "Words/Failure.h"
+#include "Words/WriteFailure.h"
 
 #include <cerrno>
-#include <system_error>
 #include <unistd.h>
 
 namespace ovrin {
 
 void PrintResult(std::string_view text) {
     const int error = WriteOutput({}, [&](OutputStream& stream) { stream << text; });
-    if (error && error != EPIPE)
-        throw Failure("Cannot write to standard output: " + std::system_category().message(error));
+    if (error && error != EPIPE) throw Failure("Cannot write to standard output: " + WhyNotWritten(error));
 }
 
 void Tell(std::string_view text) {

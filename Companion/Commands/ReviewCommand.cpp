@@ -1,6 +1,6 @@
 #include "Commands/ReviewCommand.h"
 
-#include "Commands/PathArguments.h"
+#include "Commands/DiffArguments.h"
 #include "Commands/ReviewVersions.h"
 #include "Destination.h"
 #include "Names/PrintableText.h"
@@ -10,11 +10,11 @@
 #include "Settle/Web/SinglePage.h"
 #include "Words/Failure.h"
 #include "Words/ProgressCount.h"
+#include "Words/WriteFailure.h"
 
 #include <CLI/CLI.hpp>
 #include <iostream>
 #include <memory>
-#include <system_error>
 
 namespace ovrin {
 
@@ -56,12 +56,12 @@ void WritePage(const std::string& file, ReviewPage& review, const ReviewPage::Pr
     const std::string path = file == "-" ? "" : file;
     if (const int error = Deliver(
             path, {page.size(), [&page](OutputStream& stream) { stream << page; }, Durability::Synced}))
-        throw Failure("Cannot write " + Printable(file) + ": " + std::system_category().message(error));
+        throw Failure("Cannot write " + Printable(file) + ": " + WhyNotWritten(error));
 }
 
 void Serve(const PageOptions& options, ReviewPage& review) {
     ServePages(options, [&](const PageRequest& request) {
-        if (std::optional<PageAnswer> file = AnswerFile(request)) return std::move(*file);
+        if (std::optional<PageAnswer> file = AnswerPageFile(request)) return std::move(*file);
         return review.Answer(request);
     });
 }
@@ -92,17 +92,10 @@ Outcome RunReview(const ReviewWish& wish) {
 
 Action DescribeReview(CLI::App& command) {
     const auto wish = std::make_shared<ReviewWish>();
-    command
-        .add_option("REVISION", wish->operands.words,
-                    "none: the working tree against the last commit; one: against the working tree; two, or "
-                    "A..B, A...B: against each other; or two files, or three: BASE OURS THEIRS")
-        ->expected(0, -1);
-    command.add_option(kPathOption, wish->operands.paths, "only these files or folders; also behind --")
-        ->type_name("PATH")
-        ->expected(1)
-        ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
-    auto* staged =
-        command.add_flag("--staged,--cached", wish->operands.isStaged, "show what is to be committed");
+    auto* staged = AddDiffOperands(
+        command, wish->operands,
+        "none: the working tree against the last commit; one: against the working tree; two, or "
+        "A..B, A...B: against each other; or two files, or three: BASE OURS THEIRS");
     command.add_option("--merge", wish->merge, "show the two sides of a merge, and what came of them")
         ->type_name("COMMIT")
         ->excludes(staged);

@@ -45,6 +45,7 @@ struct OpenMerge {
     std::string rules, typeInfo; ///< files that were named; empty for none
     std::size_t conflicts = 0;   ///< open ones, in the beginning
     std::string identity;        ///< of this merge; another one of the same scene has another
+    std::string process;         ///< of version control, which asked for it; empty where it isn't known
     ThreeTexts texts;            ///< empty where only the rest was asked for
 };
 

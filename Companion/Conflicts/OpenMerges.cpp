@@ -6,6 +6,7 @@
 #include "Names/PrintableText.h"
 #include "Systems/Repository.h"
 #include "Words/Failure.h"
+#include "Words/WriteFailure.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -26,6 +27,7 @@ using nlohmann::json;
 
 constexpr const char* kMergeExtension = ".merge";
 constexpr const char* kProgressExtension = ".progress";
+constexpr std::uint64_t kPlaces = 4;                      // of a path; more where all of them are taken
 constexpr std::size_t kMostHeader = std::size_t{1} << 20; // bytes
 
 /// FNV-1a, of 64 bits, in hexadecimal digits. Paths of one number are told apart by what the files say.
@@ -64,14 +66,15 @@ void Write(const std::string& file, const std::string& header, const std::vector
     };
     content.durability = durability;
     if (const int error = Deliver(file, content))
-        throw Failure("Cannot write " + file + ": " + std::system_category().message(error));
+        throw Failure("Cannot write " + file + ": " + WhyNotWritten(error));
 }
 
-std::string HeaderOf(const OpenMerge& merge) {
+std::string HeaderOf(const OpenMerge& merge, const std::string& identity) {
     const Occasion& occasion = merge.occasion;
     const json header = {
         {"version", 1},
-        {"identity", merge.identity},
+        {"identity", identity},
+        {"process", merge.process},
         {"action", occasion.action},
         {"base", occasion.base},
         {"ours", occasion.ours},
@@ -99,6 +102,7 @@ constexpr std::size_t kPartsWithoutTexts = 3;
 void TakeHeader(const json& header, OpenMerge& merge) {
     if (header.at("version") != 1) throw Failure("written by a newer version of ovrin");
     merge.identity = header.at("identity");
+    merge.process = header.value("process", "");
     merge.occasion = {header.at("action"), header.at("base"), header.at("ours"), header.at("theirs"),
                       header.at("head")};
     merge.take = SideNamed(header.at("take").get<std::string>());
@@ -167,16 +171,31 @@ bool IsOfAnother(const std::string& file, const std::string& path) {
     }
 }
 
+json ToJson(const Progress& progress, const std::string& identity) {
+    json decisions = json::array();
+    for (const Decision& decision : progress.decisions)
+        decisions.push_back({{"path", decision.path}, {"side", SideName(decision.side)}});
+    json steps = json::array();
+    for (const DecisionStep& step : progress.steps)
+        steps.push_back({{"decisions", step.decisions}, {"number", step.number}});
+    return {{"identity", identity}, {"open", progress.open}, {"decisions", decisions}, {"steps", steps}};
+}
+
 } // namespace
 
 OpenMerges::OpenMerges(const Repository& repository) : m_Folder(repository.data + "/ovrin/") {}
 
+/// Its record may stand behind a gap, which is left where that of another path of the same number was
+/// removed.
 OpenMerges::Place OpenMerges::PlaceOf(const std::string& path) const {
-    for (std::uint64_t attempt = 0;; ++attempt) {
+    std::string free;
+    for (std::uint64_t attempt = 0; attempt < kPlaces || free.empty(); ++attempt) {
         const std::string file = m_Folder + NumberOf(path, attempt);
-        if (IsMissing(file + kMergeExtension)) return {file, false};
-        if (!IsOfAnother(file + kMergeExtension, path)) return {file, true};
+        const bool isMissing = IsMissing(file + kMergeExtension);
+        if (!isMissing && !IsOfAnother(file + kMergeExtension, path)) return {file, true};
+        if (isMissing && free.empty()) free = file;
     }
+    return {free, false};
 }
 
 void OpenMerges::MakeFolder() const {
@@ -187,11 +206,12 @@ void OpenMerges::MakeFolder() const {
 
 void OpenMerges::Add(OpenMerge& merge) {
     MakeFolder();
-    merge.identity = NewIdentity();
+    std::string identity = NewIdentity();
     const auto parts = PartsOf(merge);
     // As safe as what version control writes of the merge itself, also in the place of an earlier one.
-    Write(PlaceOf(merge.path).file + kMergeExtension, HeaderOf(merge), {parts.begin(), parts.end()},
+    Write(PlaceOf(merge.path).file + kMergeExtension, HeaderOf(merge, identity), {parts.begin(), parts.end()},
           Durability::Passing);
+    merge.identity = std::move(identity);
 }
 
 std::vector<OpenMerge> OpenMerges::List() const {
@@ -204,6 +224,21 @@ std::vector<OpenMerge> OpenMerges::List() const {
         throw Failure("Cannot look into " + m_Folder + ": " + error.message());
     std::ranges::sort(merges, {}, &OpenMerge::path);
     return merges;
+}
+
+bool OpenMerges::HasFellowOf(const OpenMerge& merge) const {
+    if (merge.process.empty()) return false;
+    std::error_code error;
+    const fs::directory_iterator files(m_Folder, error);
+    return std::any_of(begin(files), end(files), [&](const fs::directory_entry& entry) {
+        if (entry.path().extension() != kMergeExtension) return false;
+        try {
+            const OpenMerge other = ReadMerge(entry.path().string(), Extent::WithoutTexts);
+            return other.process == merge.process && other.occasion.head == merge.occasion.head;
+        } catch (const Failure&) {
+            return false;
+        }
+    });
 }
 
 std::optional<OpenMerge> OpenMerges::Find(const std::string& path) const {
@@ -257,17 +292,15 @@ void OpenMerges::SetProgress(OpenMerge& merge, const Progress& known, const Prog
         throw Failure(Printable(merge.path) +
                       " was settled elsewhere meanwhile, or its merge was ended or made again: nothing is "
                       "decided here. End this, and run \"ovrin settle\" again");
-    if (merge.identity.empty()) Add(merge);
-    json decisions = json::array();
-    for (const Decision& decision : progress.decisions)
-        decisions.push_back({{"path", decision.path}, {"side", SideName(decision.side)}});
-    json steps = json::array();
-    for (const DecisionStep& step : progress.steps)
-        steps.push_back({{"decisions", step.decisions}, {"number", step.number}});
-    const json written = {
-        {"identity", merge.identity}, {"open", progress.open}, {"decisions", decisions}, {"steps", steps}};
-    // Nobody else has what a person decided.
-    Write(PlaceOf(merge.path).file + kProgressExtension, TextOf(written) + "\n", {}, Durability::Synced);
+    try {
+        if (merge.identity.empty()) Add(merge);
+        // Nobody else has what a person decided.
+        Write(PlaceOf(merge.path).file + kProgressExtension, TextOf(ToJson(progress, merge.identity)) + "\n",
+              {}, Durability::Synced);
+    } catch (const Failure& failure) {
+        throw Failure(failure.what() + (". What is decided in " + Printable(merge.path)) +
+                      " stays as it was: set that right, and decide again");
+    }
 }
 
 void OpenMerges::Remove(const std::string& path) {

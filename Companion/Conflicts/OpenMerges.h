@@ -31,6 +31,8 @@ public:
     std::optional<OpenMerge> Find(const std::string& path) const;
     /// Whether there is one of a scene.
     bool Has(const std::string& path) const { return PlaceOf(path).isTaken; }
+    /// Whether any of them was asked for by the same process of version control, in the same merge.
+    bool HasFellowOf(const OpenMerge& merge) const;
     /// How far it has come: nothing settled if nothing is known.
     Progress ProgressOf(const OpenMerge& merge) const;
     /// Whether nobody has made the merge again, ended it or decided in it since its progress was `known`. One

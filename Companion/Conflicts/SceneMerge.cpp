@@ -1,6 +1,7 @@
 #include "Conflicts/SceneMerge.h"
 
 #include "Conflicts/DecisionPath.h"
+#include "Scenes/SceneFile.h"
 #include "Words/Failure.h"
 
 #include "Session/StageWatcher.h"
@@ -35,7 +36,8 @@ std::string Tell(const MergeError& error) {
     std::string text = (error.file.empty() ? "The scene" : error.file) + " can't be " + VerbOf(error.stage);
     if (!error.Object().empty()) text += ", at object " + error.Object();
     if (error.Line()) text += ", line " + std::to_string(error.Line());
-    return text + ": " + error.reason;
+    text += ": " + error.reason;
+    return error.stage == MergeError::Stage::Read ? text + kCureOfUnreadable : text;
 }
 
 /// Carries out a step of the engine. What it throws becomes a Failure.

@@ -104,6 +104,9 @@ Diagnosis LookAtSubversion(Patient& patient) {
 
 Diagnosis LookAtMergeTools(Patient&) {
     const std::string file = GetSpecFilename(kDefaultSpecFile);
+    if (!FileExists(file.c_str()))
+        return {Health::Problem, file + ", which names the merge tools, is missing or can't be read",
+                "install the program whole, or write ~/.mergespecfile.txt, as mergespecfile(5) tells"};
     const bool isOfProgram = GetFolder(file) == GetDataFilesDir();
     const FallbackCommandMap tools = PopulateFallbacks(file);
     if (tools.empty())

@@ -17,8 +17,8 @@ Point Sum(const Point& one, const Point& other) {
 } // namespace
 
 Affine Affine::Of(const Point& displacement, const Quaternion& rotation, const Point& scale) {
-    const double length = std::sqrt(rotation.x * rotation.x + rotation.y * rotation.y +
-                                    rotation.z * rotation.z + rotation.w * rotation.w);
+    // Unlike the root of the squares it is neither without end nor nothing where the numbers aren't.
+    const double length = std::hypot(std::hypot(rotation.x, rotation.y), std::hypot(rotation.z, rotation.w));
     const bool isNone = length == 0;
     const double x = isNone ? 0 : rotation.x / length, y = isNone ? 0 : rotation.y / length,
                  z = isNone ? 0 : rotation.z / length, w = isNone ? 1 : rotation.w / length;

@@ -98,8 +98,9 @@ void ObjectRows::Walk(const Step& step) {
     if (shape == ValueShape::Fields ||
         (isInside && (shape == ValueShape::Colour || shape == ValueShape::Vector)))
         return WalkFields(step);
-    if (shape == ValueShape::List && WalkElements(step)) return;
-    AddRow(step, shape, nullptr);
+    const std::size_t told = m_Rows.size();
+    if (shape == ValueShape::List && WalkElements(step) && m_Rows.size() > told) return;
+    AddRow(step, shape, nullptr); // of elements with keys, too, if nothing but their order differs
     if (isInside) AddUntold(m_Property);
 }
 

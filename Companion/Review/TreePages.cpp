@@ -65,17 +65,16 @@ json TreePages::Hits(std::string_view text, PageRange range) const {
     json hits = json::array();
     for (const Index hit : Part(found, range)) {
         json way = json::array(), names = json::array();
-        for (const Index above : m_Tree.Way(hit)) {
-            if (way.size() == kMostWay) break;
+        const std::vector<Index> all = m_Tree.Way(hit);
+        for (const Index above : Part(all, {0, kMostWay})) {
             way.push_back(Printable(nodes[above].id->Value()));
             names.push_back(LabelOf(above));
         }
-        const bool isShortened = way.size() == kMostWay;
         hits.push_back({{"id", Printable(nodes[hit].id->Value())},
                         {"name", LabelOf(hit)},
                         {"way", std::move(way)},
                         {"names", std::move(names)}});
-        if (isShortened) hits.back()["isShortened"] = true;
+        if (all.size() > kMostWay) hits.back()["isShortened"] = true;
     }
     return {{"total", found.size()}, {"hits", std::move(hits)}};
 }

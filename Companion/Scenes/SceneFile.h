@@ -24,6 +24,11 @@ SceneKind ClassifyScene(std::string_view bytes);
 /// line; npos if there is none.
 std::size_t FindMarker(std::string_view bytes);
 
+/// What to do about a scene that the engine can't read. It goes by characters and bytes as if they were the
+/// same, which holds for what the editor writes.
+inline constexpr const char* kCureOfUnreadable =
+    "; let the editor save it again, which escapes letters that aren't ASCII";
+
 /// One sentence for people: what the file `name` is, and what to do next. Without a full stop.
 std::string TellKind(const std::string& name, SceneKind kind);
 

@@ -4,6 +4,8 @@
 #include "Conflicts/Requirements.h"
 #include "Settle/StructureDecisions.h"
 
+#include <algorithm>
+#include <iterator>
 #include <unordered_set>
 
 namespace ovrin {
@@ -22,11 +24,16 @@ std::vector<Decision> Consequences(SceneMerge& merge, const MergeNames& names,
         for (const OpenConflict& conflict : conflicts) {
             const MergeNames::ID id = conflict.path.front();
             if (conflict.path.size() != 1 || !structure.IsWithout(id, without)) continue;
-            (names.Has(VersionOf(side), id) ? kept : given).push_back(id);
-            if (conflict.kind != ConflictKind::BrokenRequirement || names.Has(VersionOf(side), id)) continue;
-            for (const MergeNames::ID needing : NeededBy(merge.Session(), id, side))
-                if (structure.IsWithout(needing, without)) removed.push_back(needing);
+            const bool isKept = names.Has(VersionOf(side), id);
+            (isKept ? kept : given).push_back(id);
+            if (conflict.kind != ConflictKind::BrokenRequirement || (isKept && !taken.wereSettled)) continue;
+            for (const MergeNames::ID needing : NeededBy(merge.Session(), id, isKept ? without : side))
+                if (structure.IsWithout(needing, without)) (isKept ? kept : removed).push_back(needing);
         }
+        std::vector<MergeNames::ID> before;
+        std::ranges::copy_if(taken.alreadyKept, std::back_inserter(before),
+                             [&](MergeNames::ID id) { return structure.IsWithout(id, without); });
+        structure.AlreadyKept(before, without);
         structure.Keep(kept, without);
         if (taken.wereSettled) structure.Return(given, without);
         structure.Remove(removed, without);

@@ -13,6 +13,9 @@ namespace ovrin {
 struct TakenSide {
     Side side;
     bool wereSettled = false; ///< the conflicts, in another way
+    /// Objects that other decisions keep, although a side removed them: those that were named with them in
+    /// one list follow as if all were kept at once.
+    std::span<const MergeNames::ID> alreadyKept = {};
 };
 
 /// What follows when `side` is taken for these conflicts: decisions without which the scene would lack what

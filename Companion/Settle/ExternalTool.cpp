@@ -1,11 +1,13 @@
 #include "Settle/ExternalTool.h"
 
 #include "Destination.h"
+#include "Fallback.h"
 #include "FileUtils.h"
 #include "Names/PrintableText.h"
 #include "Systems/ChildProcess.h"
 #include "Systems/ScratchFolder.h"
 #include "Words/Failure.h"
+#include "Words/WriteFailure.h"
 
 #include <cerrno>
 #include <system_error>
@@ -25,7 +27,7 @@ std::string Read(const std::string& file) {
 void Write(const std::string& file, const std::string& bytes, Durability durability) {
     const Content content{bytes.size(), [&](OutputStream& stream) { stream << bytes; }, durability};
     if (const int error = Deliver(file, content))
-        throw Failure(Printable(file) + " can't be written: " + std::system_category().message(error));
+        throw Failure(Printable(file) + " can't be written: " + WhyNotWritten(error));
 }
 
 /// The file, or one that stands for it where it is missing or empty: a scene without objects, with the header
@@ -40,9 +42,18 @@ std::string ObjectsOf(const std::string& file, const std::string& other, const S
     return standIn;
 }
 
+void WantToolList() {
+    const std::string file = GetSpecFilename(kDefaultSpecFile);
+    if (!FileExists(file.c_str()))
+        throw Failure(Printable(file) + ", which names the merge tools, is missing or can't be read: install "
+                                        "the program whole, or write ~/.mergespecfile.txt, as "
+                                        "mergespecfile(5) tells");
+}
+
 } // namespace
 
 void MergeWithTool(const ToolFiles& files) {
+    WantToolList();
     const ScratchFolder scratch;
     const std::string result = scratch.File("result");
     // A path that looks like an option is none to a program that gets it from here.

@@ -11,11 +11,15 @@
 
 namespace ovrin {
 
+/// Why a conflict that was decided is open: decisions on a loop of parents may contradict each other.
+inline constexpr const char* kStillLoop = "with the sides that are taken, the objects would still be below "
+                                          "each other: take one side for all of them";
+
 /// A conflict that was met while a scene is settled.
 struct MetConflict {
     const OpenConflict* conflict; ///< stays as long as the session
     bool isOpen;
-    std::optional<Side> decided;       ///< by the decision that counts there, of a settled one
+    std::optional<Side> decided;       ///< by the decision that counts there; of an open one see kStillLoop
     std::optional<Side> proposed = {}; ///< what was decided of the same values before
 };
 

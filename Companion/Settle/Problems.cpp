@@ -26,7 +26,12 @@ const YAMLScalar* ChildrenKey() {
     return key;
 }
 
-/// "m_Target", "m_Slots[2].item".
+/// The field of an object that a place is in; null for an object that has no fields.
+const YAMLScalar* FieldAt(const Path& place) {
+    return place.size() > 2 ? place[2] : nullptr;
+}
+
+/// "m_Target", "m_Slots[2].item"; empty for an object that has no fields.
 std::string PropertyAt(const Path& place) {
     std::string words;
     for (std::size_t i = 2; i < place.size(); ++i) {
@@ -93,7 +98,7 @@ private:
                    m_OpenObjects.contains(m_Structure.TopOf(id, without));
         });
     }
-    bool IsOpenAt(const Path& place) const { return m_OpenFields.contains({place[0], place[2]}); }
+    bool IsOpenAt(const Path& place) const { return m_OpenFields.contains({place[0], FieldAt(place)}); }
     /// Whether it is open what the child stands below that a list has or lacks.
     bool IsPlaceOpen(const Breakage& broken) const {
         const ID child = broken.kind == Breakage::Kind::NotListed       ? broken.object
@@ -131,7 +136,7 @@ private:
 
     std::string TextOf(const Breakage& broken) const {
         const std::string object = NameOf(broken.object), other = NameOf(broken.other);
-        const YAMLScalar* field = broken.place[2];
+        const YAMLScalar* field = FieldAt(broken.place);
         const bool isComponents = field == YAMLScalar::mComponent;
         const std::string list = isComponents ? "the list of components of " : "the list of children of ";
         const std::string gone = HowGone(broken.other);
@@ -153,7 +158,8 @@ private:
         if (isComponents || field == ChildrenKey())
             return list + object + " names " + (isComponents ? LeadingName(broken.other) : other) +
                    ", which was " + gone;
-        return LeadingName(broken.object) + ": " + PropertyAt(broken.place) + " refers to " +
+        const std::string property = PropertyAt(broken.place);
+        return LeadingName(broken.object) + (property.empty() ? "" : ": " + property) + " refers to " +
                LeadingName(broken.other) + ", which was " + gone;
     }
 

@@ -64,6 +64,8 @@ std::string TellConflicts(SettleSession& session) {
         else
             text +=
                 "  " + (conflict.property.empty() ? "" : conflict.property + ": ") + TellState(met) + '\n';
+        if (met.isOpen && met.decided)
+            text += std::string("    taken: ") + SideName(*met.decided) + ", but " + kStillLoop + '\n';
         if (met.proposed) text += std::string("    proposed: ") + SideName(*met.proposed) + '\n';
         text += "    path    " + Printable(conflict.path) + '\n';
     }

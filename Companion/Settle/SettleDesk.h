@@ -39,8 +39,9 @@ public:
         const OpenConflict* about; ///< stays as long as the desk
         std::size_t object;        ///< index of the first item about the same object
         bool isOpen;
-        std::optional<Side>
-            decided; ///< by a decision at this very place; nothing if one elsewhere settled it
+        /// By a decision at this very place; nothing if one elsewhere settled it. Of an open one see
+        /// kStillLoop.
+        std::optional<Side> decided;
         /// Of an open one: what was decided of the same values before.
         std::optional<Side> proposed;
     };
@@ -82,6 +83,7 @@ public:
 
     /// SettleScenes::Finish, after which finished scenes stay in the list.
     std::vector<std::string> Finish(bool overwrite, Remarks& remarks);
+    const Remarks& ChangedByHand() const { return m_Scenes.ChangedByHand(); }
 
 private:
     template <class Make> Step MakeStep(const Make& make);

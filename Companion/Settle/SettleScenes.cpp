@@ -70,6 +70,13 @@ std::string TellOver(const std::string& path) {
                              "somebody else settled it. Run \"ovrin settle\" again";
 }
 
+std::string TellIdle(const std::string& path, const std::vector<std::string>& idle) {
+    return Printable(path) +
+           ": kept decisions that match nothing in this merge have no effect: " + Printable(idle.front()) +
+           (idle.size() > 1 ? " and " + std::to_string(idle.size() - 1) + " more" : "") +
+           "; \"ovrin settle --list\" shows what is open";
+}
+
 std::string TellByHand(const std::string& path) {
     return Printable(path) + " was changed by hand since it was merged, and stays as it is: \"ovrin settle "
                              "--as-is\" takes the file "
@@ -202,6 +209,7 @@ std::unique_ptr<SettleSession> SettleScenes::Load(IndexMerges& index, const std:
     } else {
         session = std::make_unique<SettleSession>(index.Read(path));
     }
+    if (!session->Idle().empty()) remarks.push_back(TellIdle(path, session->Idle()));
     session->Propose(m_Earlier);
     return session;
 }
@@ -260,6 +268,7 @@ std::vector<std::string> SettleScenes::Finish(bool overwrite, Remarks& remarks) 
     const std::vector<SettleSession*> sessions = ToFinish();
     const std::set<std::string> open = PathsStillOpen(sessions);
     std::vector<std::string> finished;
+    m_ChangedByHand.clear();
     for (SettleSession* session : sessions) {
         const std::string& path = session->Source().path;
         if (!open.contains(path)) {
@@ -272,7 +281,8 @@ std::vector<std::string> SettleScenes::Finish(bool overwrite, Remarks& remarks) 
             continue;
         }
         if (!overwrite && !IsUntouched(*session, result)) {
-            remarks.push_back(TellByHand(path));
+            m_ChangedByHand.push_back(TellByHand(path));
+            remarks.push_back(m_ChangedByHand.back());
             continue;
         }
         DeliverScene(FileOf(path), result);

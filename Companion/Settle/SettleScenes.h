@@ -55,6 +55,8 @@ public:
     /// finished; `remarks` tells of the others. Until the record goes, doing it again completes what was
     /// interrupted.
     std::vector<std::string> Finish(bool overwrite, Remarks& remarks);
+    /// Those remarks of the last Finish that are about files that it would replace if it may `overwrite`.
+    const Remarks& ChangedByHand() const { return m_ChangedByHand; }
 
     /// Takes the files of the scenes that are left as they stand, whatever was decided. Throws Failure for
     /// one with conflict markers or that isn't there, and takes none then.
@@ -81,6 +83,7 @@ private:
     LiveMerges m_Live;
     std::vector<std::unique_ptr<SettleSession>> m_Sessions;
     std::vector<SceneCount> m_Unreadable;
+    Remarks m_ChangedByHand;
     std::set<std::string> m_Finished; // paths; their files are nobody's business any more
 };
 

@@ -1,5 +1,6 @@
 #include "Settle/SettleSession.h"
 
+#include "Conflicts/Conflict.h"
 #include "Conflicts/DecisionPath.h"
 #include "Settle/Consequences.h"
 #include "Settle/DecisionTable.h"
@@ -32,6 +33,29 @@ bool IsCovered(Path path, const DecisionTable& decided) {
     return false;
 }
 
+/// Whether an object that one side lacks is there, or isn't, by a decision already, as it would be by this
+/// one: then the side stays that a person took for it.
+bool IsSoAlready(const Decision& decision, const DecisionTable& decided, const MergeNames& names) {
+    const Path path = PathOfDecision(decision.path);
+    const auto isIn = [&](Version version) { return names.Has(version, path.front()); };
+    if (path.size() != 1 || isIn(Version::Ours) == isIn(Version::Theirs)) return false;
+    const std::optional<Side> side = decided.Find(path);
+    return side && isIn(VersionOf(*side)) == isIn(VersionOf(decision.side));
+}
+
+/// The objects that a side removed, and that are kept by a decision about a conflict.
+std::vector<MergeNames::ID> KeptBy(const DecisionTable& decided, const MetConflicts& conflicts,
+                                   const MergeNames& names) {
+    std::vector<MergeNames::ID> kept;
+    for (std::size_t i = 0; i < conflicts.size(); ++i) {
+        const Path& path = conflicts[i].path;
+        if (path.size() != 1) continue;
+        const std::optional<Side> side = decided.Find(path);
+        if (side && names.Has(VersionOf(*side), path.front())) kept.push_back(path.front());
+    }
+    return kept;
+}
+
 } // namespace
 
 SettleSession::SettleSession(OpenMerge merge, Progress progress)
@@ -41,7 +65,10 @@ SettleSession::SettleSession(OpenMerge merge, Progress progress)
     Meet();
     if (m_Source.identity.empty()) m_Source.conflicts = Open().size();
     m_Problems = FindProblems(m_Merge, m_Names);
-    if (!m_Decisions.empty()) MergeAgain();
+    if (m_Decisions.empty()) return;
+    // What later decisions took the place of isn't met any more, but is in the merge without them.
+    for (const std::string& path : MergeAgain())
+        if (!Touches(path)) m_Idle.push_back(path);
 }
 
 /// The conflicts of the merge as it is in this process.
@@ -91,8 +118,7 @@ void SettleSession::TakeStates(const std::vector<std::string>& open) {
     const DecisionTable decided(m_Decisions);
     std::vector<MetConflicts::State> states(m_Conflicts.size(), {false, {}});
     for (const std::string& path : open) states[*m_Conflicts.Find(PathOfDecision(path))].isOpen = true;
-    for (std::size_t i = 0; i < states.size(); ++i)
-        if (!states[i].isOpen) states[i].decided = decided.Find(m_Conflicts[i].path);
+    for (std::size_t i = 0; i < states.size(); ++i) states[i].decided = decided.Find(m_Conflicts[i].path);
     m_Conflicts.SetStates(std::move(states));
 }
 
@@ -219,8 +245,11 @@ bool SettleSession::EndLoops(const std::vector<Decision>& decisions) {
 }
 
 void SettleSession::AddConsequences(const std::vector<OpenConflict>& conflicts, TakenSide taken) {
-    const std::vector<Decision> more = Consequences(m_Merge, m_Names, Open(), conflicts, taken);
-    m_Decisions.insert(m_Decisions.end(), more.begin(), more.end());
+    const DecisionTable decided(m_Decisions);
+    const std::vector<MergeNames::ID> kept = KeptBy(decided, m_Conflicts, m_Names);
+    taken.alreadyKept = kept;
+    for (const Decision& more : Consequences(m_Merge, m_Names, Open(), conflicts, taken))
+        if (!IsSoAlready(more, decided, m_Names)) m_Decisions.push_back(more);
 }
 
 void SettleSession::EndStep(std::size_t decisionsBefore) {
@@ -257,6 +286,8 @@ std::size_t SettleSession::TakeEach(const std::function<std::optional<Side>(cons
             for (const auto& [side, conflicts] : round) AddConsequences(conflicts, {side});
             MergeAgain();
         }
+        // Nothing is no step, save that what both sides added was looked through.
+        if (m_Decisions.size() == before && !m_Merge.IsBothAdded()) return std::size_t{0};
         EndStep(before);
         std::size_t settled = tried.size();
         for (const OpenConflict& conflict : Open()) settled -= tried.count(conflict.path);

@@ -42,6 +42,8 @@ public:
     const std::vector<Decision>& Decisions() const { return m_Decisions; }
     /// Nothing is open, and a scene that both sides added was looked through, which a step shows.
     bool IsSettled() const { return Open().empty() && !(m_Merge.IsBothAdded() && m_Steps.empty()); }
+    /// The paths of those decisions it began with that match nothing in the merge, and have no effect.
+    const std::vector<std::string>& Idle() const { return m_Idle; }
     /// What is wrong with the result.
     const std::vector<Problem>& Problems() const { return m_Problems; }
 
@@ -61,7 +63,8 @@ public:
     /// decided.
     std::vector<Decision> Decide(const std::vector<Decision>& decisions, Follow follow = Follow::Yes);
     /// Decides all open conflicts that `isMeant` accepts, and those of them that follow, for a side, as one
-    /// step. What can't be settled by a side stays open. Returns how many conflicts were settled.
+    /// step. What can't be settled by a side stays open. Returns how many conflicts were settled. Where none
+    /// is meant there is no step, save in a scene that both sides added.
     std::size_t TakeAll(Side side, const std::function<bool(const OpenConflict&)>& isMeant);
     /// The same by what is proposed of each.
     std::size_t TakeProposed(const std::function<bool(const OpenConflict&)>& isMeant);
@@ -125,6 +128,7 @@ private:
     SceneMerge m_Merge;
     MergeNames m_Names;
     std::vector<Decision> m_Decisions;
+    std::vector<std::string> m_Idle;
     std::vector<DecisionStep> m_Steps;
     struct UndoneStep {
         std::vector<Decision> decisions;

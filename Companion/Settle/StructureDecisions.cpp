@@ -104,6 +104,12 @@ void StructureDecisions::Keep(const std::vector<ID>& ids, Side without) {
     DecideWhole(ids, without, OtherThan(without));
 }
 
+void StructureDecisions::AlreadyKept(const std::vector<ID>& ids, Side without) {
+    const std::size_t before = m_Decisions.size();
+    for (const ID id : ids) DecideEntries(TopOf(id, without), without, OtherThan(without));
+    m_Decisions.erase(m_Decisions.begin() + static_cast<std::ptrdiff_t>(before), m_Decisions.end());
+}
+
 void StructureDecisions::Return(const std::vector<ID>& ids, Side without) {
     DecideWhole(ids, without, without);
 }

@@ -38,6 +38,9 @@ public:
     /// For objects that `without`, ours or theirs, lacks and the other side has: they are kept, with the
     /// whole of what was removed or added with them.
     void Keep(const std::vector<ID>& ids, Side without);
+    /// Tells of such objects that other decisions keep: a list that names them besides those of the next call
+    /// of Keep can follow.
+    void AlreadyKept(const std::vector<ID>& ids, Side without);
     /// Takes Keep back.
     void Return(const std::vector<ID>& ids, Side without);
     /// For such objects the other way round: they go, with what stands under them.

@@ -129,14 +129,16 @@ Wanted ParseWanted(const std::string& text) {
 }
 
 void DecideWanted(Sessions sessions, std::span<const Wanted> wanted) {
-    std::map<SettleSession*, std::vector<Decision>> decisions;
+    std::map<const SettleSession*, std::vector<Decision>> decisions; // only looked into
     for (const Wanted& one : wanted) {
         const std::vector<Meant> meant = FindMeant(sessions, one.what);
         if (meant.empty()) FailWithNothing(one.what);
         if (meant.size() > 1 && !IsPattern(one.what)) FailWithSeveral(one.what, meant);
         for (const Meant& place : meant) decisions[place.session].push_back({place.path, one.side});
     }
-    for (const auto& [session, made] : decisions) MakeStep(*session, made, SettleSession::Follow::Yes);
+    for (const auto& session : sessions)
+        if (const auto made = decisions.find(session.get()); made != decisions.end())
+            MakeStep(*session, made->second, SettleSession::Follow::Yes);
 }
 
 void DecideByFile(Sessions sessions, const std::string& file) {

@@ -2,6 +2,7 @@
 
 #include "Setup/MarkedBlock.h"
 #include "Words/Failure.h"
+#include "Words/WriteFailure.h"
 
 #include "Destination.h"
 #include "FileUtils.h"
@@ -159,7 +160,7 @@ void Write(const ConfigChange& change) {
         Deliver(change.path, {change.after.size(), [&](OutputStream& stream) { stream << change.after; }});
     if (error == 0) return;
     if (change.folders > 0) RemoveEmptyFolders(change.path, change.folders);
-    FailWith("Cannot write " + change.path, error);
+    throw Failure("Cannot write " + change.path + ": " + WhyNotWritten(error));
 }
 
 } // namespace

@@ -102,13 +102,14 @@ SystemSetup SetupOfSubversion(const ProgramCall& program) {
     SystemSetup setup = RemovalFromSubversion(program);
     const std::string tool = program.ForSubversion(), path = setup.files.front().path;
     const std::string others = OthersTool(path);
+    const bool isThere = IsThere(tool);
     const bool isOfOldSetup = others.ends_with("ovrinmerge-vcs"); // the program's name of earlier versions
     if (!others.empty() && !IsOurToolOfSubversion(others) && !isOfOldSetup)
         setup.refused.push_back(path + " has merge-tool-cmd = " + others +
                                 " already, and Subversion knows one tool only. Take that line out and set up "
-                                "again, or call " +
-                                tool + " from there");
-    if (!IsThere(tool))
+                                "again" +
+                                (isThere ? ", or call " + tool + " from there" : ""));
+    if (!isThere)
         setup.refused.push_back(tool +
                                 " is not there, which Subversion would call: install the program whole");
     if (!setup.refused.empty()) setup.files.clear();

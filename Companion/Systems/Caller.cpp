@@ -3,6 +3,7 @@
 #include "FileUtils.h"
 
 #include <algorithm>
+#include <cstdlib>
 #include <iterator>
 #include <sstream>
 #include <unistd.h>
@@ -38,18 +39,28 @@ std::vector<std::string> WordsOf(pid_t process) {
     return words;
 }
 
-/// 0 where there is none.
-pid_t ParentOf(pid_t process) {
+/// What the machine tells of a process, from its state on; nothing where there is none.
+std::vector<std::string> FieldsOf(pid_t process) {
     std::string bytes;
-    if (ReadWholeFile("/proc/" + std::to_string(process) + "/stat", bytes) != ReadResult::Complete) return 0;
+    if (ReadWholeFile("/proc/" + std::to_string(process) + "/stat", bytes) != ReadResult::Complete) return {};
     // "12 (a name) S 11 ...", where the name may hold anything.
     const std::size_t name = bytes.rfind(')');
-    if (name == std::string::npos) return 0;
+    if (name == std::string::npos) return {};
     std::istringstream stream(bytes.substr(name + 1));
-    char state = 0;
-    pid_t parent = 0;
-    stream >> state >> parent;
-    return stream ? parent : 0;
+    return {std::istream_iterator<std::string>(stream), {}};
+}
+
+/// 0 where there is none.
+pid_t ParentOf(pid_t process) {
+    const std::vector<std::string> fields = FieldsOf(process);
+    return fields.size() > 1 ? std::atoi(fields[1].c_str()) : 0;
+}
+
+/// Numbers of processes come again, but not with the same beginning.
+std::string IdentityOf(pid_t process) {
+    constexpr std::size_t kBegin = 19;
+    const std::vector<std::string> fields = FieldsOf(process);
+    return fields.size() > kBegin ? std::to_string(process) + " since " + fields[kBegin] : "";
 }
 
 } // namespace
@@ -88,7 +99,10 @@ std::optional<Caller> FindCaller() {
     constexpr int kMostLevels = 16;
     pid_t process = getppid();
     for (int level = 0; level < kMostLevels && process > 1; ++level) {
-        if (auto caller = CallerOf(WordsOf(process))) return caller;
+        if (auto caller = CallerOf(WordsOf(process))) {
+            caller->process = IdentityOf(process);
+            return caller;
+        }
         process = ParentOf(process);
     }
     return {};

@@ -11,6 +11,7 @@ struct Caller {
     std::string program;            ///< "git", "hg" or "svn"
     std::string command;            ///< "merge", "cherry-pick"...; what stands there of an alias
     std::vector<std::string> words; ///< behind the command
+    std::string process = {};       ///< tells its process from all others; empty: not known
 
     /// Those of the words that don't begin with a dash.
     std::vector<std::string> Operands() const;

@@ -55,7 +55,7 @@ std::vector<std::string> TrackedFiles(const Repository& repository) {
     return {};
 }
 
-std::vector<std::string> ChangedFiles(const Repository& repository) {
+std::vector<std::string> DifferingFiles(const Repository& repository) {
     switch (repository.kind) {
     case SystemKind::Git: {
         const Git git(repository);

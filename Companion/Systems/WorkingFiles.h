@@ -17,7 +17,7 @@ std::vector<std::string> TrackedFiles(const Repository& repository);
 
 /// Those that differ from the last commit, and those that version control neither keeps nor is told to
 /// ignore. Subversion doesn't look into folders that are new.
-std::vector<std::string> ChangedFiles(const Repository& repository);
+std::vector<std::string> DifferingFiles(const Repository& repository);
 
 /// What Mercurial and Subversion are started with, so that a program can read their lists: without what the
 /// user likes to see, and with all letters in paths.

@@ -48,6 +48,12 @@ struct DoctorTest : GitFolder {
     }
 };
 
+// There is none beside these tests.
+TEST_F(DoctorTest, ListOfToolsThatIsMissingIsTold) {
+    EXPECT_TRUE(
+        Has(Look(LookAtMergeTools).text, "mergespecfile.txt, which names the merge tools, is missing"));
+}
+
 TEST_F(DoctorTest, VersionsOfGitAreJudgedByWhatTheyCanDo) {
     surroundings::FakePrograms programs;
     for (const auto& [told, state] : {std::pair{"git version 2.37.9", "problem"},

@@ -164,6 +164,8 @@ TEST_F(OpenMergesTest, PathThatFindsItsPlaceTakenGetsAnother) {
     Added("a.ovrin");
     EXPECT_EQ(merges().Find("a.ovrin")->path, "a.ovrin");
     EXPECT_EQ(merges().List().size(), 2u);
+    std::filesystem::remove(ofA); // as b.ovrin's end does
+    EXPECT_EQ(merges().Find("a.ovrin")->path, "a.ovrin");
 }
 
 /// Two processes each write and remove scenes of their own, and read the list all the time.

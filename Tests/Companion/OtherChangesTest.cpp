@@ -101,7 +101,7 @@ TEST_F(OtherSystemTest, TrackedAndChangedFilesAreInOrderAndOnce) {
     programs.Say("svn", "status",
                  "M       b\nD       gone\n?       new\n!       lost\nX       external\n C      tree\nA  +   "
                  " copied\n");
-    EXPECT_EQ(ChangedFiles(Copy(SystemKind::Subversion)), (Paths{"b", "copied", "new"}));
+    EXPECT_EQ(DifferingFiles(Copy(SystemKind::Subversion)), (Paths{"b", "copied", "new"}));
 }
 
 } // namespace

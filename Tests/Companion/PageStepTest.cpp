@@ -3,6 +3,7 @@
 #include "Words/Failure.h"
 
 #include <gtest/gtest.h>
+#include <sstream>
 
 namespace {
 
@@ -51,6 +52,48 @@ TEST(PageStepTest, WhatIsNotUnderstoodInFullIsNoStep) {
         EXPECT_THROW(ReadFinish(body), Failure) << body;
     EXPECT_THROW(ReadRevision(R"({"revision":1,"more":1})"), Failure);
     EXPECT_THROW(ReadNothing(R"({"x":1})"), Failure);
+}
+
+TEST(PageStepTest, WhatIsToldTwiceIsNoStep) {
+    for (const char* body : {R"({"item":3,"item":4,"side":"ours","revision":1})",
+                             R"({"item":3,"side":"ours","side":"ours","revision":1})",
+                             R"({"item":3,"side":"ours","revision":1,"revision":2})",
+                             R"({"item":3,"\u0069tem":4,"side":"ours","revision":1})"})
+        EXPECT_THROW(ReadStep(body), Failure) << body;
+    EXPECT_THROW(ReadFinish(R"({"overwrite":false,"overwrite":true,"revision":1})"), Failure);
+}
+
+TEST(PageStepTest, ValuesThatNobodySendsAreToldAsFailures) {
+    std::istringstream words(
+        R"(null true [] {} -0 -1 1.0 1e0 1e999 0x1 01 NaN "\ud800" "\u0000" "ours\u0000")"
+        " \"\xff\"");
+    std::vector<std::string> values = {std::string(60000, '[') + std::string(60000, ']'),
+                                       std::string(5000, '9')};
+    for (std::string word; words >> word;) values.push_back(word);
+    for (const std::string& value : values) {
+        EXPECT_THROW(ReadStep(R"({"item":)" + value + R"(,"side":"ours","revision":1})"), Failure) << value;
+        EXPECT_THROW(ReadStep(R"({"item":1,"side":)" + value + R"(,"revision":1})"), Failure) << value;
+        EXPECT_THROW(ReadRevision(R"({"revision":)" + value + "}"), Failure) << value;
+        EXPECT_THROW(ReadNothing(R"({"x":)" + value + "}"), Failure) << value;
+    }
+}
+
+/// A step as it was changed on the way is none, or is one; it is never something else that is thrown.
+TEST(PageStepTest, StepThatIsCutOrChangedIsNeverHalfAStep) {
+    const std::string body = R"({"item":3,"side":"theirs","revision":7})";
+    for (std::size_t at = 0; at < body.size(); ++at) {
+        EXPECT_THROW(ReadStep(body.substr(0, at)), Failure) << at;
+        for (int byte = 0; byte < 256; ++byte) {
+            std::string changed = body;
+            changed[at] = static_cast<char>(byte);
+            try {
+                const TakeItem take = std::get<TakeItem>(ReadStep(changed).step);
+                EXPECT_EQ(take.side, Side::Theirs) << changed;
+                EXPECT_LT(take.item, 10) << changed;
+            } catch (const Failure&) {
+            }
+        }
+    }
 }
 
 } // namespace

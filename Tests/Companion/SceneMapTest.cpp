@@ -67,6 +67,17 @@ TEST_F(SceneMapTest, WhatIsBrokenHasNoPlaceAndStopsNothing) {
     EXPECT_NE(PlacesIn(scene, {"70"}), "-");
 }
 
+TEST_F(SceneMapTest, RotationsTurnAlikeWhateverTheirLength) {
+    for (const std::string length : {"1", "3", "1e300", "1e-200", "-1e-300"}) {
+        const std::string turn = "; m_LocalRotation: {x: 0, y: " + length + ", z: 0, w: " + length + "}";
+        EXPECT_EQ(PlacesIn(Place(10, "A", 0, {}, turn) + Place(20, "B", 11, {}, At(1, 2, 0)), {"20"}),
+                  "0 200 -100")
+            << length;
+    }
+    const std::string none = "; m_LocalRotation: {x: 0, y: 0, z: 0, w: nan}";
+    EXPECT_EQ(PlacesIn(Place(10, "A", 0, {}, none) + Place(20, "B", 11), {"10", "20"}), "0 0 0, -");
+}
+
 TEST_F(SceneMapTest, ADeepHierarchyNeedsNoStack) {
     std::string scene;
     for (int i = 1; i <= 20000; ++i) scene += Place(10 * i, "D", i > 1 ? 10 * i - 9 : 0, {}, At(1, 0, 0));
@@ -135,6 +146,18 @@ TEST_F(SceneMapTest, EveryObjectIsToldOrCountedOnceAtAnySizeOfSquares) {
             EXPECT_LE(map["items"].size() + map["bundles"].size(), cells * cells + singly);
         }
     }
+}
+
+TEST_F(SceneMapTest, SquaresShareTheBoxEvenlyAndItsEdgesAreIn) {
+    std::string scene;
+    for (int i = 0; i < 4; ++i) scene += Place(10 * i + 10, "Post", 0, {}, At(i, 0, 0));
+    Viewed viewed(scene, scene, scene);
+    EXPECT_EQ(viewed.view.Map({MapView::Top, {}, 4})["items"].size(), 4);
+    const json bundles = viewed.view.Map({MapView::Top, {}, 2})["bundles"];
+    ASSERT_EQ(bundles.size(), 2);
+    EXPECT_EQ(bundles[0]["box"], json({0.0, 0.0, 1.0, 0.0}));
+    EXPECT_EQ(bundles[1]["x"], 2.5);
+    EXPECT_EQ(viewed.view.Map({MapView::Top, MapBox{1, 0, 2, 0}, 4})["items"].size(), 2);
 }
 
 TEST_F(SceneMapTest, ABoxShowsWhatIsInIt) {

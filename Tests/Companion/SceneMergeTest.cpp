@@ -120,6 +120,9 @@ TEST_F(SceneMergeTest, FailureTellsTheSideTheObjectAndTheReason) {
     const std::string failure = FailureOf(texts);
     EXPECT_TRUE(failure.starts_with("theirs can't be read, at object 10, line 3: ")) << failure;
     EXPECT_TRUE(FailureOf({texts.base, "no scene", texts.base}).starts_with("ours can't be read: "));
+    const std::string unescaped =
+        kHeader + Lantern("  m_Note: \xC3\xA9\n") + "--- !o!1 &20\nGameObject:\n  m_Layer: 2\n";
+    EXPECT_NE(FailureOf({texts.base, unescaped, texts.base}).find("save it again"), std::string::npos);
 }
 
 } // namespace

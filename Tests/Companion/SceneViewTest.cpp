@@ -46,6 +46,24 @@ TEST_F(SceneViewTest, MarksTellWhoDidWhat) {
     EXPECT_EQ(other.Tree(true), "Lantern changed by both\n");
 }
 
+TEST_F(SceneViewTest, WhatIsSeenFromFarthestIsTheMark) {
+    const auto scene = [](const std::string& boat) { return kHarbour + boat; };
+    const std::string here = scene(Place(20, "Boat", 11)), changed = scene(Place(20, "Boot", 11)),
+                      moved = scene(Place(20, "Boat")), both = scene(Place(20, "Boot")), gone = scene("");
+    const std::tuple<std::string, std::string, std::string, const char*> cases[] = {
+        {here, moved, changed, "moved by both"},     {here, gone, changed, "removed by ours"},
+        {here, moved, gone, "removed by theirs"},    {here, gone, gone, "removed by both"},
+        {gone, here, here, "added by both"},         {gone, here, gone, "added by ours"},
+        {here, here, both, "moved by theirs"},       {here, both, here, "moved by ours"},
+        {here, changed, changed, "changed by both"}, {here, here, here, "same"}};
+    for (const auto& [base, ours, theirs, mark] : cases) {
+        Viewed viewed(base, ours, theirs);
+        const json page = viewed.view.Object("20", false);
+        const std::string by = page["by"].is_null() ? "" : " by " + page["by"].get<std::string>();
+        EXPECT_EQ(page["mark"].get<std::string>() + by, mark);
+    }
+}
+
 TEST_F(SceneViewTest, WhatTheirsAloneRenamedHasItsNewName) {
     Viewed viewed(Place(10, "Pier"), Place(10, "Pier"), Place(10, "Quay"));
     EXPECT_EQ(viewed.Tree(), "Quay changed by theirs\n Transform same\n");
@@ -161,6 +179,20 @@ TEST_F(SceneViewTest, HostileScenesGetBoundedAnswers) {
     EXPECT_EQ(viewed.view.Find("mole", {0, 5})["hits"][0]["way"], json::array()); // of a loop
     EXPECT_TRUE(viewed.view.Object("10020", true)["rows"].is_array());
     viewed.view.Map({});
+}
+
+TEST_F(SceneViewTest, WayIsShortenedWhereSomethingIsLeftOut) {
+    std::string deep;
+    for (int i = 1; i <= 258; ++i) deep += Place(10 * i, "D" + std::to_string(i), 10 * i - 9);
+    Viewed viewed(deep, deep, deep);
+    for (const int depth : {255, 256, 257}) {
+        const json hit = viewed.view.Find(std::to_string(10 * depth + 10), {0, 1})["hits"][0];
+        const json page = viewed.view.Object(std::to_string(10 * depth + 10), false);
+        EXPECT_EQ(hit.value("isShortened", false), depth > 256) << depth;
+        EXPECT_EQ(page.value("isShortened", false), depth > 256) << depth;
+        EXPECT_EQ(hit["way"].size(), std::min(depth, 256));
+        EXPECT_EQ(hit["names"].back(), "D" + std::to_string(std::min(depth, 256)));
+    }
 }
 
 TEST_F(SceneViewTest, RequestsThatMakeNoSenseAreRefused) {

@@ -1,20 +1,14 @@
 #include "Settle/SettleDesk.h"
 
-#include "Support/Program.h"
-#include "Systems/Process.h"
+#include "OpenScenes.h"
 #include "Words/Failure.h"
 
 #include <algorithm>
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
 #include <gtest/gtest.h>
 
 namespace {
 
-using namespace ovrin;
-
-const std::string kHeader = "%YAML 1.1\n%TAG !o! tag:ovrin.dev,2011:\n";
+using namespace open_scenes;
 
 /// What stands below Harbour, of Transform 21: a GameObject with a Transform, and a script that has a target.
 std::string Entity(int id, const std::string& name, int father, int target = 0, int range = 1,
@@ -41,33 +35,8 @@ std::string Child(int id) {
     return "\n  - {fileID: " + std::to_string(id + 1) + "}";
 }
 
-struct SettleDeskTest : testing::Test {
-    static void SetUpTestSuite() { ovrin_yaml::initialize(); }
-    SettleDeskTest() : before(std::filesystem::current_path()) {
-        char folder[] = "/tmp/ovrin-test-XXXXXX";
-        std::filesystem::current_path(mkdtemp(folder));
-        OutputOf({"git", "init", "-q"});
-        setenv("OVRIN_RULES", OVRIN_SOURCE_DIR "/Src/Data/mergerules.txt", 1);
-    }
-    ~SettleDeskTest() override {
-        const auto folder = std::filesystem::current_path();
-        std::filesystem::current_path(before);
-        std::filesystem::remove_all(folder);
-    }
-
-    /// Version control is in the midst of a merge of these, as another program left it.
-    void Merge(const ThreeTexts& texts, const std::string& name = "a.ovrin") {
-        std::ofstream(name) << texts.ours;
-        std::string stages;
-        int stage = 0;
-        for (const std::string& text : {texts.base, texts.ours, texts.theirs}) {
-            const std::string object = OutputOf({"git", "hash-object", "-w", "--stdin"}, {.input = text});
-            stages += "100644 " + object.substr(0, object.find('\n')) + ' ' + std::to_string(++stage) + '\t' +
-                      name + '\n';
-        }
-        OutputOf({"git", "update-index", "--index-info"},
-                 {.input = "0 " + std::string(40, '0') + "\t" + name + "\n" + stages});
-    }
+struct SettleDeskTest : UnmergedFolder {
+    void Merge(const ThreeTexts& texts, const std::string& name = "a.ovrin") const { Unmerge(name, texts); }
     SettleDesk& Open() {
         remarks.clear();
         desk.reset();
@@ -82,7 +51,6 @@ struct SettleDeskTest : testing::Test {
         return texts;
     }
 
-    const std::filesystem::path before;
     Remarks remarks;
     std::unique_ptr<SettleScenes> scenes;
     std::unique_ptr<SettleDesk> desk;
@@ -132,6 +100,26 @@ TEST_F(SettleDeskTest, SceneIsSettledInOnePlaceAtATime) {
     desk->Take(1, Side::Ours);
     EXPECT_THROW(SettleDesk(others).Undo(), Failure);
     EXPECT_TRUE(others.Sessions()[1]->IsSettled());
+}
+
+TEST_F(SettleDeskTest, StepThatOneSceneCannotKeepIsTakenBackInAll) {
+    Merge(Ranges(1, 2, 3));
+    const auto many = [](int range) {
+        std::string scene = kHeader;
+        for (int id = 100; id < 130; ++id) scene += Object(id, std::to_string(range), "Crate");
+        return scene;
+    };
+    Merge({many(1), many(2), many(3)}, "b.ovrin");
+    Open().Take(0, Side::Theirs);
+    desk->Take(1, Side::Theirs);
+    desk->Undo();
+    {
+        const surroundings::FileLimit full(700); // enough for the first scene
+        EXPECT_THROW(desk->TakeAll(Side::Ours), Failure);
+        EXPECT_EQ(desk->CountOpen(), 30);
+    }
+    EXPECT_EQ(Open().CountOpen(), 30);
+    EXPECT_TRUE(desk->Undo() && !desk->Undo());
 }
 
 TEST_F(SettleDeskTest, SceneWhoseMergeIsOverIsNotFinished) {
@@ -228,16 +216,16 @@ std::string Car(const std::vector<int>& classes) {
 
 // Theirs removes the engine, and ours adds a wheel.
 TEST_F(SettleDeskTest, RequirementIsSettledByKeepingOrRemovingBoth) {
-    std::ofstream("types")
-        << kHeader
-        << "--- !o!1 &1\nMergeTypeInfo:\n"
-           "- {id: 500, name: Engine, ismulti: 0, baseid: 2, requires: '', conflicts: ''}\n"
-           "- {id: 501, name: Wheel, ismulti: 0, baseid: 2, requires: f4010000, "
-           "conflicts: ''}\n";
-    setenv("OVRIN_TYPE_INFO", "types", 1);
+    folder.Write("types",
+                 kHeader +
+                     "--- !o!1 &1\nMergeTypeInfo:\n"
+                     "- {id: 500, name: Engine, ismulti: 0, baseid: 2, requires: '', conflicts: ''}\n"
+                     "- {id: 501, name: Wheel, ismulti: 0, baseid: 2, requires: f4010000, conflicts: ''}\n");
     Merge({Car({500}), Car({500, 501}), Car({})});
-    Open();
-    unsetenv("OVRIN_TYPE_INFO");
+    {
+        const surroundings::Variable types("OVRIN_TYPE_INFO", "types");
+        Open();
+    }
     ASSERT_EQ(desk->CountOpen(), 1) << (remarks.empty() ? "" : remarks[0]);
     EXPECT_EQ(desk->Items()[0].about->kind, ConflictKind::BrokenRequirement);
     EXPECT_EQ(desk->Describe(desk->Items()[0]).choices,

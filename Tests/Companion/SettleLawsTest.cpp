@@ -1,4 +1,5 @@
 #include "Conflicts/DecisionPath.h"
+#include "OpenScenes.h"
 #include "SceneGenerator.h"
 #include "Settle/SettleSession.h"
 #include "Settle/Wanted.h"
@@ -11,7 +12,7 @@
 
 namespace {
 
-using namespace ovrin;
+using namespace open_scenes;
 
 // More of them find no more.
 constexpr unsigned kSeeds = 100;
@@ -37,14 +38,6 @@ ThreeTexts GeneratedTexts(unsigned seed, bool isThinned) {
     std::mt19937 random(seed);
     if (!isThinned) return {base.str(), right.str(), left.str()};
     return {base.str(), Thinned(right.str(), random), Thinned(left.str(), random)};
-}
-
-std::unique_ptr<SettleSession> SessionOf(const ThreeTexts& texts, const Progress& progress = {}) {
-    OpenMerge merge;
-    merge.path = "a.ovrin";
-    merge.rules = OVRIN_SOURCE_DIR "/Src/Data/mergerules.txt";
-    merge.texts = texts;
-    return std::make_unique<SettleSession>(merge, progress);
 }
 
 /// How all conflicts stand, in words.

@@ -1,16 +1,17 @@
 #include "Settle/SettleSession.h"
 
+#include "ErrorOf.h"
+#include "OpenScenes.h"
 #include "Settle/Steps.h"
 #include "Settle/Wanted.h"
 #include "Words/Failure.h"
 
 #include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
 
 namespace {
 
-using namespace ovrin;
-
-const std::string kHeader = "%YAML 1.1\n%TAG !o! tag:ovrin.dev,2011:\n";
+using namespace open_scenes;
 
 /// A GameObject of id 10 with its Transform 11, which stands below the Transform of 20, "Harbour".
 std::string Lantern(int layer, const std::string& name, int range) {
@@ -27,14 +28,6 @@ std::string Transform(int id, int father, const std::string& children, int order
     return "--- !o!4 &" + std::to_string(id) + "\nTransform:\n  m_Children:" + children +
            "\n  m_Father: {fileID: " + std::to_string(father) + "}\n  m_Order: " + std::to_string(order) +
            "\n";
-}
-
-std::unique_ptr<SettleSession> SessionOf(const ThreeTexts& texts, const Progress& progress = {}) {
-    OpenMerge merge;
-    merge.path = "a.ovrin";
-    merge.rules = OVRIN_SOURCE_DIR "/Src/Data/mergerules.txt";
-    merge.texts = texts;
-    return std::make_unique<SettleSession>(merge, progress);
 }
 
 struct SettleSessionTest : testing::Test {
@@ -172,6 +165,88 @@ TEST_F(SettleSessionTest, ObjectIsKeptWithAllThatWasRemovedWithIt) {
     removed->Undo();
     removed->TakeAll(Side::Theirs, all);
     EXPECT_EQ(removed->Result(), theirs);
+}
+
+TEST_F(SettleSessionTest, DecisionIsAPathAndASide) {
+    EXPECT_EQ(ParseWanted("a=b=ours").what, "a=b");
+    EXPECT_EQ(ParseWanted("a=theirs").side, Side::Theirs);
+    for (const char* wrong : {"", "=", "=ours", "a", "a=", "a=OURS", "a=ours ", "ours", "a=left"})
+        EXPECT_THROW(ParseWanted(wrong), Failure) << wrong;
+}
+
+TEST_F(SettleSessionTest, LastOfSeveralDecisionsOfOneCallCounts) {
+    const std::vector<Wanted> wanted = {{"*.GameObject.m_Layer", Side::Theirs},
+                                        {"Harbour.m_Layer", Side::Base},
+                                        {"10.GameObject.m_Layer", Side::Ours}};
+    DecideWanted(sessions, wanted);
+    EXPECT_EQ(session().Open().size(), 1);
+    EXPECT_NE(session().Result().find("m_Layer: 5\n  m_Name: Lamp"), std::string::npos);
+    EXPECT_NE(session().Result().find("m_Layer: 2\n  m_Name: Harbour"), std::string::npos);
+    EXPECT_TRUE(session().Undo() && !session().Undo());
+}
+
+TEST_F(SettleSessionTest, FileOfDecisionsThatIsNoneIsTold) {
+    const program::WorkingDirectory folder;
+    const auto told = [&](const std::string& text) {
+        folder.Write("decisions", text);
+        return failures::ErrorOf<Failure>(
+            [&] { DecideByFile(sessions, (folder.Path() / "decisions").string()); });
+    };
+    EXPECT_NE(told("").find("has no decision below"), std::string::npos);
+    EXPECT_NE(told("Conflict handling:\n").find("has no decision below"), std::string::npos);
+    EXPECT_NE(told("Conflict handling:\nMiddle 10\n").find("can't be made out"), std::string::npos);
+    EXPECT_NE(told("Conflict handling:\nLeft 10.GameObject.m_None\n").find("matches nothing"),
+              std::string::npos);
+    EXPECT_TRUE(session().Decisions().empty());
+    EXPECT_EQ(told("Conflict handling:\nLeft 10.GameObject.m_Range\nRight 10.GameObject.m_Range\n"), "none");
+    EXPECT_NE(session().Result().find("m_Range: 3"), std::string::npos); // the first counts there
+    sessions.push_back(SessionOf(texts));
+    EXPECT_NE(told("Conflict handling:\nLeft 10\n").find("is for one scene, and there are 2"),
+              std::string::npos);
+}
+
+TEST_F(SettleSessionTest, ProposalsAreTakenWhereTheyAreAndNowhereElse) {
+    EXPECT_THROW(TakeProposed(sessions, ""), Failure);
+    const program::WorkingDirectory folder;
+    EarlierDecisions earlier({SystemKind::Git, "", folder.Path()});
+    session().Propose(earlier);
+    session().Decide({{"10.GameObject.m_Range", Side::Theirs}});
+    EXPECT_EQ(session().TellDecided(earlier), 1);
+    sessions[0] = SessionOf({texts.base, texts.theirs, texts.ours}); // the sides swapped
+    session().Propose(earlier);
+    EXPECT_EQ(session().CountProposed(), 1);
+    EXPECT_THROW(TakeProposed(sessions, "Harbour/Nothing"), Failure);
+    EXPECT_EQ(TakeProposed(sessions, "Harbour"), 1);
+    EXPECT_NE(session().Result().find("m_Range: 3"), std::string::npos);
+    EXPECT_EQ(session().CountProposed(), 0);
+    EXPECT_THROW(TakeProposed(sessions, ""), Failure);
+}
+
+TEST_F(SettleSessionTest, NameOfSeveralObjectsIsToldWithTheirNumbers) {
+    const auto scene = [](int layer) {
+        const std::string fields = "GameObject:\n  m_Layer: " + std::to_string(layer) + "\n  m_Name: Crate\n";
+        return kHeader + "--- !o!1 &1\n" + fields + "--- !o!1 &2\n" + fields;
+    };
+    sessions[0] = SessionOf({scene(1), scene(2), scene(3)});
+    const std::string told = failures::ErrorOf<Failure>([&] { TakeSide(sessions, Side::Ours, "Crate"); });
+    EXPECT_NE(told.find("\n  Crate (1)\n  Crate (2)\n"), std::string::npos) << told;
+    EXPECT_THROW(Set("Crate.m_Layer=ours"), Failure);
+    EXPECT_EQ(TakeSide(sessions, Side::Ours, "Crate (2)") + TakeSide(sessions, Side::Ours, "1"), 2);
+}
+
+TEST_F(SettleSessionTest, CountTellsWhatIsKnown) {
+    OpenMerge merge = MergeOf(texts, "a\n.ovrin");
+    merge.conflicts = 3;
+    EXPECT_EQ(TellCount(SceneCount::Of(merge, {{}, 1})),
+              "a\\n.ovrin: 1 open conflict, 2 settled (merge, ours is main, theirs is topic)");
+    merge.occasion = {};
+    merge.isBothAdded = true;
+    EXPECT_EQ(TellCount(SceneCount::Of(merge, {{}, 5})), // decisions led to more
+              "a\\n.ovrin: 5 open conflicts, both sides added the scene");
+    EXPECT_EQ(ToJson(SceneCount::Of(merge, {{}, 5})).dump(),
+              R"({"action":null,"base":null,"bothAdded":true,"open":5,"ours":null,"path":"a\n.ovrin",)"
+              R"("problem":null,"settled":0,"theirs":null})");
+    EXPECT_EQ(TellCount({.path = "a", .problem = "gone"}), "a: gone");
 }
 
 } // namespace

@@ -167,6 +167,9 @@ TEST_F(SetupRunTest, ToolOfAnotherIsNotTakenFromSubversion) {
     const SetupReport report = RunSetup({.system = "svn", .program = "ovrin"});
     EXPECT_EQ(report.failures, 1u);
     EXPECT_NE(report.words.find("merge-tool-cmd = other already"), std::string::npos) << report.words;
+    EXPECT_NE(report.words.find("or call ovrin-svn from there"), std::string::npos) << report.words;
+    const std::string missing = RunSetup({.system = "svn", .program = "nowhere"}).words;
+    EXPECT_EQ(missing.find("nowhere-svn"), missing.rfind("nowhere-svn")) << missing;
     EXPECT_EQ(home.Folder().Read(".subversion/config"), config);
     std::filesystem::remove(home.Path() / ".subversion/config");
     EXPECT_EQ(RunSetup({.system = "svn", .program = "ovrin"}).failures, 0u);

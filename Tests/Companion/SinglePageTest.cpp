@@ -46,6 +46,73 @@ TEST(ModuleBundle, WhatIsNoKnownFormIsRefused) {
             << text;
 }
 
+TEST(ModuleBundle, FormsAreKnownHoweverTheyAreSpaced) {
+    for (const char* text :
+         {"import{ a } from \"./b.js\";", "import* as b from \"./b.js\";", "import'./b.js';",
+          "import(\"./b.js\");", "import.meta.url;", "import\t{ a } from \"./b.js\";",
+          "import\n{ a } from \"./b.js\";", "export* from \"./b.js\";", "export{ a };",
+          "export\tconst a = 1;", "export let a = 1;", "export const $ = 1;", "export const a$ = 1;",
+          "export const { a } = b;", "export"})
+        EXPECT_NE(Bundled({Module("main.js", text), Module("b.js", "")}).find("form that isn't known"),
+                  std::string::npos)
+            << text;
+    for (const char* text : {"imported();\n", "exports.a = 1;\n", "import_();\n", "export$();\n", "", "\n"})
+        EXPECT_EQ(Bundled({Module("main.js", text)}),
+                  "const module1 = (() => {\n" + std::string(*text ? text : "\n") + "return { };\n})();\n");
+}
+
+TEST(ModuleBundle, ModulesInARingAreTold) {
+    EXPECT_EQ(Bundled({Module("main.js", "import \"./a.js\";\n"), Module("a.js", "import \"./b.js\";\n"),
+                       Module("b.js", "import \"./a.js\";\n")}),
+              "Module a.js needs itself");
+    EXPECT_EQ(Bundled({Module("main.js", "import \"./a.js\";\n")}), "There is no module a.js");
+}
+
+/// What a file of the page holds; nothing if there is none.
+std::string BytesOf(const std::string& name) {
+    for (const PageFile& file : PageFiles())
+        if (file.name == name) return std::string(file.bytes);
+    return "";
+}
+
+/// The files of a page with one in place of its own.
+std::vector<PageFile> FilesWith(std::string_view name, std::string_view bytes) {
+    std::vector<PageFile> files(PageFiles().begin(), PageFiles().end());
+    for (PageFile& file : files)
+        if (file.name == name) file.bytes = bytes;
+    return files;
+}
+
+TEST(SinglePage, FilesThatWouldEndTheirElementAreRefused) {
+    for (const char* text : {"/* </style> */", "/* </STYLE\n> */", "/* </sTyLe */", "/* <!-- */"})
+        EXPECT_THROW(SinglePage(FilesWith("style.css", text), "{}"), Failure) << text;
+    for (const char* text : {"a = '</script>';", "a = '</SCRIPT >';", "a = '</Script';", "// <!--<script>"})
+        EXPECT_THROW(SinglePage(FilesWith("main.js", text), "{}"), Failure) << text;
+    EXPECT_NO_THROW(SinglePage(FilesWith("main.js", "a = '<\\/script>' < /style/;"), "{}"));
+}
+
+TEST(SinglePage, PageWithoutItsPlacesIsNone) {
+    const std::string page = BytesOf("index.html");
+    for (const char* place : {"<meta charset=\"utf-8\">", "<link rel=\"icon\"", "<link rel=\"stylesheet\"",
+                              "<script type=\"module\"", "</body>"}) {
+        std::string without = page;
+        without.replace(without.find(place), 2, "x");
+        EXPECT_THROW(SinglePage(FilesWith("index.html", without), "{}"), Failure) << place;
+    }
+    EXPECT_THROW(SinglePage({}, "{}"), Failure);
+}
+
+TEST(SinglePage, DataComesBackAsItWas) {
+    std::string text;
+    for (int letter = 1; letter < 128; ++letter) text += static_cast<char>(letter);
+    for (const char* more : {"\xE2\x80\xA8", "\xE2\x80\xA9", "\xE2\x80\xA7", "\xE2\x80\xAE", "\xE2\x80\xAA",
+                             "\xF0\x9F\x8F\xAE", "</body>", "<!--<script>", "]]>", "&lt;"})
+        text += more;
+    const nlohmann::json data = {{text, {text, {{"</script>", 1}}}}};
+    EXPECT_EQ(nlohmann::json::parse(SafeInScript(JsonText(data))), data);
+    for (const char* cut : {"\xE2", "\xE2\x80", ""}) EXPECT_EQ(SafeInScript(cut), cut);
+}
+
 TEST(SinglePage, NothingInTheDataIsMarkup) {
     const std::string hostile =
         "</script><script>alert(1)</script><!--&amp;\xE2\x80\xA8\xE2\x80\xA9\xE2\x80\xA6\xFF\\";
@@ -74,12 +141,25 @@ TEST(SinglePage, TheFileAsksForNothing) {
     EXPECT_NE(page, other);
 }
 
+TEST(SinglePage, EveryFileThatThePageNamesIsThere) {
+    const std::string page = BytesOf("index.html");
+    std::size_t named = 0;
+    for (const std::string place : {"href=\"", "src=\""})
+        for (std::size_t at = page.find(place); at != std::string::npos; at = page.find(place, at + 1)) {
+            const std::size_t begin = at + place.size();
+            const std::string name = page.substr(begin, page.find('"', begin) - begin);
+            EXPECT_TRUE(name.starts_with('#') || !BytesOf(name).empty()) << name;
+            ++named;
+        }
+    EXPECT_GE(named, 3);
+}
+
 TEST(SinglePage, FilesAreAnsweredByTheirNamesAlone) {
-    EXPECT_EQ(AnswerFile({"GET", "", {}, ""})->type, "text/html; charset=utf-8");
-    EXPECT_EQ(AnswerFile({"GET", "main.js", {}, ""})->type, "text/javascript; charset=utf-8");
-    EXPECT_FALSE(AnswerFile({"POST", "main.js", {}, ""}));
+    EXPECT_EQ(AnswerPageFile({"GET", "", {}, ""})->type, "text/html; charset=utf-8");
+    EXPECT_EQ(AnswerPageFile({"GET", "main.js", {}, ""})->type, "text/javascript; charset=utf-8");
+    EXPECT_FALSE(AnswerPageFile({"POST", "main.js", {}, ""}));
     for (const char* path : {"../main.js", "./main.js", "/etc/passwd", "Page/main.js", "api/session"})
-        EXPECT_FALSE(AnswerFile({"GET", path, {}, ""})) << path;
+        EXPECT_FALSE(AnswerPageFile({"GET", path, {}, ""})) << path;
 }
 
 } // namespace

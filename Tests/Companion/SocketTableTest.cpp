@@ -30,4 +30,31 @@ TEST(SocketTableTest, OwnerIsThatOfTheOtherEnd) {
     EXPECT_FALSE(FindOwner("", 0xC001, 8123));
 }
 
+TEST(SocketTableTest, TableThatIsCutTellsTheOwnerOrNothing) {
+    std::size_t told = 0;
+    for (std::size_t length = 0; length <= kTable.size(); ++length)
+        if (const auto owner = FindOwner(kTable.substr(0, length), 0xC001, 8123)) {
+            EXPECT_EQ(owner->user, 1001) << length;
+            EXPECT_TRUE(owner->isOpen) << length;
+            ++told;
+        }
+    EXPECT_GT(told, 100);
+}
+
+TEST(SocketTableTest, LineOfAnotherConnectionTellsNothing) {
+    const auto line = [](const std::string& here, const std::string& there, const std::string& user = "7") {
+        return "   1: " + here + " " + there + " 01 00000000:00000000 00:00000000 00000000 " + user +
+               " 0 712 1 0\n";
+    };
+    const std::string own = "0100007F:C001", server = "0100007F:1FBB";
+    EXPECT_EQ(FindOwner(line(own, server), 0xC001, 8123)->user, 7);
+    EXPECT_EQ(FindOwner(line(server, own) + line(own, server, "8"), 0xC001, 8123)->user, 8);
+    for (const std::string& other :
+         {line(server, own), line(own, "0100007F:1FBC"), line(own, "0200007F:1FBB"),
+          line("0200007F:C001", server), line(own + "0", server), line(own, server + "0"),
+          line(own, server, "-"), line(own, server, "x"), line(own, server, "99999999999"), line("", server),
+          "100007F:C001 " + server, std::string(5000, '\n')})
+        EXPECT_FALSE(FindOwner(other, 0xC001, 8123)) << other;
+}
+
 } // namespace

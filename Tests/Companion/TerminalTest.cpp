@@ -1,102 +1,23 @@
-#include "Settle/Terminal/Prompts.h"
 #include "Settle/Terminal/Screen.h"
 
-#include "Conflicts/OpenMerges.h"
-#include "Systems/Process.h"
+#include "Settle/Terminal/Prompts.h"
+#include "TerminalScene.h"
 
-#include <clocale>
-#include <filesystem>
-#include <fstream>
+#include <algorithm>
 #include <gtest/gtest.h>
+#include <random>
 #include <sstream>
 
 namespace {
 
-using namespace ovrin;
+using namespace open_scenes;
 
-const std::string kHeader = "%YAML 1.1\n%TAG !o! tag:ovrin.dev,2011:\n";
+const ThreeTexts kTwo = TwoConflicts();
 
-std::string Object(int id, const std::string& layer, const std::string& name) {
-    return "--- !o!1 &" + std::to_string(id) + "\nGameObject:\n  m_Layer: " + layer + "\n  m_Name: " + name +
-           "\n";
-}
-
-/// Base, ours and theirs: a layer, and an object that theirs has removed.
-const std::array<std::string, 3> kTwo = {kHeader + Object(10, "1", "Lantern") + Object(20, "1", "Buoy"),
-                                         kHeader + Object(10, "5", "Lantern") + Object(20, "7", "Buoy"),
-                                         kHeader + Object(10, "2", "Lantern")};
-
-/// A person in a repository whose index holds scenes unmerged, as a merge that stopped leaves them.
-struct TerminalTest : testing::Test {
-    static void SetUpTestSuite() { ovrin_yaml::initialize(); }
-    TerminalTest() {
-        std::setlocale(LC_CTYPE, "C.UTF-8");
-        char made[] = "/tmp/ovrin-test-XXXXXX";
-        std::filesystem::current_path(mkdtemp(made));
-        OutputOf({"git", "init", "-q"});
-    }
-    ~TerminalTest() override {
-        const auto folder = std::filesystem::current_path();
-        std::filesystem::current_path("/");
-        std::filesystem::remove_all(folder);
-        std::setlocale(LC_CTYPE, "C");
-    }
-
-    void Add(const std::string& name, const std::array<std::string, 3>& texts) {
-        std::string entries;
-        for (std::size_t i = 0; i < texts.size(); ++i) {
-            if (texts[i].empty()) continue;
-            const std::string object = OutputOf({"git", "hash-object", "-w", "--stdin"}, {.input = texts[i]});
-            entries += "100644 " + object.substr(0, object.find('\n')) + " " + std::to_string(i + 1) + "\t" +
-                       name + "\n";
-        }
-        OutputOf({"git", "update-index", "--index-info"}, {.input = entries});
-        OpenMerge merge;
-        merge.path = name;
-        merge.occasion = {.action = "merge", .base = "", .ours = "main", .theirs = "topic", .head = ""};
-        merge.isBothAdded = texts[0].empty();
-        merge.rules = OVRIN_SOURCE_DIR "/Src/Data/mergerules.txt";
-        merge.texts = {texts[0], texts[1], texts[2]};
-        OpenMerges(*FindRepository()).Add(merge);
-    }
-    void Begin() {
-        scenes.emplace(remarks);
-        ASSERT_EQ(scenes->Open(remarks), 0) << remarks[0];
-        for (const auto& session : scenes->Sessions())
-            if (!std::filesystem::exists(session->Source().path))
-                std::ofstream(session->Source().path) << session->Left();
-        desk.emplace(*scenes);
-        walk.emplace(*desk);
-        screen.emplace(*walk, letters);
-    }
-    std::vector<std::string> Picture(Extent extent = Screen::kLeast) {
-        std::vector<std::string> texts;
-        for (const StyledLine& line : screen->Draw(extent)) {
-            EXPECT_EQ(ColumnsOf(line), extent.columns);
-            texts.push_back(TextOf(line).substr(0, TextOf(line).find_last_not_of(' ') + 1));
-        }
-        EXPECT_EQ(texts.size(), extent.rows);
-        return texts;
-    }
-    /// The picture as one text, after these keys.
-    std::string After(const std::string& keys, Extent extent = Screen::kLeast) {
-        Picture(extent);
-        for (const char key : keys) screen->Press(key == '\n' ? Key::Enter : KeyOf(key));
-        std::string text;
-        for (const std::string& line : Picture(extent)) text += line + '\n';
-        return text;
-    }
-
-    Remarks remarks;
-    const Letters letters = Letters(true);
-    std::optional<SettleScenes> scenes;
-    std::optional<SettleDesk> desk;
-    std::optional<Walk> walk;
-    std::optional<Screen> screen;
-};
+struct TerminalTest : TerminalScene {};
 
 TEST_F(TerminalTest, ScreenShowsTheListTheValuesAndTheKeys) {
-    Add("Pier.ovrin", kTwo);
+    Record("Pier.ovrin", kTwo);
     Begin();
     const std::vector<std::string> expected = {
         " 2 of 2 open · Pier.ovrin                  merge: ours is main, theirs is topic",
@@ -118,7 +39,7 @@ TEST_F(TerminalTest, ScreenShowsTheListTheValuesAndTheKeys) {
 }
 
 TEST_F(TerminalTest, DecisionGoesOnToTheNextAndUndoComesBack) {
-    Add("Pier.ovrin", kTwo);
+    Record("Pier.ovrin", kTwo);
     Begin();
     std::string text = After("o");
     EXPECT_NE(text.find("   m_Layer                ours │ theirs removed it and ours changed it"),
@@ -129,13 +50,23 @@ TEST_F(TerminalTest, DecisionGoesOnToTheNextAndUndoComesBack) {
     text = After("u");
     EXPECT_NE(text.find("m_Layer: both changed it"), std::string::npos) << text;
     EXPECT_EQ(desk->CountOpen(), 2);
-    After("rT");
+    After("rat");
     EXPECT_TRUE(desk->IsSettled());
     EXPECT_NE(After("").find("f finishes"), std::string::npos);
 }
 
+TEST_F(TerminalTest, CapitalsAreForOneObjectAndAllIsAskedFor) {
+    Record("Pier.ovrin", kTwo);
+    Begin();
+    EXPECT_NE(After("T").find("Took theirs (topic) for Lantern and what stands under it"), std::string::npos);
+    EXPECT_EQ(desk->CountOpen(), 1);
+    EXPECT_NE(After("a").find("Which side for all that is open? o ours"), std::string::npos);
+    EXPECT_NE(After("n").find("Nothing was decided"), std::string::npos);
+    EXPECT_EQ(desk->CountOpen(), 1);
+}
+
 TEST_F(TerminalTest, ArrowsAndEnterAreEnough) {
-    Add("Pier.ovrin", kTwo);
+    Record("Pier.ovrin", kTwo);
     Begin();
     EXPECT_NE(After("\n").find("Choose a side"), std::string::npos);
     screen->Press(Key::Right);
@@ -153,8 +84,8 @@ TEST_F(TerminalTest, ArrowsAndEnterAreEnough) {
 }
 
 TEST_F(TerminalTest, SeveralScenesAreOneListAndFinishedApartOnlyWhenAgreed) {
-    Add("A.ovrin", kTwo);
-    Add("B.ovrin", kTwo);
+    Record("A.ovrin", kTwo);
+    Record("B.ovrin", kTwo);
     Begin();
     EXPECT_NE(After("f").find("No scene is settled yet"), std::string::npos);
     EXPECT_NE(After("otf").find("1 scene is settled, 1 scene is not"), std::string::npos);
@@ -167,10 +98,10 @@ TEST_F(TerminalTest, SeveralScenesAreOneListAndFinishedApartOnlyWhenAgreed) {
 
 // Ours refers to the buoy, which theirs has removed.
 TEST_F(TerminalTest, ProblemsThatAreLeftAreFinishedOnlyWhenAgreed) {
-    Add("Pier.ovrin",
-        {kTwo[0],
-         kHeader + Object(10, "5", "Lantern") + "  m_Target: {fileID: 20}\n" + Object(20, "1", "Buoy"),
-         kTwo[2]});
+    Record("Pier.ovrin",
+           {kTwo.base,
+            kHeader + Object(10, "5", "Lantern") + "  m_Target: {fileID: 20}\n" + Object(20, "1", "Buoy"),
+            kTwo.theirs});
     Begin();
     EXPECT_NE(After("of").find("1 problem is left in what is settled. Finish as it is?"), std::string::npos);
     After("n");
@@ -181,11 +112,11 @@ TEST_F(TerminalTest, ProblemsThatAreLeftAreFinishedOnlyWhenAgreed) {
 }
 
 TEST_F(TerminalTest, OnlyKeysThatMergeAreSteps) {
-    Add("Pier.ovrin", kTwo);
+    Record("Pier.ovrin", kTwo);
     Begin();
     for (const char key : std::string("otbOTBugrf1")) EXPECT_TRUE(screen->IsStep(KeyOf(key))) << key;
-    for (const char key : std::string("np?/wq")) EXPECT_FALSE(screen->IsStep(KeyOf(key))) << key;
-    screen->Press(KeyOf('w'));
+    for (const char key : std::string("np?/aq")) EXPECT_FALSE(screen->IsStep(KeyOf(key))) << key;
+    screen->Press(KeyOf('a'));
     EXPECT_TRUE(screen->IsStep(KeyOf('t')) && !screen->IsStep(KeyOf('n')));
     EXPECT_NE(TextOf(screen->DrawWorking(Screen::kLeast)[Screen::kLeast.rows - 3]).find("Working"),
               std::string::npos);
@@ -193,18 +124,31 @@ TEST_F(TerminalTest, OnlyKeysThatMergeAreSteps) {
 
 TEST_F(TerminalTest, FileThatWasChangedByHandIsReplacedOnlyWhenAgreed) {
     for (const char* answer : {"n", "y"}) {
-        Add("Pier.ovrin", kTwo);
-        std::ofstream("Pier.ovrin") << "by hand\n";
+        Record("Pier.ovrin", kTwo);
+        folder.Write("Pier.ovrin", "by hand\n");
         Begin();
-        EXPECT_NE(After("Tf").find("was changed by hand"), std::string::npos);
+        EXPECT_NE(After("atf").find("was changed by hand"), std::string::npos);
         After(answer);
         ASSERT_TRUE(screen->End());
         EXPECT_EQ(screen->End()->finished.size(), *answer == 'y' ? 1 : 0);
     }
 }
 
+TEST_F(TerminalTest, OnlyFilesThatWereChangedByHandAreAskedAbout) {
+    for (const char* name : {"A.ovrin", "Over.ovrin", "Pier.ovrin"}) Record(name, kTwo);
+    folder.Write("Pier.ovrin", "by hand\n");
+    Begin();
+    After("at");
+    OpenMerges(Found()).Remove("Over.ovrin");
+    const std::string asked = After("f");
+    EXPECT_NE(asked.find("Pier.ovrin was changed by hand"), std::string::npos) << asked;
+    EXPECT_EQ(asked.find("Over.ovrin stays"), std::string::npos) << asked;
+    EXPECT_EQ(screen->Reached().finished, std::vector<std::string>{"A.ovrin"});
+    EXPECT_EQ(screen->Reached().refused.size(), 2);
+}
+
 TEST_F(TerminalTest, SceneThatBothAddedIsLookedThrough) {
-    Add("Pier.ovrin", {"", kHeader + Object(10, "5", "Lantern"), kHeader + Object(20, "7", "Buoy")});
+    Record("Pier.ovrin", {"", kHeader + Object(10, "5", "Lantern"), kHeader + Object(20, "7", "Buoy")});
     Begin();
     const std::string text = After("");
     EXPECT_NE(text.find("1 of 1 open"), std::string::npos) << text;
@@ -216,14 +160,12 @@ TEST_F(TerminalTest, SceneThatBothAddedIsLookedThrough) {
 }
 
 TEST_F(TerminalTest, LongValuesBeginAtTheirDifferenceAndScroll) {
-    std::array<std::string, 3> texts;
-    for (std::size_t side = 0; side < texts.size(); ++side) {
-        texts[side] = kHeader + Object(10, "1", "Lantern") + "  m_Note:";
-        for (int i = 0; i < 900; ++i)
-            texts[side] += " word" + std::to_string(i == 400 ? 1000 + static_cast<int>(side) : i);
-        texts[side] += "\n";
-    }
-    Add("Pier.ovrin", texts);
+    const auto scene = [](int different) {
+        std::string text = kHeader + Object(10, "1", "Lantern") + "  m_Note:";
+        for (int i = 0; i < 900; ++i) text += " word" + std::to_string(i == 400 ? different : i);
+        return text + "\n";
+    };
+    Record("Pier.ovrin", {scene(1000), scene(1001), scene(1002)});
     Begin();
     for (const Extent extent : {Screen::kLeast, Extent{160, 50}}) {
         const std::string text = After("", extent);
@@ -236,7 +178,7 @@ TEST_F(TerminalTest, LongValuesBeginAtTheirDifferenceAndScroll) {
 }
 
 TEST_F(TerminalTest, SearchFindsAPartOfAName) {
-    Add("Pier.ovrin", kTwo);
+    Record("Pier.ovrin", kTwo);
     Begin();
     EXPECT_NE(After("/bUO\n").find("theirs removed it and ours changed it"), std::string::npos);
     EXPECT_EQ(walk->At(), 1);
@@ -245,7 +187,7 @@ TEST_F(TerminalTest, SearchFindsAPartOfAName) {
 }
 
 TEST_F(TerminalTest, SmallWindowIsToldAndNothingIsLost) {
-    Add("Pier.ovrin", kTwo);
+    Record("Pier.ovrin", kTwo);
     Begin();
     for (const Extent extent : {Extent{1, 1}, Extent{79, 24}, Extent{300, 23}}) After("", extent);
     EXPECT_NE(After("", {79, 24}).find("This window has 79 x 24 characters"), std::string::npos);
@@ -255,27 +197,27 @@ TEST_F(TerminalTest, SmallWindowIsToldAndNothingIsLost) {
 }
 
 TEST_F(TerminalTest, ASCIIIsEnough) {
-    Add("Pier.ovrin", {kTwo[0], kTwo[1] + "  m_Note: \"\\u706F\"\n", kTwo[2]});
+    Record("Pier.ovrin", {kTwo.base, kTwo.ours + "  m_Note: \"\\u706F\"\n", kTwo.theirs});
     Begin();
     screen.emplace(*walk, Letters(false));
     for (const char letter : After("?") + After(" n")) EXPECT_LT(static_cast<unsigned char>(letter), 0x80);
 }
 
 TEST_F(TerminalTest, PromptsAskTheSameThings) {
-    Add("Pier.ovrin", kTwo);
+    Record("Pier.ovrin", kTwo);
     Begin();
-    std::istringstream answers("x\nf\no\nw\nt\nf\n");
+    std::istringstream answers("x\nf\no\na\nt\nf\n");
     std::ostringstream told;
     EXPECT_EQ(SettleByPrompts(*walk, letters, answers, told).finished.size(), 1);
     for (const char* words : {"2 of 2 open · Pier.ovrin\nLantern (10)\n  m_Layer: both changed it\n    base  "
                               "  1\n    ours    5    main\n",
                               "\"x\" is no answer", "No scene is settled yet",
-                              "Which side for Buoy and what stands under it?", "0 of 2 open"})
+                              "Which side for all that is open? o ours", "0 of 2 open"})
         EXPECT_NE(told.str().find(words), std::string::npos) << words << "\n" << told.str();
 }
 
 TEST_F(TerminalTest, EndOfTheAnswersLeavesAndKeepsTheDecisions) {
-    Add("Pier.ovrin", kTwo);
+    Record("Pier.ovrin", kTwo);
     Begin();
     std::istringstream answers("t\n");
     std::ostringstream told;
@@ -283,6 +225,134 @@ TEST_F(TerminalTest, EndOfTheAnswersLeavesAndKeepsTheDecisions) {
     SettleScenes again(remarks);
     again.Open(remarks);
     EXPECT_EQ(again.Sessions()[0]->Open().size(), 1);
+}
+
+TEST_F(TerminalTest, SearchTakesCharactersAndGivesThemBack) {
+    Record("Pier.ovrin", kTwo);
+    Begin();
+    After("/");
+    for (const std::uint32_t point : {0x62, 0xE4, 0x706F, 0x1F6A2, 0x9B})
+        screen->Press(static_cast<Key>(point));
+    EXPECT_NE(After("").find("Search: bä灯\U0001F6A2\\u009b_"), std::string::npos) << After("");
+    for (const char* left : {"bä灯\U0001F6A2_", "bä灯_", "bä_", "b_", " _", " _"}) {
+        screen->Press(Key::Erase);
+        EXPECT_NE(After("").find(left), std::string::npos) << left;
+    }
+    EXPECT_NE(After("\n").find("Nothing was searched for before"), std::string::npos);
+    After("/buoy");
+    screen->Press(Key::Escape);
+    EXPECT_EQ(walk->At(), 0);
+}
+
+TEST_F(TerminalTest, QuestionsStayUntilTheyAreAnsweredAndDecideNothingByOtherKeys) {
+    Record("Pier.ovrin", kTwo);
+    Record("Quay.ovrin", kTwo);
+    Begin();
+    for (const Key key : {Key::Enter, Key::Escape, Key::Unknown, KeyOf('O'), KeyOf('a'), KeyOf('y')}) {
+        EXPECT_NE(After("a").find("Which side for all that is open"), std::string::npos);
+        screen->Press(Key::Redraw);
+        EXPECT_NE(After("").find("Which side for all that is open"), std::string::npos);
+        screen->Press(key);
+        EXPECT_NE(After("").find("Nothing was decided"), std::string::npos);
+    }
+    EXPECT_EQ(desk->CountOpen(), 4);
+    After("ot");
+    for (const Key key : {Key::Enter, Key::Escape, KeyOf('Y'), KeyOf('f')}) {
+        EXPECT_NE(After("f").find("1 scene is settled, 1 scene is not"), std::string::npos);
+        screen->Press(key);
+        EXPECT_NE(After("").find("Nothing was finished"), std::string::npos);
+    }
+    EXPECT_EQ(Unmerged(), "Pier.ovrin\nQuay.ovrin");
+}
+
+TEST_F(TerminalTest, HelpScrollsWithinItsLinesAndGoesBack) {
+    Record("Pier.ovrin", kTwo);
+    Begin();
+    const std::string first = After("?");
+    EXPECT_NE(first.find("any other key goes back"), std::string::npos) << first;
+    const std::string last = After(std::string(90, 'j'));
+    EXPECT_NE(last.find("go back in them"), std::string::npos) << last;
+    EXPECT_EQ(After(std::string(90, 'k')), first);
+    EXPECT_EQ(After("j", {200, 60}).find("any other key"), std::string::npos); // all of it is in sight
+    EXPECT_NE(After("t").find("2 of 2 open"), std::string::npos);              // which takes nothing
+}
+
+TEST_F(TerminalTest, PlaceIsInSightWhateverTheSizeOfTheList) {
+    ThreeTexts texts = {kHeader, kHeader, kHeader};
+    for (int id = 100; id < 160; ++id) {
+        texts.base += Object(id, "1", "B" + std::to_string(id));
+        texts.ours += Object(id, "2", "B" + std::to_string(id));
+        texts.theirs += Object(id, "3", "B" + std::to_string(id));
+    }
+    Record("Pier.ovrin", texts);
+    Begin();
+    std::mt19937 random(1);
+    std::size_t top = 0;
+    for (int round = 0; round < 300; ++round) {
+        walk->GoTo(random() % walk->Stops().size());
+        const std::size_t rows = 2 + random() % 30;
+        const auto lines = ConflictListLines(*walk, letters, {40, rows}, top);
+        ASSERT_EQ(lines.size(), rows);
+        const auto isSelected = [](const StyledLine& line) { return line.front().style == Style::Selected; };
+        const auto selected = std::ranges::find_if(lines, isSelected);
+        ASSERT_TRUE(selected != lines.end() && selected != lines.begin());
+        EXPECT_EQ(std::ranges::count_if(lines, isSelected), 1);
+        // The object's name stands above.
+        EXPECT_NE(TextOf(*std::prev(selected)).find(walk->ObjectOf(walk->Here())), std::string::npos);
+    }
+}
+
+TEST_F(TerminalTest, NamesAndValuesOfOthersCannotSpeakToTheTerminal) {
+    const auto scene = [](const char* layer) {
+        return kHeader + Object(10, layer, "\"\\x1B]0;gone\\x07\\u202E\"") + "  m_Note: \"\\x1B[2J\\n\\x9b" +
+               layer + "\"\n";
+    };
+    OpenMerge merge = MergeOf({scene("1"), scene("2"), scene("3")}, "\x1b[2J.ovrin");
+    merge.occasion.ours = "\x1b]52;c;x\x07";
+    Unmerge(merge.path, merge.texts);
+    OpenMerges(Found()).Add(merge);
+    Begin();
+    std::string seen = After("") + After("?") + After("nw") + After("x/[2J\n") + After("f") + After("of");
+    std::istringstream input("v\nn\nv\n?\na\nx\na\nt\nq\n");
+    std::ostringstream output;
+    SettleByPrompts(*walk, letters, input, output);
+    seen += output.str();
+    for (const char letter : seen) EXPECT_TRUE(letter == '\n' || static_cast<unsigned char>(letter) >= ' ');
+    for (const char* harmful : {"\u202E", "\u009b"}) EXPECT_EQ(seen.find(harmful), std::string::npos);
+}
+
+TEST_F(TerminalTest, WhateverIsPressedIsKeptAndFitsAnyWindow) {
+    const auto holder = [](int target) {
+        return "--- !o!114 &90\nMonoBehaviour:\n  m_Target: {fileID: " + std::to_string(target) + "}\n";
+    };
+    ThreeTexts texts = kTwo;
+    texts.base += holder(0);
+    texts.ours += holder(20); // which theirs has removed
+    texts.theirs += holder(0);
+    std::string wide = kTwo.theirs;
+    wide.replace(wide.find("Lantern"), 7, "灯台灯台灯台灯台");
+    const std::vector<Key> keys = [] {
+        std::vector<Key> all = {Key::Up,    Key::Down,   Key::Left,  Key::Right,  Key::Home,     Key::End,
+                                Key::Enter, Key::Escape, Key::Erase, Key::PageUp, Key::PageDown, Key::Redraw};
+        for (const char key : std::string("npotbwOTBgurrjkvV12/?uuotb")) all.push_back(KeyOf(key));
+        return all;
+    }();
+    for (unsigned seed = 0; seed < 12; ++seed) {
+        Record("a.ovrin", texts);
+        Record("b.ovrin", {"", kTwo.ours, kTwo.theirs});
+        Unmerge("c.ovrin", {kTwo.base, kTwo.ours, wide});
+        Begin();
+        std::mt19937 random(seed);
+        for (int pressed = 0; pressed < 60 && !screen->End(); ++pressed) {
+            screen->Press(keys[random() % keys.size()]);
+            Picture({80 + random() % 120, 24 + random() % 40});
+        }
+        if (screen->End()) continue;
+        SettleScenes again(remarks);
+        again.Open(remarks);
+        for (std::size_t at = 0; at < 3; ++at)
+            EXPECT_EQ(again.Sessions()[at]->Decisions(), scenes->Sessions()[at]->Decisions()) << seed;
+    }
 }
 
 } // namespace

@@ -2,7 +2,9 @@
 #include "Settle/Terminal/Letters.h"
 #include "Settle/Terminal/StyledText.h"
 #include "Settle/Terminal/TextDifference.h"
+#include "Support/Surroundings.h"
 
+#include <algorithm>
 #include <clocale>
 #include <gtest/gtest.h>
 #include <random>
@@ -101,6 +103,96 @@ TEST_F(TerminalTextTest, EachKeyAsksForOneThingAndTheHelpTellsOfIt) {
         }
     EXPECT_EQ(KeyLines(80, letters).size(), 2);
     for (const StyledLine& line : HelpLines(80, letters, false)) EXPECT_LE(ColumnsOf(line), 80);
+}
+
+/// A text of blanks, letters, wide characters and marks.
+std::string RandomText(std::mt19937& random, std::size_t length) {
+    constexpr const char* kParts[] = {"a", "b", " ", "灯", "n\u0308", "-", "\u0301", "  "};
+    std::string text;
+    while (length-- > 0) text += kParts[random() % std::size(kParts)];
+    return text;
+}
+
+TEST_F(TerminalTextTest, NoTextIsEverWiderThanItsPlace) {
+    std::mt19937 random(3);
+    for (int round = 0; round < 3000; ++round) {
+        const std::string text = letters.Shown(RandomText(random, random() % 20));
+        const std::size_t columns = 1 + random() % 12, split = BytesWithin(text, random() % 12);
+        EXPECT_LE(ColumnsOf(EndWithin(text, columns, letters)), columns) << text;
+        EXPECT_LE(ColumnsOf(BeginningWithin(text, columns, letters)), columns) << text;
+        EXPECT_EQ(ColumnsOf(text.substr(0, split)) + ColumnsOf(text.substr(split)), ColumnsOf(text));
+        const StyledLine line = {{text.substr(0, split), Style::Strong}, {text.substr(split)}};
+        EXPECT_EQ(ColumnsOf(Fitted(line, columns)), columns) << text;
+        std::string wrapped;
+        for (const StyledLine& part : Wrapped(line, columns)) {
+            wrapped += TextOf(part);
+            EXPECT_LE(ColumnsOf(part), std::max<std::size_t>(columns, 2)) << text;
+        }
+        std::string whole = text;
+        EXPECT_EQ(std::erase(wrapped, ' ') <= std::erase(whole, ' '), true);
+        EXPECT_EQ(wrapped, whole) << columns;
+    }
+}
+
+TEST_F(TerminalTextTest, PartsAreOrderedAndWhatTheyLeaveIsInTheOtherText) {
+    std::mt19937 random(5);
+    for (int round = 0; round < 3000; ++round) {
+        const std::string text = RandomText(random, random() % 12), other = RandomText(random, random() % 12);
+        std::size_t at = 0;
+        for (const TextRange& part : PartsNotIn(text, other)) {
+            EXPECT_TRUE(part.begin >= at && part.begin < part.end && part.end <= text.size());
+            at = part.end + 1; // those that touch are one
+        }
+        EXPECT_EQ(PartsNotIn(text, other).empty() && PartsNotIn(other, text).empty(), text == other)
+            << text << "|" << other;
+    }
+}
+
+TEST_F(TerminalTextTest, SignsAndPointsOfNumbersAreOfTheirWords) {
+    EXPECT_EQ(Compared("-4.5", "4.5"), "[-4.5]");
+    EXPECT_EQ(Compared("1.2.3", "1.2.4"), "[1.2.3]");
+    EXPECT_EQ(Compared("end.", "end"), "end[.]");
+    EXPECT_EQ(Compared(".", ""), "[.]");
+    EXPECT_EQ(Compared("a - b", "a b"), "a [- ]b");
+    EXPECT_EQ(Compared("one\ntwo", "one\nthree\ntwo"), "one\ntwo");
+    EXPECT_EQ(Compared("灯台", "灯"), "[灯台]");
+}
+
+TEST_F(TerminalTextTest, LettersAreThoseOfTheEnvironment) {
+    const surroundings::Variable character("LC_CTYPE", {}), language("LANG", {});
+    for (const auto& [locale, isUTF8] : std::map<std::string, bool>{{"C", false},
+                                                                    {"POSIX", false},
+                                                                    {"", false},
+                                                                    {"C.UTF-8", true},
+                                                                    {"xx_XX.UTF-8", true},
+                                                                    {"xx_XX.utf8", true},
+                                                                    {"xx_XX.utf-8", true},
+                                                                    {"xx_XX.UTF-8@euro", true},
+                                                                    {"xx_XX.ISO-8859-1", false},
+                                                                    {"xx", false}}) {
+        const surroundings::Variable all("LC_ALL", locale);
+        EXPECT_EQ(Letters::OfEnvironment().IsUTF8(), isUTF8) << locale;
+        EXPECT_EQ(Letters::OfEnvironment().Shown("灯"), isUTF8 ? "灯" : "\\u706f") << locale;
+    }
+    const surroundings::Variable all("LC_ALL", {}), last("LANG", "xx_XX.UTF-8");
+    EXPECT_TRUE(Letters::OfEnvironment().IsUTF8());
+}
+
+TEST_F(TerminalTextTest, SidesHaveTheLettersOfTheirNames) {
+    for (const Side side : {Side::Base, Side::Ours, Side::Theirs}) {
+        const Key key = KeyOf(LetterOf(side));
+        EXPECT_EQ(SideOf(key), side);
+        EXPECT_EQ(SideOf(RequestOf(key).value()), side);
+        EXPECT_EQ(SideOf(static_cast<Key>(static_cast<unsigned>(key) - 'a' + 'A')), std::nullopt);
+    }
+    for (const Key key :
+         {Key{}, Key::Unknown, Key::Redraw, KeyOf('0'), KeyOf('x'), static_cast<Key>(0x10FFFF)})
+        EXPECT_FALSE(RequestOf(key) || SideOf(key));
+    EXPECT_EQ(RequestOf(KeyOf('1')), Request::Remedy);
+    for (const std::size_t columns : {1, 12, 13, 40}) {
+        EXPECT_GE(HelpLines(columns, letters, true).size(), 10);
+        for (const StyledLine& line : KeyLines(columns, ascii)) EXPECT_FALSE(line.empty());
+    }
 }
 
 } // namespace

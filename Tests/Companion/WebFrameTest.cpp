@@ -47,6 +47,36 @@ TEST_F(WebFrameTest, LengthsThatLeadOutAreNoFrame) {
     EXPECT_FALSE(Received({8, 5}, "abcd"));
 }
 
+TEST_F(WebFrameTest, FrameThatIsCutAnywhereIsNone) {
+    const WebFrame sent = {"ab", "", std::string(10, '\0')};
+    EXPECT_TRUE(SendFrame(here.Get(), sent));
+    std::string bytes(100, '\0');
+    bytes.resize(static_cast<std::size_t>(read(there.Get(), bytes.data(), bytes.size())));
+    for (std::size_t length = 0; length <= bytes.size(); ++length) {
+        int ends[2];
+        ASSERT_EQ(socketpair(AF_UNIX, SOCK_STREAM, 0, ends), 0);
+        Descriptor from(ends[0]);
+        const Descriptor to(ends[1]);
+        EXPECT_EQ(write(from.Get(), bytes.data(), length), static_cast<ssize_t>(length));
+        from.Close();
+        EXPECT_EQ(ReceiveFrame(to.Get(), 100), length == bytes.size() ? std::optional(sent) : std::nullopt);
+    }
+}
+
+TEST_F(WebFrameTest, FramesFollowEachOtherUpToTheirBound) {
+    const WebFrame longest = {std::string(96, 'x')}, tooLong = {std::string(97, 'x')};
+    for (const WebFrame& frame : {WebFrame{}, WebFrame{""}, longest, tooLong})
+        EXPECT_TRUE(SendFrame(here.Get(), frame));
+    EXPECT_EQ(ReceiveFrame(there.Get(), 100), WebFrame{});
+    EXPECT_EQ(ReceiveFrame(there.Get(), 100), WebFrame{""});
+    EXPECT_EQ(ReceiveFrame(there.Get(), 100), longest);
+    EXPECT_FALSE(ReceiveFrame(there.Get(), 100));
+}
+
+TEST_F(WebFrameTest, LengthOfATextIsWithinItsFrame) {
+    EXPECT_FALSE(Received({12, 0xFFFFFFFF}, "abcdefgh"));
+}
+
 TEST_F(WebFrameTest, WhatIsTooLongIsNotWaitedFor) {
     EXPECT_FALSE(Received({101}, ""));
 }

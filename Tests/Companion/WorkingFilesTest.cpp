@@ -27,18 +27,18 @@ struct WorkingFilesTest : GitFolder {
 TEST_F(WorkingFilesTest, TrackedAndChangedFilesOfGitAreToldByTheirBytes) {
     Commit({{kOdd, "1"}, {"b", "1"}, {"sub/c", "1"}, {".gitignore", "ignored\n"}});
     EXPECT_EQ(TrackedFiles(Found()), (Paths{kOdd, ".gitignore", "b", "sub/c"}));
-    EXPECT_EQ(ovrin::ChangedFiles(Found()), Paths{});
+    EXPECT_EQ(DifferingFiles(Found()), Paths{});
     for (const std::string& name : {kOdd, std::string("new"), std::string("ignored")})
         folder.Write(name, "2");
     std::filesystem::remove("b");
-    EXPECT_EQ(ovrin::ChangedFiles(Found()), (Paths{kOdd, "b", "new"}));
+    EXPECT_EQ(DifferingFiles(Found()), (Paths{kOdd, "b", "new"}));
 }
 
 TEST_F(WorkingFilesTest, AheadOfTheFirstCommitAllThatIsThereHasChanged) {
     folder.Write("added", "1");
     folder.Write("new", "1");
     Git({"add", "added"});
-    EXPECT_EQ(ovrin::ChangedFiles(Found()), (Paths{"added", "new"}));
+    EXPECT_EQ(DifferingFiles(Found()), (Paths{"added", "new"}));
 }
 
 TEST_F(WorkingFilesTest, UnmergedFilesAreSettledByTheirNames) {

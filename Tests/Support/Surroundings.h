@@ -6,6 +6,7 @@
 #include <map>
 #include <optional>
 #include <string>
+#include <sys/resource.h>
 #include <sys/stat.h>
 
 /// What a program finds around itself: variables, the present folder, other programs.
@@ -43,6 +44,22 @@ public:
 
 private:
     const fs::path m_Before;
+};
+
+/// No file can be written that is longer, as on a full disk, for as long as this lives.
+class FileLimit {
+public:
+    explicit FileLimit(rlim_t bytes) {
+        getrlimit(RLIMIT_FSIZE, &m_Before);
+        const rlimit limit{bytes, m_Before.rlim_max};
+        setrlimit(RLIMIT_FSIZE, &limit);
+    }
+    FileLimit(const FileLimit&) = delete;
+    FileLimit& operator=(const FileLimit&) = delete;
+    ~FileLimit() { setrlimit(RLIMIT_FSIZE, &m_Before); }
+
+private:
+    rlimit m_Before{};
 };
 
 /// Programs that say what they are told to, in front of all others on the path. With --batch they wait for a

@@ -40,10 +40,10 @@ void CarryOut(Walk& walk, Request request, Key key) {
     case Request::Theirs:
     case Request::Base:
         return walk.Take(*SideOf(request));
-    case Request::AllOurs:
-    case Request::AllTheirs:
-    case Request::AllBase:
-        return walk.TakeAll(*SideOf(request));
+    case Request::WholeOurs:
+    case Request::WholeTheirs:
+    case Request::WholeBase:
+        return walk.TakeWhole(*SideOf(request));
     case Request::Proposed:
         return walk.TakeProposed();
     case Request::Remedy:

@@ -45,7 +45,7 @@ Style StyleOf(Side side) {
 
 StyledSpan StateOf(const SettleDesk::Item& item) {
     if (item.isOpen && item.proposed) return {SideName(*item.proposed) + std::string("?"), Style::Faint};
-    if (item.isOpen) return {};
+    if (item.isOpen && !item.decided) return {};
     return item.decided ? StyledSpan{SideName(*item.decided), StyleOf(*item.decided)}
                         : StyledSpan{"settled", Style::Faint};
 }

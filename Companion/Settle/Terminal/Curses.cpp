@@ -9,6 +9,7 @@
 #include <array>
 #include <cerrno>
 #include <csignal>
+#include <cstdint>
 #include <cstdlib>
 #include <cstring>
 #include <curses.h>
@@ -22,7 +23,8 @@ namespace ovrin {
 namespace {
 
 constexpr int kSignals[] = {SIGINT, SIGTERM, SIGHUP, SIGQUIT};
-constexpr int kEscapeDelay = 100; // milliseconds that the rest of an arrow key may take
+constexpr int kEscapeDelay = 100; // milliseconds that the rest of an arrow key or a character may take
+constexpr std::uint32_t kLastCharacter = 0x10FFFF, kNoCharacter = 0xFFFFFFFF;
 
 // What the handler of signals needs, which may call next to nothing.
 pid_t s_Owner;
@@ -109,7 +111,7 @@ void MakeColours() {
         if (kLooks[at].colour >= 0) init_pair(static_cast<short>(at + 1), kLooks[at].colour, -1);
 }
 
-Key FunctionKey(wint_t code) {
+Key FunctionKey(int code) {
     switch (code) {
     case KEY_UP:
         return Key::Up;
@@ -140,12 +142,12 @@ Key FunctionKey(wint_t code) {
     }
 }
 
-Key CharacterKey(wint_t code) {
+Key CharacterKey(std::uint32_t code) {
     switch (code) {
-    case L'\r':
-    case L'\n':
+    case '\r':
+    case '\n':
         return Key::Enter;
-    case L'\t':
+    case '\t':
         return Key::Tab;
     case 0x1B:
         return Key::Escape;
@@ -156,8 +158,25 @@ Key CharacterKey(wint_t code) {
         clearok(curscr, TRUE);
         return Key::Redraw;
     default:
-        return code < 0x20 ? Key::Unknown : static_cast<Key>(code);
+        return code < 0x20 || code > kLastCharacter ? Key::Unknown : static_cast<Key>(code);
     }
+}
+
+/// The character of UTF-8 that begins with a byte, whose other bytes come at once. Curses itself would wait
+/// for more of what is no character in the locale, and swallow the keys that follow.
+Key LongCharacterKey(int first) {
+    if (first < 0xC2 || first > 0xF4) return Key::Unknown;
+    const int bytes = first >= 0xF0 ? 4 : first >= 0xE0 ? 3 : 2;
+    auto code = static_cast<std::uint32_t>(first & (0x7F >> bytes));
+    timeout(kEscapeDelay);
+    for (int at = 1; at < bytes && code != kNoCharacter; ++at) {
+        const int next = getch();
+        const bool isOfIt = next != ERR && (next & ~0x3F) == 0x80;
+        if (!isOfIt && next != ERR) ungetch(next);
+        code = isOfIt ? (code << 6) | static_cast<std::uint32_t>(next & 0x3F) : kNoCharacter;
+    }
+    timeout(-1);
+    return code < 0x80 ? Key::Unknown : CharacterKey(code);
 }
 
 } // namespace
@@ -209,13 +228,11 @@ void Curses::Show(const std::vector<StyledLine>& picture) {
 }
 
 std::optional<Key> Curses::Read() {
-    wint_t code = 0;
     errno = 0;
-    const int kind = get_wch(&code);
-    if (kind == KEY_CODE_YES) return FunctionKey(code);
-    if (kind == OK) return CharacterKey(code);
-    if (errno == EINTR) return Key::Redraw;
-    return {};
+    const int code = getch();
+    if (code == ERR) return errno == EINTR ? std::optional(Key::Redraw) : std::nullopt;
+    if (code > 0xFF) return FunctionKey(code);
+    return code < 0x80 ? CharacterKey(static_cast<std::uint32_t>(code)) : LongCharacterKey(code);
 }
 
 } // namespace ovrin

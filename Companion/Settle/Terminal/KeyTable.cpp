@@ -16,20 +16,20 @@ constexpr KeyEntry kKeys[] = {
     {Request::Ours, {KeyOf('o')}, "o", "Ours", "take ours here, and go to the next open conflict", true},
     {Request::Theirs, {KeyOf('t')}, "t", "Theirs", "take theirs", true},
     {Request::Base, {KeyOf('b')}, "b", "Base", "take what was there before both changed it", true},
-    {Request::Whole,
-     {KeyOf('w')},
-     "w",
-     "Whole object",
-     "take one side for all that is open about this object and what stands under it; o, t or b says which",
-     true},
-    {Request::AllOurs,
+    {Request::WholeOurs,
      {KeyOf('O')},
      "O T B",
-     "All open",
-     "take ours, theirs or base for all that is open, in all scenes",
+     "Whole object",
+     "take ours, theirs or base for all that is open about this object and what stands under it",
      true},
-    {Request::AllTheirs, {KeyOf('T')}, nullptr, nullptr, nullptr, true},
-    {Request::AllBase, {KeyOf('B')}, nullptr, nullptr, nullptr, true},
+    {Request::WholeTheirs, {KeyOf('T')}, nullptr, nullptr, nullptr, true},
+    {Request::WholeBase, {KeyOf('B')}, nullptr, nullptr, nullptr, true},
+    {Request::All,
+     {KeyOf('a')},
+     "a",
+     "All open",
+     "take one side for all that is open, in all scenes; o, t or b says which",
+     true},
     {Request::Proposed,
      {KeyOf('g')},
      "g",
@@ -107,13 +107,13 @@ bool IsForPrompts(Request request) {
 std::optional<Side> SideOf(Request request) {
     switch (request) {
     case Request::Ours:
-    case Request::AllOurs:
+    case Request::WholeOurs:
         return Side::Ours;
     case Request::Theirs:
-    case Request::AllTheirs:
+    case Request::WholeTheirs:
         return Side::Theirs;
     case Request::Base:
-    case Request::AllBase:
+    case Request::WholeBase:
         return Side::Base;
     default:
         return {};

@@ -2,6 +2,7 @@
 
 #include "Names/PrintableText.h"
 
+#include <cctype>
 #include <clocale>
 #include <cstdint>
 #include <cstdlib>
@@ -73,6 +74,12 @@ std::string InASCII(std::string_view printable) {
     return text;
 }
 
+/// "de_DE.UTF-8", "de_DE.utf8", "de_DE.utf-8@euro".
+bool IsNameOfUTF8(std::string locale) {
+    for (char& letter : locale) letter = static_cast<char>(std::tolower(static_cast<unsigned char>(letter)));
+    return locale.find(".utf-8") != std::string::npos || locale.find(".utf8") != std::string::npos;
+}
+
 } // namespace
 
 Letters Letters::OfEnvironment() {
@@ -82,9 +89,7 @@ Letters Letters::OfEnvironment() {
     for (const char* name : {"LC_ALL", "LC_CTYPE", "LANG"}) {
         const char* const asked = std::getenv(name);
         if (!asked || !*asked) continue;
-        const std::string_view locale = asked;
-        const bool wantsUTF8 = locale.ends_with("UTF-8") || locale.ends_with("utf8");
-        return Letters(wantsUTF8 && std::setlocale(LC_CTYPE, "C.UTF-8") && hasUTF8());
+        return Letters(IsNameOfUTF8(asked) && std::setlocale(LC_CTYPE, "C.UTF-8") && hasUTF8());
     }
     return Letters(false);
 }

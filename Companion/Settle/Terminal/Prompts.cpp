@@ -40,7 +40,7 @@ private:
 
     void Answer(const std::string& answer);
     void Confirm();
-    void TakeWhole();
+    void TakeAll();
     void Search(const std::string& text);
     void Finish();
 
@@ -113,6 +113,8 @@ void Prompts::TellConflictHere(const SettleDesk::Item& item) {
     Tell(TellConflict(words, SideLabels::Of(m_Walk.SceneOf(here).Source().occasion)));
     if (!item.isOpen)
         Tell("  settled" + (item.decided ? ": " + m_Walk.NameOf(here, *item.decided) : ""));
+    else if (item.decided)
+        Tell("  you took " + m_Walk.NameOf(here, *item.decided) + ", but " + kStillLoop);
     else if (item.proposed)
         Tell("  decided before: " + m_Walk.NameOf(here, *item.proposed) + ", which Enter takes again");
 }
@@ -143,8 +145,8 @@ void Prompts::Answer(const std::string& answer) {
         return Tell(HelpLines(kColumns, m_Letters, true));
     case Request::ViewOn:
         return TellValues();
-    case Request::Whole:
-        return TakeWhole();
+    case Request::All:
+        return TakeAll();
     case Request::Finish:
         return Finish();
     case Request::Leave:
@@ -162,11 +164,11 @@ void Prompts::Confirm() {
     m_Walk.GoToNextOpen();
 }
 
-void Prompts::TakeWhole() {
+void Prompts::TakeAll() {
     const auto answer = Ask(QuestionForSide(m_Walk) + ": ");
     const auto side = answer && answer->size() == 1 ? SideOf(KeyOf(answer->front())) : std::nullopt;
     if (side)
-        m_Walk.TakeWhole(*side);
+        m_Walk.TakeAll(*side);
     else
         m_Walk.Say("Nothing was decided");
 }
@@ -189,7 +191,8 @@ void Prompts::Finish() {
         m_End.finished.insert(m_End.finished.end(), finished->paths.begin(), finished->paths.end());
         m_End.refused = finished->refused;
         m_IsOver = true;
-        if (overwrite || m_End.refused.empty() || !IsAgreed(QuestionToOverwrite(m_End.refused))) return;
+        const Remarks& changed = finished->changedByHand;
+        if (overwrite || changed.empty() || !IsAgreed(QuestionToOverwrite(changed))) return;
     }
 }
 

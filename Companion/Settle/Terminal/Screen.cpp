@@ -93,7 +93,7 @@ void Screen::Answer(Request request, Key key) {
         m_Typed.clear();
         m_Mode = Mode::Searching;
         return;
-    case Request::Whole:
+    case Request::All:
         m_Mode = Mode::AskingSide;
         return;
     case Request::Finish:
@@ -142,7 +142,7 @@ void Screen::AskSide(Key key) {
     m_Mode = Mode::Walking;
     const auto side = SideOf(key);
     if (!side) return m_Walk.Say("Nothing was decided");
-    m_Walk.TakeWhole(*side);
+    m_Walk.TakeAll(*side);
     Arrive();
 }
 
@@ -182,7 +182,8 @@ void Screen::Finish(bool overwrite) {
     if (!finished) return; // which was said
     m_Ended.finished.insert(m_Ended.finished.end(), finished->paths.begin(), finished->paths.end());
     m_Ended.refused = finished->refused;
-    if (finished->refused.empty() || overwrite) return Leave();
+    m_ChangedByHand = finished->changedByHand;
+    if (m_ChangedByHand.empty() || overwrite) return Leave();
     m_Mode = Mode::AskingToOverwrite;
 }
 
@@ -196,7 +197,7 @@ std::string Screen::Question() const {
     case Mode::AskingToFinish:
         return QuestionToFinish(m_Walk);
     case Mode::AskingToOverwrite:
-        return QuestionToOverwrite(m_Ended.refused);
+        return QuestionToOverwrite(m_ChangedByHand);
     default:
         return m_Walk.Said();
     }

@@ -31,6 +31,8 @@ public:
     std::vector<StyledLine> DrawWorking(Extent extent);
     /// What was reached, once there is nothing left to press.
     const std::optional<TerminalEnd>& End() const { return m_End; }
+    /// What was reached so far.
+    const TerminalEnd& Reached() const { return m_Ended; }
 
 private:
     enum class Mode : std::uint8_t {
@@ -71,6 +73,7 @@ private:
     std::optional<ValuePanes> m_Panes;
     std::size_t m_PanesColumns = 0;
     TerminalEnd m_Ended;
+    Remarks m_ChangedByHand;
     std::optional<TerminalEnd> m_End;
 };
 

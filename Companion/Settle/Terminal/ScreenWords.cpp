@@ -60,12 +60,11 @@ std::vector<StyledLine> ProblemLines(const Walk& walk, const Letters& letters) {
 }
 
 std::string QuestionForSide(const Walk& walk) {
-    const Walk::Stop& here = walk.Here();
-    std::string question = "Which side for ";
-    question += here.item ? walk.ObjectOf(here) + " and what stands under it" : walk.NameOf(here);
+    std::string question = "Which side for all that is open";
+    if (walk.Desk().Scenes().size() > 1) question += ", in all scenes";
     const char* separator = "? ";
     for (const Side side : {Side::Ours, Side::Theirs, Side::Base}) {
-        question += separator + std::string(1, LetterOf(side)) + " " + walk.NameOf(here, side);
+        question += separator + std::string(1, LetterOf(side)) + " " + SideName(side);
         separator = ", ";
     }
     return question;
@@ -95,9 +94,9 @@ std::string QuestionToFinish(const Walk& walk) {
            ". Finish what is settled, and leave? What you decided of the rest is kept. y yes, n no";
 }
 
-std::string QuestionToOverwrite(const Remarks& refused) {
+std::string QuestionToOverwrite(const Remarks& changedByHand) {
     std::string question;
-    for (const std::string& remark : refused) question += remark + ". ";
+    for (const std::string& remark : changedByHand) question += remark + ". ";
     return question + "Put the settled scene in place there, too? y yes, n leave the file as it is";
 }
 

@@ -16,7 +16,7 @@ std::string CountLine(const Walk& walk);
 std::string SidesLine(const Walk& walk);
 /// What is missing, and what can be done about it under which number.
 std::vector<StyledLine> ProblemLines(const Walk& walk, const Letters& letters);
-/// "Which side for ... ? o ours (main), t theirs (topic), b base".
+/// "Which side for all that is open, in all scenes? o ours, t theirs, b base".
 std::string QuestionForSide(const Walk& walk);
 /// Why there is nothing to finish.
 std::string NothingToFinish(const Walk& walk);
@@ -26,7 +26,7 @@ bool NeedsQuestion(const Walk& walk);
 /// are none.
 std::string QuestionToFinish(const Walk& walk);
 /// Whether to replace the files that these remarks are about.
-std::string QuestionToOverwrite(const Remarks& refused);
+std::string QuestionToOverwrite(const Remarks& changedByHand);
 /// A whole screen that is too small for anything else.
 std::vector<StyledLine> TooSmall(Extent extent, Extent least);
 

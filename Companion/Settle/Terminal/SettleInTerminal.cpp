@@ -28,7 +28,7 @@ TerminalEnd SettleOnScreen(Walk& walk, const Letters& letters, Curses& curses) {
     while (!screen.End()) {
         curses.Show(screen.Draw(curses.Size()));
         const auto key = curses.Read();
-        if (!key) return {};
+        if (!key) return screen.Reached();
         if (areLarge && screen.IsStep(*key)) curses.Show(screen.DrawWorking(curses.Size()));
         screen.Press(*key);
     }

@@ -135,7 +135,8 @@ std::array<SideText, 3> AddedObjectsOf(const Walk& walk, const Walk::Stop& stop,
         std::vector<StyledLine>& lines = sides[static_cast<std::size_t>(side)].lines;
         const auto objects = ObjectsNotIn(names.In(VersionOf(side)), names.In(VersionOf(other)));
         sides[static_cast<std::size_t>(side)].what = {
-            {std::to_string(objects.size()) + " objects of its own", Style::Strong}};
+            {std::to_string(objects.size()) + (objects.size() == 1 ? " object" : " objects") + " of its own",
+             Style::Strong}};
         for (const std::string& name : objects)
             for (StyledLine& wrapped : Wrapped({{letters.Shown(name)}}, columns))
                 lines.push_back(std::move(wrapped));

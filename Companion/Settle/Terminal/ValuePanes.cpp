@@ -53,7 +53,11 @@ std::vector<StyledLine> ConflictHead(const Walk& walk, const Walk::Stop& stop, c
     std::vector<StyledLine> lines = {HeadingOf(walk, stop, letters), what};
     if (!item.isOpen && !item.decided)
         lines.push_back({{"settled by what was decided of another place", Style::Faint}});
-    if (item.isOpen && item.proposed)
+    if (item.isOpen && item.decided)
+        lines.push_back(
+            {{letters.Shown("you took " + walk.NameOf(stop, *item.decided) + ", but " + kStillLoop),
+              Style::Warning}});
+    else if (item.isOpen && item.proposed)
         lines.push_back({{letters.Shown("decided before: " + walk.NameOf(stop, *item.proposed) +
                                         ", which Enter takes again")}});
     return lines;

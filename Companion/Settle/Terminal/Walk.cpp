@@ -5,8 +5,9 @@
 
 #include <algorithm>
 #include <cctype>
+#include <set>
 #include <string_view>
-#include <unordered_set>
+#include <utility>
 
 namespace ovrin {
 
@@ -214,15 +215,17 @@ void Walk::Mend(std::size_t remedy) {
 
 /// Goes to what is open again.
 void Walk::Undo() {
-    std::unordered_set<const OpenConflict*> open;
-    for (const SettleDesk::Item& item : m_Desk.Items())
-        if (item.isOpen) open.insert(item.about);
+    const auto whatIsAt = [&](const Stop& stop) {
+        return std::pair(stop.scene, stop.item ? ItemOf(stop)->about : nullptr);
+    };
+    std::set<std::pair<std::size_t, const OpenConflict*>> open; // only looked into
+    for (const Stop& stop : m_Stops)
+        if (IsOpen(stop)) open.insert(whatIsAt(stop));
     bool isDone = false;
     if (!Do([&] { isDone = m_Desk.Undo(); })) return;
     Say(isDone ? "The last step is taken back; r makes it again" : "There is no step to take back");
-    const auto reopened = std::ranges::find_if(m_Stops, [&](const Stop& stop) {
-        return stop.item && IsOpen(stop) && !open.contains(ItemOf(stop)->about);
-    });
+    const auto reopened = std::ranges::find_if(
+        m_Stops, [&](const Stop& stop) { return IsOpen(stop) && !open.contains(whatIsAt(stop)); });
     if (reopened != m_Stops.end()) m_At = static_cast<std::size_t>(reopened - m_Stops.begin());
 }
 
@@ -235,6 +238,7 @@ void Walk::Redo() {
 std::optional<Walk::Finished> Walk::Finish(bool overwrite) {
     Finished finished;
     if (!Do([&] { finished.paths = m_Desk.Finish(overwrite, finished.refused); })) return {};
+    finished.changedByHand = m_Desk.ChangedByHand();
     return finished;
 }
 

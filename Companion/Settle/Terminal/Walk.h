@@ -69,6 +69,7 @@ public:
     struct Finished {
         std::vector<std::string> paths; ///< of the scenes that are in place
         Remarks refused;                ///< about those that are settled and are not
+        Remarks changedByHand;          ///< those of them that are about files that may be overwritten
     };
     /// Nothing if it failed, which is said then.
     std::optional<Finished> Finish(bool overwrite);

@@ -3,6 +3,7 @@
 #include "Words/Failure.h"
 
 #include <algorithm>
+#include <cctype>
 #include <map>
 #include <regex>
 #include <vector>
@@ -10,6 +11,13 @@
 namespace ovrin {
 
 namespace {
+
+/// Whether a line begins with a word, and not with a longer name.
+bool BeginsWith(std::string_view line, std::string_view word) {
+    if (!line.starts_with(word)) return false;
+    const char next = line.size() == word.size() ? ' ' : line[word.size()];
+    return !std::isalnum(static_cast<unsigned char>(next)) && next != '_' && next != '$';
+}
 
 class Bundle {
 public:
@@ -41,14 +49,15 @@ private:
     /// The text of a module as a function's, after those that it needs were added.
     std::string BodyOf(std::string_view text, const std::string& module) {
         static const std::regex import(R"re(^import (?:(\{[^}]*\}) from )?"\./([^"]+)";)re");
-        static const std::regex exported(R"re(^export ((?:async )?function\*?|class|const) (\w+))re");
+        static const std::regex exported(
+            R"re(^export ((?:async )?function\*?|class|const) (\w+)(?![\w$]))re");
         std::string body, exports;
         while (!text.empty()) {
             const std::size_t end = std::min(text.find('\n'), text.size() - 1) + 1;
             std::string line(text.substr(0, end));
             std::size_t taken = end;
             std::smatch match;
-            if (line.starts_with("import ") || line.starts_with("import\"")) {
+            if (BeginsWith(line, "import")) {
                 taken = std::min(text.find(';'), text.size() - 1) + 1;
                 line = text.substr(0, taken);
                 if (!std::regex_search(line, match, import)) TellUnknown(module, line);
@@ -56,7 +65,7 @@ private:
                 if (match[1].matched)
                     body += "const " + std::regex_replace(match[1].str(), std::regex(" as "), ": ") + " = " +
                             constant + ";";
-            } else if (line.starts_with("export ") || line.starts_with("export{")) {
+            } else if (BeginsWith(line, "export")) {
                 if (!std::regex_search(line, match, exported)) TellUnknown(module, line);
                 exports += (exports.empty() ? " " : ", ") + match[2].str();
                 body += line.substr(std::string_view("export ").size());

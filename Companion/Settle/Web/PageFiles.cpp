@@ -4,7 +4,7 @@
 
 namespace ovrin {
 
-std::optional<PageAnswer> AnswerFile(const PageRequest& request) {
+std::optional<PageAnswer> AnswerPageFile(const PageRequest& request) {
     const std::string_view name = request.path.empty() ? "index.html" : std::string_view(request.path);
     const std::span<const PageFile> files = PageFiles();
     const auto file = std::ranges::find(files, name, &PageFile::name);

@@ -19,6 +19,6 @@ struct PageFile {
 std::span<const PageFile> PageFiles();
 
 /// The file that a page asks for; the page itself for an empty path. Nothing for any other path.
-std::optional<PageAnswer> AnswerFile(const PageRequest& request);
+std::optional<PageAnswer> AnswerPageFile(const PageRequest& request);
 
 } // namespace ovrin

@@ -4,6 +4,7 @@
 #include "Words/Failure.h"
 
 #include <nlohmann/json.hpp>
+#include <set>
 
 namespace ovrin {
 
@@ -11,10 +12,22 @@ namespace {
 
 using nlohmann::json;
 
+/// What the text says; something else than an object if it is no JSON. Throws Failure where an object tells
+/// something twice, of which no reader knows what was meant.
+json ParsedOnce(const std::string& text) {
+    std::set<std::string> keys;
+    const auto look = [&](int depth, json::parse_event_t event, json& parsed) {
+        if (depth == 1 && event == json::parse_event_t::key && !keys.insert(parsed.get<std::string>()).second)
+            throw Failure("The request tells \"" + Printable(parsed.get<std::string>()) + "\" twice");
+        return true;
+    };
+    return json::parse(text, look, false);
+}
+
 /// The values of an object, each of which is to be read once.
 class Fields {
 public:
-    explicit Fields(const std::string& body) : m_Object(json::parse(body, nullptr, false)) {
+    explicit Fields(const std::string& body) : m_Object(ParsedOnce(body)) {
         if (!m_Object.is_object()) throw Failure("The request is no object in JSON");
     }
 

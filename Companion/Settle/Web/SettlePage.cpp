@@ -76,7 +76,7 @@ PageAnswer SettlePage::Get(const PageRequest& request) {
     if (request.path == "api/session") return JsonAnswer(Session());
     if (request.path == "api/conflicts") return JsonAnswer(Conflicts(request));
     if (std::optional<PageAnswer> answer = m_Views.Answer(request)) return *std::move(answer);
-    if (std::optional<PageAnswer> answer = AnswerFile(request)) return *std::move(answer);
+    if (std::optional<PageAnswer> answer = AnswerPageFile(request)) return *std::move(answer);
     return PageError(404, "There is nothing of that name");
 }
 
@@ -209,12 +209,20 @@ std::vector<std::string> SettlePage::Next() const {
     return NextSteps(m_Scenes.Where(), m_Desk.Scenes().front()->Source().occasion.action);
 }
 
+void SettlePage::TellNoneIsReady() const {
+    if (m_Desk.CountOpen() > 0)
+        throw Failure((m_Finished.empty() ? "No scene is settled yet: " : "No other scene is settled yet: ") +
+                      CountOpen(m_Desk.CountOpen()) + " left");
+    throw Failure(m_Desk.IsSettled() ? "All that is settled is written"
+                                     : "Look through what both sides added, and take it first");
+}
+
 /// Puts the results of settled scenes in their places.
 PageAnswer SettlePage::Finish(bool overwrite) {
     bool isAnyReady = false;
     for (std::size_t scene = 0; scene < m_Desk.Scenes().size(); ++scene)
         isAnyReady = isAnyReady || (m_Desk.Scenes()[scene]->IsSettled() && !IsFinished(scene));
-    if (!isAnyReady) throw Failure("No scene is settled yet: " + CountOpen(m_Desk.CountOpen()) + " left");
+    if (!isAnyReady) TellNoneIsReady();
     Remarks remarks;
     const std::vector<std::string> finished = m_Desk.Finish(overwrite, remarks);
     m_Finished.insert(m_Finished.end(), finished.begin(), finished.end());
@@ -222,6 +230,7 @@ PageAnswer SettlePage::Finish(bool overwrite) {
     const bool isOver = m_Finished.size() == m_Desk.Scenes().size();
     return LastAnswer(isOver, {{"finished", AllPrintable(finished)},
                                {"remarks", remarks},
+                               {"changedByHand", m_Desk.ChangedByHand().size()},
                                {"next", isOver ? Next() : std::vector<std::string>()},
                                {"isOver", isOver}});
 }

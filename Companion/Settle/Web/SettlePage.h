@@ -41,6 +41,7 @@ private:
     SettleDesk::Step MakeStep(const PageStep& step);
     PageAnswer GoBack(bool isRedo);
     PageAnswer Finish(bool overwrite);
+    [[noreturn]] void TellNoneIsReady() const;
     PageAnswer Leave();
     PageAnswer AnswerStep(const SettleDesk::Step& step);
     bool IsFinished(std::size_t scene) const;

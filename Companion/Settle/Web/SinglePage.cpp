@@ -4,6 +4,7 @@
 #include "Words/Failure.h"
 
 #include <algorithm>
+#include <cctype>
 #include <random>
 
 namespace ovrin {
@@ -22,9 +23,12 @@ void Replace(std::string& text, std::string_view what, const std::string& by) {
     text.replace(at, what.size(), by);
 }
 
-/// What stands in an element ends it nowhere.
+/// What stands in an element, whose name has small letters, ends it nowhere.
 std::string Inside(const std::string& text, const char* element) {
-    if (text.find("</" + std::string(element)) != std::string::npos || text.find("<!--") != std::string::npos)
+    std::string small = text;
+    for (char& letter : small) letter = static_cast<char>(std::tolower(static_cast<unsigned char>(letter)));
+    if (small.find("</" + std::string(element)) != std::string::npos ||
+        small.find("<!--") != std::string::npos)
         throw Failure("The page's own files hold what would end the element " + std::string(element));
     return text;
 }

@@ -11,6 +11,10 @@ void ModelPipe::Tell(const WebFrame& frame) {
 
 WebFrame ModelPipe::Ask(const WebFrame& request) {
     const std::lock_guard turn(m_Turn);
+    {
+        const std::lock_guard answered(m_Answered);
+        m_IsAwaited = true;
+    }
     Tell(request);
     std::unique_lock answered(m_Answered);
     m_HasAnswer.wait(answered, [&] { return m_Answer.has_value(); });
@@ -22,7 +26,7 @@ void ModelPipe::TakeAnswers() {
         std::optional<WebFrame> frame = ReceiveFrame(m_Socket, kMostAnswerFrame);
         if (!frame || frame->size() != 5 || frame->front() != "answer") return;
         const std::lock_guard answered(m_Answered);
-        if (m_Answer) return; // to no question
+        if (!std::exchange(m_IsAwaited, false)) return; // to no question: the next one would get it
         m_Answer = std::move(frame);
         m_HasAnswer.notify_one();
     }

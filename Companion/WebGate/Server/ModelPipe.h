@@ -29,6 +29,7 @@ private:
     std::mutex m_Sending; // keeps frames in one piece
     std::mutex m_Answered;
     std::condition_variable m_HasAnswer;
+    bool m_IsAwaited = false; // an answer
     std::optional<WebFrame> m_Answer;
 };
 

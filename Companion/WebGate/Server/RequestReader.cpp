@@ -42,7 +42,8 @@ std::optional<std::string> RequestReader::Head() {
     std::size_t searched = 0;
     for (;;) {
         const std::size_t end = m_Read.find(kHeadEnd, searched);
-        if (end != std::string::npos && end + kHeadEnd.size() <= kMostHead) {
+        if (end != std::string::npos) {
+            if (end + kHeadEnd.size() > kMostHead) return {};
             std::string rest = m_Read.substr(end + kHeadEnd.size());
             m_Read.resize(end + kHeadEnd.size());
             return std::exchange(m_Read, std::move(rest));

@@ -2,6 +2,10 @@ import { make, makeButton } from "./dom.js";
 import { showValue } from "./value.js";
 import { SIDES, capital, propertyWords, splitName } from "./words.js";
 
+/** Why a conflict that was decided is open. */
+const STILL_LOOP = "with the sides that are taken, the objects would still be below each other: take one side for " +
+    "all of them";
+
 const KEYS = { base: "B", ours: "O", theirs: "T" };
 
 /**
@@ -27,7 +31,7 @@ export function makeCard(page, steps, row, follow) {
 function stateWords(item) {
     const what = `${capital(item.what)}.`;
     if (!item.isOpen) return `${what} ${item.decided ? `You took ${item.decided}.` : "Another decision settled it."}`;
-    if (item.decided) return `${what} You took ${item.decided}, which alone doesn't settle it.`;
+    if (item.decided) return `${what} Open: you took ${item.decided}, but ${STILL_LOOP}.`;
     return item.proposed ? `${what} Open; it was decided before: ${item.proposed}.` : `${what} Open.`;
 }
 

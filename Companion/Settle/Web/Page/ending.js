@@ -72,7 +72,7 @@ export class Ending {
         const force = makeButton("Replace what was changed by hand", () => this.finish(true));
         part("ending").replaceChildren(make("h2", { id: "ending-title" }, title), listOf(answer.finished),
             listOf(answer.remarks), make("p", { class: "dialog-buttons" },
-                ...(answer.remarks.length && !overwrite ? [force] : []), close));
+                ...(answer.changedByHand && !overwrite ? [force] : []), close));
         part("ending").showModal();
         close.focus();
     }

@@ -60,7 +60,9 @@ export class ValuesView {
         const { item } = page;
         const rows = object.rows.filter((row) => row !== above && (!item || row.item !== item.index));
         const none = above ? "No other field of it differs." : "None of its own fields differs.";
-        const mark = make("span", { class: `mark mark-${object.mark}` },
+        // What another parent changes of a Transform is told of the object that it places.
+        const isToldElsewhere = object.mark === "same" && object.rows.some(({ state }) => state !== "same");
+        const mark = isToldElsewhere ? null : make("span", { class: `mark mark-${object.mark}` },
             make("span", { class: "sign", "aria-hidden": "true" }, MARKS[object.mark].sign),
             ` ${capital(markWords(object.mark, object.by, page.isComparison))}`);
         return make("section", { class: "object", "aria-labelledby": "object-title" },
