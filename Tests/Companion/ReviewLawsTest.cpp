@@ -126,7 +126,9 @@ void CheckRows(Viewed& viewed) {
         for (const json& row : page["rows"])
             if (row["item"].is_number()) ++told[row["item"]];
         EXPECT_NO_THROW(static_cast<void>(page.dump()));
-        if (node.mark.isChanged || node.open) EXPECT_FALSE(page["rows"].empty()) << page;
+        if (node.mark.isChanged || node.open) {
+            EXPECT_FALSE(page["rows"].empty()) << page;
+        }
         EXPECT_GE(page["rows"].size(), node.open);
     }
     for (std::size_t i = 0; i < told.size(); ++i)
@@ -212,8 +214,9 @@ TEST_P(ReviewLaws, PlacesAreThoseOfTheFileAlone) {
             const auto* id = ovrin_yaml::YAMLScalar::Lookup(std::to_string(10 * i + 10));
             const Point *one = after.Find(id), *other = alone.Find(id);
             ASSERT_EQ(one == nullptr, other == nullptr) << round << ": " << 10 * i + 10;
-            if (one)
+            if (one) {
                 EXPECT_EQ(std::tie(one->x, one->y, one->z), std::tie(other->x, other->y, other->z)) << round;
+            }
         }
     }
 }
