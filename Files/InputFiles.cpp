@@ -1,22 +1,49 @@
 #include "InputFiles.h"
 
+#include "Descriptor.h"
 #include "FileUtils.h"
 
 #include "Diff/RulesReader.h"
 #include "Session/ReadInputs.h"
 
+#include <fcntl.h>
+#include <memory>
 #include <sstream>
+#include <unistd.h>
 
 using namespace ovrin_yaml;
 
+namespace {
+
+constexpr const char *kCannotOpen = "Cannot open file", *kCannotRead = "Cannot read file";
+
+std::string WholeFile(const std::string& path) {
+    std::string bytes;
+    const ReadResult result = ReadWholeFile(path, bytes);
+    if (result == ReadResult::CannotOpen) throw YAMLError(kCannotOpen);
+    if (result == ReadResult::CannotRead) throw YAMLError(kCannotRead);
+    return bytes;
+}
+
+ByteSource Opened(const std::string& path) {
+    const auto file = std::make_shared<Descriptor>(OpenFile(path.c_str(), O_RDONLY));
+    if (!file->IsOpen()) throw YAMLError(kCannotOpen);
+    return [file](char* bytes, std::size_t size) {
+        const ssize_t count = Uninterrupted([&] { return read(file->Get(), bytes, size); });
+        if (count < 0) throw YAMLError(kCannotRead);
+        return static_cast<std::size_t>(count);
+    };
+}
+
+} // namespace
+
 InputFile FileInput(const std::string& path) {
-    return {path, FileSize(path), [path] {
-                std::string bytes;
-                const ReadResult result = ReadWholeFile(path, bytes);
-                if (result == ReadResult::CannotOpen) throw YAMLError("Cannot open file");
-                if (result == ReadResult::CannotRead) throw YAMLError("Cannot read file");
-                return bytes;
-            }};
+    // Less is read at one go.
+    constexpr std::size_t kMuch = std::size_t{4} << 20;
+    const std::string native = OvrinToNativePath(path);
+    InputFile input{path, FileSize(path), [native] { return WholeFile(native); }, {}};
+    if (input.size >= kMuch) input.open = [native] { return Opened(native); };
+    return input;
 }
 
 MergeRules SetupRules(const std::string& rulesFile) {

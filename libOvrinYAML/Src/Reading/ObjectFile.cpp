@@ -86,17 +86,34 @@ void ObjectFile::TakeText(std::string text) {
     m_Header = FileHeaderOf(*m_Text);
 }
 
+void ObjectFile::TakeAlong(ByteSource source, ObjectFile& base) {
+    TextWindow window(std::move(source));
+    // A text that begins with the header of another object file has the signature.
+    if (IsBesides(base) && window.Reaches(base.m_Header.size() + kDocumentStart.size()) &&
+        window.Rest().starts_with(base.m_Header) &&
+        window.Rest().substr(base.m_Header.size()).starts_with(kDocumentStart)) {
+        CutAlong(base, window);
+    } else {
+        Take(window.TakeRest());
+        Cut(&base);
+    }
+}
+
 void ObjectFile::Cut(ObjectFile* base) {
     if (!m_Options.fast || !HasWrittenHeader(*m_Text)) return;
-    if (base && m_Options.share && !base->m_Documents.empty() && m_Header == base->m_Header) {
-        m_Base = base;
-        m_TakerBit = static_cast<std::uint8_t>(1u << m_Base->m_TakerCount++);
-        CutAlong();
-        DropSharedText();
+    if (base && IsBesides(*base) && m_Header == base->m_Header) {
+        const auto text = m_Text;
+        TextWindow window(*text);
+        CutAlong(*base, window);
     } else {
         CutAlone();
         if (m_Options.recognise) m_Maker = std::make_shared<Maker>(m_Text);
     }
+}
+
+/// Whether documents of a file that is cut may be shared.
+bool ObjectFile::IsBesides(const ObjectFile& base) const {
+    return m_Options.fast && m_Options.share && !base.m_Documents.empty();
 }
 
 void ObjectFile::CutAlone() {
@@ -121,51 +138,50 @@ void ObjectFile::AddDocument(const char* begin, std::size_t length, std::size_t 
     std::atomic_ref(m_Base->m_Documents[lender].wantedBy).fetch_or(m_TakerBit, std::memory_order_relaxed);
 }
 
-/// Whether the base's document stands at `position` in the same words and ends there, too.
-bool ObjectFile::StandsAt(const Document& document, const char* position, const char* end) const {
-    const std::size_t left = static_cast<std::size_t>(end - position);
-    if (left < document.length || std::memcmp(position, document.begin, document.length) != 0) return false;
-    if (left == document.length) return true;
-    return position[document.length - 1] == '\n' &&
-           std::string_view(position + document.length, left - document.length).starts_with(kDocumentStart);
+/// Whether the base's document stands here in the same words and ends here, too.
+bool ObjectFile::StandsAt(const Document& document, TextWindow& window) {
+    window.Reaches(document.length + kDocumentStart.size());
+    const std::string_view text = window.Rest();
+    if (!text.starts_with(std::string_view(document.begin, document.length))) return false;
+    if (text.size() == document.length) return true;
+    return text[document.length - 1] == '\n' && text.substr(document.length).starts_with(kDocumentStart);
 }
 
 /// Most documents follow each other as they do in the base, so the base's next one is tried before any
-/// search.
-void ObjectFile::CutAlong() {
-    const std::vector<Document>& known = m_Base->m_Documents;
+/// search. What doesn't stand there is kept.
+void ObjectFile::CutAlong(ObjectFile& base, TextWindow& window) {
+    m_Base = &base;
+    m_TakerBit = static_cast<std::uint8_t>(1u << base.m_TakerCount++);
+    const std::vector<Document>& known = base.m_Documents;
     ReserveDocuments(known.size());
+    std::string own;
     std::size_t expected = 0;
-    for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
-        if (expected < known.size() && StandsAt(known[expected], begin, End())) {
-            AddDocument(begin, known[expected].length, expected);
+    for (window.Skip(base.m_Header.size()); window.Reaches(1); window.Skip(m_Documents.back().length)) {
+        if (expected < known.size() && StandsAt(known[expected], window)) {
+            AddDocument(known[expected].begin, known[expected].length, expected);
             ++expected;
-        } else {
-            const char* end = FindDocumentEnd(begin, End());
-            AddDocument(begin, static_cast<std::size_t>(end - begin), FindLender(begin, end, expected));
+            continue;
         }
-        begin += m_Documents.back().length;
+        const std::string_view document = window.Document();
+        const std::size_t lender = FindLender(document, expected);
+        AddDocument(lender == kNone ? nullptr : known[lender].begin, document.size(), lender);
+        if (lender == kNone) own += document;
     }
+    KeepOwn(std::move(own));
 }
 
-/// Where most documents stand in the base in the same words, the others alone are kept.
-void ObjectFile::DropSharedText() {
-    std::size_t ownBytes = 0;
-    for (const Document& document : m_Documents)
-        if (document.lender == kNone) ownBytes += document.length;
-    if (ownBytes > m_Length / 2) return;
-    std::string own;
-    own.reserve(ownBytes);
-    for (Document& document : m_Documents)
-        if (document.lender == kNone) own.append(document.begin, document.length);
+/// Takes the texts of the documents that no other file lends, one behind the other.
+void ObjectFile::KeepOwn(std::string own) {
     m_Text = std::make_shared<const std::string>(std::move(own));
     m_Header = m_Base->m_Header;
     m_HasWholeText = false;
+    m_Length = m_Header.size();
     const char* position = m_Text->data();
     for (Document& document : m_Documents) {
-        const bool isOwn = document.lender == kNone;
-        document.begin = isOwn ? position : m_Base->m_Documents[document.lender].begin;
-        if (isOwn) position += document.length;
+        m_Length += document.length;
+        if (document.lender != kNone) continue;
+        document.begin = position;
+        position += document.length;
     }
 }
 
@@ -185,16 +201,14 @@ void ObjectFile::NeedWholeText() {
 }
 
 /// For a document that isn't the expected one; `expected` becomes the one behind the base's of the same id.
-std::size_t ObjectFile::FindLender(const char* begin, const char* end, std::size_t& expected) const {
+std::size_t ObjectFile::FindLender(std::string_view document, std::size_t& expected) const {
     const std::vector<Document>& known = m_Base->m_Documents;
-    const std::string_view fileID = ovrin_yaml::FileIDOf({begin, end});
+    const std::string_view fileID = ovrin_yaml::FileIDOf(document);
     const bool isChanged = expected < known.size() && FileIDOf(known[expected]) == fileID;
     const std::size_t index = isChanged ? expected : m_Base->IndexOf(fileID);
     if (index == kNone) return kNone;
     expected = index + 1;
-    const bool isSame =
-        known[index].length == static_cast<std::size_t>(end - begin) && StandsAt(known[index], begin, end);
-    return isSame ? index : kNone;
+    return document == std::string_view(known[index].begin, known[index].length) ? index : kNone;
 }
 
 std::size_t ObjectFile::IndexOf(std::string_view fileID) const {

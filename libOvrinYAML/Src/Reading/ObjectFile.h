@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Reading/DocumentLoader.h"
+#include "Reading/TextWindow.h"
 #include "Values/OvrinObjects.h"
 #include "Values/SeededHash.h"
 
@@ -66,6 +67,8 @@ public:
     void Take(std::string bytes);
     /// The same for a text that needs no signature.
     void TakeText(std::string text);
+    /// Takes a file and cuts it along `base`, as below, without having it all in memory where that can be.
+    void TakeAlong(ByteSource source, ObjectFile& base);
     /// Cuts the text, along `base` if it is not null; that must be cut already and stay where it is. Objects
     /// that are wanted before they are read are marked as shared while they are at hand.
     void Cut(ObjectFile* base);
@@ -96,11 +99,12 @@ private:
 
     static std::string_view FileIDOf(const Document& document);
     const char* End() const { return m_Text->data() + m_Text->size(); }
-    bool StandsAt(const Document& document, const char* position, const char* end) const;
-    std::size_t FindLender(const char* begin, const char* end, std::size_t& expected) const;
+    bool IsBesides(const ObjectFile& base) const;
+    static bool StandsAt(const Document& document, TextWindow& window);
+    std::size_t FindLender(std::string_view document, std::size_t& expected) const;
     std::size_t IndexOf(std::string_view fileID) const;
-    void CutAlong();
-    void DropSharedText();
+    void CutAlong(ObjectFile& base, TextWindow& window);
+    void KeepOwn(std::string own);
     void NeedWholeText();
     void ReserveDocuments(std::size_t count);
     void AddDocument(const char* begin, std::size_t length, std::size_t lender);

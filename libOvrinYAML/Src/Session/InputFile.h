@@ -1,5 +1,7 @@
 #pragma once
 
+#include "Reading/TextWindow.h"
+
 #include <cstddef>
 #include <functional>
 #include <string>
@@ -14,12 +16,15 @@ struct InputFile {
     std::size_t size;
     /// Gives the bytes of the whole file. Called once, on any thread; may throw.
     std::function<std::string()> take;
+    /// Where there is one, begins to read the file from its start, which then takes the place of `take`: for
+    /// a file that needn't be in memory as a whole. Called once, on any thread; may throw.
+    std::function<ByteSource()> open = {};
 };
 
 /// A file that is in memory already.
 inline InputFile TextInput(std::string name, std::string text) {
     const std::size_t size = text.size();
-    return {std::move(name), size, [text = std::move(text)]() mutable { return std::move(text); }};
+    return {std::move(name), size, [text = std::move(text)]() mutable { return std::move(text); }, {}};
 }
 
 } // namespace ovrin_yaml

@@ -44,12 +44,22 @@ struct FileInWork {
         if (input.size == 0) m_Stream.emplace([this] { TakeHere(); });
     }
 
-    /// Gets hold of the bytes.
-    void Take() {
+    /// Gets hold of the bytes, as far as they are wanted ahead of the first file's.
+    void Take(bool isFirst) {
         if (m_Stream)
             m_Stream->Join();
-        else
+        else if (isFirst || !input.open)
             TakeHere();
+    }
+
+    /// Afterwards, and when the first file is cut.
+    void CutAlong(ObjectFile& first) {
+        Try([&] {
+            if (input.open)
+                file.TakeAlong(input.open(), first);
+            else
+                file.Cut(&first);
+        });
     }
 
     /// Takes a step of reading, unless an earlier one failed.
@@ -112,10 +122,10 @@ void ReadOnThreads(std::deque<FileInWork>& files, bool isLittle, StageWatcher* w
     std::vector<std::function<void()>> takes, cuts, pieces;
     for (FileInWork& work : files) {
         takes.emplace_back([&] {
-            work.Take();
+            work.Take(&work == &first);
             if (&work == &first) work.Try([&] { work.file.Cut(nullptr); });
         });
-        if (&work != &first) cuts.emplace_back([&] { work.Try([&] { work.file.Cut(&first.file); }); });
+        if (&work != &first) cuts.emplace_back([&] { work.CutAlong(first.file); });
     }
     RunTasks(takes, isLittle);
     RunTasks(cuts, isLittle);
@@ -134,8 +144,11 @@ void ReadOnThreads(std::deque<FileInWork>& files, bool isLittle, StageWatcher* w
 void CutAll(std::deque<FileInWork>& files) {
     FileInWork& first = files.front();
     for (FileInWork& work : files) {
-        work.Take();
-        work.Try([&] { work.file.Cut(&work == &first ? nullptr : &first.file); });
+        work.Take(&work == &first);
+        if (&work == &first)
+            work.Try([&] { work.file.Cut(nullptr); });
+        else
+            work.CutAlong(first.file);
     }
 }
 

@@ -1,0 +1,53 @@
+#include "Reading/TextWindow.h"
+
+#include "Reading/DocumentCut.h"
+
+#include <algorithm>
+#include <cstring>
+#include <utility>
+
+namespace ovrin_yaml {
+
+namespace {
+
+/// Big enough to make calls cheap, small enough to stay in the cache.
+constexpr std::size_t kWindowSize = std::size_t{1} << 20;
+
+} // namespace
+
+TextWindow::TextWindow(ByteSource source) : m_Source(std::move(source)), m_Bytes(kWindowSize, '\0') {}
+
+/// Moves what is left to the front and fills the room behind it, which is made for `wanted` bytes in all.
+void TextWindow::ReadMore(std::size_t wanted) {
+    const std::size_t left = m_Rest.size();
+    std::copy_n(m_Rest.data(), left, m_Bytes.data());
+    if (wanted > m_Bytes.size()) m_Bytes.resize(std::max(wanted, 2 * m_Bytes.size()));
+    char* const bytes = m_Bytes.data() + left;
+    std::size_t count = m_Source(bytes, m_Bytes.size() - left);
+    m_HasEnded = count == 0;
+    if (const void* nul = std::memchr(bytes, '\0', count)) {
+        count = static_cast<std::size_t>(static_cast<const char*>(nul) - bytes);
+        m_HasEnded = true;
+    }
+    m_Rest = std::string_view(m_Bytes).substr(0, left + count);
+}
+
+std::string_view TextWindow::Document() {
+    const char* end = nullptr;
+    do {
+        end = FindDocumentEnd(m_Rest.data(), m_Rest.data() + m_Rest.size());
+        // One that ends with the window may go on behind it.
+    } while (end == m_Rest.data() + m_Rest.size() && Reaches(m_Rest.size() + 1));
+    return {m_Rest.data(), end};
+}
+
+std::string TextWindow::TakeRest() {
+    std::string rest;
+    do {
+        rest += m_Rest;
+        m_Rest = {};
+    } while (Reaches(1));
+    return rest;
+}
+
+} // namespace ovrin_yaml
