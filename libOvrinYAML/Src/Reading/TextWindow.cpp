@@ -33,12 +33,13 @@ void TextWindow::ReadMore(std::size_t wanted) {
 }
 
 std::string_view TextWindow::Document() {
-    const char* end = nullptr;
+    std::size_t length = 0;
     do {
-        end = FindDocumentEnd(m_Rest.data(), m_Rest.data() + m_Rest.size());
-        // One that ends with the window may go on behind it.
-    } while (end == m_Rest.data() + m_Rest.size() && Reaches(m_Rest.size() + 1));
-    return {m_Rest.data(), end};
+        const char* const begin = m_Rest.data();
+        length = static_cast<std::size_t>(FindDocumentEnd(begin, begin + m_Rest.size()) - begin);
+        // One that ends with the window may go on behind it; to look there may move the window.
+    } while (length == m_Rest.size() && Reaches(length + 1));
+    return m_Rest.substr(0, length);
 }
 
 std::string TextWindow::TakeRest() {
