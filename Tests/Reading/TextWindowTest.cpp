@@ -1,4 +1,5 @@
-#include "Reading/TextWindow.h"
+#include "Reading/ObjectFile.h"
+#include "Support/Documents.h"
 
 #include <gtest/gtest.h>
 
@@ -6,7 +7,7 @@
 
 namespace {
 
-using namespace ovrin_yaml;
+using namespace documents;
 
 /// Gives at most `step` bytes at a time.
 ByteSource InSteps(const std::string& text, std::size_t step) {
@@ -15,6 +16,24 @@ ByteSource InSteps(const std::string& text, std::size_t step) {
         at += count;
         return count;
     };
+}
+
+/// The signature of a file is looked for in its bytes, and its text ends at the first NUL.
+TEST(TextWindow, BytesBehindANulTellOfTheSignatureStill) {
+    using namespace std::string_literals;
+    const std::string text = ObjectText("--- !o!1 &1\na: 1\n");
+    for (const std::string& file : {"\0"s + text, "\0\0\0\0"s + text, "\0\0\0\0\0"s + text,
+                                    text.substr(0, 3) + "\0"s + text, text + "\0x"s, "\0"s, ""s}) {
+        OvrinObjects objects, whole, stepwise;
+        ObjectFile base(objects, {}), expected(whole, {});
+        base.Take(text);
+        base.Cut(nullptr);
+        const std::string failure = ErrorOf([&] { expected.Take(file); });
+        for (const std::size_t step : {1, 6, 1000}) {
+            ObjectFile along(stepwise, {});
+            EXPECT_EQ(ErrorOf([&] { along.TakeAlong(InSteps(file, step), base); }), failure) << file;
+        }
+    }
 }
 
 TEST(TextWindow, AnyStepsGiveTheSameDocuments) {

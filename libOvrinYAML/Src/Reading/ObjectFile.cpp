@@ -94,7 +94,7 @@ void ObjectFile::TakeAlong(ByteSource source, ObjectFile& base) {
         window.Rest().substr(base.m_Header.size()).starts_with(kDocumentStart)) {
         CutAlong(base, window);
     } else {
-        Take(window.TakeRest());
+        Take(window.TakeBytes());
         Cut(&base);
     }
 }
