@@ -1,3 +1,4 @@
+#include "Diff/YAMLMappingDiff.h"
 #include "Repair/ObjectTraits.h"
 #include "Repair/UnbuiltReferences.h"
 #include "Session/MergeSession.h"
@@ -50,6 +51,16 @@ struct UnbuiltTest : testing::Test {
         EXPECT_EQ(merged.substr(merged.find('\n')), expected.substr(expected.find('\n')));
     }
 
+    /// What goes wrong in a step, and where.
+    template <class Step> static std::string Failure(const Step& step) {
+        try {
+            step();
+        } catch (const MergeError& error) {
+            return error.what() + ", " + error.Object() + ", " + std::to_string(error.Line());
+        }
+        return "none";
+    }
+
     std::string shared, base, left, right;
 };
 
@@ -93,7 +104,7 @@ TEST_F(UnbuiltTest, AnIDThatMovedIsFollowedInTheBytes) {
 
 /// A Transform of a prefab instance, which has to name it.
 TEST_F(UnbuiltTest, AStrippedTransformWithoutALinkIsAFailureStill) {
-    const auto failure = [this](bool recognise) { return ErrorOf([&] { Merge(recognise); }); };
+    const auto failure = [this](bool recognise) { return Failure([&] { Merge(recognise); }); };
     shared = "--- !o!4 &1 stripped\nTransform:\n  m_PrefabInstance: {fileID: 7}\n";
     EXPECT_EQ(failure(true), "none");
     shared += "--- !o!4 &2 stripped\nTransform:\n  m_Other: {fileID: 7}\n";
@@ -103,14 +114,7 @@ TEST_F(UnbuiltTest, AStrippedTransformWithoutALinkIsAFailureStill) {
 
 /// Where most is shared only the rest of left and right is kept, and a failure needs the whole.
 TEST_F(UnbuiltTest, FailuresHaveTheirPlaceInTheWholeFile) {
-    const auto place = [this](bool recognise) {
-        try {
-            Read(recognise);
-        } catch (const MergeError& error) {
-            return error.what() + ", " + error.Object() + ", " + std::to_string(error.Line());
-        }
-        return std::string("none");
-    };
+    const auto place = [this](bool recognise) { return Failure([&] { Read(recognise); }); };
     for (int id = 10; id < 60; ++id) shared += Transform(id, 0);
     left = "--- !o!1 &1\nA: 1\n--- !o!1 &2\nA: [\n" + Transform(3, 0);
     EXPECT_TRUE(place(true).ends_with(", 2, 155")) << place(true);
@@ -126,6 +130,22 @@ TEST_F(UnbuiltTest, WhatMayNotBeSharedIsReadOfTheBasesBytes) {
     shared += "--- !o!1107 &1\nAnimatorStateMachine:\n  m_StateMachineTransitions:\n    first: {fileID: 1}\n";
     right = Transform(2, 0);
     ExpectBuilt(std::string(50, 'u') + "bb");
+}
+
+/// Its objects are others than the base's, which are compared with them.
+TEST_F(UnbuiltTest, NothingIsUnbuiltBesideAFileOfAnotherHeader) {
+    const std::string object = ObjectText("--- !o!1 &1\na: 1\nb: r27104\n");
+    for (const std::string handle : {"!o!", "!x!"}) {
+        // The hash is the same, and so nothing else is looked at.
+        const std::string other =
+            "%YAML 1.1\n%TAG " + handle + " tag:a,2011:\n--- " + handle + "1 &1\nk: w84188\n";
+        MergeSession session(Threads::None);
+        session.Read({TextInput("base", object), TextInput("left", other), TextInput("right", object)});
+        EXPECT_EQ(Built(session.BaseObjects().GetMapping()), "b");
+        session.Prepare();
+        session.Diff();
+        EXPECT_TRUE(session.LeftDiff().Entries().empty());
+    }
 }
 
 TEST_F(UnbuiltTest, AnyNumberOfThreadsMayAskForAnObject) {
