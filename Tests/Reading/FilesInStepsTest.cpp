@@ -19,7 +19,7 @@ ByteSource InSteps(const std::string& text, std::size_t step) {
 }
 
 /// The signature of a file is looked for in its bytes, and its text ends at the first NUL.
-TEST(TextWindow, BytesBehindANulTellOfTheSignatureStill) {
+TEST(FilesInSteps, BytesBehindANulTellOfTheSignatureStill) {
     using namespace std::string_literals;
     const std::string text = ObjectText("--- !o!1 &1\na: 1\n");
     for (const std::string& file : {"\0"s + text, "\0\0\0\0"s + text, "\0\0\0\0\0"s + text,
@@ -36,7 +36,7 @@ TEST(TextWindow, BytesBehindANulTellOfTheSignatureStill) {
     }
 }
 
-TEST(TextWindow, AnyStepsGiveTheSameDocuments) {
+TEST(FilesInSteps, AnyStepsGiveTheSameDocuments) {
     const std::string first = "--- !o!1 &1\na: '!'\n", second = "--- !o!1 &2\nb: '--- !o!'\n";
     for (std::size_t step = 1; step < 40; ++step) {
         TextWindow window(InSteps(first + second, step));
