@@ -41,13 +41,4 @@ std::string_view TextWindow::Document() {
     return {m_Rest.data(), end};
 }
 
-std::string TextWindow::TakeRest() {
-    std::string rest;
-    do {
-        rest += m_Rest;
-        m_Rest = {};
-    } while (Reaches(1));
-    return rest;
-}
-
 } // namespace ovrin_yaml

@@ -27,8 +27,6 @@ public:
     void Skip(std::size_t length) { m_Rest.remove_prefix(length); }
     /// The document of an object file that begins here, as far as FindDocumentEnd.
     std::string_view Document();
-    /// Reads all that is left.
-    std::string TakeRest();
 
 private:
     void ReadMore(std::size_t wanted);
