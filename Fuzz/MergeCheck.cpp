@@ -3,14 +3,37 @@
 #include "MergeLaws.h"
 #include "MergeRun.h"
 
+#include <algorithm>
+
 using namespace ovrin_yaml;
 
 namespace ovrin_fuzz {
+
+namespace {
+
+/// Gives few bytes at a time.
+ByteSource InSteps(const std::string& text) {
+    return [text, at = std::size_t{0}](char* bytes, std::size_t size) mutable {
+        constexpr std::size_t kStep = 61;
+        const std::size_t count = std::min({kStep, size, text.size() - at});
+        std::copy_n(text.data() + at, count, bytes);
+        at += count;
+        return count;
+    };
+}
+
+} // namespace
 
 std::string CheckMerge(const MergeTexts& texts) {
     const auto files = [&]() -> std::vector<InputFile> {
         return {TextInput("base", texts.base), TextInput("left", texts.left),
                 TextInput("right", texts.right)};
+    };
+    const auto inSteps = [&]() -> std::vector<InputFile> {
+        std::vector<InputFile> inputs = files();
+        for (std::size_t i = 1; i < inputs.size(); ++i)
+            inputs[i].open = [text = i == 1 ? texts.left : texts.right] { return InSteps(text); };
+        return inputs;
     };
     const auto run = [&](bool fast, bool share, Threads threads, Sessions sessions) {
         ReaderOptions options = DefaultReaderOptions();
@@ -20,7 +43,7 @@ std::string CheckMerge(const MergeTexts& texts) {
         return RunMerge({files, options, threads, sessions});
     };
     const auto runUnbuilt = [&](Threads threads, Sessions sessions) {
-        return RunMerge({files, DefaultReaderOptions(), threads, sessions, {}, false});
+        return RunMerge({inSteps, DefaultReaderOptions(), threads, sessions, {}, false});
     };
     const MergeOutcome expected = run(false, false, Threads::None, Sessions::OneEach);
     const MergeOutcome unshared = run(true, false, Threads::None, Sessions::One);

@@ -21,11 +21,24 @@ struct UnbuiltTest : testing::Test {
         auto session = std::make_unique<MergeSession>(threads);
         ReaderOptions options = DefaultReaderOptions();
         options.recognise = recognise;
-        session->Read({TextInput("base", ObjectText(shared + base)),
-                       TextInput("left", ObjectText(shared + left)),
-                       TextInput("right", ObjectText(shared + right))},
+        session->Read({TextInput("base", ObjectText(shared + base)), Input("left", ObjectText(shared + left)),
+                       Input("right", ObjectText(shared + right))},
                       nullptr, options);
         return session;
+    }
+    /// A file that is in memory, or comes in steps of so many bytes.
+    InputFile Input(const std::string& name, const std::string& text) const {
+        InputFile input = TextInput(name, text);
+        if (step == 0) return input;
+        input.open = [text, step = step]() -> ByteSource {
+            return [text, step, at = std::size_t{0}](char* bytes, std::size_t size) mutable {
+                const std::size_t count = std::min({step, size, text.size() - at});
+                std::copy_n(text.data() + at, count, bytes);
+                at += count;
+                return count;
+            };
+        };
+        return input;
     }
     /// The whole merge. "b" and "u" for each object of the result that is built or isn't, in file order,
     /// ahead of its text.
@@ -45,10 +58,14 @@ struct UnbuiltTest : testing::Test {
         return built;
     }
     /// The merge is that of objects that are all built, and these objects had to be.
-    void ExpectBuilt(const std::string& built) const {
-        const std::string merged = Merge(), expected = Merge(false);
-        EXPECT_EQ(merged.substr(0, merged.find('\n')), built);
-        EXPECT_EQ(merged.substr(merged.find('\n')), expected.substr(expected.find('\n')));
+    void ExpectBuilt(const std::string& built) {
+        const std::string expected = Merge(false);
+        for (const std::size_t each : {0, 1, 5, 1000}) {
+            step = each;
+            const std::string merged = Merge();
+            EXPECT_EQ(merged.substr(0, merged.find('\n')), built) << each;
+            EXPECT_EQ(merged.substr(merged.find('\n')), expected.substr(expected.find('\n'))) << each;
+        }
     }
 
     /// What goes wrong in a step, and where.
@@ -62,6 +79,7 @@ struct UnbuiltTest : testing::Test {
     }
 
     std::string shared, base, left, right;
+    std::size_t step = 0;
 };
 
 std::string Transform(int id, int father) {
@@ -117,11 +135,32 @@ TEST_F(UnbuiltTest, FailuresHaveTheirPlaceInTheWholeFile) {
     const auto place = [this](bool recognise) { return Failure([&] { Read(recognise); }); };
     for (int id = 10; id < 60; ++id) shared += Transform(id, 0);
     left = "--- !o!1 &1\nA: 1\n--- !o!1 &2\nA: [\n" + Transform(3, 0);
+    step = 100;
     EXPECT_TRUE(place(true).ends_with(", 2, 155")) << place(true);
     EXPECT_EQ(place(true), place(false));
     left = "--- !o!1 &1\n# only libyaml reads this\nA: 1\n" + Transform(3, 0);
     EXPECT_EQ(place(true), "none");
     EXPECT_EQ(Written(Read()->LeftObjects()), ObjectText(shared + "--- !o!1 &1\nA: 1\n" + Transform(3, 0)));
+}
+
+/// What comes in steps and isn't beside the base is read as any other file.
+TEST_F(UnbuiltTest, FilesThatHaveNothingInCommonWithTheBaseAreReadWhole) {
+    shared = Transform(1, 0);
+    const auto readSide = [this](const std::string& file, std::size_t bytes) {
+        step = bytes;
+        MergeSession session(Threads::None);
+        const std::string failure = ErrorOf([&] {
+            session.Read({TextInput("base", ObjectText(shared)), Input("left", file), Input("right", file)});
+        });
+        return failure == "none" ? Written(session.RightObjects()) : failure;
+    };
+    std::string otherHeader = ObjectText(shared), later = ObjectText(shared + Transform(2, 0));
+    otherHeader.replace(otherHeader.find("tag:"), 4, "tag:other.");
+    for (const std::string& file :
+         {otherHeader, std::string("no signature"), std::string(), ObjectText(""), later,
+          later + '\0' + "--- !o!1 &3\nA: [\n", "\xEF\xBB\xBF" + later, ObjectText(shared).substr(0, 30)})
+        for (const std::size_t bytes : {1, 10, 1000})
+            EXPECT_EQ(readSide(file, bytes), readSide(file, 0)) << file;
 }
 
 /// Transitions are changed in every file, so none may be shared.

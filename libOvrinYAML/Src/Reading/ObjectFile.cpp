@@ -2,6 +2,7 @@
 
 #include "Reading/ChunkWalker.h"
 #include "Reading/DocumentCut.h"
+#include "Reading/DocumentTreeMaker.h"
 #include "Reading/Fast/BatchedBuilder.h"
 #include "Reading/Fast/Recogniser.h"
 #include "Reading/Fast/WrittenFormReader.h"
@@ -11,6 +12,7 @@
 #include "Writing/WrittenForm.h"
 
 #include <algorithm>
+#include <array>
 #include <atomic>
 #include <cstring>
 #include <optional>
@@ -44,28 +46,6 @@ private:
     std::optional<Recognition> m_Recognition;
 };
 
-/// Builds what was only recognised, with the reader that would have built it.
-class ObjectFile::Maker final : public TreeMaker {
-public:
-    explicit Maker(std::shared_ptr<const std::string> text) : m_Text(std::move(text)) {}
-
-private:
-    YAMLMapping* Make(std::string_view source) override {
-        // Memory may have been lacking half-way through the last one.
-        if (m_IsAtWork) m_Reader.reset();
-        m_IsAtWork = true;
-        if (!m_Reader) m_Reader = std::make_unique<TreeReader>(m_Text->data() + m_Text->size());
-        YAMLMapping* tree = m_Reader->Read(source, kFileHeaderLines).object;
-        m_Reader->InternTexts();
-        m_IsAtWork = false;
-        return tree;
-    }
-
-    const std::shared_ptr<const std::string> m_Text;
-    std::unique_ptr<TreeReader> m_Reader;
-    bool m_IsAtWork = false;
-};
-
 std::string_view ObjectFile::FileIDOf(const Document& document) {
     return ovrin_yaml::FileIDOf({document.begin, document.length});
 }
@@ -86,30 +66,29 @@ void ObjectFile::TakeText(std::string text) {
     m_Header = FileHeaderOf(*m_Text);
 }
 
-void ObjectFile::TakeAlong(ByteSource source, ObjectFile& base) {
+bool ObjectFile::TakeAlong(ByteSource source, ObjectFile& base) {
+    if (!MayShareWith(base)) return false;
     TextWindow window(std::move(source));
-    // A text that begins with the header of another object file has the signature.
-    if (IsBesides(base) && window.Reaches(base.m_Header.size() + kDocumentStart.size()) &&
-        window.Rest().starts_with(base.m_Header) &&
-        window.Rest().substr(base.m_Header.size()).starts_with(kDocumentStart)) {
-        BecomeTakerOf(base);
-        CutAlong(base, window);
-    } else {
-        Take(window.TakeBytes());
-        Cut(&base);
-    }
+    // One that begins with the header of another object file has the signature.
+    const bool hasItsHeader = window.Reaches(base.m_Header.size() + kDocumentStart.size()) &&
+                              window.Rest().starts_with(base.m_Header) &&
+                              window.Rest().substr(base.m_Header.size()).starts_with(kDocumentStart);
+    if (!hasItsHeader) return false;
+    BecomeTakerOf(base);
+    CutAlong(base, window);
+    return true;
 }
 
 void ObjectFile::Cut(ObjectFile* base) {
     if (base) BecomeTakerOf(*base);
     if (!m_Options.fast || !HasWrittenHeader(*m_Text)) return;
-    if (base && IsBesides(*base) && m_Header == base->m_Header) {
+    if (base && MayShareWith(*base) && m_Header == base->m_Header) {
         const auto text = m_Text;
         TextWindow window(*text);
         CutAlong(*base, window);
     } else {
         CutAlone();
-        if (m_Options.recognise) m_Maker = std::make_shared<Maker>(m_Text);
+        if (m_Options.recognise) m_Maker = std::make_shared<DocumentTreeMaker>(m_Text);
     }
 }
 
@@ -119,7 +98,7 @@ void ObjectFile::BecomeTakerOf(ObjectFile& base) {
 }
 
 /// Whether documents of a file that is cut may be shared.
-bool ObjectFile::IsBesides(const ObjectFile& base) const {
+bool ObjectFile::MayShareWith(const ObjectFile& base) const {
     return m_Options.fast && m_Options.share && !base.m_Documents.empty();
 }
 
@@ -248,7 +227,6 @@ std::size_t ObjectFile::MakePieces() {
 }
 
 void ObjectFile::ReadPiece(std::size_t piece) {
-    constexpr std::size_t kAtOnce = 32;
     Readers readers(End());
     for (std::size_t i = m_Pieces[piece].first; i < m_Pieces[piece].end; i += kAtOnce)
         ReadDocuments(readers, {&m_Documents[i], std::min(kAtOnce, m_Pieces[piece].end - i)});
@@ -260,6 +238,7 @@ void ObjectFile::ReadDocuments(Readers& readers, std::span<Document> documents) 
         if (document.lender == kNone && !(IsWantedByAll(document) && Recognise(readers, document)))
             Read(readers.Trees(), document);
     readers.InternTexts();
+    InternIDs(documents);
     for (Document& document : documents)
         if (document.object && document.object->IsBuilt()) Complete(document);
 }
@@ -276,7 +255,6 @@ bool ObjectFile::Recognise(Readers& readers, Document& document) const {
     if (!object || !isAsWritten || object->Traits() & m_Options.unshared) return false;
     document.object = YAMLMapping::CreateUnbuilt(text, *m_Maker);
     document.object->SetTraitsAsRead(object->Traits());
-    document.fileID = YAMLScalar::Lookup(FileIDOf(document));
     document.isLendable = document.isMarked = true;
     return true;
 }
@@ -286,6 +264,24 @@ void ObjectFile::Read(TreeReader& reader, Document& document) const {
     const auto read = reader.Read({document.begin, document.length}, kFileHeaderLines);
     document.object = read.object;
     document.isAsWritten = read.isAsWritten;
+}
+
+/// Of objects that were recognised. All are asked for before the first is looked up.
+void ObjectFile::InternIDs(std::span<Document> documents) {
+    ScalarTable& table = ScalarTable::Instance();
+    std::array<std::uint32_t, kAtOnce> hashes;
+    const auto forEach = [&](const auto& visit) {
+        for (std::size_t i = 0; i < documents.size(); ++i)
+            if (documents[i].object && !documents[i].object->IsBuilt()) visit(documents[i], hashes[i]);
+    };
+    forEach([&](const Document& document, std::uint32_t& hash) {
+        hash = ScalarTable::HashOf(FileIDOf(document));
+        table.PrefetchSlot(hash);
+    });
+    forEach([&](const Document&, std::uint32_t hash) { table.PrefetchScalar(hash); });
+    forEach([&](Document& document, std::uint32_t hash) {
+        document.fileID = table.Intern(FileIDOf(document), hash, 0);
+    });
 }
 
 /// What there is to do with an object that the fast reader has read, as long as it is at hand.

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Reading/DocumentLoader.h"
+#include "Reading/ReaderOptions.h"
 #include "Reading/TextWindow.h"
 #include "Values/OvrinObjects.h"
 #include "Values/SeededHash.h"
@@ -22,20 +23,6 @@ class BatchedBuilder;
 class ChunkWalker;
 class Recogniser;
 template <class Builder> class WrittenFormReader;
-
-/// How object files are read. What they mean doesn't depend on it: tests and benchmarks switch parts off.
-struct ReaderOptions {
-    bool fast = true;  ///< read documents in written form without libyaml
-    bool share = true; ///< share the objects of documents that are the same in two files, to the letter
-    /// Looks at each object right after the fast reader has read it, while it is at hand; what it returns is
-    /// kept as YAMLMapping::TraitsAsRead. Called from any thread, only for objects without repeated keys.
-    std::uint8_t (*inspect)(const YAMLMapping& object) = nullptr;
-    /// Objects with one of these traits are never shared.
-    std::uint8_t unshared = 0;
-    /// Build no tree of an object that all files have in the same words before somebody asks for it. Its
-    /// traits are those of ObjectTrait.
-    bool recognise = false;
-};
 
 /// An object file on its way from text to objects.
 ///
@@ -67,8 +54,9 @@ public:
     void Take(std::string bytes);
     /// The same for a text that needs no signature.
     void TakeText(std::string text);
-    /// Takes a file and cuts it along `base`, as below, without having it all in memory where that can be.
-    void TakeAlong(ByteSource source, ObjectFile& base);
+    /// Takes a file and cuts it along `base`, as below, without ever having it all in memory. False, with
+    /// nothing done, for a file that hasn't the base's header or isn't to share anything.
+    bool TakeAlong(ByteSource source, ObjectFile& base);
     /// Cuts the text, along `base` if it is not null; that must be cut already and stay where it is. Objects
     /// that are wanted before they are read are marked as shared while they are at hand.
     void Cut(ObjectFile* base);
@@ -96,11 +84,12 @@ private:
         std::size_t first, end; // documents
     };
     static constexpr std::size_t kNone = SIZE_MAX;
+    static constexpr std::size_t kAtOnce = 32; // documents
 
     static std::string_view FileIDOf(const Document& document);
     const char* End() const { return m_Text->data() + m_Text->size(); }
     void BecomeTakerOf(ObjectFile& base);
-    bool IsBesides(const ObjectFile& base) const;
+    bool MayShareWith(const ObjectFile& base) const;
     static bool StandsAt(const Document& document, TextWindow& window);
     std::size_t FindLender(std::string_view document, std::size_t& expected) const;
     std::size_t IndexOf(std::string_view fileID) const;
@@ -111,12 +100,12 @@ private:
     void AddDocument(const char* begin, std::size_t length, std::size_t lender);
     void CutAlone();
     class Readers;
-    class Maker;
 
     void ReadDocuments(Readers& readers, std::span<Document> documents) const;
     bool IsWantedByAll(const Document& document) const;
     bool Recognise(Readers& readers, Document& document) const;
     void Read(TreeReader& reader, Document& document) const;
+    static void InternIDs(std::span<Document> documents);
     void Complete(Document& document) const;
     void FinishDocuments();
     bool ReadNext(ChunkWalker& walker, std::size_t offset) const;
@@ -137,7 +126,7 @@ private:
     std::vector<Piece> m_Pieces;
     AliasBudget m_AliasBudget;
 
-    // File id to document, for the files that are cut along this one; made by the first that asks.
+    // File id to document, for the files to be cut along this one; made by the first that asks.
     mutable std::mutex m_IndexLock;
     mutable std::unordered_map<std::string_view, std::size_t, SeededHash> m_Index;
 };

@@ -1,5 +1,7 @@
 #include "Reading/ObjectFileReader.h"
 
+#include "Reading/ObjectFile.h"
+
 namespace ovrin_yaml {
 
 namespace {

@@ -1,6 +1,7 @@
 #pragma once
 
-#include "Reading/ObjectFile.h"
+#include "Reading/ReaderOptions.h"
+#include "Values/OvrinObjects.h"
 
 #include <string>
 

@@ -23,11 +23,13 @@ void TextWindow::ReadMore(std::size_t wanted) {
     std::copy_n(m_Rest.data(), left, m_Bytes.data());
     if (wanted > m_Bytes.size()) m_Bytes.resize(std::max(wanted, 2 * m_Bytes.size()));
     char* const bytes = m_Bytes.data() + left;
-    const std::size_t count = m_Source(bytes, m_Bytes.size() - left);
-    const void* nul = std::memchr(bytes, '\0', count);
-    m_HasEnded = count == 0 || nul;
-    m_Behind = nul ? static_cast<std::size_t>(bytes + count - static_cast<const char*>(nul)) : 0;
-    m_Rest = std::string_view(m_Bytes).substr(0, left + count - m_Behind);
+    std::size_t count = m_Source(bytes, m_Bytes.size() - left);
+    m_HasEnded = count == 0;
+    if (const void* nul = std::memchr(bytes, '\0', count)) {
+        count = static_cast<std::size_t>(static_cast<const char*>(nul) - bytes);
+        m_HasEnded = true;
+    }
+    m_Rest = std::string_view(m_Bytes).substr(0, left + count);
 }
 
 std::string_view TextWindow::Document() {
@@ -38,13 +40,6 @@ std::string_view TextWindow::Document() {
         // One that ends with the window may go on behind it; to look there may move the window.
     } while (length == m_Rest.size() && Reaches(length + 1));
     return m_Rest.substr(0, length);
-}
-
-std::string TextWindow::TakeBytes() {
-    std::string bytes(m_Rest.data(), m_Rest.size() + m_Behind);
-    while (const std::size_t count = m_Source(m_Bytes.data(), m_Bytes.size()))
-        bytes.append(m_Bytes, 0, count);
-    return bytes;
 }
 
 } // namespace ovrin_yaml

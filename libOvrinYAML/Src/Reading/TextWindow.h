@@ -27,9 +27,6 @@ public:
     void Skip(std::size_t length) { m_Rest.remove_prefix(length); }
     /// The document of an object file that begins here, as far as FindDocumentEnd.
     std::string_view Document();
-    /// Reads all that is left of the file, that behind a NUL too. Nothing can be read of the window
-    /// afterwards.
-    std::string TakeBytes();
 
 private:
     void ReadMore(std::size_t wanted);
@@ -37,7 +34,6 @@ private:
     ByteSource m_Source;
     std::string m_Bytes; // those read last
     std::string_view m_Rest;
-    std::size_t m_Behind = 0; // bytes behind it that are no text: a NUL and what follows
     bool m_HasEnded = false;
 };
 

@@ -14,10 +14,10 @@ struct InputFile {
     /// Bytes; 0 if that can't be told beforehand. Such a file may be a pipe: `take` is called on a thread of
     /// its own then.
     std::size_t size;
-    /// Gives the bytes of the whole file. Called once, on any thread; may throw.
+    /// Gives the bytes of the whole file. Called once at most, on any thread; may throw.
     std::function<std::string()> take;
-    /// Where there is one, begins to read the file from its start, which then takes the place of `take`: for
-    /// a file that needn't be in memory as a whole. Called once, on any thread; may throw.
+    /// Where there is one, begins to read the file from its start, for those who need not have it in memory
+    /// as a whole: `take` may still be called afterwards. On any thread; may throw.
     std::function<ByteSource()> open = {};
 };
 

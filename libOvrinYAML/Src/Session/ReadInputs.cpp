@@ -1,5 +1,6 @@
 #include "Session/ReadInputs.h"
 
+#include "Reading/ObjectFile.h"
 #include "Repair/ObjectTraits.h"
 #include "Session/MergeError.h"
 #include "Session/StageWatcher.h"
@@ -55,10 +56,9 @@ struct FileInWork {
     /// Afterwards, and when the first file is cut.
     void CutAlong(ObjectFile& first) {
         Try([&] {
-            if (input.open)
-                file.TakeAlong(input.open(), first);
-            else
-                file.Cut(&first);
+            if (input.open && file.TakeAlong(input.open(), first)) return;
+            if (input.open) file.Take(input.take());
+            file.Cut(&first);
         });
     }
 

@@ -1,8 +1,9 @@
 #pragma once
 
-#include "Reading/ObjectFile.h"
+#include "Reading/ReaderOptions.h"
 #include "Session/InputFile.h"
 #include "Session/Thread.h"
+#include "Values/OvrinObjects.h"
 
 #include <vector>
 
