@@ -157,6 +157,8 @@ std::string FileEdits::Value() {
 void FileEdits::Edit(std::span<std::string> files) {
     if (Below(12) == 0)
         EditFrame(files[Below(files.size())]);
+    else if (files.size() > 1 && Below(8) == 0)
+        ShareObject(files);
     else
         EditLines(files);
 }
@@ -203,6 +205,26 @@ void FileEdits::PutInTwins(std::span<std::string> files, std::string_view line) 
         if (inBlock) value = AsBlock(value, IndentOf(line) + 2);
         AtLine({&file, 1}, line,
                [&](std::string& text, Block block) { Replace(text, block, WithValue(line, value)); });
+    }
+}
+
+/// Gives all files an object of one of them, in the place of theirs or behind all: edits leave ever less that
+/// is the same in all of them, which is read in a way of its own.
+void FileEdits::ShareObject(std::span<std::string> files) {
+    const std::string from = files[Below(files.size())];
+    auto headers = LinesOf(from);
+    std::erase_if(headers, [](std::string_view line) { return !IsHeader(line); });
+    if (headers.empty()) return;
+    const std::string_view header = headers[Below(headers.size())];
+    const Block block = BlockAt(from, static_cast<std::size_t>(header.data() - from.data()));
+    const std::string object = from.substr(block.begin, block.end - block.begin);
+    for (std::string& file : files) {
+        bool isThere = false;
+        AtLine({&file, 1}, header, [&](std::string& text, Block theirs) {
+            Replace(text, theirs, object);
+            isThere = true;
+        });
+        if (!isThere) file += object;
     }
 }
 

@@ -27,6 +27,7 @@ private:
     std::string Value();
     void EditLines(std::span<std::string> files);
     void PutInTwins(std::span<std::string> files, std::string_view line);
+    void ShareObject(std::span<std::string> files);
     void EditFrame(std::string& file);
 
     std::mt19937 m_Random;

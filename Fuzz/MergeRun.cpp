@@ -145,7 +145,7 @@ MergeOutcome RunMerge(const MergeWay& way) {
     try {
         (way.sessions == Sessions::One ? MergeInOneSession : MergeInSessions)(way, outcome);
     } catch (const YAMLError& error) {
-        outcome.failure = error.what();
+        outcome.failure = error.what() + ", at " + error.Object() + ":" + std::to_string(error.Line());
     } catch (const YAMLError* error) { // of a cycle that can't be broken
         outcome.failure = "cycle: " + error->what();
     } catch (const BrokenTree& fault) {

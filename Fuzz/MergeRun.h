@@ -12,7 +12,7 @@ namespace ovrin_fuzz {
 
 /// All that a merge gives.
 struct MergeOutcome {
-    std::string failure;    // "none", or what was thrown
+    std::string failure;    // "none", or what was thrown and its place
     std::string brokenTree; // the first fault of CheckTree, and after which stage; empty if there was none
     std::string report;     // with the decisions that were no conflicts
     std::string result;

@@ -22,6 +22,8 @@ ExitStatus HandleDiffCommand(DiffConfig& config) {
     TimerStat timer(root, "Output diff");
     // The text is complete before the destination is touched: an object that can't be shown ends the command.
     std::ostringstream text;
+    // A stream keeps to itself that memory is lacking, unless it is told not to.
+    text.exceptions(std::ios_base::badbit);
     text << "Diff '" << config.leftFile << "' vs. '" << config.rightFile << "':\n";
     ovrin_yaml::YAMLDiffOutput output(text, kIndentWidth);
     ovrin_yaml::OutputDiff(session.LeftDiff(), output);

@@ -48,6 +48,8 @@ ExitStatus HandleStripCommand(StripConfig& config) {
     // The text is complete before the destination is touched: an object that can't be written ends the
     // command.
     std::ostringstream text;
+    // A stream keeps to itself that memory is lacking, unless it is told not to.
+    text.exceptions(std::ios_base::badbit);
     Output(session.LeftObjects(), text);
     const int error =
         Deliver(config.destFile, {text.view().size(), [&](std::ostream& stream) { stream << text.view(); }});

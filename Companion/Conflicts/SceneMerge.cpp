@@ -187,6 +187,8 @@ void SceneMerge::BreakLoops(std::vector<RecordResolve> decisions, Side take) {
 
 std::string SceneMerge::Result() const {
     std::ostringstream stream;
+    // A stream keeps to itself that memory is lacking, unless it is told not to.
+    stream.exceptions(std::ios_base::badbit);
     WithFailures([&] { Output(m_Session.Result(), stream); });
     return std::move(stream).str();
 }

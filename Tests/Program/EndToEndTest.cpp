@@ -186,12 +186,34 @@ TEST_F(BadInput, MoreThanTheMemoryIsTold) {
 #if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
     GTEST_SKIP() << "sanitizers need more memory than the test leaves";
 #endif
-    directory.Run("truncate -s 300M left.ovrin");
+    directory.Run("truncate -s 300M base.ovrin");
     for (const char* command : {"merge --fallback none base.ovrin left.ovrin right.ovrin dest.ovrin",
                                 "diff base.ovrin left.ovrin dest.ovrin"}) {
         EXPECT_EQ(directory.Run(std::string("ulimit -v 200000; \"$OVRIN\" ") + command), 1) << command;
         EXPECT_EQ(directory.Read("stderr"), "Out of memory\n") << command;
         EXPECT_EQ(directory.Read("dest.ovrin"), "untouched\n");
+    }
+}
+
+TEST_F(BadInput, LittleMemoryCutsNothingOff) {
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+    GTEST_SKIP() << "sanitizers need more memory than the test leaves";
+#endif
+    for (const std::string name : {"base", "left"}) {
+        std::string text = "%YAML 1.1\n%TAG !o! tag:ovrin.dev,2011:\n";
+        for (int id = 1; id < 3000; ++id)
+            text += "--- !o!1 &" + std::to_string(id) + "\nA: " + name + std::string(3000, 'x') + "\n";
+        directory.Write(name + ".ovrin", text);
+    }
+    for (const std::string command : {"strip", "diff"}) {
+        EXPECT_EQ(directory.Run("\"$OVRIN\" " + command + " base.ovrin left.ovrin whole"), 0);
+        for (int kilobytes = 30000; kilobytes < 110000; kilobytes += 4000) {
+            directory.Write("dest.ovrin", "untouched\n");
+            const int status = directory.Run("ulimit -v " + std::to_string(kilobytes) + "; \"$OVRIN\" " +
+                                             command + " --nothreads base.ovrin left.ovrin dest.ovrin");
+            EXPECT_TRUE(directory.Read("dest.ovrin") == (status ? "untouched\n" : directory.Read("whole")))
+                << command << kilobytes;
+        }
     }
 }
 

@@ -1,3 +1,4 @@
+#include "Diff/YAMLMappingDiff.h"
 #include "Repair/ObjectTraits.h"
 #include "Repair/UnbuiltReferences.h"
 #include "Session/MergeSession.h"
@@ -67,6 +68,16 @@ struct UnbuiltTest : testing::Test {
         }
     }
 
+    /// What goes wrong in a step, and where.
+    template <class Step> static std::string Failure(const Step& step) {
+        try {
+            step();
+        } catch (const MergeError& error) {
+            return error.what() + ", " + error.Object() + ", " + std::to_string(error.Line());
+        }
+        return "none";
+    }
+
     std::string shared, base, left, right;
     std::size_t step = 0;
 };
@@ -111,7 +122,7 @@ TEST_F(UnbuiltTest, AnIDThatMovedIsFollowedInTheBytes) {
 
 /// A Transform of a prefab instance, which has to name it.
 TEST_F(UnbuiltTest, AStrippedTransformWithoutALinkIsAFailureStill) {
-    const auto failure = [this](bool recognise) { return ErrorOf([&] { Merge(recognise); }); };
+    const auto failure = [this](bool recognise) { return Failure([&] { Merge(recognise); }); };
     shared = "--- !o!4 &1 stripped\nTransform:\n  m_PrefabInstance: {fileID: 7}\n";
     EXPECT_EQ(failure(true), "none");
     shared += "--- !o!4 &2 stripped\nTransform:\n  m_Other: {fileID: 7}\n";
@@ -121,14 +132,7 @@ TEST_F(UnbuiltTest, AStrippedTransformWithoutALinkIsAFailureStill) {
 
 /// Where most is shared only the rest of left and right is kept, and a failure needs the whole.
 TEST_F(UnbuiltTest, FailuresHaveTheirPlaceInTheWholeFile) {
-    const auto place = [this](bool recognise) {
-        try {
-            Read(recognise);
-        } catch (const MergeError& error) {
-            return error.what() + ", " + error.Object() + ", " + std::to_string(error.Line());
-        }
-        return std::string("none");
-    };
+    const auto place = [this](bool recognise) { return Failure([&] { Read(recognise); }); };
     for (int id = 10; id < 60; ++id) shared += Transform(id, 0);
     left = "--- !o!1 &1\nA: 1\n--- !o!1 &2\nA: [\n" + Transform(3, 0);
     step = 100;
@@ -153,7 +157,8 @@ TEST_F(UnbuiltTest, FilesThatHaveNothingInCommonWithTheBaseAreReadWhole) {
     std::string otherHeader = ObjectText(shared), later = ObjectText(shared + Transform(2, 0));
     otherHeader.replace(otherHeader.find("tag:"), 4, "tag:other.");
     for (const std::string& file :
-         {otherHeader, std::string("no signature"), std::string(), ObjectText(""), later,
+         {otherHeader, std::string("no signature"), std::string(1, '\0') + later,
+          std::string(5, '\0') + later, std::string(), ObjectText(""), later,
           later + '\0' + "--- !o!1 &3\nA: [\n", "\xEF\xBB\xBF" + later, ObjectText(shared).substr(0, 30)})
         for (const std::size_t bytes : {1, 10, 1000})
             EXPECT_EQ(readSide(file, bytes), readSide(file, 0)) << file;
@@ -165,6 +170,22 @@ TEST_F(UnbuiltTest, WhatMayNotBeSharedIsReadOfTheBasesBytes) {
     shared += "--- !o!1107 &1\nAnimatorStateMachine:\n  m_StateMachineTransitions:\n    first: {fileID: 1}\n";
     right = Transform(2, 0);
     ExpectBuilt(std::string(50, 'u') + "bb");
+}
+
+/// Its objects are others than the base's, which are compared with them.
+TEST_F(UnbuiltTest, NothingIsUnbuiltBesideAFileOfAnotherHeader) {
+    const std::string object = ObjectText("--- !o!1 &1\na: 1\nb: r27104\n");
+    for (const std::string handle : {"!o!", "!x!"}) {
+        // The hash is the same, and so nothing else is looked at.
+        const std::string other =
+            "%YAML 1.1\n%TAG " + handle + " tag:a,2011:\n--- " + handle + "1 &1\nk: w84188\n";
+        MergeSession session(Threads::None);
+        session.Read({TextInput("base", object), TextInput("left", other), TextInput("right", object)});
+        EXPECT_EQ(Built(session.BaseObjects().GetMapping()), "b");
+        session.Prepare();
+        session.Diff();
+        EXPECT_TRUE(session.LeftDiff().Entries().empty());
+    }
 }
 
 TEST_F(UnbuiltTest, AnyNumberOfThreadsMayAskForAnObject) {

@@ -15,6 +15,12 @@ namespace ovrin_yaml {
 
 namespace {
 
+/// The hash of an object that is unbuilt comes with its tree.
+std::uint32_t HashOf(const YAMLNode& node) {
+    if (const YAMLMapping* mapping = AsMapping(&node)) mapping->NeedTree();
+    return node.m_Hash;
+}
+
 void RequireNormalState(const YAMLNode* node) {
     if (const YAMLMapping* mapping = AsMapping(node)) mapping->RequireNormalState();
 }
@@ -78,13 +84,13 @@ bool ScalarsDiffer(const DiffContext& context, const YAMLScalar* base, const YAM
 
 bool CountAsEqual(const YAMLNode* base, const YAMLNode* dest) {
     if (base == dest) return true;
-    if (!base || !dest || base->m_Hash != dest->m_Hash) return false;
-    if (base->m_Hash != 0) return true;
-    // A rebuilt hash says nothing of repeated keys, and what they hold must not get lost; and who was unbuilt
-    // has a hash only now.
-    RequireNormalState(base);
-    RequireNormalState(dest);
-    return base->m_Hash == dest->m_Hash;
+    if (!base || !dest || HashOf(*base) != HashOf(*dest)) return false;
+    // A rebuilt hash says nothing of repeated keys, and what they hold must not get lost.
+    if (base->m_Hash == 0) {
+        RequireNormalState(base);
+        RequireNormalState(dest);
+    }
+    return true;
 }
 
 const Operation* CreateDiffOperation(DiffContext& context, const YAMLNode* base, const YAMLNode* dest) {

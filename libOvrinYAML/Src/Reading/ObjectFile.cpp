@@ -73,11 +73,14 @@ bool ObjectFile::TakeAlong(ByteSource source, ObjectFile& base) {
     const bool hasItsHeader = window.Reaches(base.m_Header.size() + kDocumentStart.size()) &&
                               window.Rest().starts_with(base.m_Header) &&
                               window.Rest().substr(base.m_Header.size()).starts_with(kDocumentStart);
-    if (hasItsHeader) CutAlong(base, window);
-    return hasItsHeader;
+    if (!hasItsHeader) return false;
+    BecomeTakerOf(base);
+    CutAlong(base, window);
+    return true;
 }
 
 void ObjectFile::Cut(ObjectFile* base) {
+    if (base) BecomeTakerOf(*base);
     if (!m_Options.fast || !HasWrittenHeader(*m_Text)) return;
     if (base && MayShareWith(*base) && m_Header == base->m_Header) {
         const auto text = m_Text;
@@ -87,6 +90,11 @@ void ObjectFile::Cut(ObjectFile* base) {
         CutAlone();
         if (m_Options.recognise) m_Maker = std::make_shared<DocumentTreeMaker>(m_Text);
     }
+}
+
+/// A file that then can't be cut along the base wants none of its documents.
+void ObjectFile::BecomeTakerOf(ObjectFile& base) {
+    m_TakerBit = static_cast<std::uint8_t>(1u << base.m_TakerCount++);
 }
 
 /// Whether documents of a file that is cut may be shared.
@@ -129,7 +137,6 @@ bool ObjectFile::StandsAt(const Document& document, TextWindow& window) {
 /// search. What doesn't stand there is kept.
 void ObjectFile::CutAlong(ObjectFile& base, TextWindow& window) {
     m_Base = &base;
-    m_TakerBit = static_cast<std::uint8_t>(1u << base.m_TakerCount++);
     const std::vector<Document>& known = base.m_Documents;
     ReserveDocuments(known.size());
     std::string own;

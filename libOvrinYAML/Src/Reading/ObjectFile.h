@@ -88,6 +88,7 @@ private:
 
     static std::string_view FileIDOf(const Document& document);
     const char* End() const { return m_Text->data() + m_Text->size(); }
+    void BecomeTakerOf(ObjectFile& base);
     bool MayShareWith(const ObjectFile& base) const;
     static bool StandsAt(const Document& document, TextWindow& window);
     std::size_t FindLender(std::string_view document, std::size_t& expected) const;
@@ -114,7 +115,7 @@ private:
     OvrinObjects& m_Objects;
     const ReaderOptions m_Options;
     ObjectFile* m_Base = nullptr;
-    std::atomic<unsigned> m_TakerCount = 0;    // files that are cut along this one
+    std::atomic<unsigned> m_TakerCount = 0;    // files to be cut along this one
     std::uint8_t m_TakerBit = 0;               // of this one among those of the base
     std::shared_ptr<const std::string> m_Text; // the documents of its own alone, or the whole
     std::size_t m_Length = 0;                  // of the whole

@@ -24,21 +24,20 @@ void TextWindow::ReadMore(std::size_t wanted) {
     if (wanted > m_Bytes.size()) m_Bytes.resize(std::max(wanted, 2 * m_Bytes.size()));
     char* const bytes = m_Bytes.data() + left;
     std::size_t count = m_Source(bytes, m_Bytes.size() - left);
-    m_HasEnded = count == 0;
-    if (const void* nul = std::memchr(bytes, '\0', count)) {
-        count = static_cast<std::size_t>(static_cast<const char*>(nul) - bytes);
-        m_HasEnded = true;
-    }
+    const void* const nul = std::memchr(bytes, '\0', count);
+    m_HasEnded = count == 0 || nul;
+    if (nul) count = static_cast<std::size_t>(static_cast<const char*>(nul) - bytes);
     m_Rest = std::string_view(m_Bytes).substr(0, left + count);
 }
 
 std::string_view TextWindow::Document() {
-    const char* end = nullptr;
+    std::size_t length = 0;
     do {
-        end = FindDocumentEnd(m_Rest.data(), m_Rest.data() + m_Rest.size());
-        // One that ends with the window may go on behind it.
-    } while (end == m_Rest.data() + m_Rest.size() && Reaches(m_Rest.size() + 1));
-    return {m_Rest.data(), end};
+        const char* const begin = m_Rest.data();
+        length = static_cast<std::size_t>(FindDocumentEnd(begin, begin + m_Rest.size()) - begin);
+        // One that ends with the window may go on behind it; to look there may move the window.
+    } while (length == m_Rest.size() && Reaches(length + 1));
+    return m_Rest.substr(0, length);
 }
 
 } // namespace ovrin_yaml

@@ -130,6 +130,11 @@ public:
     static YAMLMapping* CreateUnbuilt(std::string_view source, TreeMaker& maker);
     /// Whether the tree is there: who can do without it may spare its cost.
     bool IsBuilt() const { return !(State() & kUnbuilt); }
+    /// Builds the tree if it isn't there, for who reads m_Hash or m_Line; all that asks for pairs does so.
+    void NeedTree() const {
+        if (!IsBuilt()) [[unlikely]]
+            BuildTree();
+    }
     /// The values, in the order of RawEntries.
     YAMLNode** Values() {
         NeedTree();
@@ -242,10 +247,6 @@ private:
 
     /// What is there for threads that see the tree as built.
     std::uint8_t State() const { return __atomic_load_n(&m_State, __ATOMIC_ACQUIRE); }
-    void NeedTree() const {
-        if (!IsBuilt()) [[unlikely]]
-            BuildTree();
-    }
     void BuildTree() const;
     void TakeTree(YAMLMapping& tree);
 
