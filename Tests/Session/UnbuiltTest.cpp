@@ -157,7 +157,8 @@ TEST_F(UnbuiltTest, FilesThatHaveNothingInCommonWithTheBaseAreReadWhole) {
     std::string otherHeader = ObjectText(shared), later = ObjectText(shared + Transform(2, 0));
     otherHeader.replace(otherHeader.find("tag:"), 4, "tag:other.");
     for (const std::string& file :
-         {otherHeader, std::string("no signature"), std::string(), ObjectText(""), later,
+         {otherHeader, std::string("no signature"), std::string(1, '\0') + later,
+          std::string(5, '\0') + later, std::string(), ObjectText(""), later,
           later + '\0' + "--- !o!1 &3\nA: [\n", "\xEF\xBB\xBF" + later, ObjectText(shared).substr(0, 30)})
         for (const std::size_t bytes : {1, 10, 1000})
             EXPECT_EQ(readSide(file, bytes), readSide(file, 0)) << file;

@@ -24,11 +24,9 @@ void TextWindow::ReadMore(std::size_t wanted) {
     if (wanted > m_Bytes.size()) m_Bytes.resize(std::max(wanted, 2 * m_Bytes.size()));
     char* const bytes = m_Bytes.data() + left;
     std::size_t count = m_Source(bytes, m_Bytes.size() - left);
-    m_HasEnded = count == 0;
-    if (const void* nul = std::memchr(bytes, '\0', count)) {
-        count = static_cast<std::size_t>(static_cast<const char*>(nul) - bytes);
-        m_HasEnded = true;
-    }
+    const void* const nul = std::memchr(bytes, '\0', count);
+    m_HasEnded = count == 0 || nul;
+    if (nul) count = static_cast<std::size_t>(static_cast<const char*>(nul) - bytes);
     m_Rest = std::string_view(m_Bytes).substr(0, left + count);
 }
 
