@@ -126,7 +126,7 @@ private:
     std::vector<Piece> m_Pieces;
     AliasBudget m_AliasBudget;
 
-    // File id to document, for the files to be cut along this one; made by the first that asks.
+    // File id to document, for the files that are cut along this one; made by the first that asks.
     mutable std::mutex m_IndexLock;
     mutable std::unordered_map<std::string_view, std::size_t, SeededHash> m_Index;
 };
