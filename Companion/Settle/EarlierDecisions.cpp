@@ -120,6 +120,8 @@ void EarlierDecisions::Read() {
 
 void EarlierDecisions::ReadLines(const std::string& text) {
     std::istringstream lines(text);
+    // A stream takes a lack of memory for the end of the text, unless it is told not to.
+    lines.exceptions(std::ios_base::badbit);
     std::string line;
     std::getline(lines, line);
     if (!line.starts_with(kBeginning)) throw Failure("another version may have written it");
