@@ -53,6 +53,8 @@ MergeRules SetupRules(const std::string& rulesFile) {
     if (ReadWholeFile(path, text) != ReadResult::Complete)
         throw YAMLError("Cannot open rules file for reading:" + path);
     std::istringstream stream(std::move(text));
+    // It would take a lack of memory for the end of the text.
+    stream.exceptions(std::ios_base::badbit);
     MergeRules rules;
     LoadSequenceUniqueKeys(stream, rules);
     return rules;

@@ -49,6 +49,8 @@ bool ReadResolveFile(TimerStat& root, const MergeConfig& config, std::vector<Rec
         return false;
     }
     std::istringstream stream(std::move(text));
+    // It would take a lack of memory for the end of the text.
+    stream.exceptions(std::ios_base::badbit);
     decisions = ReadDecisions(stream);
     return true;
 }

@@ -72,6 +72,8 @@ std::vector<Decision> ReadDecisionFile(const std::string& file) {
     if (ReadWholeFile(file, text) != ReadResult::Complete)
         throw Failure("The file of decisions " + Printable(file) + " can't be read");
     std::istringstream stream(std::move(text));
+    // It would take a lack of memory for the end of the text.
+    stream.exceptions(std::ios_base::badbit);
     std::vector<Decision> decisions;
     try {
         for (const RecordResolve& resolve : ReadDecisions(stream))
