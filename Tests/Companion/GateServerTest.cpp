@@ -113,7 +113,7 @@ bool IsAnswer(const std::string& answer, const std::string& status, const std::s
 }
 
 TEST_F(GateServerTest, ModelHearsWhatWasAskedAndNothingElse) {
-    const std::string bytes("{\r\n\r\n\0\xff\"GET / HTTP/1.1\r\n\r\n", 28);
+    const std::string bytes("{\r\n\r\n\0\xff\"GET / HTTP/1.1\r\n\r\n", 26);
     const std::pair<std::string, WebFrame> requests[] = {
         {Request("GET", ""), {"request", "GET", "", ""}},
         {Request("GET", "api/x?b=2&a=%00%FF%26&c"),
