@@ -14,6 +14,7 @@
 
 #include "Merge/ConflictReport.h"
 #include "Session/MergeSession.h"
+#include "Session/Tasks.h"
 #include "Writing/ObjectFileWriter.h"
 
 #include <iostream>
@@ -78,9 +79,11 @@ int OutputConflicts(TimerStat& root, const MergeConfig& config, const RecordingC
     return config.conflictFile.empty() && config.destFile.empty() ? error : 0;
 }
 
-int OutputResult(TimerStat& root, const std::string& path, const OvrinObjects& result) {
+int OutputResult(TimerStat& root, const MergeConfig& config, const std::string& path,
+                 const OvrinObjects& result) {
     TimerStat timer(root, "Output result");
-    return WriteOutput(path, [&](std::ostream& stream) { Output(result, stream); });
+    return WriteOutput(
+        path, [&](std::ostream& stream) { Output(result, stream, RunnerFor(ThreadsOf(config.useThreads))); });
 }
 
 /// Premerged files that can't be written are lost without a word where nobody is to work on them. Returns
@@ -115,7 +118,7 @@ ExitStatus HandleMergeCommand(const MergeConfig& config, const std::string& outp
     { TimerStat timer(root, "Cloning base roots"); }
     ApplyMergedChanges(root, config, session);
     if (const int error = OutputConflicts(root, config, session.Resolver())) return FailToWrite({}, error);
-    if (const int error = OutputResult(root, outputPath, session.Result()))
+    if (const int error = OutputResult(root, config, outputPath, session.Result()))
         return FailToWrite(outputPath, error);
     if (!session.Resolver().HasPendingConflicts()) return ExitStatus::Done;
     if (UseOfBase(config) == MergeSession::Base::Kept &&

@@ -1,3 +1,4 @@
+#include "ErrorOf.h"
 #include "Support/Trees.h"
 #include "Values/OvrinObjects.h"
 #include "Writing/ObjectFileWriter.h"
@@ -155,9 +156,9 @@ protected:
     }
 
     /// Everything behind the header lines, whose tag authority belongs to the build.
-    static string Body(const OvrinObjects& objects) {
+    static std::string Body(const OvrinObjects& objects, const TaskRunner& run = {}) {
         std::ostringstream stream;
-        Output(objects, stream);
+        Output(objects, stream, run);
         const string text = stream.str();
         const std::size_t end = text.find(",2011:\n");
         EXPECT_TRUE(text.starts_with("%YAML 1.1\n%TAG !o! tag:") && end != string::npos);
@@ -204,6 +205,25 @@ TEST_F(ObjectFileWriter, RefusesObjectsWithoutClassOrWithRepeatedKeys) {
     m_Objects.GetMapping().Clear();
     Add("12", {{"A", "1"}, {"MERGE_FileID", "12"}});
     EXPECT_EQ(problem(), "Object has no class id: 12");
+}
+
+TEST_F(ObjectFileWriter, ManyObjectsAreTheSameInWhateverOrderTheyAreWritten) {
+    std::size_t runs = 0;
+    const TaskRunner backwards = [&](std::size_t count, const std::function<void(std::size_t)>& task) {
+        for (++runs; count > 0;) task(--count);
+    };
+    YAMLMapping& root = m_Objects.GetMapping();
+    for (int i = 0; i < 20000; ++i) {
+        Add(IntToString(i), {{"A", std::string_view(IntToString(i))}, {"MERGE_ClassID", "1"}});
+        if (i % 7 == 0) AsMapping(root.Get(IndexScalar(i)))->SetSource("--- !o!1 &0\nB: 1\n");
+    }
+    for (const int i : {0, 255, 256, 19999}) root.Remove(IndexScalar(i));
+    const string expected = Body(m_Objects);
+    EXPECT_TRUE(Body(m_Objects, backwards) == expected);
+    EXPECT_EQ(runs, 3u);
+    for (const int i : {15000, 9001, 9000})
+        ToMapping(root.GetForChange(IndexScalar(i))).Remove(YAMLScalar::classIDPlaceHolderName);
+    EXPECT_EQ(failures::ErrorOf([&] { Body(m_Objects, backwards); }), "Object has no class id: 9000");
 }
 
 TEST_F(ObjectFileWriter, CloneIsACopyOfItsOwn) {

@@ -25,6 +25,11 @@ public:
     /// The text, which stands right behind the object.
     std::string_view Value() const { return {reinterpret_cast<const char*>(this + 1), m_Length}; }
 
+    /// Room for what a writer finds out about the text, so that it need not be looked at again; 0: nothing
+    /// yet. All who write it must mean the same, since any thread may.
+    std::uint8_t WriterMemo() const { return __atomic_load_n(&m_WriterMemo, __ATOMIC_RELAXED); }
+    void SetWriterMemo(std::uint8_t memo) const { __atomic_store_n(&m_WriterMemo, memo, __ATOMIC_RELAXED); }
+
     /// The text as a decimal number as a stream in the "C" locale reads it: what does not begin with a number
     /// is 0, what stands behind the number is ignored, and what is out of range is the nearest limit.
     int GetIntValue() const;
@@ -79,6 +84,7 @@ private:
         m_Line = line;
     }
 
+    mutable std::uint8_t m_WriterMemo = 0;
     const std::uint32_t m_Length;
 };
 

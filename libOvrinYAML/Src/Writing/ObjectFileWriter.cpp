@@ -4,6 +4,9 @@
 #include "Writing/WrittenForm.h"
 #include "Writing/YAMLEmitter.h"
 
+#include <algorithm>
+#include <array>
+#include <exception>
 #include <ostream>
 #include <vector>
 
@@ -11,11 +14,59 @@ namespace ovrin_yaml {
 
 namespace {
 
-/// Text is handed to the stream in pieces of about this size: big enough to make calls cheap, small enough
-/// to stay in the cache.
-constexpr std::size_t kPieceSize = std::size_t{1} << 20;
-
 constexpr std::string_view kTagAuthority = OVRIN_TAG_AUTHORITY;
+
+/// Hands text to a stream in pieces that make calls cheap. Untouched objects that are neighbours in the file
+/// that was read go out as one range of its bytes, and a long range isn't copied on the way.
+class Pieces {
+public:
+    explicit Pieces(std::ostream& stream) : m_Stream(stream) {}
+
+    /// Where text is appended that stands behind all that was put so far.
+    std::string& Own() {
+        EndRange();
+        if (m_Own.size() >= kPieceSize) WriteOwn();
+        return m_Own;
+    }
+    /// Takes bytes that stay until Flush.
+    void Put(std::string_view bytes) {
+        if (m_Range.data() + m_Range.size() == bytes.data()) {
+            m_Range = {m_Range.data(), m_Range.size() + bytes.size()};
+        } else {
+            EndRange();
+            m_Range = bytes;
+        }
+    }
+    void Flush() {
+        EndRange();
+        WriteOwn();
+    }
+
+private:
+    static constexpr std::size_t kPieceSize = std::size_t{1} << 18;
+    static constexpr std::size_t kLongRange = std::size_t{1} << 14;
+
+    void EndRange() {
+        if (m_Range.size() < kLongRange) {
+            m_Own += m_Range;
+        } else {
+            WriteOwn();
+            Write(m_Range);
+        }
+        m_Range = {};
+    }
+    void WriteOwn() {
+        Write(m_Own);
+        m_Own.clear();
+    }
+    void Write(std::string_view text) {
+        m_Stream.write(text.data(), static_cast<std::streamsize>(text.size()));
+    }
+
+    std::ostream& m_Stream;
+    std::string m_Own;
+    std::string_view m_Range; // behind m_Own
+};
 
 void AppendHeaderLine(const YAMLScalar& rootKey, const YAMLMapping& object, std::string& text) {
     const YAMLScalar* fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
@@ -46,24 +97,83 @@ void AppendObject(const YAMLScalar& rootKey, const YAMLMapping& object, std::str
     text.push_back('\n');
 }
 
+namespace {
+
+/// Whether it is worth the while to write objects on several threads.
+bool AreManyChanged(const YAMLMapping::Pairs& entries) {
+    constexpr std::size_t kMany = 1000;
+    std::size_t count = 0;
+    for (const YAMLMapping::Entry entry : entries)
+        if (const YAMLMapping* object = AsMapping(entry.value); object && object->Source().empty()) ++count;
+    return count >= kMany && count >= entries.size() / 8;
+}
+
+/// A few of many objects that are written one behind the other.
+struct Group {
+    std::string text;
+    std::exception_ptr failure; // at the object behind the text
+
+    void Write(const YAMLMapping::Pairs& entries, std::size_t first, std::size_t end) {
+        text.clear();
+        failure = nullptr;
+        try {
+            for (std::size_t i = first; i < end; ++i) {
+                if (!entries[i].key) continue;
+                const YAMLMapping& object = ToMapping(entries[i].value);
+                if (!object.Source().empty())
+                    text += object.Source();
+                else
+                    AppendObject(*entries[i].key, object, text);
+            }
+        } catch (...) {
+            failure = std::current_exception();
+        }
+    }
+};
+
+/// Writes groups of objects at the same time: so many that the threads have enough to do, and so few that
+/// little waits in memory. The first failure in the order of the objects is the one that is thrown.
+void PutInGroups(const YAMLMapping::Pairs& entries, Pieces& pieces, const TaskRunner& run) {
+    constexpr std::size_t kGroupSize = 256;
+    std::array<Group, 32> groups;
+    for (std::size_t first = 0; first < entries.size(); first += groups.size() * kGroupSize) {
+        const std::size_t left = entries.size() - first;
+        const std::size_t count = std::min(groups.size(), (left + kGroupSize - 1) / kGroupSize);
+        run(count, [&](std::size_t i) {
+            const std::size_t begin = first + i * kGroupSize;
+            groups[i].Write(entries, begin, std::min(begin + kGroupSize, entries.size()));
+        });
+        for (std::size_t i = 0; i < count; ++i) {
+            if (groups[i].failure) std::rethrow_exception(groups[i].failure);
+            pieces.Own() += groups[i].text;
+        }
+    }
+}
+
+} // namespace
+
 std::string_view TagAuthority() {
     return kTagAuthority;
 }
 
-void Output(const OvrinObjects& objects, std::ostream& stream) {
-    std::string text(kFileHeaderStart);
-    text.append(kTagAuthority).append(kFileHeaderEnd);
-    for (const YAMLMapping::Entry entry : objects.GetMapping()) {
-        const YAMLMapping& object = ToMapping(entry.value);
-        if (!object.Source().empty())
-            text += object.Source();
-        else
-            AppendObject(*entry.key, object, text);
-        if (text.size() < kPieceSize) continue;
-        stream.write(text.data(), static_cast<std::streamsize>(text.size()));
-        text.clear();
+void Output(const OvrinObjects& objects, std::ostream& stream, const TaskRunner& run) {
+    objects.GetMapping().RequireNormalState();
+    const YAMLMapping::Pairs entries = objects.GetMapping().RawEntries();
+    Pieces pieces(stream);
+    pieces.Own().append(kFileHeaderStart).append(kTagAuthority).append(kFileHeaderEnd);
+    if (run && AreManyChanged(entries)) {
+        PutInGroups(entries, pieces, run);
+    } else {
+        for (const YAMLMapping::Entry entry : entries) {
+            if (!entry.key) continue;
+            const YAMLMapping& object = ToMapping(entry.value);
+            if (!object.Source().empty())
+                pieces.Put(object.Source());
+            else
+                AppendObject(*entry.key, object, pieces.Own());
+        }
     }
-    stream.write(text.data(), static_cast<std::streamsize>(text.size()));
+    pieces.Flush();
     stream.flush();
 }
 

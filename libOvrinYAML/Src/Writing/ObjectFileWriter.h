@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Values/OvrinObjects.h"
+#include "Values/TaskRunner.h"
 
 #include <iosfwd>
 #include <string>
@@ -21,6 +22,7 @@ std::string_view TagAuthority();
 
 /// Writes an object file as the editor does. Throws YAMLError "Object has no class id: " and the id's text
 /// when an object lost the entry, and the duplicate-keys text when an object holds repeated keys at its top.
-void Output(const OvrinObjects& objects, std::ostream& stream);
+/// Where there is a `run`, it is for many objects that were changed.
+void Output(const OvrinObjects& objects, std::ostream& stream, const TaskRunner& run = {});
 
 } // namespace ovrin_yaml

@@ -1,5 +1,6 @@
 #include "Writing/ScalarStyle.h"
 
+#include "Values/YAMLScalar.h"
 #include "Writing/WrittenForm.h"
 
 namespace ovrin_yaml {
@@ -52,6 +53,25 @@ ScalarForms ClassifyScalar(std::string_view text) {
     indicator |= text.back() == ':';
     forms.plainInBlock = !indicator;
     forms.plainInFlow = !indicator && !(seen & kFlowIndicator) && !(seen & kColon);
+    return forms;
+}
+
+ScalarForms FormsOf(const YAMLScalar& scalar) {
+    enum Memo : std::uint8_t {
+        kKnown = 1,
+        kPlainInBlock = 2,
+        kPlainInFlow = 4,
+        kSingleQuoted = 8,
+        kLineBreaks = 16
+    };
+    const unsigned memo = scalar.WriterMemo();
+    if (memo)
+        return {(memo & kPlainInBlock) != 0, (memo & kPlainInFlow) != 0, (memo & kSingleQuoted) != 0,
+                (memo & kLineBreaks) != 0};
+    const ScalarForms forms = ClassifyScalar(scalar.Value());
+    scalar.SetWriterMemo(static_cast<std::uint8_t>(
+        kKnown | (forms.plainInBlock ? kPlainInBlock : 0) | (forms.plainInFlow ? kPlainInFlow : 0) |
+        (forms.singleQuoted ? kSingleQuoted : 0) | (forms.lineBreaks ? kLineBreaks : 0)));
     return forms;
 }
 

@@ -4,6 +4,8 @@
 
 namespace ovrin_yaml {
 
+class YAMLScalar;
+
 /// What a scalar's text allows. Double quotes are always allowed.
 struct ScalarForms {
     bool plainInBlock = true;
@@ -16,5 +18,7 @@ struct ScalarForms {
 
 /// Classifies a text, in time linear in its length. The empty text is plain in block context only.
 ScalarForms ClassifyScalar(std::string_view text);
+/// The same for a scalar, which remembers it: keys and many values are written again and again.
+ScalarForms FormsOf(const YAMLScalar& scalar);
 
 } // namespace ovrin_yaml

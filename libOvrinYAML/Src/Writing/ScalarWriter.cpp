@@ -117,4 +117,14 @@ void WriteDoubleQuoted(TextOutput& output, std::string_view text, Folding foldin
     output.Put('"');
 }
 
+void WriteScalar(TextOutput& output, std::string_view text, ScalarForms forms, bool plainAllowed,
+                 Folding folding) {
+    if (plainAllowed)
+        WritePlain(output, text, folding);
+    else if (forms.singleQuoted)
+        WriteSingleQuoted(output, text, folding);
+    else
+        WriteDoubleQuoted(output, text, folding);
+}
+
 } // namespace ovrin_yaml

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Writing/ScalarStyle.h"
 #include "Writing/TextOutput.h"
 
 #include <string_view>
@@ -22,5 +23,9 @@ void WritePlain(TextOutput& output, std::string_view text, Folding folding);
 void WriteSingleQuoted(TextOutput& output, std::string_view text, Folding folding);
 /// All but printable ASCII is escaped, a byte that is no part of valid UTF-8 as if it were a character.
 void WriteDoubleQuoted(TextOutput& output, std::string_view text, Folding folding);
+/// Writes in the first of these styles that is allowed: plain if `plainAllowed`, the quoted ones as the
+/// text's `forms` tell.
+void WriteScalar(TextOutput& output, std::string_view text, ScalarForms forms, bool plainAllowed,
+                 Folding folding);
 
 } // namespace ovrin_yaml

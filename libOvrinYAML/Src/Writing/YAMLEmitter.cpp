@@ -38,10 +38,12 @@ std::string_view TextOf(const YAMLNode& node) {
 
 void YAMLEmitter::EmitDocument(const YAMLNode& root) {
     EmitBlockNode(root, kOutsideRoot, Behind::Nothing);
-    if (root.GetKind() == YAMLNode::Kind::Scalar && ClassifyScalar(TextOf(root)).plainInBlock) {
+    if (root.GetKind() == YAMLNode::Kind::Scalar &&
+        FormsOf(static_cast<const YAMLScalar&>(root)).plainInBlock) {
         m_Output.Break(0);
         m_Output.Put(kDocumentEnd);
     }
+    m_Output.Finish();
 }
 
 void YAMLEmitter::EmitDocument(const Pairs& pairs, bool flow) {
@@ -49,6 +51,7 @@ void YAMLEmitter::EmitDocument(const Pairs& pairs, bool flow) {
         EmitFlowMapping(pairs, kOutsideRoot, Behind::Nothing);
     else
         EmitBlockMapping(pairs, kOutsideRoot, Behind::Nothing);
+    m_Output.Finish();
 }
 
 void YAMLEmitter::EmitBlockNode(const YAMLNode& node, int outer, Behind behind) {
@@ -60,7 +63,7 @@ void YAMLEmitter::EmitBlockNode(const YAMLNode& node, int outer, Behind behind) 
             return EmitBlockSequence(*sequence, outer, behind);
     } else {
         Separate(behind);
-        const ScalarForms forms = ClassifyScalar(TextOf(node));
+        const ScalarForms forms = FormsOf(static_cast<const YAMLScalar&>(node));
         return EmitScalar(TextOf(node), forms, forms.plainInBlock, outer);
     }
     EmitFlowNode(node, outer, behind);
@@ -78,7 +81,7 @@ void YAMLEmitter::EmitBlockMapping(const Pairs& pairs, int outer, Behind behind)
 
 void YAMLEmitter::EmitBlockPair(const YAMLMapping::Entry& pair, int indent) {
     const std::string_view key = pair.key->Value();
-    const ScalarForms forms = ClassifyScalar(key);
+    const ScalarForms forms = FormsOf(*pair.key);
     if (IsSimpleKey(key, forms)) {
         EmitSimpleKey(key, forms, forms.plainInBlock);
         m_Output.Put(':');
@@ -116,7 +119,7 @@ void YAMLEmitter::EmitFlowNode(const YAMLNode& node, int outer, Behind behind) {
         EmitFlowSequence(*sequence, outer, behind);
     } else {
         Separate(behind);
-        const ScalarForms forms = ClassifyScalar(TextOf(node));
+        const ScalarForms forms = FormsOf(static_cast<const YAMLScalar&>(node));
         EmitScalar(TextOf(node), forms, forms.plainInFlow, outer);
     }
 }
@@ -136,7 +139,7 @@ void YAMLEmitter::EmitFlowMapping(const Pairs& pairs, int outer, Behind behind) 
 
 void YAMLEmitter::EmitFlowPair(const YAMLMapping::Entry& pair, int indent, Behind behind) {
     const std::string_view key = pair.key->Value();
-    const ScalarForms forms = ClassifyScalar(key);
+    const ScalarForms forms = FormsOf(*pair.key);
     Separate(behind);
     if (IsSimpleKey(key, forms)) {
         EmitSimpleKey(key, forms, forms.plainInFlow);
@@ -174,23 +177,11 @@ YAMLEmitter::Behind YAMLEmitter::BeginFlowEntry(int indent, bool first) {
 }
 
 void YAMLEmitter::EmitSimpleKey(std::string_view key, ScalarForms forms, bool plainAllowed) {
-    constexpr Folding kNoFolding{false, 0};
-    if (plainAllowed && !key.empty())
-        WritePlain(m_Output, key, kNoFolding);
-    else if (forms.singleQuoted)
-        WriteSingleQuoted(m_Output, key, kNoFolding);
-    else
-        WriteDoubleQuoted(m_Output, key, kNoFolding);
+    WriteScalar(m_Output, key, forms, plainAllowed && !key.empty(), {false, 0});
 }
 
 void YAMLEmitter::EmitScalar(std::string_view text, ScalarForms forms, bool plainAllowed, int outer) {
-    const Folding folding{true, ContinuationIndent(outer)};
-    if (plainAllowed)
-        WritePlain(m_Output, text, folding);
-    else if (forms.singleQuoted)
-        WriteSingleQuoted(m_Output, text, folding);
-    else
-        WriteDoubleQuoted(m_Output, text, folding);
+    WriteScalar(m_Output, text, forms, plainAllowed, {true, ContinuationIndent(outer)});
 }
 
 void YAMLEmitter::Separate(Behind behind) {
