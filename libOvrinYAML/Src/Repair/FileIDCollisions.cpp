@@ -1,5 +1,6 @@
 #include "Repair/FileIDCollisions.h"
 
+#include "Repair/IDFilter.h"
 #include "Repair/ObjectAccess.h"
 #include "Repair/UnbuiltReferences.h"
 #include "Values/AlignedLookup.h"
@@ -102,7 +103,12 @@ void RewriteReferences(const std::vector<NewID>& newIDs, YAMLMapping& root) {
     const auto refersToMoved = [&](const YAMLScalar*, const YAMLMapping& mapping) {
         return rewriter.RefersToMoved(mapping);
     };
-    const auto isMoved = [&](const YAMLScalar* id) { return rewriter.IsMoved(id); };
+    std::vector<const YAMLScalar*> movedIDs;
+    for (const NewID& newID : newIDs) movedIDs.push_back(newID.from);
+    const IDFilter moved(movedIDs);
+    const auto isMoved = [&](std::string_view id) {
+        return moved.MayContain(id) && rewriter.IsMoved(YAMLScalar::Lookup(id));
+    };
     const auto isOfInterest = [&](const YAMLMapping& object) {
         return !newIDs.empty() && MayRefer(object, *YAMLScalar::fileID, isMoved);
     };

@@ -11,7 +11,7 @@ namespace ovrin_yaml {
 
 namespace {
 
-/// The objects that may have a prefab link to what isMeant(const YAMLScalar*) tells of.
+/// The objects that may have a prefab link to the file id that isMeant(std::string_view) tells of.
 template <class IsMeant> auto MayHaveLinkTo(const IsMeant& isMeant) {
     return [isMeant](const YAMLMapping& object) {
         return object.TraitsAsRead() & kHasPrefabLink &&
@@ -22,7 +22,7 @@ template <class IsMeant> auto MayHaveLinkTo(const IsMeant& isMeant) {
 void RepairPrefabLinks(RepairRoots& roots) {
     std::vector<const YAMLScalar*> orphans;
     const auto isOfInterest =
-        MayHaveLinkTo([&](const YAMLScalar* prefab) { return roots.IsRemoved(prefab); });
+        MayHaveLinkTo([&](std::string_view id) { return roots.IsRemoved(YAMLScalar::Lookup(id)); });
     ForEachObject(roots.merged, isOfInterest, [&](const YAMLScalar* id, const YAMLNode* object) {
         const auto [classKey, fields] = GetTransform(object);
         const YAMLScalar* prefab = GetMappingPath(fields, {YAMLScalar::mPrefabInternal, YAMLScalar::fileID});
@@ -59,7 +59,7 @@ void RepairDanglingLinks(RepairRoots& roots) {
     const IsDangling isDangling{roots.merged};
     std::vector<const YAMLScalar*> placeHolders;
     const auto isOfInterest = MayHaveLinkTo(
-        [&](const YAMLScalar* prefab) { return prefab != YAMLScalar::zero && !roots.merged.HasKey(prefab); });
+        [&](std::string_view id) { return id != "0" && !roots.merged.HasKey(YAMLScalar::Lookup(id)); });
     ForEachObject(roots.merged, isOfInterest, [&](const YAMLScalar* id, YAMLNode* value) {
         const YAMLMapping* object = AsMapping(value);
         if (!object || FindMappings(id, value, isDangling).empty()) return;

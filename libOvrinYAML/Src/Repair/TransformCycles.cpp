@@ -1,5 +1,6 @@
 #include "Repair/TransformCycles.h"
 
+#include "Repair/IDFilter.h"
 #include "Repair/ObjectTraits.h"
 #include "Repair/UnbuiltReferences.h"
 
@@ -36,7 +37,10 @@ public:
     /// link.
     explicit TransformParents(const RepairRoots& roots) : m_Merged(roots.merged) {
         const bool anyRemoved = !roots.removed.empty();
-        const auto isRemoved = [&](const YAMLScalar* parent) { return roots.IsRemoved(parent); };
+        const IDFilter removed(roots.removed);
+        const auto isRemoved = [&](std::string_view parent) {
+            return removed.MayContain(parent) && roots.IsRemoved(YAMLScalar::Lookup(parent));
+        };
         const auto isOfInterest = [&](const YAMLMapping& object) {
             const std::uint8_t traits = object.TraitsAsRead();
             if (traits & kLacksFather) return (traits & kLacksInstance) != 0;
