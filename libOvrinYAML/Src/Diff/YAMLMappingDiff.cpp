@@ -3,6 +3,8 @@
 #include "Diff/ChildPairs.h"
 #include "Diff/KeyOrder.h"
 
+#include <algorithm>
+
 namespace ovrin_yaml {
 
 YAMLMappingDiff* YAMLMappingDiff::Diff(DiffContext& context, const YAMLMapping* base,
@@ -44,7 +46,21 @@ const Operation* YAMLMappingDiff::Find(const YAMLScalar* key) const {
     return nullptr;
 }
 
+bool YAMLMappingDiff::LeavesKeys() const {
+    const auto changesInPlace = [](const Entry& entry) {
+        const Operation::Kind kind = entry.operation->GetKind();
+        return kind != Operation::Kind::Add && kind != Operation::Kind::Remove;
+    };
+    return (!m_KeyOrder || IsIdentityKeyOrder(m_KeyOrder)) &&
+           std::all_of(m_Entries.begin(), m_Entries.end(), changesInPlace);
+}
+
 void YAMLMappingDiff::Apply(YAMLMapping& target) const {
+    if (LeavesKeys()) {
+        target.RequireNormalState();
+        for (const Entry& entry : m_Entries) entry.operation->Apply(target, entry.key);
+        return;
+    }
     std::vector<const YAMLScalar*> before;
     before.reserve(target.Size());
     for (const auto& entry : target) before.push_back(entry.key);

@@ -44,6 +44,8 @@ public:
     /// Changes `target`, which must equal the base of the diff. Throws YAMLError where it doesn't fit;
     /// `target` is then left halfway.
     void Apply(YAMLMapping& target) const;
+    /// Whether applying it neither adds nor removes a key, nor moves one.
+    bool LeavesKeys() const;
 
     /// How the key list changed. Set by every Diff, as an identity if it didn't; null in a diff made
     /// otherwise, where the order that applying the entries leaves is kept.

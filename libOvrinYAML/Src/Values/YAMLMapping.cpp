@@ -276,8 +276,11 @@ void YAMLMapping::Reorder(const std::vector<const YAMLScalar*>& order) {
     AssertMayChange();
     std::vector<Entry> ordered;
     ordered.reserve(Size());
+    std::uint32_t position = KeyIndex::kMissing;
     for (const YAMLScalar* key : order) {
-        const std::uint32_t position = Find(key);
+        // Most keys follow each other as they did.
+        const std::uint32_t next = position + 1;
+        position = next < m_Size && m_Keys[next] == key ? next : Find(key);
         if (position == KeyIndex::kMissing) continue;
         if (ordered.size() == Size()) throw YAMLError("Unmapped key when trying to reorder mapping keys");
         ordered.push_back(RawEntries()[position]);
