@@ -21,6 +21,8 @@ class OutlineBuilder {
 public:
     /// Nothing is read ahead of what is handed over.
     static constexpr std::size_t kReadAhead = 0;
+    /// It needs each pair.
+    static constexpr bool kKnowsShapes = false;
 
     OutlineBuilder();
 
@@ -29,6 +31,7 @@ public:
         m_Stack.push_back({scalar, scalar->Value(), Kind::Text});
     }
     void AddText(std::string_view text) { m_Stack.push_back({nullptr, text, Kind::Text}); }
+    void AddPassingText(std::string_view text) { AddScalar(ovrin_yaml::YAMLScalar::Lookup(text)); }
     ovrin_yaml::YAMLScalar* Intern(std::string_view text) { return ovrin_yaml::YAMLScalar::Lookup(text); }
 
     /// Opens a container; what is added from now on belongs to it.

@@ -23,10 +23,10 @@ void BatchedBuilder::AddLong(std::string_view text) {
 
 void BatchedBuilder::AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry& entry) {
     m_Late[++m_LateCount] = {text.data(), static_cast<std::uint32_t>(text.size()),
-                             hash,        static_cast<std::uint32_t>(m_Stack.size()),
+                             hash,        static_cast<std::uint32_t>(m_Stack.Size()),
                              &entry,      nullptr};
     entry.user = static_cast<std::uint16_t>(m_LateCount);
-    m_Stack.emplace_back(nullptr, hash, static_cast<std::uint32_t>(m_LateCount));
+    m_Stack.Push(nullptr, hash, static_cast<std::uint32_t>(m_LateCount));
     if (m_LateCount == kMostLate) InternTexts();
 }
 
@@ -60,8 +60,8 @@ void BatchedBuilder::InternTexts() {
 }
 
 bool BatchedBuilder::CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed) {
-    const Node* nodes = m_Stack.data() + mark;
-    const std::size_t count = (m_Stack.size() - mark) / 2;
+    const Node* nodes = m_Stack.From(mark);
+    const std::size_t count = (m_Stack.Size() - mark) / 2;
     const KeyLists::List keys =
         m_KeyLists.Get(count, [nodes](std::size_t i) { return static_cast<YAMLScalar*>(nodes[2 * i].node); });
     if (!keys) return false;
@@ -76,14 +76,14 @@ bool BatchedBuilder::CloseMapping(std::size_t mark, bool flow, std::uint32_t lin
     }
     mapping->m_Hash = hash;
     mapping->m_Line = line;
-    m_Stack.resize(mark);
-    m_Stack.emplace_back(mapping, hash);
+    m_Stack.Cut(mark);
+    m_Stack.Push(mapping, hash);
     return true;
 }
 
 void BatchedBuilder::CloseSequence(std::size_t mark, bool flow, std::uint32_t line) {
-    const Node* nodes = m_Stack.data() + mark;
-    const std::size_t count = m_Stack.size() - mark;
+    const Node* nodes = m_Stack.From(mark);
+    const std::size_t count = m_Stack.Size() - mark;
     YAMLSequence* sequence = YAMLAlloc<YAMLSequence>::create(flow);
     sequence->m_Items.resize(count);
     std::uint32_t hash = 0;
@@ -94,8 +94,8 @@ void BatchedBuilder::CloseSequence(std::size_t mark, bool flow, std::uint32_t li
     }
     sequence->m_Hash = hash;
     sequence->m_Line = line;
-    m_Stack.resize(mark);
-    m_Stack.emplace_back(sequence, hash);
+    m_Stack.Cut(mark);
+    m_Stack.Push(sequence, hash);
 }
 
 /// A value may still be missing, so only the key can be asked for.
@@ -107,14 +107,14 @@ YAMLMapping* BatchedBuilder::TakeObject(bool isStripped) {
 }
 
 YAMLNode* BatchedBuilder::TakeRoot() {
-    YAMLNode* root = m_Stack.front().node;
-    m_Stack.clear();
+    YAMLNode* root = m_Stack[0].node;
+    m_Stack.Cut(0);
     m_FirstLate = m_LateCount;
     return root;
 }
 
 void BatchedBuilder::Clear() {
-    m_Stack.clear();
+    m_Stack.Cut(0);
     m_LateCount = m_FirstLate;
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Reading/Fast/KeyLists.h"
+#include "Reading/Fast/NodeStack.h"
 #include "Reading/Fast/ShortTextCache.h"
 #include "Values/YAMLMapping.h"
 #include "Values/YAMLScalar.h"
@@ -9,7 +10,6 @@
 #include <cstddef>
 #include <cstdint>
 #include <string_view>
-#include <vector>
 
 namespace ovrin_yaml {
 
@@ -33,8 +33,10 @@ public:
     // be readable.
 
     static constexpr std::size_t kReadAhead = ShortText::kLongest;
+    /// It needs each pair.
+    static constexpr bool kKnowsShapes = false;
 
-    void AddNode(YAMLNode* node, std::uint32_t hash) { m_Stack.emplace_back(node, hash); }
+    void AddNode(YAMLNode* node, std::uint32_t hash) { m_Stack.Push(node, hash); }
     void AddScalar(YAMLScalar* scalar) { AddNode(scalar, scalar->m_Hash); }
     void AddText(std::string_view text) {
         if (text.size() <= ShortText::kLongest) {
@@ -50,11 +52,13 @@ public:
             AddLong(text);
         }
     }
+    /// A text that need not stay.
+    void AddPassingText(std::string_view text) { AddScalar(YAMLScalar::Lookup(text)); }
     /// The scalar of a text that may be read as the others, at once.
     YAMLScalar* Intern(std::string_view text);
 
     /// Where the stack ends: what is added from now on belongs to the container closed with it.
-    std::size_t Mark() const { return m_Stack.size(); }
+    std::size_t Mark() const { return m_Stack.Size(); }
     /// Makes a mapping of the keys and values behind the mark, the last `unhashed` pairs left out of its
     /// hash. Keys must be interned scalars. False if one of them stands there twice.
     bool CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed = 0);
@@ -98,7 +102,7 @@ private:
     void AddLate(std::string_view text, std::uint32_t hash, ShortTextCache::Entry& entry);
     void SetPlace(const Node& node, YAMLNode** place) { m_Late[node.late].place = place; }
 
-    std::vector<Node> m_Stack;
+    NodeStack<Node> m_Stack;
     std::size_t m_LateCount = 0;
     std::size_t m_FirstLate = 0; // of the tree under way
     // The first is nobody's: which texts are late is hard to foretell, so that writing where nobody reads is

@@ -25,10 +25,16 @@ private:
 
     void ReadCollection(KnownKey& parent);
     void ReadMapping(KnownKey& parent);
+    bool ReadByShape(KnownKey& parent);
+    bool ReadByShape(const FlowShape& shape);
+    void LearnShape(const char* begin, KnownKey& parent);
     KnownKey& ReadKey(const KnownKey& parent, KeyGuess& guess);
     void ReadQuotedKey();
     void ReadSequence(KnownKey& parent);
     void ReadValue(KnownKey& parent);
+    static bool StartsText(char first) {
+        return first != '{' && first != '[' && first != '\'' && first != '"';
+    }
     const char* ScanText();
     bool SkipUsualSeparator();
     bool ReadSeparator(char close);
@@ -50,8 +56,12 @@ template <class Builder> void FlowReader<Builder>::ReadCollection(KnownKey& pare
 
 template <class Builder> void FlowReader<Builder>::ReadMapping(KnownKey& parent) {
     FormCursor& cursor = m_Form.cursor;
+    if constexpr (Builder::kKnowsShapes)
+        if (parent.shapes && ReadByShape(parent)) return;
+    const char* const begin = cursor.Position();
     const std::size_t mark = m_Form.builder.Mark();
     const std::uint32_t line = cursor.Line();
+    bool hasUsualKeys = true;
     cursor.Skip();
     if (*cursor == '}') {
         cursor.Skip();
@@ -60,11 +70,55 @@ template <class Builder> void FlowReader<Builder>::ReadMapping(KnownKey& parent)
         KeyGuess* guess = &parent.inside;
         do {
             KnownKey& key = ReadKey(parent, *guess);
+            hasUsualKeys = hasUsualKeys && &key != &m_Form.keys.Unknown();
             ReadValue(key);
             guess = &key.next;
         } while (SkipUsualSeparator() || ReadSeparator('}'));
     }
     m_Form.CloseMapping(mark, true, line);
+    if constexpr (Builder::kKnowsShapes)
+        if (hasUsualKeys && cursor.Line() == line) LearnShape(begin, parent);
+}
+
+/// Reads a mapping of a shape that is known, in far less time than pair by pair. False, with nothing read, if
+/// it has another.
+template <class Builder> bool FlowReader<Builder>::ReadByShape(KnownKey& parent) {
+    if (ReadByShape(parent.shapes->Latest())) return true;
+    if (!ReadByShape(parent.shapes->Earlier())) return false;
+    parent.shapes->TakeEarlier();
+    return true;
+}
+
+template <class Builder> bool FlowReader<Builder>::ReadByShape(const FlowShape& shape) {
+    if (shape.Count() == 0) return false;
+    FormCursor& cursor = m_Form.cursor;
+    const char* const begin = cursor.Position();
+    std::string_view fileID;
+    const char* position = begin;
+    for (std::size_t pair = 0; pair < shape.Count(); ++pair) {
+        position = shape.Match(pair, position);
+        if (!position || !StartsText(*position)) break;
+        cursor.MoveTo(position);
+        const char* const end = ScanText();
+        if (pair == shape.FileIDPair()) fileID = {position, end};
+        position = end;
+    }
+    if (position) position = shape.Match(shape.Count(), position);
+    const bool isRead = position && static_cast<std::size_t>(position - cursor.LineStart()) <= kLineWidth;
+    cursor.MoveTo(isRead ? position : begin);
+    if (isRead) m_Form.builder.AddMapping(shape.facts, fileID);
+    return isRead;
+}
+
+/// Of the mapping from `begin` to here, which stands on one line and has no keys but such as may be guessed.
+template <class Builder> void FlowReader<Builder>::LearnShape(const char* begin, KnownKey& parent) {
+    // Behind the width lines are broken.
+    if (m_Form.cursor.Column() > kLineWidth) return;
+    FlowShape shape = FlowShape::Of({begin, m_Form.cursor.Position()});
+    if (shape.Count() == 0) return;
+    shape.facts = m_Form.builder.FactsOfLast();
+    if (!parent.shapes) parent.shapes = std::make_unique<FlowShapes>();
+    parent.shapes->Learn(shape);
 }
 
 /// Ends at the first character of the value.
@@ -95,7 +149,7 @@ template <class Builder> void FlowReader<Builder>::ReadQuotedKey() {
     FormCursor& cursor = m_Form.cursor;
     const char* begin = cursor.Position();
     const std::uint32_t line = cursor.Line();
-    m_Form.builder.AddScalar(YAMLScalar::Lookup(m_Form.quoted.Read(true)));
+    m_Form.builder.AddScalar(YAMLScalar::Lookup(m_Form.quoted.Read({true, QuotedPlace::kKey})));
     if (cursor.Line() != line) throw NotSure();
     m_Form.notes.NoteKey({begin, cursor.Position()});
     if (*cursor != ':') throw NotSure();
@@ -122,8 +176,8 @@ template <class Builder> void FlowReader<Builder>::ReadValue(KnownKey& parent) {
     const char first = *m_Form.cursor;
     if (first == '{' || first == '[') {
         ReadCollection(parent);
-    } else if (first == '\'' || first == '"') {
-        m_Form.AddQuoted(true);
+    } else if (!StartsText(first)) {
+        m_Form.AddQuoted({true, m_Indent + kIndentStep});
     } else {
         const char* end = ScanText();
         m_Form.builder.AddText({m_Form.cursor.Position(), end});

@@ -35,7 +35,7 @@ template <class Builder> struct FormReading {
     /// writer writes for it. Ends behind the colon.
     KnownKey& AddKey(const char* end, const KnownKey& parent, KeyGuess& guess);
     /// Adds the quoted value that begins here. Ends behind it.
-    void AddQuoted(bool inFlow);
+    void AddQuoted(QuotedPlace place);
     /// As the builder's function. A mapping that the builder refuses is left to the library's path.
     void CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t unhashed = 0) {
         if (!builder.CloseMapping(mark, flow, line, unhashed)) throw NotSure();
@@ -59,11 +59,10 @@ KnownKey& FormReading<Builder>::AddKey(const char* end, const KnownKey& parent, 
     return isWritten && isSame ? keys.Learn(parent, scalar, guess) : keys.Unknown();
 }
 
-template <class Builder> void FormReading<Builder>::AddQuoted(bool inFlow) {
-    const std::string_view text = quoted.Read(inFlow);
-    // One that doesn't stand in the document will not stay.
+template <class Builder> void FormReading<Builder>::AddQuoted(QuotedPlace place) {
+    const std::string_view text = quoted.Read(place);
     if (quoted.Holds(text))
-        builder.AddScalar(YAMLScalar::Lookup(text));
+        builder.AddPassingText(text);
     else
         builder.AddText(text);
 }

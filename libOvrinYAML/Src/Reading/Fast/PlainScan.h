@@ -6,6 +6,9 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
+#ifdef __SSE2__
+#include <emmintrin.h>
+#endif
 
 namespace ovrin_yaml {
 
@@ -21,14 +24,29 @@ constexpr std::uint64_t EachByte(std::uint64_t byte) {
     return byte * 0x0101010101010101u;
 }
 
-/// The lowest bits of eight bytes, side by side: the factor moves each of them to its place in the top byte.
+/// Sixteen bytes that are compared at once; the result of a comparison has ff for true.
+using ByteVector [[gnu::vector_size(16)]] = std::uint8_t;
+
+#ifdef __SSE2__
+/// The lowest bits of the results of a comparison, side by side.
+inline unsigned BitOfEachByte(ByteVector results) {
+    return static_cast<unsigned>(_mm_movemask_epi8(reinterpret_cast<__m128i>(results)));
+}
+#else
+/// The same of eight bytes: the factor moves each bit to its place in the top byte.
 ///
 ///     bytes, the last one first    00 ff ff 00  00 00 00 00
 ///     & EachByte(1)                00 01 01 00  00 00 00 00
 ///     * factor >> 56                                     60    01100000: the bytes 5 and 6
-inline std::uint64_t BitOfEachByte(std::uint64_t bytes) {
-    return (bytes & EachByte(1)) * 0x0102040810204080u >> 56;
+inline unsigned BitOfEachByte(std::uint64_t bytes) {
+    return static_cast<unsigned>((bytes & EachByte(1)) * 0x0102040810204080u >> 56);
 }
+inline unsigned BitOfEachByte(ByteVector results) {
+    std::uint64_t halves[2];
+    std::memcpy(halves, &results, sizeof halves);
+    return BitOfEachByte(halves[0]) | BitOfEachByte(halves[1]) << 8;
+}
+#endif
 
 /// The first byte that is no letter, digit or one of "-./_". These are most of what stands in a scene, and
 /// plain in both styles wherever they don't begin a text.
@@ -40,21 +58,18 @@ inline std::uint64_t BitOfEachByte(std::uint64_t bytes) {
 ///     others        ......11.......1    in none of them
 ///                         ^ the first of them ends the word
 inline const char* SkipWord(const char* p) {
-    using Bytes [[gnu::vector_size(16)]] = std::uint8_t;
     constexpr std::uint8_t kFirst = '-', kSpan = '9' - '-', kLetter = 'a', kLetters = 'z' - 'a';
     constexpr std::uint8_t kCase = 0x20, kUnderscore = '_';
-    static_assert(sizeof(Bytes) <= kScanAhead);
-    for (;; p += sizeof(Bytes)) {
-        Bytes bytes;
+    static_assert(sizeof(ByteVector) <= kScanAhead);
+    for (;; p += sizeof(ByteVector)) {
+        ByteVector bytes;
         std::memcpy(&bytes, p, sizeof bytes);
         // Ranges begin at zero, so that one comparison tells what is in them.
-        const auto others =
-            ~((bytes - kFirst <= kSpan) | ((bytes | kCase) - kLetter <= kLetters) | (bytes == kUnderscore));
-        std::uint64_t halves[2];
-        std::memcpy(halves, &others, sizeof halves);
-        // Where a word ends is hard to foretell, so both halves are looked at without a branch.
-        const std::uint64_t bits = BitOfEachByte(halves[0]) | BitOfEachByte(halves[1]) << 8;
-        if (bits) return p + std::countr_zero(bits);
+        const auto ofWord =
+            (bytes - kFirst <= kSpan) | ((bytes | kCase) - kLetter <= kLetters) | (bytes == kUnderscore);
+        // Where a word ends is hard to foretell, so all are looked at without a branch.
+        const unsigned others = BitOfEachByte(reinterpret_cast<ByteVector>(ofWord)) ^ 0xffffu;
+        if (others) return p + std::countr_zero(others);
     }
 }
 

@@ -1,5 +1,6 @@
 #include "Reading/Fast/QuotedText.h"
 
+#include "Writing/ScalarWriter.h"
 #include "Writing/WrittenForm.h"
 
 namespace ovrin_yaml {
@@ -35,24 +36,27 @@ int DigitOf(char c) {
 
 } // namespace
 
-std::string_view QuotedText::Read(bool inFlow) {
+std::string_view QuotedText::Read(QuotedPlace place) {
     const char quote = *m_Cursor;
+    const std::size_t column = m_Cursor.Column();
     m_Cursor.Skip();
     const char* begin = m_Cursor.Position();
     const char* p = begin;
     const char other = quote == '"' ? '\'' : '"';
     while (IsPlainInQuotes(*p) || *p == other) ++p;
-    if (*p != quote || (quote == '\'' && p[1] == '\'')) return ReadPieces(p);
+    if (*p != quote || (quote == '\'' && p[1] == '\'')) {
+        ReadPieces(p);
+        NotePieces(begin - 1, column, place);
+        return m_Text;
+    }
     const std::string_view text(begin, p);
-    m_Notes.NoteQuoted(quote, text, inFlow, m_Cursor.LineStart());
+    m_Notes.NoteQuoted(quote, text, place.inFlow, m_Cursor.LineStart());
     m_Cursor.MoveTo(p + 1);
     return text;
 }
 
 /// Up to `from` the text stands for itself, unless it ends in blanks: these are looked at again.
-std::string_view QuotedText::ReadPieces(const char* from) {
-    // Few are as written, so it isn't worth the while to find out.
-    m_Notes.NoteIf(true);
+void QuotedText::ReadPieces(const char* from) {
     const char* begin = m_Cursor.Position();
     const char quote = begin[-1];
     while (from != begin && from[-1] == ' ') --from;
@@ -73,7 +77,19 @@ std::string_view QuotedText::ReadPieces(const char* from) {
         }
     }
     m_Cursor.Skip();
-    return m_Text;
+}
+
+/// What was read of pieces from the quote at `begin` on is written again to be compared: where a line breaks
+/// and what is escaped follows from many rules. Of keys few are as written, so that isn't worth the while.
+void QuotedText::NotePieces(const char* begin, std::size_t column, QuotedPlace place) {
+    if (place.foldIndent == QuotedPlace::kKey || !m_Notes.IsAsWritten()) return m_Notes.NoteIf(true);
+    const ScalarForms forms = ClassifyScalar(m_Text);
+    m_Written.clear();
+    TextOutput output(m_Written, column);
+    WriteScalar(output, m_Text, forms, place.inFlow ? forms.plainInFlow : forms.plainInBlock,
+                {true, place.foldIndent});
+    output.Finish();
+    m_Notes.NoteIf(m_Written != std::string_view(begin, m_Cursor.Position()));
 }
 
 /// Blanks inside a line stand for themselves. Around line ends they count for nothing: one line end is a

@@ -9,6 +9,14 @@
 
 namespace ovrin_yaml {
 
+/// Where a quoted text stands, as far as the writer's choices depend on it.
+struct QuotedPlace {
+    static constexpr int kKey = -1;
+
+    bool inFlow;
+    int foldIndent; ///< of the lines that it is spread over, or kKey
+};
+
 /// Reads texts between quotes.
 ///
 ///     'a: b'         a: b        most stand for themselves, and are not copied
@@ -25,18 +33,20 @@ public:
 
     /// The text whose opening quote stands here; ends behind the closing one. It stands in the document, or
     /// here up to the next reading.
-    std::string_view Read(bool inFlow);
+    std::string_view Read(QuotedPlace place);
     bool Holds(std::string_view text) const { return text.data() == m_Text.data(); }
 
 private:
-    std::string_view ReadPieces(const char* from);
+    void ReadPieces(const char* from);
+    void NotePieces(const char* begin, std::size_t column, QuotedPlace place);
     void FoldLines();
     void Unescape();
     std::uint32_t ReadHex(int digits);
 
     FormCursor& m_Cursor;
     FormNotes& m_Notes;
-    std::string m_Text; // of pieces
+    std::string m_Text;    // of pieces
+    std::string m_Written; // as the writer would write it
 };
 
 } // namespace ovrin_yaml

@@ -29,21 +29,21 @@ std::uint32_t Recogniser::FactsOf(const YAMLScalar* key, std::uint32_t value) {
 
 bool Recogniser::CloseMapping(std::size_t mark, bool /*flow*/, std::uint32_t /*line*/,
                               std::size_t headerPairs) {
-    const Node* nodes = m_Stack.data() + mark;
-    const std::size_t count = (m_Stack.size() - mark) / 2;
+    const Node* nodes = m_Stack.From(mark);
+    const std::size_t count = (m_Stack.Size() - mark) / 2;
     if (!m_KeyLists.Get(count, [nodes](std::size_t i) { return nodes[2 * i].scalar; })) return false;
     std::uint32_t facts = kMapping;
     for (std::size_t i = 0; i < count; ++i)
         if (MayMatter(nodes[2 * i].scalar)) facts |= FactsOf(nodes[2 * i].scalar, nodes[2 * i + 1].facts);
     if (headerPairs) TakeTraits(nodes, count);
-    m_Stack.resize(mark);
-    m_Stack.push_back({nullptr, facts});
+    m_Stack.Cut(mark);
+    m_Stack.Push(nullptr, facts);
     return true;
 }
 
 void Recogniser::CloseSequence(std::size_t mark, bool /*flow*/, std::uint32_t /*line*/) {
-    m_Stack.resize(mark);
-    m_Stack.push_back({nullptr, 0});
+    m_Stack.Cut(mark);
+    m_Stack.Push(nullptr, 0u);
 }
 
 /// Of the object that these pairs are.
@@ -77,7 +77,7 @@ const Recogniser* Recogniser::TakeObject(bool isStripped) {
 }
 
 void Recogniser::Clear() {
-    m_Stack.clear();
+    m_Stack.Cut(0);
     m_HasPrefabLink = m_HasMark = false;
 }
 

@@ -1,12 +1,13 @@
 #pragma once
 
+#include "Reading/Fast/FlowShape.h"
 #include "Reading/Fast/KeyLists.h"
+#include "Reading/Fast/NodeStack.h"
 #include "Values/YAMLScalar.h"
 
 #include <cstddef>
 #include <cstdint>
 #include <string_view>
-#include <vector>
 
 namespace ovrin_yaml {
 
@@ -20,23 +21,30 @@ namespace ovrin_yaml {
 ///            Transform | has a father
 class Recogniser {
 public:
-    static constexpr std::size_t kReadAhead = 0;
+    static constexpr std::size_t kReadAhead = FlowShape::kReadAhead;
+    static constexpr bool kKnowsShapes = true;
 
     Recogniser();
 
-    void AddNode(const YAMLScalar* key, std::uint32_t /*hash*/) { m_Stack.push_back({key, kScalar}); }
+    void AddNode(const YAMLScalar* key, std::uint32_t /*hash*/) { m_Stack.Push(key, kScalar); }
     void AddScalar(const YAMLScalar* scalar) {
-        m_Stack.push_back({scalar, kScalar | (scalar == YAMLScalar::zero ? kZero : 0u)});
+        m_Stack.Push(scalar, kScalar | (scalar == YAMLScalar::zero ? kZero : 0u));
     }
-    void AddText(std::string_view text) {
-        m_Stack.push_back({nullptr, kScalar | (text == "0" ? kZero : 0u)});
-    }
+    void AddText(std::string_view text) { m_Stack.Push(nullptr, kScalar | (text == "0" ? kZero : 0u)); }
+    void AddPassingText(std::string_view text) { AddText(text); }
     YAMLScalar* Intern(std::string_view text) { return YAMLScalar::Lookup(text); }
 
-    std::size_t Mark() const { return m_Stack.size(); }
+    std::size_t Mark() const { return m_Stack.Size(); }
     /// As BatchedBuilder's. The mapping whose last pairs hold data of a header is the object.
     bool CloseMapping(std::size_t mark, bool flow, std::uint32_t line, std::size_t headerPairs = 0);
     void CloseSequence(std::size_t mark, bool flow, std::uint32_t line);
+
+    /// What mappings have in common that differ from the one closed last in their texts alone.
+    std::uint32_t FactsOfLast() const { return m_Stack.From(m_Stack.Size() - 1)->facts & ~kHasTarget; }
+    /// Adds one of these. `fileID` is the text that it has under that key; empty if it hasn't the key.
+    void AddMapping(std::uint32_t facts, std::string_view fileID) {
+        m_Stack.Push(nullptr, facts | (fileID.empty() || fileID == "0" ? 0u : kHasTarget));
+    }
 
     /// Itself, which has the traits (ObjectTrait) of the object that was taken last.
     using Object = const Recogniser*;
@@ -59,6 +67,9 @@ private:
         kHasTransitions = 128, // of a state machine
     };
     struct Node {
+        explicit Node(const YAMLScalar* scalar = nullptr, std::uint32_t facts = 0)
+            : scalar(scalar), facts(facts) {}
+
         const YAMLScalar* scalar; // of keys; null where nobody interned the text
         std::uint32_t facts;
     };
@@ -71,7 +82,7 @@ private:
     const YAMLScalar* const m_Transitions;
     std::uint64_t m_MayMatter = 0; // a bit for each key that facts depend on, by its hash
 
-    std::vector<Node> m_Stack;
+    NodeStack<Node> m_Stack;
     KeyLists m_KeyLists;
     std::uint8_t m_Traits = 0;
     bool m_HasPrefabLink = false; // the object under way

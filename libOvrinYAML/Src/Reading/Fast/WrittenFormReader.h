@@ -26,7 +26,7 @@ namespace ovrin_yaml {
 ///
 /// What becomes of a document is the builder's business: BatchedBuilder makes a tree of it.
 ///
-/// One reader serves any number of documents of one file, on one thread.
+/// One reader serves any number of documents, on one thread at a time.
 template <class Builder> class WrittenFormReader {
 public:
     struct Document {
@@ -36,8 +36,9 @@ public:
         bool isAsWritten = false;
     };
 
-    /// Everything in front of `readableEnd` may be read.
+    /// Everything in front of `readableEnd` may be read, from the document under way on.
     explicit WrittenFormReader(const char* readableEnd) : m_ReadableEnd(readableEnd) {}
+    void SetReadableEnd(const char* readableEnd) { m_ReadableEnd = readableEnd; }
 
     /// `text` reaches from the "---" of the document up to that of the next or to the end of the file; it
     /// must stay up to the next InternTexts. `firstLine` is the zero-based line of the "---".
@@ -84,7 +85,7 @@ private:
     static_assert(kReadableBehind >= Builder::kReadAhead);
     static_assert(kReadableBehind >= kScanAhead);
 
-    const char* const m_ReadableEnd;
+    const char* m_ReadableEnd;
     FormReading<Builder> m_Form;
     FlowReader<Builder> m_Flow{m_Form};
     std::deque<std::string> m_Copies; // of documents at the end of what may be read
@@ -262,7 +263,7 @@ template <class Builder> void WrittenFormReader<Builder>::ReadInline(int indent,
     if (first == '{' || first == '[') {
         m_Flow.Read(indent, parent);
     } else if (first == '\'' || first == '"') {
-        m_Form.AddQuoted(false);
+        m_Form.AddQuoted({false, indent + kIndentStep});
     } else {
         ReadPlainText(indent);
         return;
@@ -306,7 +307,7 @@ void WrittenFormReader<Builder>::ReadFoldedText(int indent, std::string_view fir
         width = cursor.Column();
         cursor.NextLine();
     }
-    m_Form.builder.AddScalar(YAMLScalar::Lookup(m_FoldedText));
+    m_Form.builder.AddPassingText(m_FoldedText);
 }
 
 } // namespace ovrin_yaml
