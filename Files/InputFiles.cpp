@@ -35,14 +35,28 @@ ByteSource Opened(const std::string& path) {
     };
 }
 
+PartSource OpenedInParts(const std::string& path) {
+    const auto file = std::make_shared<Descriptor>(OpenFile(path.c_str(), O_RDONLY));
+    if (!file->IsOpen()) throw YAMLError(kCannotOpen);
+    return [file](std::size_t offset, char* bytes, std::size_t size) {
+        const ssize_t count =
+            Uninterrupted([&] { return pread(file->Get(), bytes, size, static_cast<off_t>(offset)); });
+        if (count < 0) throw YAMLError(kCannotRead);
+        return static_cast<std::size_t>(count);
+    };
+}
+
 } // namespace
 
 InputFile FileInput(const std::string& path) {
     // Less is read at one go.
     constexpr std::size_t kMuch = std::size_t{4} << 20;
     const std::string native = OvrinToNativePath(path);
-    InputFile input{path, FileSize(path), [native] { return WholeFile(native); }, {}};
-    if (input.size >= kMuch) input.open = [native] { return Opened(native); };
+    InputFile input{path, FileSize(path), [native] { return WholeFile(native); }, {}, {}};
+    if (input.size >= kMuch) {
+        input.open = [native] { return Opened(native); };
+        input.openParts = [native] { return OpenedInParts(native); };
+    }
     return input;
 }
 

@@ -11,6 +11,7 @@
 #include "Writing/CheckTree.h"
 #include "Writing/ObjectFileWriter.h"
 
+#include <algorithm>
 #include <sstream>
 
 using namespace ovrin_yaml;
@@ -39,18 +40,28 @@ struct ReadFile {
         });
     }
 
-    /// Reads the file along itself, so that no object must be built.
+    /// Reads the file in parts, and along itself, so that no object must be built.
     void ReadTwice(std::string_view text, const ReaderOptions& options) {
         ObjectFile file(objects, options), same(side, options);
-        for (ObjectFile* each : {&file, &same}) {
-            each->Take(std::string(text));
-            each->Cut(each == &file ? nullptr : &file);
-        }
+        file.TakeCut(InParts(text));
+        file.Cut(nullptr);
+        same.Take(std::string(text));
+        same.Cut(&file);
         for (ObjectFile* each : {&file, &same}) {
             const std::size_t count = each->MakePieces();
             for (std::size_t piece = 0; piece < count; ++piece) each->ReadPiece(piece);
             each->Finish();
         }
+    }
+
+    static CutText InParts(std::string_view text) {
+        const PartSource source = [text](std::size_t offset, char* bytes, std::size_t size) {
+            return text.substr(std::min(offset, text.size())).copy(bytes, size);
+        };
+        const TaskRunner run = [](std::size_t count, const std::function<void(std::size_t)>& task) {
+            for (std::size_t i = 0; i < count; ++i) task(i);
+        };
+        return ReadInParts(source, text.size(), run, 16 + text.size() % 64).value();
     }
 
     std::string Written() const {

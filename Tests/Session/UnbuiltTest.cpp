@@ -6,11 +6,14 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <string>
 #include <thread>
 
 namespace {
 
 using namespace documents;
+using namespace std::string_literals;
 
 /// Three files that have all of `shared` in common, around which each has what is its own.
 struct UnbuiltTest : testing::Test {
@@ -93,6 +96,64 @@ TEST_F(UnbuiltTest, WhatNobodyTouchesIsNeverBuilt) {
     left = "--- !o!1 &3\nGameObject:\n  m_Name: b\n";
     right = base + "--- !o!1 &4\nGameObject:\n  m_Name: c\n";
     ExpectBuilt("uubb");
+}
+
+/// Long texts are broken behind the width, and what can't be seen is escaped.
+TEST_F(UnbuiltTest, QuotedTextsMayStandAsTheyAreWritten) {
+    const std::string words =
+        "one two three four five six seven eight nine ten eleven twelve thirteen fourteen";
+    for (const std::string& fields :
+         {"  m_Text: 'a: " + words + "'\n", "  m_Text: \"\\t " + words + "  " + words + "\"\n",
+          "  m_Text: 'it''s'\n"s, "  m_Text: \"\\tb\\x01\\u1234\"\n"s, "  m_Text: 'a: b\n\n    c'\n"s,
+          "  m_List:\n  - 'a: " + words + "'\n", "  m_Link: {a: 1, b: 'a: " + words + "', c: \"\\t\"}\n"}) {
+        const std::string written = ReadAndWrite(ObjectText("--- !o!1 &2\nGameObject:\n" + fields));
+        shared = written.substr(written.find("---"));
+        ExpectBuilt("u");
+        // The text and what it means stay the same.
+        const std::size_t fold = shared.find("\n    "), escape = shared.find("\\t");
+        if (fold == std::string::npos && escape == std::string::npos) continue;
+        if (fold != std::string::npos)
+            shared.insert(fold + 1, " ");
+        else
+            shared.replace(escape, 2, "\\x09");
+        ExpectBuilt("b");
+    }
+}
+
+/// Mappings of one shape differ in what their texts tell of the object.
+TEST_F(UnbuiltTest, TextsOfAShapeThatIsKnownCount) {
+    const auto linked = [](int id, const std::string& link) {
+        return "--- !o!1 &" + std::to_string(id) + "\nGameObject:\n  m_PrefabInternal: " + link + "\n";
+    };
+    int id = 10;
+    for (const std::string link :
+         {"{fileID: 0}", "{fileID: 0}", "{fileID: 9}", "{fileID: 0}", "{fileID: 0, a: 1}",
+          "{fileID: 9, a: 1}", "{a: 9, b: 1}", "{a: 9, b: 1}", "{fileID: 0}", "{fileID: 9}"})
+        shared += linked(id++, link);
+    base = left = "--- !o!1001 &9\nPrefab:\n  a: 1\n";
+    ExpectBuilt("uubuubuuub");
+    for (const std::string odd : {"{fileID: 0, fileID: 9}", "{a: 1, a: 1}", "{fileID: '9'}",
+                                  "{fileID: {a: 1}}", "{fileID: }", "{fileID: 1, b: 2", "{fileID: 12"}) {
+        shared = linked(1, "{fileID: 0}") + linked(2, "{a: 1, b: 1}") + linked(3, "{fileID: 0, b: 1}") +
+                 linked(4, odd);
+        const auto outcome = [&](bool recognise) {
+            std::string merged;
+            const std::string failure = Failure([&] { merged = Merge(recognise); });
+            return failure + merged.substr(std::min(merged.find('\n'), merged.size()));
+        };
+        EXPECT_EQ(outcome(true), outcome(false)) << odd;
+    }
+}
+
+/// The base is searched near the place where something else was expected, and as a whole only if much isn't
+/// there.
+TEST_F(UnbuiltTest, DocumentsThatMovedFarAreFoundInTheEnd) {
+    std::string front, back;
+    for (int id = 1; id <= 400; ++id) (id <= 100 ? front : back) += Transform(id, 0);
+    base = right = front + back;
+    left = back + front;
+    // left begins with the second part, of which 256 documents are only looked for nearby.
+    ExpectBuilt(std::string(100, 'u') + std::string(256, 'b') + std::string(44, 'u'));
 }
 
 TEST_F(UnbuiltTest, ChildrenOfARemovedTransformAreFoundInTheirBytes) {
@@ -211,8 +272,7 @@ TEST_F(UnbuiltTest, WhatStandsOtherwiseThanUsualMayReferToAnything) {
             YAMLMapping* Make(std::string_view) override { throw YAMLError("built"); }
         } maker;
         const YAMLMapping& object = *YAMLMapping::CreateUnbuilt(fields, maker);
-        return MayRefer(object, *YAMLScalar::mFather,
-                        [](const YAMLScalar* id) { return id == YAMLScalar::Lookup("12"); });
+        return MayRefer(object, *YAMLScalar::mFather, [](std::string_view id) { return id == "12"; });
     };
     for (const char* no :
          {"a: 12\n", "m_Father: {fileID: 1}\n", "m_Father: {fileID: 123}\n", "{m_Father: {fileID: 2, a: 12}}",

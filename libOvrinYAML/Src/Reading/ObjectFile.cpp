@@ -13,7 +13,7 @@
 
 #include <algorithm>
 #include <array>
-#include <atomic>
+#include <cassert>
 #include <cstring>
 #include <optional>
 #include <utility>
@@ -28,11 +28,16 @@ constexpr std::size_t kPieceBytes = std::size_t{1} << 20;
 
 } // namespace
 
-/// The readers of one thread, each made when it is needed: they are big, and a small file may do with one.
+/// The readers that one thread uses, each made when it is needed: they are big, a small file may do with one,
+/// and they read the faster the more they know.
 class ObjectFile::Readers {
 public:
-    explicit Readers(const char* end) : m_End(end) {}
-
+    /// Of documents of a text that ends at `end`.
+    void SetEnd(const char* end) {
+        m_End = end;
+        if (m_Trees) m_Trees->SetReadableEnd(end);
+        if (m_Recognition) m_Recognition->SetReadableEnd(end);
+    }
     TreeReader& Trees() { return m_Trees ? *m_Trees : m_Trees.emplace(m_End); }
     Recognition& Recognisers() { return m_Recognition ? *m_Recognition : m_Recognition.emplace(m_End); }
     void InternTexts() {
@@ -41,23 +46,33 @@ public:
     }
 
 private:
-    const char* const m_End;
+    const char* m_End = nullptr;
     std::optional<TreeReader> m_Trees;
     std::optional<Recognition> m_Recognition;
 };
+
+ObjectFile::ObjectFile(OvrinObjects& objects, ReaderOptions options)
+    : m_Objects(objects), m_Options(options) {}
+
+ObjectFile::~ObjectFile() = default;
 
 std::string_view ObjectFile::FileIDOf(const Document& document) {
     return ovrin_yaml::FileIDOf({document.begin, document.length});
 }
 
 void ObjectFile::Take(std::string bytes) {
-    if (!HasSignature(bytes))
+    const std::size_t length = std::min(bytes.find('\0'), bytes.size());
+    TakeCut({std::move(bytes), length, {}});
+}
+
+void ObjectFile::TakeCut(CutText text) {
+    if (!HasSignature(text.bytes))
         throw YAMLError(
             "File is not a valid text serialized YAML file. Make sure that Asset Serialization is "
             "set to 'Force text' in Editor Settings.");
-    if (const void* nul = std::memchr(bytes.data(), '\0', bytes.size()))
-        bytes.resize(static_cast<std::size_t>(static_cast<const char*>(nul) - bytes.data()));
-    TakeText(std::move(bytes));
+    text.bytes.resize(text.length);
+    TakeText(std::move(text.bytes));
+    m_Starts = std::move(text.starts);
 }
 
 void ObjectFile::TakeText(std::string text) {
@@ -94,7 +109,8 @@ void ObjectFile::Cut(ObjectFile* base) {
 
 /// A file that then can't be cut along the base wants none of its documents.
 void ObjectFile::BecomeTakerOf(ObjectFile& base) {
-    m_TakerBit = static_cast<std::uint8_t>(1u << base.m_TakerCount++);
+    const std::lock_guard lock(base.m_TakersLock);
+    base.m_Takers.push_back(this);
 }
 
 /// Whether documents of a file that is cut may be shared.
@@ -104,24 +120,27 @@ bool ObjectFile::MayShareWith(const ObjectFile& base) const {
 
 void ObjectFile::CutAlone() {
     constexpr std::size_t kBytesPerDocument = 400;
-    ReserveDocuments(m_Text->size() / kBytesPerDocument);
-    for (const char* begin = m_Text->data() + m_Header.size(); begin != End();) {
-        const char* end = FindDocumentEnd(begin, End());
-        AddDocument(begin, static_cast<std::size_t>(end - begin), kNone);
+    const std::size_t guess = m_Starts.empty() ? m_Text->size() / kBytesPerDocument : m_Starts.size() + 1;
+    m_Documents.reserve(guess);
+    AdviseHugePages(m_Documents.data(), guess * sizeof(Document));
+    const char* begin = m_Text->data() + m_Header.size();
+    const auto addUpTo = [&](const char* end) {
+        m_Documents.push_back({begin, static_cast<std::size_t>(end - begin)});
         begin = end;
-    }
+    };
+    for (const std::size_t start : m_Starts)
+        if (start > m_Header.size()) addUpTo(m_Text->data() + start);
+    while (begin != End()) addUpTo(m_Starts.empty() ? FindDocumentEnd(begin, End()) : End());
+    m_Starts = {};
+    if (!m_Documents.empty()) m_Runs.push_back({0, m_Documents.size(), false});
 }
 
-void ObjectFile::ReserveDocuments(std::size_t count) {
-    m_Documents.reserve(count);
-    AdviseHugePages(m_Documents.data(), count * sizeof(Document));
-}
-
-void ObjectFile::AddDocument(const char* begin, std::size_t length, std::size_t lender) {
-    m_Documents.push_back({begin, length, lender});
-    if (lender == kNone) return;
-    // Left and right may want one object at the same time, and say the same.
-    std::atomic_ref(m_Base->m_Documents[lender].wantedBy).fetch_or(m_TakerBit, std::memory_order_relaxed);
+void ObjectFile::AddToRun(std::size_t document, bool isLent) {
+    Run* const last = m_Runs.empty() ? nullptr : &m_Runs.back();
+    if (last && last->isLent == isLent && last->first + last->count == document)
+        ++last->count;
+    else
+        m_Runs.push_back({document, 1, isLent});
 }
 
 /// Whether the base's document stands here in the same words and ends here, too.
@@ -138,19 +157,26 @@ bool ObjectFile::StandsAt(const Document& document, TextWindow& window) {
 void ObjectFile::CutAlong(ObjectFile& base, TextWindow& window) {
     m_Base = &base;
     const std::vector<Document>& known = base.m_Documents;
-    ReserveDocuments(known.size());
     std::string own;
+    m_Length = base.m_Header.size();
+    std::size_t length = 0;
     std::size_t expected = 0;
-    for (window.Skip(base.m_Header.size()); window.Reaches(1); window.Skip(m_Documents.back().length)) {
+    for (window.Skip(m_Length); window.Reaches(1); window.Skip(length), m_Length += length) {
         if (expected < known.size() && StandsAt(known[expected], window)) {
-            AddDocument(known[expected].begin, known[expected].length, expected);
+            length = known[expected].length;
+            AddToRun(expected, true);
             ++expected;
             continue;
         }
         const std::string_view document = window.Document();
-        const std::size_t lender = FindLender(document, expected);
-        AddDocument(lender == kNone ? nullptr : known[lender].begin, document.size(), lender);
-        if (lender == kNone) own += document;
+        length = document.size();
+        if (const std::size_t lender = FindLender(document, expected); lender != kNone) {
+            AddToRun(lender, true);
+        } else {
+            AddToRun(m_Documents.size(), false);
+            m_Documents.push_back({nullptr, length});
+            own += document;
+        }
     }
     KeepOwn(std::move(own));
 }
@@ -160,13 +186,19 @@ void ObjectFile::KeepOwn(std::string own) {
     m_Text = std::make_shared<const std::string>(std::move(own));
     m_Header = m_Base->m_Header;
     m_HasWholeText = false;
-    m_Length = m_Header.size();
     const char* position = m_Text->data();
     for (Document& document : m_Documents) {
-        m_Length += document.length;
-        if (document.lender != kNone) continue;
         document.begin = position;
         position += document.length;
+    }
+}
+
+/// Calls visit(documents, bytes) for each run.
+template <class Visit> void ObjectFile::ForEachRun(const Visit& visit) const {
+    for (const Run& run : m_Runs) {
+        const Document* first = &(run.isLent ? m_Base : this)->m_Documents[run.first];
+        const Document& last = first[run.count - 1];
+        visit(run, std::string_view(first->begin, last.begin + last.length));
     }
 }
 
@@ -175,51 +207,86 @@ void ObjectFile::NeedWholeText() {
     if (m_HasWholeText) return;
     std::string whole(m_Header);
     whole.reserve(m_Length);
-    for (const Document& document : m_Documents) whole.append(document.begin, document.length);
+    ForEachRun([&](const Run&, std::string_view bytes) { whole += bytes; });
+    const char* position = whole.data() + m_Header.size();
+    ForEachRun([&](const Run& run, std::string_view bytes) {
+        for (std::size_t i = run.first; !run.isLent && i < run.first + run.count; ++i)
+            m_Documents[i].begin = position + (m_Documents[i].begin - bytes.data());
+        position += bytes.size();
+    });
     m_Text = std::make_shared<const std::string>(std::move(whole));
     m_HasWholeText = true;
-    const char* position = m_Text->data() + m_Header.size();
-    for (Document& document : m_Documents) {
-        document.begin = position;
-        position += document.length;
-    }
 }
 
 /// For a document that isn't the expected one; `expected` becomes the one behind the base's of the same id.
-std::size_t ObjectFile::FindLender(std::string_view document, std::size_t& expected) const {
-    const std::vector<Document>& known = m_Base->m_Documents;
-    const std::string_view fileID = ovrin_yaml::FileIDOf(document);
-    const bool isChanged = expected < known.size() && FileIDOf(known[expected]) == fileID;
-    const std::size_t index = isChanged ? expected : m_Base->IndexOf(fileID);
+std::size_t ObjectFile::FindLender(std::string_view document, std::size_t& expected) {
+    const std::size_t index = FindInBase(ovrin_yaml::FileIDOf(document), expected);
     if (index == kNone) return kNone;
     expected = index + 1;
-    return document == std::string_view(known[index].begin, known[index].length) ? index : kNone;
+    const Document& known = m_Base->m_Documents[index];
+    return document == std::string_view(known.begin, known.length) ? index : kNone;
+}
+
+/// The base's document of an id. Where a few were removed it is near the one that was expected; one that
+/// isn't there is nearly always new, and one that was only moved may be read twice. So the base is indexed,
+/// which costs a look at each of its documents, only for files in which many aren't found.
+std::size_t ObjectFile::FindInBase(std::string_view fileID, std::size_t expected) {
+    constexpr std::size_t kNear = 16;
+    constexpr std::size_t kManyUnfound = 256;
+    constexpr std::size_t kUsualHeader = 128; // no long ones are looked through again and again
+    if (m_UnfoundCount == kManyUnfound) return m_Base->IndexOf(fileID);
+    const std::vector<Document>& known = m_Base->m_Documents;
+    const std::size_t end = std::min(expected + kNear, known.size());
+    for (std::size_t i = expected; i < end; ++i)
+        if (ovrin_yaml::FileIDOf({known[i].begin, std::min(known[i].length, kUsualHeader)}) == fileID)
+            return i;
+    ++m_UnfoundCount;
+    return kNone;
 }
 
 std::size_t ObjectFile::IndexOf(std::string_view fileID) const {
     // Not std::call_once: a lack of memory can't get through the frames of the C library.
     const std::lock_guard lock(m_IndexLock);
-    if (m_Index.empty()) {
-        m_Index.reserve(m_Documents.size());
-        for (std::size_t i = 0; i < m_Documents.size(); ++i) m_Index.try_emplace(FileIDOf(m_Documents[i]), i);
+    const auto idOf = [this](std::size_t i) { return FileIDOf(m_Documents[i]); };
+    if (m_Index.IsEmpty()) {
+        // The header lines lie far from each other in memory: ask for those that come next.
+        constexpr std::size_t kAhead = 8;
+        m_Index.Build(m_Documents.size(), [&](std::size_t i) {
+            if (i + kAhead < m_Documents.size()) __builtin_prefetch(m_Documents[i + kAhead].begin);
+            return idOf(i);
+        });
     }
-    const auto found = m_Index.find(fileID);
-    return found == m_Index.end() ? kNone : found->second;
+    return m_Index.Find(fileID, idOf);
+}
+
+/// Which file wants which document.
+void ObjectFile::NoteWants() {
+    std::uint8_t bit = 1;
+    for (const ObjectFile* taker : m_Takers) {
+        for (const Run& run : taker->m_Runs)
+            for (std::size_t i = run.first; run.isLent && i < run.first + run.count; ++i)
+                m_Documents[i].wantedBy |= bit;
+        bit = static_cast<std::uint8_t>(bit << 1);
+    }
 }
 
 std::size_t ObjectFile::MakePieces() {
+    assert(m_Takers.size() <= 8 && "a bit for each");
+    NoteWants();
     std::size_t bytes = 0, bytesToBuild = 0;
     Piece piece{0, 0};
     for (std::size_t i = 0; i < m_Documents.size(); ++i) {
         const Document& document = m_Documents[i];
-        if (document.lender == kNone) bytes += document.length;
-        if (document.lender == kNone && !IsWantedByAll(document)) bytesToBuild += document.length;
+        bytes += document.length;
+        if (!IsWantedByAll(document)) bytesToBuild += document.length;
         piece.end = i + 1;
         if (bytes < kPieceBytes && piece.end != m_Documents.size()) continue;
         m_Pieces.push_back(piece);
         piece = {piece.end, piece.end};
         bytes = 0;
     }
+    for (const ObjectFile* taker : m_Takers)
+        if (taker->m_Base) bytesToBuild += taker->m_Text->size();
     // A guess that spares the table most of its growing.
     constexpr std::size_t kBytesPerScalar = 56;
     if (!m_Base) ScalarTable::Instance().Reserve(m_Documents.size() + bytesToBuild / kBytesPerScalar);
@@ -227,16 +294,34 @@ std::size_t ObjectFile::MakePieces() {
 }
 
 void ObjectFile::ReadPiece(std::size_t piece) {
-    Readers readers(End());
-    for (std::size_t i = m_Pieces[piece].first; i < m_Pieces[piece].end; i += kAtOnce)
-        ReadDocuments(readers, {&m_Documents[i], std::min(kAtOnce, m_Pieces[piece].end - i)});
+    WithReaders(End(), [&](Readers& readers) {
+        for (std::size_t i = m_Pieces[piece].first; i < m_Pieces[piece].end; i += kAtOnce)
+            ReadDocuments(readers, {&m_Documents[i], std::min(kAtOnce, m_Pieces[piece].end - i)});
+    });
 }
 
-/// Reads those that no other file lends.
+/// Calls work(readers) with readers for a text that ends at `end`: the base's, which are free at the moment,
+/// or new ones. What fails with them does so for good.
+template <class Work> void ObjectFile::WithReaders(const char* end, const Work& work) {
+    ObjectFile& owner = m_Base ? *m_Base : *this;
+    std::unique_ptr<Readers> readers;
+    {
+        const std::lock_guard lock(owner.m_ReadersLock);
+        if (!owner.m_IdleReaders.empty()) {
+            readers = std::move(owner.m_IdleReaders.back());
+            owner.m_IdleReaders.pop_back();
+        }
+    }
+    if (!readers) readers = std::make_unique<Readers>();
+    readers->SetEnd(end);
+    work(*readers);
+    const std::lock_guard lock(owner.m_ReadersLock);
+    owner.m_IdleReaders.push_back(std::move(readers));
+}
+
 void ObjectFile::ReadDocuments(Readers& readers, std::span<Document> documents) const {
     for (Document& document : documents)
-        if (document.lender == kNone && !(IsWantedByAll(document) && Recognise(readers, document)))
-            Read(readers.Trees(), document);
+        if (!IsWantedByAll(document) || !Recognise(readers, document)) Read(readers.Trees(), document);
     readers.InternTexts();
     InternIDs(documents);
     for (Document& document : documents)
@@ -244,7 +329,7 @@ void ObjectFile::ReadDocuments(Readers& readers, std::span<Document> documents) 
 }
 
 bool ObjectFile::IsWantedByAll(const Document& document) const {
-    return m_Maker && m_TakerCount > 0 && document.wantedBy == (1u << m_TakerCount) - 1;
+    return m_Maker && !m_Takers.empty() && document.wantedBy == (1u << m_Takers.size()) - 1;
 }
 
 /// False for an object whose tree is needed: one that would be written in another way, which goes by the
@@ -255,7 +340,7 @@ bool ObjectFile::Recognise(Readers& readers, Document& document) const {
     if (!object || !isAsWritten || object->Traits() & m_Options.unshared) return false;
     document.object = YAMLMapping::CreateUnbuilt(text, *m_Maker);
     document.object->SetTraitsAsRead(object->Traits());
-    document.isLendable = document.isMarked = true;
+    document.isLendable = true;
     return true;
 }
 
@@ -290,8 +375,7 @@ void ObjectFile::Complete(Document& document) const {
     document.fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
     if (m_Options.inspect) object.SetTraitsAsRead(m_Options.inspect(object));
     document.isLendable = !(object.TraitsAsRead() & m_Options.unshared);
-    document.isMarked = document.isLendable && document.wantedBy;
-    if (document.isMarked) object.MarkAsShared();
+    if (document.isLendable && document.wantedBy) object.MarkAsShared();
     if (!m_Base && document.isAsWritten) object.SetSource({document.begin, document.length});
 }
 
@@ -301,7 +385,7 @@ void ObjectFile::Finish() {
     m_Objects.KeepMaker(m_Base ? m_Base->m_Maker : m_Maker);
     // A text that ends behind the first marker holds no document.
     if (m_Length <= m_Header.size() + 5) return;
-    if (m_Documents.empty())
+    if (m_Runs.empty())
         ReadRestByLibrary(m_Header.size());
     else
         FinishDocuments();
@@ -310,28 +394,36 @@ void ObjectFile::Finish() {
 }
 
 void ObjectFile::FinishDocuments() {
+    std::size_t count = 0;
+    for (const Run& run : m_Runs) count += run.count;
+    m_Objects.GetMapping().Reserve(count);
+    std::size_t offset = m_Header.size();
+    WithReaders((m_Base ? m_Base : this)->End(), [&](Readers& readers) {
+        for (const Run& run : m_Runs)
+            if (!FinishRun(run, readers, offset)) return;
+    });
+}
+
+/// Adds the objects of a run that begins at `offset`, which becomes that of its end. False if the rest of the
+/// file is done, too.
+bool ObjectFile::FinishRun(const Run& run, Readers& readers, std::size_t& offset) {
+    // The places of keys in the root lie far from each other in memory: ask for those that come next.
+    constexpr std::size_t kAhead = 8;
     YAMLMapping& root = m_Objects.GetMapping();
-    root.Reserve(m_Documents.size());
-    Readers readers(m_Base ? m_Base->End() : End());
-    for (Document& document : m_Documents) {
-        const Document* lender = document.lender == kNone ? nullptr : &m_Base->m_Documents[document.lender];
-        if (lender && lender->isLendable) {
-            // Nearly always done by now, while the object was at hand.
-            if (!lender->isMarked) lender->object->MarkAsShared();
-            root.Append(lender->fileID, lender->object);
-            continue;
-        }
-        if (lender) {
-            document.lender = kNone;
-            const char* const begin = std::exchange(document.begin, lender->begin);
+    const std::span documents(&(run.isLent ? m_Base : this)->m_Documents[run.first], run.count);
+    for (std::size_t i = 0; i < documents.size(); offset += documents[i++].length) {
+        if (i + kAhead < documents.size()) root.PrefetchKey(documents[i + kAhead].fileID);
+        Document document = documents[i];
+        if (run.isLent && !document.isLendable) {
+            document = {document.begin, document.length};
             ReadDocuments(readers, {&document, 1});
-            document.begin = begin;
         }
         if (document.object)
             root.Append(document.fileID, document.object);
-        else if (!ReadByLibrary(document, &document == &m_Documents.back()))
-            return;
+        else if (!ReadByLibrary(document, offset))
+            return false;
     }
+    return true;
 }
 
 /// Reads the next document of a walker that began at `offset`.
@@ -346,13 +438,13 @@ bool ObjectFile::ReadNext(ChunkWalker& walker, std::size_t offset) const {
     }
 }
 
-/// Reads a single document with libyaml. If it doesn't end where the next one begins, all that follows goes
-/// the same way, and false is returned.
-bool ObjectFile::ReadByLibrary(const Document& document, bool isLast) {
+/// Reads the single document at `offset` with libyaml. If it doesn't end where the next one begins, all that
+/// follows goes the same way, and false is returned.
+bool ObjectFile::ReadByLibrary(const Document& document, std::size_t offset) {
     NeedWholeText();
-    const auto offset = static_cast<std::size_t>(document.begin - m_Text->data());
+    const bool isLast = offset + document.length == m_Length;
     std::string chunk(m_Header);
-    chunk.append(document.begin, document.length);
+    chunk.append(*m_Text, offset, document.length);
     if (!isLast) chunk += kDocumentMark;
     ChunkWalker walker(std::move(chunk), std::string(m_Header), m_Objects.GetMapping(), m_AliasBudget);
     if (!ReadNext(walker, offset)) return false;

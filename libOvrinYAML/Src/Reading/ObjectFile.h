@@ -1,12 +1,12 @@
 #pragma once
 
+#include "Reading/DocumentIndex.h"
 #include "Reading/DocumentLoader.h"
+#include "Reading/PartReading.h"
 #include "Reading/ReaderOptions.h"
 #include "Reading/TextWindow.h"
 #include "Values/OvrinObjects.h"
-#include "Values/SeededHash.h"
 
-#include <atomic>
 #include <cstddef>
 #include <cstdint>
 #include <memory>
@@ -14,7 +14,6 @@
 #include <span>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
 
 namespace ovrin_yaml {
@@ -45,13 +44,16 @@ template <class Builder> class WrittenFormReader;
 class ObjectFile {
 public:
     /// Fills `objects`, which must be empty and outlive the file.
-    ObjectFile(OvrinObjects& objects, ReaderOptions options) : m_Objects(objects), m_Options(options) {}
+    ObjectFile(OvrinObjects& objects, ReaderOptions options);
+    ~ObjectFile();
     ObjectFile(const ObjectFile&) = delete;
     ObjectFile& operator=(const ObjectFile&) = delete;
 
     /// Takes the bytes of a whole file, up to the first NUL. Throws YAMLError for a file without the
     /// signature.
     void Take(std::string bytes);
+    /// The same of one in which it is known where the documents begin.
+    void TakeCut(CutText text);
     /// The same for a text that needs no signature.
     void TakeText(std::string text);
     /// Takes a file and cuts it along `base`, as below, without ever having it all in memory. False, with
@@ -70,20 +72,23 @@ private:
     struct Document {
         const char* begin;
         std::size_t length;
-        std::size_t lender;            // the base's document in the same words, or kNone
         YAMLMapping* object = nullptr; // null: not read, or left to libyaml
         YAMLScalar* fileID = nullptr;  // of the object
-        std::uint8_t wantedBy = 0;     // files that would take the object, a bit each; set by several threads
+        std::uint8_t wantedBy = 0;     // files that would take the object, a bit each
         bool isLendable = false; // the object may be copied before a change, so another file may take it
-        bool isMarked = false;   // the object is marked as shared
         bool isAsWritten = false;
+    };
+    /// Documents that stand one behind the other, in this file and in m_Documents, its own or the base's.
+    struct Run {
+        std::size_t first, count;
+        bool isLent; // by the base, which has them in the same words
     };
     using TreeReader = WrittenFormReader<BatchedBuilder>;
     using Recognition = WrittenFormReader<Recogniser>;
     struct Piece {
-        std::size_t first, end; // documents
+        std::size_t first, end; // documents of its own
     };
-    static constexpr std::size_t kNone = SIZE_MAX;
+    static constexpr std::size_t kNone = DocumentIndex::kMissing;
     static constexpr std::size_t kAtOnce = 32; // documents
 
     static std::string_view FileIDOf(const Document& document);
@@ -91,16 +96,18 @@ private:
     void BecomeTakerOf(ObjectFile& base);
     bool MayShareWith(const ObjectFile& base) const;
     static bool StandsAt(const Document& document, TextWindow& window);
-    std::size_t FindLender(std::string_view document, std::size_t& expected) const;
+    std::size_t FindLender(std::string_view document, std::size_t& expected);
+    std::size_t FindInBase(std::string_view fileID, std::size_t expected);
     std::size_t IndexOf(std::string_view fileID) const;
     void CutAlong(ObjectFile& base, TextWindow& window);
+    void AddToRun(std::size_t document, bool isLent);
     void KeepOwn(std::string own);
     void NeedWholeText();
-    void ReserveDocuments(std::size_t count);
-    void AddDocument(const char* begin, std::size_t length, std::size_t lender);
+    template <class Visit> void ForEachRun(const Visit& visit) const;
     void CutAlone();
+    void NoteWants();
     class Readers;
-
+    template <class Work> void WithReaders(const char* end, const Work& work);
     void ReadDocuments(Readers& readers, std::span<Document> documents) const;
     bool IsWantedByAll(const Document& document) const;
     bool Recognise(Readers& readers, Document& document) const;
@@ -108,27 +115,33 @@ private:
     static void InternIDs(std::span<Document> documents);
     void Complete(Document& document) const;
     void FinishDocuments();
+    bool FinishRun(const Run& run, Readers& readers, std::size_t& offset);
     bool ReadNext(ChunkWalker& walker, std::size_t offset) const;
-    bool ReadByLibrary(const Document& document, bool isLast);
+    bool ReadByLibrary(const Document& document, std::size_t offset);
     void ReadRestByLibrary(std::size_t offset);
 
     OvrinObjects& m_Objects;
     const ReaderOptions m_Options;
     ObjectFile* m_Base = nullptr;
-    std::atomic<unsigned> m_TakerCount = 0;    // files to be cut along this one
-    std::uint8_t m_TakerBit = 0;               // of this one among those of the base
+    std::mutex m_TakersLock;
+    std::vector<const ObjectFile*> m_Takers;   // files to be cut along this one
     std::shared_ptr<const std::string> m_Text; // the documents of its own alone, or the whole
     std::size_t m_Length = 0;                  // of the whole
     bool m_HasWholeText = true;
     std::shared_ptr<TreeMaker> m_Maker; // of the objects that are only recognised
     std::string_view m_Header;
-    std::vector<Document> m_Documents; // empty: libyaml reads all of the text
+    std::vector<std::size_t> m_Starts; // of documents in the text, but for the first, where they are known
+    std::vector<Document> m_Documents; // its own
+    std::vector<Run> m_Runs;           // empty: libyaml reads all of the text
+    std::size_t m_UnfoundCount = 0;    // documents taken for new without a search in all of the base
     std::vector<Piece> m_Pieces;
+    std::mutex m_ReadersLock;
+    std::vector<std::unique_ptr<Readers>> m_IdleReaders; // for this file and its takers
     AliasBudget m_AliasBudget;
 
-    // File id to document, for the files that are cut along this one; made by the first that asks.
+    // For the files that are cut along this one; made by the first that asks.
     mutable std::mutex m_IndexLock;
-    mutable std::unordered_map<std::string_view, std::size_t, SeededHash> m_Index;
+    mutable DocumentIndex m_Index;
 };
 
 } // namespace ovrin_yaml

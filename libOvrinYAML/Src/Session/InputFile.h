@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Reading/PartReading.h"
 #include "Reading/TextWindow.h"
 
 #include <cstddef>
@@ -19,12 +20,14 @@ struct InputFile {
     /// Where there is one, begins to read the file from its start, for those who need not have it in memory
     /// as a whole: `take` may still be called afterwards. On any thread; may throw.
     std::function<ByteSource()> open = {};
+    /// Where there is one, begins to read the file in parts, in any order. As `open` otherwise.
+    std::function<PartSource()> openParts = {};
 };
 
 /// A file that is in memory already.
 inline InputFile TextInput(std::string name, std::string text) {
     const std::size_t size = text.size();
-    return {std::move(name), size, [text = std::move(text)]() mutable { return std::move(text); }, {}};
+    return {std::move(name), size, [text = std::move(text)]() mutable { return std::move(text); }, {}, {}};
 }
 
 } // namespace ovrin_yaml

@@ -4,15 +4,15 @@
 #include "Repair/ObjectTraits.h"
 #include "Session/MergeError.h"
 #include "Session/StageWatcher.h"
+#include "Session/Tasks.h"
 
-#include <algorithm>
-#include <atomic>
 #include <deque>
 #include <exception>
 #include <functional>
 #include <new>
 #include <optional>
-#include <thread>
+#include <utility>
+#include <vector>
 
 namespace ovrin_yaml {
 
@@ -45,8 +45,21 @@ struct FileInWork {
         if (input.size == 0) m_Stream.emplace([this] { TakeHere(); });
     }
 
+    /// Gets hold of the bytes on all threads, where that can be done; otherwise Take will.
+    void TakeInParts() {
+        if (!input.openParts) return;
+        Try([this] {
+            std::optional<CutText> text =
+                ReadInParts(input.openParts(), input.size, RunnerFor(Threads::Everywhere));
+            if (!text) return;
+            file.TakeCut(std::move(*text));
+            m_IsTaken = true;
+        });
+    }
+
     /// Gets hold of the bytes, as far as they are wanted ahead of the first file's.
     void Take(bool isFirst) {
+        if (m_IsTaken) return;
         if (m_Stream)
             m_Stream->Join();
         else if (isFirst || !input.open)
@@ -82,6 +95,7 @@ private:
     }
 
     std::optional<Thread> m_Stream;
+    bool m_IsTaken = false;
 };
 
 /// Below this size of all files together, threads cost more than they bring.
@@ -93,19 +107,9 @@ bool IsLittleWork(const std::deque<FileInWork>& files) {
     return bytes < kLittleWork;
 }
 
-/// Carries out the tasks on as many threads as the machine has processors, handing them out in their order.
-void RunTasks(const std::vector<std::function<void()>>& tasks, bool isLittle) {
-    std::atomic<std::size_t> next = 0;
-    const auto work = [&] {
-        for (std::size_t i = next++; i < tasks.size(); i = next++) tasks[i]();
-    };
-    const std::size_t processors = isLittle ? 1 : std::max(2u, std::thread::hardware_concurrency());
-    const std::size_t count = std::min(tasks.size(), processors);
-    std::vector<Thread> threads;
-    threads.reserve(count);
-    while (threads.size() < count) threads.emplace_back(work, isLittle);
-    for (Thread& thread : threads) thread.Join();
-    for (const Thread& thread : threads) thread.CheckForExceptions();
+void RunAll(const std::vector<std::function<void()>>& tasks, bool isLittle) {
+    RunTasks(
+        tasks.size(), [&](std::size_t i) { tasks[i](); }, isLittle);
 }
 
 void ReadPieces(FileInWork& work) {
@@ -114,12 +118,11 @@ void ReadPieces(FileInWork& work) {
 }
 
 /// First the bytes of all files. Then the others are cut along the first; by then it is known which of its
-/// objects they want. All pieces are read, in any order, and last the objects are put together in the order
-/// of the files.
+/// objects they want. All pieces are read, in any order, and last the objects of each file are put together.
 void ReadOnThreads(std::deque<FileInWork>& files, bool isLittle, StageWatcher* watcher) {
     const WatchedStep step(watcher, "Read base, left and right");
     FileInWork& first = files.front();
-    std::vector<std::function<void()>> takes, cuts, pieces;
+    std::vector<std::function<void()>> takes, cuts, pieces, ends;
     for (FileInWork& work : files) {
         takes.emplace_back([&] {
             work.Take(&work == &first);
@@ -127,16 +130,17 @@ void ReadOnThreads(std::deque<FileInWork>& files, bool isLittle, StageWatcher* w
         });
         if (&work != &first) cuts.emplace_back([&] { work.CutAlong(first.file); });
     }
-    RunTasks(takes, isLittle);
-    RunTasks(cuts, isLittle);
+    if (!isLittle) first.TakeInParts();
+    RunAll(takes, isLittle);
+    RunAll(cuts, isLittle);
     for (FileInWork& work : files) {
         const std::size_t count = work.failure ? 0 : work.file.MakePieces();
         for (std::size_t piece = 0; piece < count; ++piece)
             pieces.emplace_back([&work, piece] { work.file.ReadPiece(piece); });
     }
-    RunTasks(pieces, isLittle);
-
-    for (FileInWork& work : files) work.Try([&] { work.file.Finish(); });
+    for (FileInWork& work : files) ends.emplace_back([&work] { work.Try([&] { work.file.Finish(); }); });
+    RunAll(pieces, isLittle);
+    RunAll(ends, isLittle);
     for (const FileInWork& work : files)
         if (work.failure) std::rethrow_exception(work.failure);
 }

@@ -34,25 +34,30 @@ void* AllocateZeroed(std::size_t bytes) {
     return memory;
 }
 
+void* AllocateOnHugePages(std::size_t bytes) {
+    if (bytes < kHugePage) return ThrowIfNull(std::malloc(bytes));
+    void* memory = ThrowIfNull(std::aligned_alloc(kHugePage, bytes));
+    AdviseHugePages(memory, bytes);
+    return memory;
+}
+
+void FreeOnHugePages(void* memory) {
+    std::free(memory);
+}
+
 #if !defined(OVRIN_SINGLE_ALLOCATIONS)
 
 namespace {
 
 constexpr std::size_t kLargestChunk = 2 * kHugePage;
 
-char* AllocateChunk(std::size_t bytes) {
-    if (bytes < kHugePage) return static_cast<char*>(::operator new(bytes));
-    char* chunk = static_cast<char*>(ThrowIfNull(std::aligned_alloc(kHugePage, bytes)));
-    AdviseHugePages(chunk, bytes);
-    return chunk;
-}
-
 } // namespace
 
 /// Small programs touch little memory, large ones ask for chunks seldom: chunks double up to a bound.
 void* ThreadArena::AllocateFromNewChunk(std::size_t bytes) {
+    if (bytes >= kHugePage / 2) return AllocateOnHugePages((bytes + kHugePage - 1) & ~(kHugePage - 1));
     if (bytes > nextChunk / 4) return ::operator new(bytes);
-    position = AllocateChunk(nextChunk);
+    position = static_cast<char*>(AllocateOnHugePages(nextChunk));
     left = nextChunk - bytes;
     nextChunk = std::min(nextChunk * 2, kLargestChunk);
     char* piece = position;

@@ -44,6 +44,23 @@ template <class T> struct ArenaAllocator {
     template <class U> bool operator==(const ArenaAllocator<U>&) const { return true; }
 };
 
+/// Memory for a big piece that is given back, on huge pages from its first byte on where it fills some.
+void* AllocateOnHugePages(std::size_t bytes);
+void FreeOnHugePages(void* memory);
+
+/// A stateless allocator for big arrays over these.
+template <class T> struct HugePageAllocator {
+    using value_type = T;
+
+    HugePageAllocator() = default;
+    template <class U> HugePageAllocator(const HugePageAllocator<U>&) {}
+
+    T* allocate(std::size_t count) { return static_cast<T*>(AllocateOnHugePages(count * sizeof(T))); }
+    void deallocate(T* memory, std::size_t) { FreeOnHugePages(memory); }
+
+    template <class U> bool operator==(const HugePageAllocator<U>&) const { return true; }
+};
+
 #if defined(OVRIN_SINGLE_ALLOCATIONS)
 
 inline void* ArenaAllocate(std::size_t bytes) {

@@ -26,17 +26,13 @@ std::uint32_t KeyIndex::Find(const YAMLScalar* key) const {
 
 std::size_t KeyIndex::PlaceOf(const YAMLScalar* key) const {
     const std::size_t mask = m_Slots.size() - 1;
-    // Addresses are multiples of eight and close to each other: spread them (Fibonacci hashing).
-    std::size_t place = (reinterpret_cast<std::uintptr_t>(key) >> 3) * 0x9e3779b97f4a7c15u >> 20;
+    std::size_t place = FirstPlaceOf(key);
     while (m_Slots[place & mask].key && m_Slots[place & mask].key != key) ++place;
     return place & mask;
 }
 
 void KeyIndex::Rehash(std::size_t capacity) {
-    std::vector<Slot> old;
-    old.reserve(capacity);
-    AdviseHugePages(old.data(), capacity * sizeof(Slot));
-    old.resize(capacity);
+    SlotVector old(capacity);
     old.swap(m_Slots);
     for (const Slot& slot : old)
         if (slot.key) m_Slots[PlaceOf(slot.key)] = slot;

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "Values/Arena.h"
+
 #include <cstddef>
 #include <cstdint>
 #include <vector>
@@ -24,6 +26,10 @@ public:
     void Set(const YAMLScalar* key, std::uint32_t position);
     /// The position last set for `key`, or kMissing.
     std::uint32_t Find(const YAMLScalar* key) const;
+    /// Starts to load where `key` would be found first.
+    void Prefetch(const YAMLScalar* key) const {
+        if (!m_Slots.empty()) __builtin_prefetch(&m_Slots[FirstPlaceOf(key) & (m_Slots.size() - 1)]);
+    }
     /// Keys that have a position.
     std::size_t Count() const { return m_Count; }
 
@@ -33,10 +39,16 @@ private:
         std::uint32_t position = 0;
     };
 
+    /// Addresses are multiples of eight and close to each other: this spreads them (Fibonacci hashing).
+    static std::size_t FirstPlaceOf(const YAMLScalar* key) {
+        return (reinterpret_cast<std::uintptr_t>(key) >> 3) * 0x9e3779b97f4a7c15u >> 20;
+    }
     std::size_t PlaceOf(const YAMLScalar* key) const;
     void Rehash(std::size_t capacity);
 
-    std::vector<Slot> m_Slots; // a power of two, at most half full
+    using SlotVector = std::vector<Slot, HugePageAllocator<Slot>>;
+
+    SlotVector m_Slots; // a power of two, at most half full
     std::size_t m_Count = 0;
 };
 

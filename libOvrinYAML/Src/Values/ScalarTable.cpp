@@ -4,6 +4,7 @@
 #include "Values/YAMLError.h"
 
 #include <algorithm>
+#include <cmath>
 #include <cstring>
 #include <memory>
 #include <new>
@@ -49,7 +50,10 @@ void ScalarTable::PrefetchScalar(std::uint32_t hash) const {
 }
 
 void ScalarTable::Reserve(std::size_t count) {
-    const std::size_t capacity = count * 3 / 2 / m_Shards.size() + 1;
+    // No shard gets exactly its share: with five standard deviations more hardly one has to grow.
+    const std::size_t share = count / m_Shards.size() + 1;
+    const auto most = share + 5 * static_cast<std::size_t>(std::sqrt(static_cast<double>(share)));
+    const std::size_t capacity = most * 3 / 2 + 1;
     if (capacity <= kFirstCapacity) return;
     const auto isSmaller = [capacity](const Shard& shard) {
         const Slots* slots = shard.slots.load(std::memory_order_relaxed);

@@ -193,6 +193,10 @@ public:
     /// and one whose source bytes are known forgets them. Null or a throw as with Get.
     YAMLNode* GetForChange(const YAMLScalar* key);
     bool HasKey(const YAMLScalar* key) const { return Get(key) != nullptr; }
+    /// Starts to load what a big mapping is asked for `key` with. Any pointer will do, as it isn't followed.
+    void PrefetchKey(const YAMLScalar* key) const {
+        if (const KeyIndex* index = Index()) index->Prefetch(key);
+    }
     std::size_t Size() const;
     Iterator begin() const;
     Iterator end() const;
