@@ -51,7 +51,7 @@ const ChangeSequenceOperation* DiffKeyOrder(const MergeRules& rules, const YAMLM
     YAMLSequence* destKeys = KeysOf(dest);
     // Never null: the lists differ. They are told apart by their keys, for lists of one hash need not be
     // equal.
-    const YAMLSequenceRemapper* remapper = FindKeyListMapping(baseKeys, destKeys);
+    const YAMLSequenceRemapper* remapper = FindKeyListMapping(baseKeys, destKeys, *dest);
     const YAMLSequenceDiff* diff =
         YAMLSequenceDiff::Diff(context, remapper->Arrange(baseKeys->m_Items), destKeys->m_Items);
     const bool mergeable = rules.IsMergeablePath(context.path, destKeys);

@@ -2,6 +2,7 @@
 
 #include "Diff/EqualityMatcher.h"
 #include "Values/KeyIndex.h"
+#include "Values/YAMLMapping.h"
 
 #include <algorithm>
 #include <memory>
@@ -100,17 +101,24 @@ YAMLSequenceRemapper* FindMapping(const DiffContext& context, const YAMLSequence
     return UnlessIdentity(remapper);
 }
 
-YAMLSequenceRemapper* FindKeyListMapping(const YAMLSequence* base, const YAMLSequence* dest) {
+YAMLSequenceRemapper* FindKeyListMapping(const YAMLSequence* base, const YAMLSequence* dest,
+                                         const YAMLMapping& mapping) {
     const auto& from = base->m_Items;
     const auto& to = dest->m_Items;
     YAMLSequenceRemapper* remapper = YAMLAlloc<YAMLSequenceRemapper>::create(from.size(), to.size(), true);
+    // A mapping knows where its keys stand, but not how many of those in front of them were removed.
+    const bool hasHoles = mapping.RawEntries().size() != to.size();
     std::unique_ptr<KeyIndex> indexes;
+    const auto indexOf = [&](const YAMLScalar* key) {
+        if (!hasHoles) return mapping.Find(key);
+        if (!indexes) indexes = IndexTexts(to);
+        return indexes->Find(key);
+    };
     std::size_t next = 0;
     for (std::size_t i = 0; i < from.size(); ++i) {
-        // Most keys stand behind the one that they stood behind: an index is only made when one doesn't.
+        // Most keys stand behind the one that they stood behind.
         if (next == to.size() || to[next] != from[i]) {
-            if (!indexes) indexes = IndexTexts(to);
-            const std::uint32_t found = indexes->Find(AsScalar(from[i]));
+            const std::uint32_t found = indexOf(AsScalar(from[i]));
             if (found == KeyIndex::kMissing) continue;
             next = found;
         }

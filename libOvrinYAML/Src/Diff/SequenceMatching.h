@@ -8,13 +8,16 @@
 
 namespace ovrin_yaml {
 
+class YAMLMapping;
+
 /// The map that brings `base` into the order of `dest`, by key where every element of both has a key of its
 /// own, by equality otherwise; null if every element stays where it is. The path chooses the rule.
 YAMLSequenceRemapper* FindMapping(const DiffContext& context, const YAMLSequence* base,
                                   const YAMLSequence* dest);
 
-/// The same for two lists of texts that stand in each of them once, as the keys of mappings do.
-YAMLSequenceRemapper* FindKeyListMapping(const YAMLSequence* base, const YAMLSequence* dest);
+/// The same for two lists of the keys of mappings, of which `dest` has that of `mapping`.
+YAMLSequenceRemapper* FindKeyListMapping(const YAMLSequence* base, const YAMLSequence* dest,
+                                         const YAMLMapping& mapping);
 
 /// The same by equality: a common prefix and suffix, which may overlap, and between them each base element
 /// with the first equal destination element that is still free.

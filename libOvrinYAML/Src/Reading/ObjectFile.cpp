@@ -354,19 +354,22 @@ void ObjectFile::Read(TreeReader& reader, Document& document) const {
 /// Of objects that were recognised. All are asked for before the first is looked up.
 void ObjectFile::InternIDs(std::span<Document> documents) {
     ScalarTable& table = ScalarTable::Instance();
-    std::array<std::uint32_t, kAtOnce> hashes;
+    struct ID {
+        std::string_view text;
+        std::uint32_t hash;
+    };
+    std::array<ID, kAtOnce> ids;
     const auto forEach = [&](const auto& visit) {
         for (std::size_t i = 0; i < documents.size(); ++i)
-            if (documents[i].object && !documents[i].object->IsBuilt()) visit(documents[i], hashes[i]);
+            if (documents[i].object && !documents[i].object->IsBuilt()) visit(documents[i], ids[i]);
     };
-    forEach([&](const Document& document, std::uint32_t& hash) {
-        hash = ScalarTable::HashOf(FileIDOf(document));
-        table.PrefetchSlot(hash);
+    forEach([&](const Document& document, ID& id) {
+        const std::string_view text = FileIDOf(document);
+        id = {text, ScalarTable::HashOf(text)};
+        table.PrefetchSlot(id.hash);
     });
-    forEach([&](const Document&, std::uint32_t hash) { table.PrefetchScalar(hash); });
-    forEach([&](Document& document, std::uint32_t hash) {
-        document.fileID = table.Intern(FileIDOf(document), hash, 0);
-    });
+    forEach([&](const Document&, const ID& id) { table.PrefetchScalar(id.hash); });
+    forEach([&](Document& document, const ID& id) { document.fileID = table.Intern(id.text, id.hash, 0); });
 }
 
 /// What there is to do with an object that the fast reader has read, as long as it is at hand.

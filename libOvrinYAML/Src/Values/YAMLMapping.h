@@ -200,6 +200,8 @@ public:
     std::size_t Size() const;
     Iterator begin() const;
     Iterator end() const;
+    /// The position of `key` in RawEntries, or KeyIndex::kMissing. Not in the duplicate state.
+    std::uint32_t Find(const YAMLScalar* key) const;
     /// The pair of `key`, or end().
     Iterator FindKey(const YAMLScalar* key) const;
     /// The first pair's value. The mapping must not be empty.
@@ -265,8 +267,6 @@ private:
     std::size_t Room() const { return m_Extra && m_Extra->values ? m_Extra->room : m_Size; }
     void MoveTo(std::size_t room);
     void DropRemoved();
-    /// Position of `key`, or KeyIndex::kMissing.
-    std::uint32_t Find(const YAMLScalar* key) const;
     void PushRaw(const YAMLScalar* key, YAMLNode* value);
     void PushBack(const YAMLScalar* key, YAMLNode* value);
     void BuildIndex();

@@ -16,28 +16,35 @@ class KeyLists {
 public:
     using List = const YAMLScalar* const*;
 
+    struct Known {
+        List list = nullptr;
+        std::size_t count = SIZE_MAX;
+        std::uint64_t note = 0;
+    };
+
     /// The list of keyAt(0), ..., keyAt(count - 1). Null if a key is there twice.
     template <class KeyAt> List Get(std::size_t count, const KeyAt& keyAt) {
+        const Known* known = Get(count, keyAt, [](List) { return std::uint64_t{0}; });
+        return known ? known->list : nullptr;
+    }
+    /// The same, with what note(list) said of it when it was new. Valid until the next call.
+    template <class KeyAt, class Note>
+    const Known* Get(std::size_t count, const KeyAt& keyAt, const Note& note) {
         Known& known = m_Known[PlaceOf(count, keyAt)];
         if (known.count == count) {
             bool isSame = true;
             for (std::size_t i = 0; i < count; ++i) isSame &= known.list[i] == keyAt(i);
-            if (isSame) return known.list;
+            if (isSame) return &known;
         }
         const YAMLScalar** list = Allocate(count);
         for (std::size_t i = 0; i < count; ++i) list[i] = keyAt(i);
         if (HasRepeatedKey({list, count})) return nullptr;
-        known = {list, count};
-        return list;
+        known = {list, count, note(list)};
+        return &known;
     }
 
 private:
     static constexpr unsigned kPlaceBits = 8;
-
-    struct Known {
-        List list = nullptr;
-        std::size_t count = SIZE_MAX;
-    };
 
     /// Three keys tell most lists from each other.
     template <class KeyAt> static std::size_t PlaceOf(std::size_t count, const KeyAt& keyAt) {

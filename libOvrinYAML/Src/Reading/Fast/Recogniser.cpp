@@ -3,17 +3,25 @@
 #include "Reading/Fast/PlainScan.h"
 #include "Values/ObjectTrait.h"
 
+#include <algorithm>
+#include <bit>
+
 namespace ovrin_yaml {
 
 Recogniser::Recogniser()
     : m_StateMachine(YAMLScalar::Lookup("AnimatorStateMachine")),
-      m_Transitions(YAMLScalar::Lookup("m_StateMachineTransitions")) {
-    for (const YAMLScalar* key : {static_cast<const YAMLScalar*>(YAMLScalar::fileID), m_Transitions,
-                                  static_cast<const YAMLScalar*>(YAMLScalar::mFather),
-                                  static_cast<const YAMLScalar*>(YAMLScalar::mPrefabInstance),
-                                  static_cast<const YAMLScalar*>(YAMLScalar::mPrefabInternal),
-                                  static_cast<const YAMLScalar*>(YAMLScalar::mPrefab)})
-        m_MayMatter |= std::uint64_t{1} << key->m_Hash % 64;
+      m_Transitions(YAMLScalar::Lookup("m_StateMachineTransitions")),
+      m_KeysThatMatter{YAMLScalar::fileID,          m_Transitions,
+                       YAMLScalar::mFather,         YAMLScalar::mPrefabInstance,
+                       YAMLScalar::mPrefabInternal, YAMLScalar::mPrefab} {}
+
+/// The pairs of such keys that facts may depend on, a bit each, as far as there are bits.
+std::uint64_t Recogniser::PairsThatMatter(KeyLists::List keys, std::size_t count) const {
+    std::uint64_t pairs = 0;
+    for (std::size_t i = 0; i < std::min(count, kNotedPairs); ++i)
+        if (std::find(m_KeysThatMatter.begin(), m_KeysThatMatter.end(), keys[i]) != m_KeysThatMatter.end())
+            pairs |= std::uint64_t{1} << i;
+    return pairs;
 }
 
 /// What a pair tells of the mapping that it stands in. Notes a prefab link, which counts wherever it is.
@@ -31,10 +39,15 @@ bool Recogniser::CloseMapping(std::size_t mark, bool /*flow*/, std::uint32_t /*l
                               std::size_t headerPairs) {
     const Node* nodes = m_Stack.From(mark);
     const std::size_t count = (m_Stack.Size() - mark) / 2;
-    if (!m_KeyLists.Get(count, [nodes](std::size_t i) { return nodes[2 * i].scalar; })) return false;
+    const KeyLists::Known* known = m_KeyLists.Get(
+        count, [nodes](std::size_t i) { return nodes[2 * i].scalar; },
+        [&](KeyLists::List keys) { return PairsThatMatter(keys, count); });
+    if (!known) return false;
     std::uint32_t facts = kMapping;
-    for (std::size_t i = 0; i < count; ++i)
-        if (MayMatter(nodes[2 * i].scalar)) facts |= FactsOf(nodes[2 * i].scalar, nodes[2 * i + 1].facts);
+    const auto take = [&](std::size_t i) { facts |= FactsOf(nodes[2 * i].scalar, nodes[2 * i + 1].facts); };
+    for (std::uint64_t pairs = known->note; pairs; pairs &= pairs - 1)
+        take(static_cast<std::size_t>(std::countr_zero(pairs)));
+    for (std::size_t i = kNotedPairs; i < count; ++i) take(i);
     if (headerPairs) TakeTraits(nodes, count);
     m_Stack.Cut(mark);
     m_Stack.Push(nullptr, facts);

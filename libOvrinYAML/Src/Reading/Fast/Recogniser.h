@@ -5,6 +5,7 @@
 #include "Reading/Fast/NodeStack.h"
 #include "Values/YAMLScalar.h"
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <string_view>
@@ -76,11 +77,13 @@ private:
 
     std::uint32_t FactsOf(const YAMLScalar* key, std::uint32_t value);
     void TakeTraits(const Node* nodes, std::size_t count);
-    bool MayMatter(const YAMLScalar* key) const { return m_MayMatter >> key->m_Hash % 64 & 1; }
+    std::uint64_t PairsThatMatter(KeyLists::List keys, std::size_t count) const;
+
+    static constexpr std::size_t kNotedPairs = 64;
 
     const YAMLScalar* const m_StateMachine;
     const YAMLScalar* const m_Transitions;
-    std::uint64_t m_MayMatter = 0; // a bit for each key that facts depend on, by its hash
+    const std::array<const YAMLScalar*, 6> m_KeysThatMatter; // that facts depend on
 
     NodeStack<Node> m_Stack;
     KeyLists m_KeyLists;
