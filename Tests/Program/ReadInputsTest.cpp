@@ -65,6 +65,26 @@ TEST_F(ReadInputsTest, NeitherTheReaderNorSharingNorThreadsChangeAMerge) {
     }
 }
 
+TEST_F(ReadInputsTest, NothingDependsOnHowManyObjectsAreEdited) {
+    for (std::uint64_t percent = 0; percent <= 100; percent += 10) {
+        Write({.seed = percent, .objects = 200, .edited = percent * 10000});
+        EXPECT_EQ(CompareAll(), "") << percent;
+    }
+}
+
+/// Big enough to be read in parts and in windows.
+TEST_F(ReadInputsTest, BigFilesAreReadAsSmallOnesAre) {
+    for (const std::uint64_t share : {1000, 500000}) {
+        Write({.size = 4500000, .edited = share});
+        ReaderOptions options = DefaultReaderOptions();
+        const MergeOutcome outcome = Merge(true, options);
+        EXPECT_EQ(outcome.failure, "none");
+        EXPECT_EQ(CompareOutcomes(outcome, Merge(false, options)), "");
+        options.share = options.recognise = false;
+        EXPECT_EQ(CompareOutcomes(outcome, Merge(true, options)), "");
+    }
+}
+
 TEST_F(ReadInputsTest, TheFirstFailureInTheOrderOfTheFilesIsReportedWhateverTheWay) {
     const std::string good = diffs::ObjectText("--- !o!1 &1\na: b\n"), early = "no signature",
                       late = diffs::ObjectText("--- !o!1 &1\na: b\n--- !o!1 &2\n- c\n");
