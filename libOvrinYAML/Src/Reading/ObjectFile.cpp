@@ -1,11 +1,9 @@
 #include "Reading/ObjectFile.h"
 
-#include "Reading/ChunkWalker.h"
 #include "Reading/DocumentCut.h"
 #include "Reading/DocumentTreeMaker.h"
-#include "Reading/Fast/BatchedBuilder.h"
-#include "Reading/Fast/Recogniser.h"
-#include "Reading/Fast/WrittenFormReader.h"
+#include "Reading/LibraryReader.h"
+#include "Reading/ReaderPool.h"
 #include "Values/Arena.h"
 #include "Values/ScalarTable.h"
 #include "Values/YAMLScalar.h"
@@ -15,7 +13,6 @@
 #include <array>
 #include <cassert>
 #include <cstring>
-#include <optional>
 #include <utility>
 
 namespace ovrin_yaml {
@@ -28,33 +25,15 @@ constexpr std::size_t kPieceBytes = std::size_t{1} << 20;
 
 } // namespace
 
-/// The readers that one thread uses, each made when it is needed: they are big, a small file may do with one,
-/// and they read the faster the more they know.
-class ObjectFile::Readers {
-public:
-    /// Of documents of a text that ends at `end`.
-    void SetEnd(const char* end) {
-        m_End = end;
-        if (m_Trees) m_Trees->SetReadableEnd(end);
-        if (m_Recognition) m_Recognition->SetReadableEnd(end);
-    }
-    TreeReader& Trees() { return m_Trees ? *m_Trees : m_Trees.emplace(m_End); }
-    Recognition& Recognisers() { return m_Recognition ? *m_Recognition : m_Recognition.emplace(m_End); }
-    void InternTexts() {
-        if (m_Trees) m_Trees->InternTexts();
-        if (m_Recognition) m_Recognition->InternTexts();
-    }
-
-private:
-    const char* m_End = nullptr;
-    std::optional<TreeReader> m_Trees;
-    std::optional<Recognition> m_Recognition;
-};
-
 ObjectFile::ObjectFile(OvrinObjects& objects, ReaderOptions options)
-    : m_Objects(objects), m_Options(options) {}
+    : m_Objects(objects), m_Options(options), m_Pool(std::make_unique<ReaderPool>()) {}
 
 ObjectFile::~ObjectFile() = default;
+
+/// That of the base, which may know the keys already.
+ReaderPool& ObjectFile::Pool() {
+    return m_Base ? *m_Base->m_Pool : *m_Pool;
+}
 
 std::string_view ObjectFile::FileIDOf(const Document& document) {
     return ovrin_yaml::FileIDOf({document.begin, document.length});
@@ -294,34 +273,15 @@ std::size_t ObjectFile::MakePieces() {
 }
 
 void ObjectFile::ReadPiece(std::size_t piece) {
-    WithReaders(End(), [&](Readers& readers) {
+    Pool().With(End(), [&](DocumentReaders& readers) {
         for (std::size_t i = m_Pieces[piece].first; i < m_Pieces[piece].end; i += kAtOnce)
             ReadDocuments(readers, {&m_Documents[i], std::min(kAtOnce, m_Pieces[piece].end - i)});
     });
 }
 
-/// Calls work(readers) with readers for a text that ends at `end`: the base's, which are free at the moment,
-/// or new ones. What fails with them does so for good.
-template <class Work> void ObjectFile::WithReaders(const char* end, const Work& work) {
-    ObjectFile& owner = m_Base ? *m_Base : *this;
-    std::unique_ptr<Readers> readers;
-    {
-        const std::lock_guard lock(owner.m_ReadersLock);
-        if (!owner.m_IdleReaders.empty()) {
-            readers = std::move(owner.m_IdleReaders.back());
-            owner.m_IdleReaders.pop_back();
-        }
-    }
-    if (!readers) readers = std::make_unique<Readers>();
-    readers->SetEnd(end);
-    work(*readers);
-    const std::lock_guard lock(owner.m_ReadersLock);
-    owner.m_IdleReaders.push_back(std::move(readers));
-}
-
-void ObjectFile::ReadDocuments(Readers& readers, std::span<Document> documents) const {
+void ObjectFile::ReadDocuments(DocumentReaders& readers, std::span<Document> documents) const {
     for (Document& document : documents)
-        if (!IsWantedByAll(document) || !Recognise(readers, document)) Read(readers.Trees(), document);
+        if (!IsWantedByAll(document) || !Recognise(readers, document)) Read(readers, document);
     readers.InternTexts();
     InternIDs(documents);
     for (Document& document : documents)
@@ -334,7 +294,7 @@ bool ObjectFile::IsWantedByAll(const Document& document) const {
 
 /// False for an object whose tree is needed: one that would be written in another way, which goes by the
 /// tree, or that nobody may share.
-bool ObjectFile::Recognise(Readers& readers, Document& document) const {
+bool ObjectFile::Recognise(DocumentReaders& readers, Document& document) const {
     const std::string_view text(document.begin, document.length);
     const auto [object, isAsWritten] = readers.Recognisers().Read(text, kFileHeaderLines);
     if (!object || !isAsWritten || object->Traits() & m_Options.unshared) return false;
@@ -344,9 +304,9 @@ bool ObjectFile::Recognise(Readers& readers, Document& document) const {
     return true;
 }
 
-void ObjectFile::Read(TreeReader& reader, Document& document) const {
+void ObjectFile::Read(DocumentReaders& readers, Document& document) const {
     // The parser counts the lines of the file's header in every document.
-    const auto read = reader.Read({document.begin, document.length}, kFileHeaderLines);
+    const auto read = readers.Trees().Read({document.begin, document.length}, kFileHeaderLines);
     document.object = read.object;
     document.isAsWritten = read.isAsWritten;
 }
@@ -389,7 +349,7 @@ void ObjectFile::Finish() {
     // A text that ends behind the first marker holds no document.
     if (m_Length <= m_Header.size() + 5) return;
     if (m_Runs.empty())
-        ReadRestByLibrary(m_Header.size());
+        Library().ReadRest(m_Header.size());
     else
         FinishDocuments();
     // One of objects that are unbuilt has no hash, as they have none.
@@ -401,7 +361,7 @@ void ObjectFile::FinishDocuments() {
     for (const Run& run : m_Runs) count += run.count;
     m_Objects.GetMapping().Reserve(count);
     std::size_t offset = m_Header.size();
-    WithReaders((m_Base ? m_Base : this)->End(), [&](Readers& readers) {
+    Pool().With((m_Base ? m_Base : this)->End(), [&](DocumentReaders& readers) {
         for (const Run& run : m_Runs)
             if (!FinishRun(run, readers, offset)) return;
     });
@@ -409,7 +369,7 @@ void ObjectFile::FinishDocuments() {
 
 /// Adds the objects of a run that begins at `offset`, which becomes that of its end. False if the rest of the
 /// file is done, too.
-bool ObjectFile::FinishRun(const Run& run, Readers& readers, std::size_t& offset) {
+bool ObjectFile::FinishRun(const Run& run, DocumentReaders& readers, std::size_t& offset) {
     // The places of keys in the root lie far from each other in memory: ask for those that come next.
     constexpr std::size_t kAhead = 8;
     YAMLMapping& root = m_Objects.GetMapping();
@@ -421,48 +381,18 @@ bool ObjectFile::FinishRun(const Run& run, Readers& readers, std::size_t& offset
             document = {document.begin, document.length};
             ReadDocuments(readers, {&document, 1});
         }
-        if (document.object)
+        if (document.object) {
             root.Append(document.fileID, document.object);
-        else if (!ReadByLibrary(document, offset))
-            return false;
+        } else {
+            NeedWholeText();
+            if (!Library().ReadDocument(offset, document.length)) return false;
+        }
     }
     return true;
 }
 
-/// Reads the next document of a walker that began at `offset`.
-bool ObjectFile::ReadNext(ChunkWalker& walker, std::size_t offset) const {
-    try {
-        return walker.ReadDocument();
-    } catch (YAMLError& error) {
-        const char* begin = m_Text->data() + std::min(offset + walker.Position(), m_Text->size());
-        const auto linesBefore = std::count(m_Text->data(), begin, '\n');
-        error.SetPlace(ovrin_yaml::FileIDOf({begin, End()}), static_cast<std::uint32_t>(linesBefore) + 1);
-        throw;
-    }
-}
-
-/// Reads the single document at `offset` with libyaml. If it doesn't end where the next one begins, all that
-/// follows goes the same way, and false is returned.
-bool ObjectFile::ReadByLibrary(const Document& document, std::size_t offset) {
-    NeedWholeText();
-    const bool isLast = offset + document.length == m_Length;
-    std::string chunk(m_Header);
-    chunk.append(*m_Text, offset, document.length);
-    if (!isLast) chunk += kDocumentMark;
-    ChunkWalker walker(std::move(chunk), std::string(m_Header), m_Objects.GetMapping(), m_AliasBudget);
-    if (!ReadNext(walker, offset)) return false;
-    if (!isLast && walker.Position() == document.length) return true;
-    ReadRestByLibrary(offset + walker.Position());
-    return false;
-}
-
-/// Reads everything from the document at `offset` on with libyaml.
-void ObjectFile::ReadRestByLibrary(std::size_t offset) {
-    std::string text(m_Header);
-    text.append(*m_Text, offset);
-    ChunkWalker walker(std::move(text), std::string(m_Header), m_Objects.GetMapping(), m_AliasBudget);
-    while (ReadNext(walker, offset)) {
-    }
+LibraryReader ObjectFile::Library() {
+    return {*m_Text, m_Header, m_Objects.GetMapping(), m_AliasBudget};
 }
 
 } // namespace ovrin_yaml

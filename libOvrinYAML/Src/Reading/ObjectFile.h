@@ -18,10 +18,9 @@
 
 namespace ovrin_yaml {
 
-class BatchedBuilder;
-class ChunkWalker;
-class Recogniser;
-template <class Builder> class WrittenFormReader;
+class DocumentReaders;
+class LibraryReader;
+class ReaderPool;
 
 /// An object file on its way from text to objects.
 ///
@@ -83,8 +82,6 @@ private:
         std::size_t first, count;
         bool isLent; // by the base, which has them in the same words
     };
-    using TreeReader = WrittenFormReader<BatchedBuilder>;
-    using Recognition = WrittenFormReader<Recogniser>;
     struct Piece {
         std::size_t first, end; // documents of its own
     };
@@ -106,19 +103,16 @@ private:
     template <class Visit> void ForEachRun(const Visit& visit) const;
     void CutAlone();
     void NoteWants();
-    class Readers;
-    template <class Work> void WithReaders(const char* end, const Work& work);
-    void ReadDocuments(Readers& readers, std::span<Document> documents) const;
+    ReaderPool& Pool();
+    void ReadDocuments(DocumentReaders& readers, std::span<Document> documents) const;
     bool IsWantedByAll(const Document& document) const;
-    bool Recognise(Readers& readers, Document& document) const;
-    void Read(TreeReader& reader, Document& document) const;
+    bool Recognise(DocumentReaders& readers, Document& document) const;
+    void Read(DocumentReaders& readers, Document& document) const;
     static void InternIDs(std::span<Document> documents);
     void Complete(Document& document) const;
     void FinishDocuments();
-    bool FinishRun(const Run& run, Readers& readers, std::size_t& offset);
-    bool ReadNext(ChunkWalker& walker, std::size_t offset) const;
-    bool ReadByLibrary(const Document& document, std::size_t offset);
-    void ReadRestByLibrary(std::size_t offset);
+    bool FinishRun(const Run& run, DocumentReaders& readers, std::size_t& offset);
+    LibraryReader Library();
 
     OvrinObjects& m_Objects;
     const ReaderOptions m_Options;
@@ -135,8 +129,7 @@ private:
     std::vector<Run> m_Runs;           // empty: libyaml reads all of the text
     std::size_t m_UnfoundCount = 0;    // documents taken for new without a search in all of the base
     std::vector<Piece> m_Pieces;
-    std::mutex m_ReadersLock;
-    std::vector<std::unique_ptr<Readers>> m_IdleReaders; // for this file and its takers
+    const std::unique_ptr<ReaderPool> m_Pool; // for this file and its takers
     AliasBudget m_AliasBudget;
 
     // For the files that are cut along this one; made by the first that asks.

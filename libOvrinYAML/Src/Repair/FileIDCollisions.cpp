@@ -104,6 +104,7 @@ void RewriteReferences(const std::vector<NewID>& newIDs, YAMLMapping& root) {
         return rewriter.RefersToMoved(mapping);
     };
     std::vector<const YAMLScalar*> movedIDs;
+    movedIDs.reserve(newIDs.size());
     for (const NewID& newID : newIDs) movedIDs.push_back(newID.from);
     const IDFilter moved(movedIDs);
     const auto isMoved = [&](std::string_view id) {
