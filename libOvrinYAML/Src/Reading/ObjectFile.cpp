@@ -285,8 +285,9 @@ std::size_t ObjectFile::MakePieces() {
         piece = {piece.end, piece.end};
         bytes = 0;
     }
+    // One that failed while it was cut may have no text.
     for (const ObjectFile* taker : m_Takers)
-        if (taker->m_Base) bytesToBuild += taker->m_Text->size();
+        if (taker->m_Base && taker->m_Text) bytesToBuild += taker->m_Text->size();
     // A guess that spares the table most of its growing.
     constexpr std::size_t kBytesPerScalar = 56;
     if (!m_Base) ScalarTable::Instance().Reserve(m_Documents.size() + bytesToBuild / kBytesPerScalar);
