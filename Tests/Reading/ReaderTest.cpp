@@ -1,3 +1,4 @@
+#include "Reading/ObjectFile.h"
 #include "Reading/ObjectFileReader.h"
 #include "Support/Documents.h"
 
@@ -227,6 +228,20 @@ TEST(Reader, AHundredDirectivesAreTheLimit) {
     for (int i = 2; i < 100; ++i) header += "%TAG !a" + std::to_string(i) + "! tag:t\n";
     EXPECT_EQ(ReadError(header + "--- !o!1 &2\na: 1\n"), "none");
     EXPECT_EQ(ReadError(header + "%TAG !b! tag:t\n--- !o!1 &2\na: 1\n"), "Too many directives");
+}
+
+/// The base's line of that id would be looked through for each document that has it, too.
+TEST(Reader, ALongHeaderLineIsNoReasonToLookLong) {
+    OvrinObjects objects, others;
+    ObjectFile base(objects, {}), left(others, {});
+    base.Take(ObjectText("--- !o!1 &2 " + std::string(16000000, 'x') + "\na: 1\n"));
+    base.Cut(nullptr);
+    std::string documents;
+    for (int i = 0; i < 300; ++i) documents += "--- !o!1 &" + std::to_string(1000 + i) + "\n";
+    for (int i = 0; i < 200000; ++i) documents += "--- !o!1 &2\n";
+    left.Take(ObjectText(documents));
+    left.Cut(&base);
+    EXPECT_EQ(left.MakePieces(), 3u);
 }
 
 TEST(Reader, LevelsBehindAliasesCount) {

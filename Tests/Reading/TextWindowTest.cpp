@@ -44,6 +44,19 @@ TEST(TextWindow, DocumentsMayBeLongerThanAnyRoomForThem) {
     EXPECT_TRUE(Documents(TextWindow(InSteps(text, 999))) == all);
 }
 
+/// Whoever looks far ahead at each step makes the window move its bytes only now and then.
+TEST(TextWindow, SmallStepsWithALongViewReadSeldom) {
+    constexpr std::size_t kView = 2000000, kStep = 1000;
+    const std::string text(5 * kView, 'x');
+    std::size_t reads = 0;
+    TextWindow window([&, source = InSteps(text, text.size())](char* bytes, std::size_t size) mutable {
+        ++reads;
+        return source(bytes, size);
+    });
+    while (window.Reaches(kView)) window.Skip(kStep);
+    EXPECT_LT(reads, 10u);
+}
+
 TEST(TextWindow, TextEndsAtTheFirstNul) {
     using namespace std::string_literals;
     for (const std::size_t step : {1, 3, 100}) {

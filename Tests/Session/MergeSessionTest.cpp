@@ -1,9 +1,12 @@
+#include "ErrorOf.h"
+
 #include "Session/MergeSession.h"
 #include "Support/Diffs.h"
 
 #include "Writing/ObjectFileWriter.h"
 
 #include <sstream>
+#include <utility>
 
 namespace {
 
@@ -72,6 +75,26 @@ TEST(MergeSession, FailuresTellTheirPlace) {
         ObjectText("--- !o!1 &5\nAnimatorStateMachine:\n  m_StateMachineTransitions: 1\n");
     EXPECT_EQ(PlaceOfFailure(machine, good, good),
               "base.ovrin, 5, 0: Expected key to point to yaml mapping: m_StateMachineTransitions");
+}
+
+/// It has no text then, while the base is read to its end.
+TEST(MergeSession, AFailureInTheMiddleOfASideIsTold) {
+    initialize();
+    const std::string text = Values(0, 0) + "--- !o!1 &8\nThing:\n  a: 1\n";
+    for (const Threads threads : {Threads::None, Threads::Everywhere}) {
+        InputFile left = TextInput("left.ovrin", text);
+        left.open = [&text]() -> ByteSource {
+            return [&text, isFirst = true](char* bytes, std::size_t size) mutable {
+                if (!std::exchange(isFirst, false)) throw YAMLError("Cannot read file");
+                return text.substr(0, Values(0, 0).size()).copy(bytes, size);
+            };
+        };
+        MergeSession session(threads);
+        const auto read = [&] {
+            session.Read({TextInput("base.ovrin", text), left, TextInput("right.ovrin", text)});
+        };
+        EXPECT_EQ(failures::ErrorOf(read), "Error parsing file 'left.ovrin': Cannot read file");
+    }
 }
 
 } // namespace

@@ -23,6 +23,10 @@ namespace {
 /// out.
 constexpr std::size_t kPieceBytes = std::size_t{1} << 20;
 
+/// Where ids of the base are looked for, again and again: no further, since a header line may be as long as
+/// the file. A document whose id stands behind it is shared with nobody.
+constexpr std::size_t kUsualHeader = 128;
+
 } // namespace
 
 ObjectFile::ObjectFile(OvrinObjects& objects, ReaderOptions options)
@@ -37,6 +41,11 @@ ReaderPool& ObjectFile::Pool() {
 
 std::string_view ObjectFile::FileIDOf(const Document& document) {
     return ovrin_yaml::FileIDOf({document.begin, document.length});
+}
+
+/// The same of a header line of usual length; of any other it may be empty, or less of the id.
+std::string_view ObjectFile::UsualIDOf(const Document& document) {
+    return ovrin_yaml::FileIDOf({document.begin, std::min(document.length, kUsualHeader)});
 }
 
 void ObjectFile::Take(std::string bytes) {
@@ -212,13 +221,11 @@ std::size_t ObjectFile::FindLender(std::string_view document, std::size_t& expec
 std::size_t ObjectFile::FindInBase(std::string_view fileID, std::size_t expected) {
     constexpr std::size_t kNear = 16;
     constexpr std::size_t kManyUnfound = 256;
-    constexpr std::size_t kUsualHeader = 128; // no long ones are looked through again and again
     if (m_UnfoundCount == kManyUnfound) return m_Base->IndexOf(fileID);
     const std::vector<Document>& known = m_Base->m_Documents;
     const std::size_t end = std::min(expected + kNear, known.size());
     for (std::size_t i = expected; i < end; ++i)
-        if (ovrin_yaml::FileIDOf({known[i].begin, std::min(known[i].length, kUsualHeader)}) == fileID)
-            return i;
+        if (UsualIDOf(known[i]) == fileID) return i;
     ++m_UnfoundCount;
     return kNone;
 }
@@ -226,7 +233,7 @@ std::size_t ObjectFile::FindInBase(std::string_view fileID, std::size_t expected
 std::size_t ObjectFile::IndexOf(std::string_view fileID) const {
     // Not std::call_once: a lack of memory can't get through the frames of the C library.
     const std::lock_guard lock(m_IndexLock);
-    const auto idOf = [this](std::size_t i) { return FileIDOf(m_Documents[i]); };
+    const auto idOf = [this](std::size_t i) { return UsualIDOf(m_Documents[i]); };
     if (m_Index.IsEmpty()) {
         // The header lines lie far from each other in memory: ask for those that come next.
         constexpr std::size_t kAhead = 8;
@@ -264,8 +271,9 @@ std::size_t ObjectFile::MakePieces() {
         piece = {piece.end, piece.end};
         bytes = 0;
     }
+    // One that failed while it was cut may have no text.
     for (const ObjectFile* taker : m_Takers)
-        if (taker->m_Base) bytesToBuild += taker->m_Text->size();
+        if (taker->m_Base && taker->m_Text) bytesToBuild += taker->m_Text->size();
     // A guess that spares the table most of its growing.
     constexpr std::size_t kBytesPerScalar = 56;
     if (!m_Base) ScalarTable::Instance().Reserve(m_Documents.size() + bytesToBuild / kBytesPerScalar);

@@ -89,6 +89,7 @@ private:
     static constexpr std::size_t kAtOnce = 32; // documents
 
     static std::string_view FileIDOf(const Document& document);
+    static std::string_view UsualIDOf(const Document& document);
     const char* End() const { return m_Text->data() + m_Text->size(); }
     void BecomeTakerOf(ObjectFile& base);
     bool MayShareWith(const ObjectFile& base) const;

@@ -76,11 +76,12 @@ std::optional<CutText> ReadInParts(const PartSource& source, std::size_t size, c
     if (text.bytes.size() != size || source(size, &next, 1) != 0) return std::nullopt;
 
     text.length = size;
-    for (const Part& part : parts) {
-        text.starts.insert(text.starts.end(), part.starts.begin(), part.starts.end());
-        text.length = std::min(text.length, part.end);
+    for (std::size_t i = 0; i < parts.size(); ++i) {
+        text.starts.insert(text.starts.end(), parts[i].starts.begin(), parts[i].starts.end());
+        text.length = std::min(text.length, parts[i].end);
+        // As long as no starts but the part's stand behind them.
+        if (i > 0) AddAtSeam(text.bytes, i * partSize, text.starts);
     }
-    for (std::size_t i = 1; i < parts.size(); ++i) AddAtSeam(text.bytes, i * partSize, text.starts);
     const auto isCutOff = [&](std::size_t start) { return start + kDocumentStart.size() > text.length; };
     while (!text.starts.empty() && isCutOff(text.starts.back())) text.starts.pop_back();
     return text;
