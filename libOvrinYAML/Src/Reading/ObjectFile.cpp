@@ -234,14 +234,7 @@ std::size_t ObjectFile::IndexOf(std::string_view fileID) const {
     // Not std::call_once: a lack of memory can't get through the frames of the C library.
     const std::lock_guard lock(m_IndexLock);
     const auto idOf = [this](std::size_t i) { return UsualIDOf(m_Documents[i]); };
-    if (m_Index.IsEmpty()) {
-        // The header lines lie far from each other in memory: ask for those that come next.
-        constexpr std::size_t kAhead = 8;
-        m_Index.Build(m_Documents.size(), [&](std::size_t i) {
-            if (i + kAhead < m_Documents.size()) __builtin_prefetch(m_Documents[i + kAhead].begin);
-            return idOf(i);
-        });
-    }
+    if (m_Index.IsEmpty()) m_Index.Build(m_Documents.size(), idOf);
     return m_Index.Find(fileID, idOf);
 }
 
