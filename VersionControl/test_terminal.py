@@ -137,7 +137,9 @@ def test_what_was_decided_outlives_the_program(user, terminal, number):
         screen.press("C-c")
     if number != signal.SIGKILL:
         assert "n Next" not in screen.see("what you decided is kept", "$")
-    screen.run("stty sane; ovrin settle")
+    screen.run("stty sane")
+    screen.see("status 0")  # what the first one left on the screen is gone
+    screen.run("ovrin settle")
     screen.see("1 of 2 open · b.ovrin")
     screen.press("u")
     screen.see("2 of 2 open · a.ovrin")
