@@ -1,26 +1,21 @@
 #include "Destination.h"
 
 #include "Descriptor.h"
+#include "DestinationDraft.h"
+#include "FileCopier.h"
+#include "FilePlace.h"
 #include "FileUtils.h"
 #include "NewFile.h"
 
 #include <algorithm>
 #include <cerrno>
-#include <climits>
 #include <fcntl.h>
 #include <initializer_list>
-#include <linux/magic.h> // PROC_SUPER_MAGIC
-#include <memory>
 #include <sys/stat.h>
-#include <sys/vfs.h>
 #include <unistd.h>
 #include <utility>
 
 namespace {
-
-bool IsSameFile(const struct stat& left, const struct stat& right) {
-    return left.st_dev == right.st_dev && left.st_ino == right.st_ino;
-}
 
 /// Who holds the other end of a standard stream knows the file and not its name. Where a stream was closed,
 /// its number may be that of `file`, which says nothing.
@@ -29,28 +24,6 @@ bool IsStandardStream(const Descriptor& file, const struct stat& status) {
     return std::ranges::any_of(std::initializer_list<int>{STDOUT_FILENO, STDERR_FILENO}, [&](int number) {
         return number != file.Get() && fstat(number, &stream) == 0 && IsSameFile(status, stream);
     });
-}
-
-/// Whether a link in this folder leads to an open file itself: it reads as a name that the file may have had.
-bool IsFolderOfOpenFiles(const std::string& folder) {
-    struct statfs system;
-    return statfs(folder.c_str(), &system) == 0 && system.f_type == PROC_SUPER_MAGIC;
-}
-
-/// Replaces `path` by what its links lead to, which need not exist. Returns errno or 0; EPERM for what was
-/// named by its number as an open file, and must keep its identity.
-int FollowLinks(std::string& path) {
-    constexpr int kMostLinks = 40; // as the system has it
-    char target[PATH_MAX];
-    for (int i = 0; i < kMostLinks; ++i) {
-        const ssize_t length = readlink(path.c_str(), target, sizeof(target));
-        if (length < 0) return errno == EINVAL || errno == ENOENT ? 0 : errno;
-        if (IsFolderOfOpenFiles(GetFolder(path))) return EPERM;
-        const std::string link(target, static_cast<std::size_t>(length));
-        path = link.starts_with('/') ? std::string() : GetFolder(path);
-        path += link;
-    }
-    return ELOOP;
 }
 
 /// Whether the failure says that a file can't be replaced, which isn't to say that it can't be written. The
@@ -69,6 +42,7 @@ int Make(NewFile& file, const Descriptor* old, const Content& content) {
 /// Puts a whole new file at `place`. `old` is what stands there, null for nothing. The file has no name in
 /// the folder while it is being written, if that can be had.
 int PutNewFile(const std::string& place, const Descriptor* old, const Content& content) {
+    if (old && content.draft && content.draft->TakePlace(place, *old, content.durability)) return 0;
     const mode_t mode = old ? 0600 : 0666;
     if (NewFile file(place); file.OpenUnnamed(mode) == 0) {
         if (const int error = Make(file, old, content)) return error;
@@ -137,20 +111,6 @@ int Overwrite(const Descriptor& file, const std::string& path, const Content& co
     return error;
 }
 
-void Copy(const Descriptor& source, OutputStream& stream) {
-    constexpr std::size_t kPieceSize = std::size_t{1} << 20;
-    const auto piece = std::make_unique_for_overwrite<char[]>(kPieceSize);
-    off_t position = 0;
-    while (stream) {
-        const ssize_t count =
-            Uninterrupted([&] { return pread(source.Get(), piece.get(), kPieceSize, position); });
-        if (count < 0) stream.Fail(errno);
-        if (count <= 0) return;
-        stream.write(piece.get(), count);
-        position += count;
-    }
-}
-
 } // namespace
 
 int Deliver(const std::string& path, const Content& content) {
@@ -165,10 +125,12 @@ int Deliver(const std::string& path, const Content& content) {
     return IsRefusal(error) ? Overwrite(file, nativePath, content) : error;
 }
 
-int OutputResultToDestination(const std::string& source, const std::string& dest) {
+int OutputResultToDestination(const std::string& source, const std::string& dest, DestinationDraft* draft) {
     const Descriptor file = OpenFile(OvrinToNativePath(source).c_str(), O_RDONLY);
     struct stat status;
     if (!file.IsOpen() || fstat(file.Get(), &status) != 0) return errno;
-    return Deliver(dest, {static_cast<std::uint64_t>(status.st_size),
-                          [&](OutputStream& stream) { Copy(file, stream); }});
+    const auto copy = [&](OutputStream& stream) { FileCopier(file).Copy(0, UINT64_MAX, stream); };
+    Content content{static_cast<std::uint64_t>(status.st_size), copy};
+    if (draft && draft->Complete(file)) content.draft = draft;
+    return Deliver(dest, content);
 }

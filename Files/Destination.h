@@ -5,11 +5,14 @@
 #include <cstdint>
 #include <string>
 
+class DestinationDraft;
+
 /// What a destination is to hold. `write` may be called twice.
 struct Content {
     std::uint64_t size = 0;
     OutputWriter write;
     Durability durability = Durability::Synced;
+    DestinationDraft* draft = nullptr; // where there is one, it is complete
 };
 
 /// Brings `content` to the user's destination, or to standard output where the path is empty. Returns 0 when
@@ -22,5 +25,6 @@ struct Content {
 /// failure.
 int Deliver(const std::string& path, const Content& content);
 
-/// Delivers the file `source`.
-int OutputResultToDestination(const std::string& source, const std::string& dest);
+/// Delivers the file `source`, by way of `draft` where that has followed it.
+int OutputResultToDestination(const std::string& source, const std::string& dest,
+                              DestinationDraft* draft = nullptr);

@@ -83,7 +83,11 @@ int NewFile::Fill(const OutputWriter& write, Durability durability) {
     OutputStream stream(m_File.Get());
     write(stream);
     const int error = stream.Finish();
-    return error || durability != Durability::Synced ? error : Sync(m_File.Get());
+    return error ? error : Secure(durability);
+}
+
+int NewFile::Secure(Durability durability) const {
+    return durability == Durability::Synced ? Sync(m_File.Get()) : 0;
 }
 
 int NewFile::TakeName() {

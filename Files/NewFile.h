@@ -20,6 +20,8 @@ public:
     /// Gives the file the mode, the access list and, as far as that is permitted, the owner of another one.
     int Resemble(const Descriptor& other);
     int Fill(const OutputWriter& write, Durability durability);
+    /// Brings what was filled, and what else was set, to the disk if that is wanted.
+    int Secure(Durability durability) const;
     /// Gives the hidden name to a file without name.
     int TakeName();
     /// Closes the file and puts it into its place. It must have a name.

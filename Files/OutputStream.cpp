@@ -50,5 +50,8 @@ bool OutputStream::Buffer::WritePending() {
 /// Behind a failure nothing more is written: a hole in the middle would be worse than a missing end.
 bool OutputStream::Buffer::Write(const char* text, std::size_t length) {
     if (error == 0) error = WriteFully(m_Descriptor, text, length);
-    return error == 0;
+    if (error != 0) return false;
+    m_Written += length;
+    if (watch) watch(m_Written);
+    return true;
 }

@@ -2,6 +2,7 @@
 
 #include "CommandSettings.h"
 #include "Destination.h"
+#include "DestinationDraft.h"
 #include "DriverErrors.h"
 #include "Fallback.h"
 #include "FileUtils.h"
@@ -12,6 +13,7 @@
 
 #include <exception>
 #include <new>
+#include <optional>
 
 namespace {
 
@@ -27,9 +29,10 @@ bool SetupPremergePaths(MergeConfig& config) {
            (SetupPremergePath(config.premergeBaseDest) && SetupPremergePath(config.premergeRightDest));
 }
 
-/// Returns `status` once the destination holds the file `source`.
-ExitStatus DeliverResult(const std::string& source, const MergeConfig& config, ExitStatus status) {
-    const int error = OutputResultToDestination(source, config.destFile);
+/// Returns `status` once the destination holds the file `source`, which `draft` may have followed.
+ExitStatus DeliverResult(const std::string& source, const MergeConfig& config, ExitStatus status,
+                         DestinationDraft* draft = nullptr) {
+    const int error = OutputResultToDestination(source, config.destFile, draft);
     return error ? FailToWrite(config.destFile, error) : status;
 }
 
@@ -51,9 +54,12 @@ ExitStatus HandConflictsToTool(const MergeConfig& config, const std::string& sma
 }
 
 ExitStatus MergeSmartly(MergeConfig& config, const std::string& output, bool useFallback) {
+    std::optional<DestinationDraft> draft;
+    if (config.useThreads) draft.emplace(config.destFile);
+    DestinationDraft* const draftOrNull = draft ? &*draft : nullptr;
     ExitStatus result;
     try {
-        result = HandleMergeCommand(config, output);
+        result = HandleMergeCommand(config, output, draftOrNull);
     } catch (const ovrin_yaml::YAMLError& error) {
         return Fail(error.what());
     } catch (const std::bad_alloc&) {
@@ -63,7 +69,7 @@ ExitStatus MergeSmartly(MergeConfig& config, const std::string& output, bool use
     }
     if (result == ExitStatus::Failed) return result;
     if (result != ExitStatus::Done && useFallback) return HandConflictsToTool(config, output);
-    return DeliverResult(output, config, result);
+    return DeliverResult(output, config, result, draftOrNull);
 }
 
 } // namespace

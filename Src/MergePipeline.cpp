@@ -3,6 +3,7 @@
 #include "MergePipeline.h"
 
 #include "CommandSettings.h"
+#include "DestinationDraft.h"
 #include "DriverErrors.h"
 #include "ErrMsg.h"
 #include "FileUtils.h"
@@ -79,11 +80,17 @@ int OutputConflicts(TimerStat& root, const MergeConfig& config, const RecordingC
     return config.conflictFile.empty() && config.destFile.empty() ? error : 0;
 }
 
+/// `draft`, where it isn't null, follows the file that is written.
 int OutputResult(TimerStat& root, const MergeConfig& config, const std::string& path,
-                 const OvrinObjects& result) {
+                 const OvrinObjects& result, DestinationDraft* draft) {
     TimerStat timer(root, "Output result");
-    return WriteOutput(
-        path, [&](std::ostream& stream) { Output(result, stream, RunnerFor(ThreadsOf(config.useThreads))); });
+    const auto write = [&](OutputStream& stream) {
+        if (draft) stream.Watch([&](std::uint64_t length) { draft->Follow(path, length); });
+        Output(result, stream, RunnerFor(ThreadsOf(config.useThreads)));
+    };
+    const int error = WriteOutput(path, write);
+    // Without the draft there is more room on the disk.
+    return error && draft && draft->GiveUp() ? WriteOutput(path, write) : error;
 }
 
 /// Premerged files that can't be written are lost without a word where nobody is to work on them. Returns
@@ -98,7 +105,8 @@ ExitStatus PremergeForTool(TimerStat& root, const MergeConfig& config, MergeSess
 
 } // namespace
 
-ExitStatus HandleMergeCommand(const MergeConfig& config, const std::string& outputPath) {
+ExitStatus HandleMergeCommand(const MergeConfig& config, const std::string& outputPath,
+                              DestinationDraft* draft) {
     TimerStat root("Merging", config.timing ? &std::cout : nullptr);
     MergeSession session(ThreadsOf(config.useThreads));
     ReadFiles(root, config, session);
@@ -118,9 +126,12 @@ ExitStatus HandleMergeCommand(const MergeConfig& config, const std::string& outp
     { TimerStat timer(root, "Cloning base roots"); }
     ApplyMergedChanges(root, config, session);
     if (const int error = OutputConflicts(root, config, session.Resolver())) return FailToWrite({}, error);
-    if (const int error = OutputResult(root, config, outputPath, session.Result()))
+    const bool hasConflicts = session.Resolver().HasPendingConflicts();
+    const bool isForTool = hasConflicts && config.fallbackSpecFile != kNoSpecFile;
+    if (const int error =
+            OutputResult(root, config, outputPath, session.Result(), isForTool ? nullptr : draft))
         return FailToWrite(outputPath, error);
-    if (!session.Resolver().HasPendingConflicts()) return ExitStatus::Done;
+    if (!hasConflicts) return ExitStatus::Done;
     if (UseOfBase(config) == MergeSession::Base::Kept &&
         PremergeForTool(root, config, session) != ExitStatus::Done)
         return ExitStatus::Failed;
