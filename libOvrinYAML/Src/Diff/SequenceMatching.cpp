@@ -34,16 +34,23 @@ public:
 
     /// Null if the element has no key.
     const YAMLScalar* Of(const YAMLNode* element) const {
+        if (m_KeyPaths.size() == 1) {
+            const YAMLScalar* value = ScalarAt(m_KeyPaths[0], element);
+            if (!value || m_GuidPaths.empty() || !ScalarAt(m_GuidPaths[0], element)) return value;
+        }
         const auto values = MergeRules::GetUniqueMappingValues(m_KeyPaths, element);
         if (values.empty()) return nullptr;
         const auto guid = MergeRules::GetUniqueMappingValues(m_GuidPaths, element);
-        if (values.size() == 1 && guid.empty()) return values[0];
         std::string text = CollapseKeyElementValues(values);
         if (!guid.empty()) text.append(":").append(guid[0]->Value());
         return YAMLScalar::Lookup(text);
     }
 
 private:
+    static const YAMLScalar* ScalarAt(const Path& path, const YAMLNode* element) {
+        return AsScalar(MergeRules::GetYAMLNodeFieldByPath(element, path));
+    }
+
     const std::vector<Path>& m_KeyPaths;
     std::vector<Path> m_GuidPaths;
 };
@@ -56,17 +63,30 @@ std::unique_ptr<KeyIndex> IndexTexts(const NodeList& texts) {
     return indexes;
 }
 
-/// The keys of all elements, or nothing if one has no key or two have the same.
-bool FindUniqueKeys(const ElementKeys& keys, const YAMLSequence* sequence,
-                    std::vector<const YAMLScalar*>& found, KeyIndex& indexes) {
-    const auto& items = sequence->m_Items;
-    found.reserve(items.size());
+/// False if an element has no key or two have the same.
+bool IndexUniqueKeys(const ElementKeys& keys, const NodeList& items, KeyIndex& indexes) {
     indexes.Reserve(items.size());
     for (std::size_t i = 0; i < items.size(); ++i) {
         const YAMLScalar* key = keys.Of(items[i]);
-        if (!key || indexes.Find(key) != KeyIndex::kMissing) return false;
-        indexes.Set(key, static_cast<std::uint32_t>(i));
-        found.push_back(key);
+        if (!key || !indexes.Insert(key, static_cast<std::uint32_t>(i))) return false;
+    }
+    return true;
+}
+
+/// Maps what `indexes` knows of the keys of the base. False if an element has no key or two have the same.
+bool MapUniqueKeys(const ElementKeys& keys, const NodeList& items, const KeyIndex& indexes,
+                   std::vector<int>& mapping) {
+    KeyIndex added;
+    for (std::size_t i = 0; i < items.size(); ++i) {
+        const YAMLScalar* key = keys.Of(items[i]);
+        if (!key) return false;
+        const std::uint32_t inBase = indexes.Find(key);
+        if (inBase == KeyIndex::kMissing) {
+            if (!added.Insert(key, static_cast<std::uint32_t>(i))) return false;
+            continue;
+        }
+        if (mapping[inBase] != -1) return false;
+        mapping[inBase] = static_cast<int>(i);
     }
     return true;
 }
@@ -89,16 +109,13 @@ YAMLSequenceRemapper* FindMapping(const DiffContext& context, const YAMLSequence
     const ListRule& rule = context.rules.SelectKeyPaths(context.path);
     if (rule.kind == SequenceType::Plain) return FindGenericMapping(base, dest);
     const ElementKeys keys(rule.keys);
-    std::vector<const YAMLScalar*> baseKeys, destKeys;
-    KeyIndex baseIndexes, destIndexes;
-    if (!FindUniqueKeys(keys, base, baseKeys, baseIndexes) ||
-        !FindUniqueKeys(keys, dest, destKeys, destIndexes))
-        return FindGenericMapping(base, dest);
+    KeyIndex inBase;
+    if (!IndexUniqueKeys(keys, base->m_Items, inBase)) return FindGenericMapping(base, dest);
     YAMLSequenceRemapper* remapper =
         YAMLAlloc<YAMLSequenceRemapper>::create(base->m_Items.size(), dest->m_Items.size(), true);
-    for (std::size_t i = 0; i < baseKeys.size(); ++i)
-        remapper->m_Mapping[i] = IndexOf(destIndexes, baseKeys[i]);
-    return UnlessIdentity(remapper);
+    if (MapUniqueKeys(keys, dest->m_Items, inBase, remapper->m_Mapping)) return UnlessIdentity(remapper);
+    YAMLAlloc<YAMLSequenceRemapper>::free(remapper);
+    return FindGenericMapping(base, dest);
 }
 
 YAMLSequenceRemapper* FindKeyListMapping(const YAMLSequence* base, const YAMLSequence* dest,

@@ -4,8 +4,58 @@
 #include "Diff/KeyOrder.h"
 
 #include <algorithm>
+#include <exception>
 
 namespace ovrin_yaml {
+
+namespace {
+
+/// The changes inside values of a mapping, which don't meet: carried out ahead of all others, on many values
+/// at once.
+class ChangesInside {
+public:
+    ChangesInside(const YAMLMappingDiff::EntryList& entries, YAMLMapping& target, const TaskRunner& run)
+        : m_States(entries.size(), State::Open), m_Failures(entries.size() / kGroupSize + 1) {
+        RunInGroups(run, entries.size(), kGroupSize, [&](std::size_t first, std::size_t end) {
+            for (std::size_t i = first; i < end; ++i) {
+                if (i + kAhead < end) Prefetch(entries[i + kAhead], target);
+                if (entries[i].operation->GetKind() != Operation::Kind::ChangeMapping) continue;
+                if (!Try(entries[i], i, target)) return;
+            }
+        });
+    }
+
+    /// Whether entry `i` is carried out. Throws what it failed with; those behind it may be open then.
+    bool IsDone(std::size_t i) const {
+        if (m_States[i] == State::Failed) std::rethrow_exception(m_Failures[i / kGroupSize]);
+        return m_States[i] == State::Done;
+    }
+
+private:
+    static constexpr std::size_t kGroupSize = 256, kAhead = 8;
+    enum class State : std::uint8_t { Open, Done, Failed };
+
+    static void Prefetch(const YAMLMappingDiff::Entry& entry, const YAMLMapping& target) {
+        __builtin_prefetch(entry.operation);
+        target.PrefetchKey(entry.key);
+    }
+
+    bool Try(const YAMLMappingDiff::Entry& entry, std::size_t i, YAMLMapping& target) {
+        try {
+            entry.operation->Apply(target, entry.key);
+            m_States[i] = State::Done;
+        } catch (...) {
+            m_Failures[i / kGroupSize] = std::current_exception();
+            m_States[i] = State::Failed;
+        }
+        return m_States[i] == State::Done;
+    }
+
+    std::vector<State> m_States;                // by entry
+    std::vector<std::exception_ptr> m_Failures; // by group, each of which ends with its first
+};
+
+} // namespace
 
 YAMLMappingDiff* YAMLMappingDiff::Diff(DiffContext& context, const YAMLMapping* base,
                                        const YAMLMapping* dest) {
@@ -26,24 +76,26 @@ YAMLMappingDiff* YAMLMappingDiff::Diff(const MergeRules& rules, const YAMLMappin
 }
 
 void YAMLMappingDiff::Add(const YAMLScalar* key, const Operation* operation) {
-    if (HasKey(key)) throw YAMLError("Cannot do a double change on the same key in a mapping");
+    const auto index = static_cast<std::uint32_t>(m_Entries.size());
+    if (m_Index ? !m_Index->Insert(key, index) : HasKey(key))
+        throw YAMLError("Cannot do a double change on the same key in a mapping");
     m_Entries.push_back({key, operation});
-    if (m_Index) {
-        m_Index->Set(key, static_cast<std::uint32_t>(m_Entries.size() - 1));
-    } else if (m_Entries.size() > KeyIndex::kSearchLimit) {
+    if (!m_Index && m_Entries.size() > KeyIndex::kSearchLimit) {
         m_Index = std::make_unique<KeyIndex>();
         for (std::uint32_t i = 0; i < m_Entries.size(); ++i) m_Index->Set(m_Entries[i].key, i);
     }
 }
 
 const Operation* YAMLMappingDiff::Find(const YAMLScalar* key) const {
-    if (m_Index) {
-        const std::uint32_t position = m_Index->Find(key);
-        return position == KeyIndex::kMissing ? nullptr : m_Entries[position].operation;
-    }
-    for (const Entry& entry : m_Entries)
-        if (entry.key == key) return entry.operation;
-    return nullptr;
+    const std::uint32_t index = IndexOf(key);
+    return index == KeyIndex::kMissing ? nullptr : m_Entries[index].operation;
+}
+
+std::uint32_t YAMLMappingDiff::IndexOf(const YAMLScalar* key) const {
+    if (m_Index) return m_Index->Find(key);
+    for (std::uint32_t i = 0; i < m_Entries.size(); ++i)
+        if (m_Entries[i].key == key) return i;
+    return KeyIndex::kMissing;
 }
 
 bool YAMLMappingDiff::LeavesKeys() const {
@@ -55,16 +107,26 @@ bool YAMLMappingDiff::LeavesKeys() const {
            std::all_of(m_Entries.begin(), m_Entries.end(), changesInPlace);
 }
 
-void YAMLMappingDiff::Apply(YAMLMapping& target) const {
+void YAMLMappingDiff::ApplyEntries(YAMLMapping& target, const TaskRunner& run) const {
+    if (!run) {
+        for (const Entry& entry : m_Entries) entry.operation->Apply(target, entry.key);
+        return;
+    }
+    const ChangesInside inside(m_Entries, target, run);
+    for (std::size_t i = 0; i < m_Entries.size(); ++i)
+        if (!inside.IsDone(i)) m_Entries[i].operation->Apply(target, m_Entries[i].key);
+}
+
+void YAMLMappingDiff::Apply(YAMLMapping& target, const TaskRunner& run) const {
     if (LeavesKeys()) {
         target.RequireNormalState();
-        for (const Entry& entry : m_Entries) entry.operation->Apply(target, entry.key);
+        ApplyEntries(target, run);
         return;
     }
     std::vector<const YAMLScalar*> before;
     before.reserve(target.Size());
     for (const auto& entry : target) before.push_back(entry.key);
-    for (const Entry& entry : m_Entries) entry.operation->Apply(target, entry.key);
+    ApplyEntries(target, run);
     if (m_KeyOrder) ApplyKeyOrder(m_KeyOrder, before, target);
 }
 

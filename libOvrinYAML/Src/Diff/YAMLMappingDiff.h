@@ -1,7 +1,9 @@
 #pragma once
 
 #include "Diff/Operation.h"
+#include "Values/Arena.h"
 #include "Values/KeyIndex.h"
+#include "Values/TaskRunner.h"
 
 #include <memory>
 #include <vector>
@@ -27,6 +29,7 @@ public:
         const YAMLScalar* key;
         const Operation* operation;
     };
+    using EntryList = std::vector<Entry, ArenaAllocator<Entry>>;
 
     /// The diff from `base` to `dest`, two hashed mappings at the path of `context`.
     static YAMLMappingDiff* Diff(DiffContext& context, const YAMLMapping* base, const YAMLMapping* dest);
@@ -37,13 +40,15 @@ public:
     bool HasKey(const YAMLScalar* key) const { return Find(key) != nullptr; }
     /// The operation for `key`, or null.
     const Operation* Find(const YAMLScalar* key) const;
+    /// The index of `key` in Entries(), or KeyIndex::kMissing.
+    std::uint32_t IndexOf(const YAMLScalar* key) const;
     /// In the order in which they were added; the position is the entry's index. Of a diff made by Diff: the
     /// changed and removed keys in base order, then the new ones in destination order.
-    const std::vector<Entry>& Entries() const { return m_Entries; }
+    const EntryList& Entries() const { return m_Entries; }
 
-    /// Changes `target`, which must equal the base of the diff. Throws YAMLError where it doesn't fit;
-    /// `target` is then left halfway.
-    void Apply(YAMLMapping& target) const;
+    /// Changes `target`, which must equal the base of the diff; what changes inside its values alone by
+    /// `run`, where there is one. Throws YAMLError where it doesn't fit; `target` is then left halfway.
+    void Apply(YAMLMapping& target, const TaskRunner& run = {}) const;
     /// Whether applying it neither adds nor removes a key, nor moves one.
     bool LeavesKeys() const;
 
@@ -54,7 +59,9 @@ public:
     void ResetForAlloc() {}
 
 private:
-    std::vector<Entry> m_Entries;
+    void ApplyEntries(YAMLMapping& target, const TaskRunner& run) const;
+
+    EntryList m_Entries;
     std::unique_ptr<KeyIndex>
         m_Index; // positions in m_Entries, once there are more than KeyIndex::kSearchLimit
 };

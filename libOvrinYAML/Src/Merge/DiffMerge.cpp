@@ -25,16 +25,39 @@ const ChangeSequenceOperation* MergeKeyOrder(const ChangeSequenceOperation* left
     return merged;
 }
 
+/// Finds the operations of a diff for keys that mostly come in its own order: behind the one found last is
+/// looked first.
+class AlignedFind {
+public:
+    explicit AlignedFind(const YAMLMappingDiff* diff) : m_Diff(*diff) {}
+
+    /// The operation for `key`, or null.
+    const Operation* operator()(const YAMLScalar* key) {
+        const auto& entries = m_Diff.Entries();
+        if (m_Next >= entries.size() || entries[m_Next].key != key) {
+            const std::uint32_t found = m_Diff.IndexOf(key);
+            if (found == KeyIndex::kMissing) return nullptr;
+            m_Next = found;
+        }
+        return entries[m_Next++].operation;
+    }
+
+private:
+    const YAMLMappingDiff& m_Diff;
+    std::size_t m_Next = 0;
+};
+
 /// The keys of two diffs: by their index in the diff that has them, the left one if both do; of two keys with
 /// one index the left diff's goes first.
 template <class Visit>
 void ForEachKey(const YAMLMappingDiff* left, const YAMLMappingDiff* right, const Visit& visit) {
     const auto& leftEntries = left->Entries();
     const auto& rightEntries = right->Entries();
+    AlignedFind inLeft(left), inRight(right);
     for (std::size_t index = 0; index < std::max(leftEntries.size(), rightEntries.size()); ++index) {
         if (index < leftEntries.size())
-            visit(leftEntries[index].key, leftEntries[index].operation, right->Find(leftEntries[index].key));
-        if (index < rightEntries.size() && !left->HasKey(rightEntries[index].key))
+            visit(leftEntries[index].key, leftEntries[index].operation, inRight(leftEntries[index].key));
+        if (index < rightEntries.size() && !inLeft(rightEntries[index].key))
             visit(rightEntries[index].key, nullptr, rightEntries[index].operation);
     }
 }

@@ -98,7 +98,7 @@ private:
 
 /// Goes through the file even where no id moved, and so is also what notices repeated keys in it; objects
 /// that are known to have none are passed over then.
-void RewriteReferences(const std::vector<NewID>& newIDs, YAMLMapping& root) {
+void RewriteReferences(const std::vector<NewID>& newIDs, YAMLMapping& root, const TaskRunner& run) {
     const ReferenceRewriter rewriter(newIDs);
     const auto refersToMoved = [&](const YAMLScalar*, const YAMLMapping& mapping) {
         return rewriter.RefersToMoved(mapping);
@@ -110,11 +110,14 @@ void RewriteReferences(const std::vector<NewID>& newIDs, YAMLMapping& root) {
     const auto isMoved = [&](std::string_view id) {
         return moved.MayContain(id) && rewriter.IsMoved(YAMLScalar::Lookup(id));
     };
-    const auto isOfInterest = [&](const YAMLMapping& object) {
+    const auto mayRefer = [&](const YAMLMapping& object) {
         return !newIDs.empty() && MayRefer(object, *YAMLScalar::fileID, isMoved);
     };
-    ForEachObject(root, isOfInterest, [&](const YAMLScalar* id, YAMLNode* object) {
-        if (!FindMappings(id, object, refersToMoved).empty()) rewriter.RewriteObject(Editable(root, id));
+    const auto refers = [&](const YAMLScalar* id, YAMLNode* object) {
+        return !FindMappings(id, object, refersToMoved).empty();
+    };
+    ForEachObject(root, run, mayRefer, refers, [&](const YAMLScalar* id, YAMLNode* object) {
+        if (refers(id, object)) rewriter.RewriteObject(Editable(root, id));
     });
 }
 
@@ -131,7 +134,7 @@ CreateConflictingFileIDsRemapper(const YAMLMapping& base, const YAMLMapping& lef
 }
 
 void RemapCollidingAddFileIDs(const std::vector<const YAMLScalar*>& conflicts, const YAMLMapping& base,
-                              const YAMLMapping& left, YAMLMapping& right) {
+                              const YAMLMapping& left, YAMLMapping& right, const TaskRunner& run) {
     std::unordered_set<const YAMLScalar*> handedOut;
     std::vector<NewID> newIDs;
     const auto isTaken = [&](const YAMLScalar* id) {
@@ -148,7 +151,7 @@ void RemapCollidingAddFileIDs(const std::vector<const YAMLScalar*>& conflicts, c
         object.Change(YAMLScalar::fileIDPlaceHolderName, newID.to->Clone());
         RebuildObjectHash(object);
     }
-    RewriteReferences(newIDs, right);
+    RewriteReferences(newIDs, right, run);
 }
 
 } // namespace ovrin_yaml

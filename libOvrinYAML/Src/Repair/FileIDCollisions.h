@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Values/TaskRunner.h"
 #include "Values/YAMLMapping.h"
 #include "Values/YAMLScalar.h"
 
@@ -19,11 +20,11 @@ CreateConflictingFileIDsRemapper(const YAMLMapping& base, const YAMLMapping& lef
 /// Where the two objects under a conflicting id are of different classes, gives the right one the next free
 /// id, up to 19 further, and follows it with all references of the right file; a reference with a guid points
 /// into another file and stays. Containers around an id that was rewritten get the hash that reading them
-/// would give; that of an object stays without the data of its header.
-/// Throws YAMLError "Cannot create new fileID for conflicting fileID: " and the id if none of the 19 is free,
-/// if one of them would pass the integer range, or if the id is no positive number; the right root is then as
-/// it was.
+/// would give; that of an object stays without the data of its header. Where there is a `run`, it looks for
+/// the references. Throws YAMLError "Cannot create new fileID for conflicting fileID: " and the id if none of
+/// the 19 is free, if one of them would pass the integer range, or if the id is no positive number; the right
+/// root is then as it was.
 void RemapCollidingAddFileIDs(const std::vector<const YAMLScalar*>& conflicts, const YAMLMapping& base,
-                              const YAMLMapping& left, YAMLMapping& right);
+                              const YAMLMapping& left, YAMLMapping& right, const TaskRunner& run = {});
 
 } // namespace ovrin_yaml

@@ -2,10 +2,13 @@
 
 #include "Values/AlignedLookup.h"
 
+#include <utility>
+
 namespace ovrin_yaml {
 
-RepairRoots::RepairRoots(YAMLMapping& mergedRoot, const YAMLMapping& leftRoot, const YAMLMapping& rightRoot)
-    : merged(mergedRoot), left(leftRoot), right(rightRoot) {
+RepairRoots::RepairRoots(YAMLMapping& mergedRoot, const YAMLMapping& leftRoot, const YAMLMapping& rightRoot,
+                         TaskRunner runner)
+    : merged(mergedRoot), left(leftRoot), right(rightRoot), run(std::move(runner)) {
     for (const YAMLMapping* side : {&left, &right}) {
         AlignedLookup survivors(merged);
         for (const auto& [id, object] : *side)

@@ -1,23 +1,27 @@
 #pragma once
 
+#include "Values/TaskRunner.h"
 #include "Values/YAMLMapping.h"
 #include "Values/YAMLScalar.h"
 #include "Values/YAMLSequence.h"
 
 #include <cstddef>
+#include <cstdint>
 #include <initializer_list>
 #include <unordered_set>
 #include <vector>
 
 namespace ovrin_yaml {
 
-/// The three roots that a repair looks at. Only the merged one changes.
+/// The three roots that a repair looks at. Only the merged one changes. `run` is for what can be done for
+/// many objects at once.
 struct RepairRoots {
-    RepairRoots(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right);
+    RepairRoots(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right, TaskRunner run = {});
 
     YAMLMapping& merged;
     const YAMLMapping& left;
     const YAMLMapping& right;
+    const TaskRunner run;
     /// The objects that a side has and the merge has not: somebody removed them.
     std::unordered_set<const YAMLScalar*> removed;
 
@@ -26,21 +30,39 @@ struct RepairRoots {
     void RemoveObjects(const std::vector<const YAMLScalar*>& ids);
 };
 
-/// Calls visit(id, value) for the objects of a root, but for those of which a look at what was found when
-/// they were read tells that they are of no interest: isOfInterest(object) is only asked for objects that
-/// have traits (YAMLMapping::TraitsAsRead). A YAMLError from there learns of the object.
-template <class IsOfInterest, class Visit>
-void ForEachObject(const YAMLMapping& root, const IsOfInterest& isOfInterest, const Visit& visit) {
+/// Calls visit(id, value) in file order for the objects of a root that are of interest. Of an object that has
+/// traits (YAMLMapping::TraitsAsRead), byTraits(const YAMLMapping&) tells whether it is, of any other
+/// byTree(id, value).
+///
+/// All are asked for ahead of the first visit, many at once where there is a `run`. One whose question throws
+/// a YAMLError is visited, so that the first failure in file order is the one that is thrown; a YAMLError of
+/// a visit learns of the object.
+template <class ByTraits, class ByTree, class Visit>
+void ForEachObject(const YAMLMapping& root, const TaskRunner& run, const ByTraits& byTraits,
+                   const ByTree& byTree, const Visit& visit) {
     // The objects lie far from each other in memory: ask for those that come next.
-    constexpr std::size_t kAhead = 8;
+    constexpr std::size_t kAhead = 8, kGroupSize = 4096;
     root.RequireNormalState();
     const auto entries = root.RawEntries();
+    const auto isOfInterest = [&](const YAMLMapping::Entry& entry) {
+        const YAMLMapping* object = AsMapping(entry.value);
+        return object && object->TraitsAsRead() ? byTraits(*object)
+                                                : static_cast<bool>(byTree(entry.key, entry.value));
+    };
+    std::vector<std::uint8_t> isWanted(entries.size());
+    RunInGroups(run, entries.size(), kGroupSize, [&](std::size_t first, std::size_t end) {
+        for (std::size_t i = first; i < end; ++i) {
+            if (i + kAhead < end) __builtin_prefetch(entries[i + kAhead].value);
+            try {
+                isWanted[i] = entries[i].key && isOfInterest(entries[i]);
+            } catch (const YAMLError&) {
+                isWanted[i] = true;
+            }
+        }
+    });
     for (std::size_t i = 0; i < entries.size(); ++i) {
-        if (i + kAhead < entries.size()) __builtin_prefetch(entries[i + kAhead].value);
+        if (!isWanted[i]) continue;
         const auto& [id, value] = entries[i];
-        if (!id) continue;
-        const YAMLMapping* object = AsMapping(value);
-        if (object && object->TraitsAsRead() && !isOfInterest(*object)) continue;
         try {
             visit(id, value);
         } catch (YAMLError& error) {

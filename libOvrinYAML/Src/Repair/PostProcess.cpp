@@ -21,12 +21,16 @@ template <class IsMeant> auto MayHaveLinkTo(const IsMeant& isMeant) {
 
 void RepairPrefabLinks(RepairRoots& roots) {
     std::vector<const YAMLScalar*> orphans;
-    const auto isOfInterest =
+    const auto mayHaveLink =
         MayHaveLinkTo([&](std::string_view id) { return roots.IsRemoved(YAMLScalar::Lookup(id)); });
-    ForEachObject(roots.merged, isOfInterest, [&](const YAMLScalar* id, const YAMLNode* object) {
+    const auto hasLink = [&](const YAMLScalar*, const YAMLNode* object) {
+        const YAMLScalar* prefab =
+            GetMappingPath(GetTransform(object).fields, {YAMLScalar::mPrefabInternal, YAMLScalar::fileID});
+        return !IsNoReference(prefab) && roots.IsRemoved(prefab);
+    };
+    ForEachObject(roots.merged, roots.run, mayHaveLink, hasLink, [&](const YAMLScalar* id, YAMLNode* object) {
+        if (!hasLink(id, object)) return;
         const auto [classKey, fields] = GetTransform(object);
-        const YAMLScalar* prefab = GetMappingPath(fields, {YAMLScalar::mPrefabInternal, YAMLScalar::fileID});
-        if (IsNoReference(prefab) || !roots.IsRemoved(prefab)) return;
         const YAMLScalar* gameObject = GetMappingPath(fields, {YAMLScalar::mGameObject, YAMLScalar::fileID});
         if (!IsNoReference(gameObject) && HasObject(roots.merged, gameObject))
             SetReference(roots.merged, id, classKey, YAMLScalar::mPrefabInternal, YAMLScalar::zero);
@@ -58,12 +62,14 @@ bool IsPlaceHolderOfNothing(const YAMLMapping& object, const IsDangling& isDangl
 void RepairDanglingLinks(RepairRoots& roots) {
     const IsDangling isDangling{roots.merged};
     std::vector<const YAMLScalar*> placeHolders;
-    const auto isOfInterest = MayHaveLinkTo(
+    const auto mayHaveLink = MayHaveLinkTo(
         [&](std::string_view id) { return id != "0" && !roots.merged.HasKey(YAMLScalar::Lookup(id)); });
-    ForEachObject(roots.merged, isOfInterest, [&](const YAMLScalar* id, YAMLNode* value) {
-        const YAMLMapping* object = AsMapping(value);
-        if (!object || FindMappings(id, value, isDangling).empty()) return;
-        if (IsPlaceHolderOfNothing(*object, isDangling)) {
+    const auto hasLink = [&](const YAMLScalar* id, YAMLNode* value) {
+        return AsMapping(value) && !FindMappings(id, value, isDangling).empty();
+    };
+    ForEachObject(roots.merged, roots.run, mayHaveLink, hasLink, [&](const YAMLScalar* id, YAMLNode* value) {
+        if (!hasLink(id, value)) return;
+        if (IsPlaceHolderOfNothing(*AsMapping(value), isDangling)) {
             placeHolders.push_back(id);
             return;
         }
@@ -76,17 +82,18 @@ void RepairDanglingLinks(RepairRoots& roots) {
 } // namespace
 
 void PostProcessMergeOnly(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
-                          ConflictResolver& resolver) {
-    RepairRoots roots(merged, left, right);
+                          ConflictResolver& resolver, const TaskRunner& run) {
+    RepairRoots roots(merged, left, right, run);
     RepairPrefabLinks(roots);
     CheckTransformHierarchy(roots, resolver);
     RepairDanglingLinks(roots);
-    RestoreRepeatedKeys(merged);
+    RestoreRepeatedKeys(merged, run);
 }
 
 bool PostProcess(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
-                 const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver) {
-    PostProcessMergeOnly(merged, left, right, resolver);
+                 const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver,
+                 const TaskRunner& run) {
+    PostProcessMergeOnly(merged, left, right, resolver, run);
     const std::vector<ComponentDependencyConflict> conflicts =
         FindComponentDependencyConflicts(merged, left, right, types);
     for (const ComponentDependencyConflict& conflict : conflicts)

@@ -14,15 +14,19 @@ namespace {
 /// Calls replace(key, transitions) for each state machine that has transitions, puts its result in their
 /// place, and calls replaced(object).
 template <class Replace, class Replaced>
-void ReplaceTransitions(YAMLMapping& root, const Replace& replace, const Replaced& replaced) {
+void ReplaceTransitions(YAMLMapping& root, const TaskRunner& run, const Replace& replace,
+                        const Replaced& replaced) {
     const YAMLScalar* const machine = YAMLScalar::Lookup("AnimatorStateMachine");
     const YAMLScalar* const key = YAMLScalar::Lookup("m_StateMachineTransitions");
-    const auto isOfInterest = [](const YAMLMapping& object) {
-        return object.TraitsAsRead() & kHasTransitions;
+    const auto hadTransitions = [](const YAMLMapping& object) {
+        return (object.TraitsAsRead() & kHasTransitions) != 0;
     };
-    ForEachObject(root, isOfInterest, [&](const YAMLScalar* id, const YAMLNode* value) {
+    const auto find = [](const YAMLScalar*, const YAMLNode* value) {
         const YAMLMapping* object = AsMapping(value);
-        const YAMLNode* transitions = object ? TransitionsOf(*object) : nullptr;
+        return object ? TransitionsOf(*object) : nullptr;
+    };
+    ForEachObject(root, run, hadTransitions, find, [&](const YAMLScalar* id, const YAMLNode* value) {
+        const YAMLNode* transitions = find(id, value);
         if (!transitions) return;
         YAMLNode* replacement = replace(*key, transitions);
         YAMLMapping& editable = Editable(root, id);
@@ -52,12 +56,12 @@ YAMLNode* ToRepeatedKeys(const YAMLScalar& key, const YAMLNode* transitions) {
 
 } // namespace
 
-void PreProcess(YAMLMapping& root) {
-    ReplaceTransitions(root, ToList, [](YAMLMapping& object) { object.RebuildHash(false); });
+void PreProcess(YAMLMapping& root, const TaskRunner& run) {
+    ReplaceTransitions(root, run, ToList, [](YAMLMapping& object) { object.RebuildHash(false); });
 }
 
-void RestoreRepeatedKeys(YAMLMapping& root) {
-    ReplaceTransitions(root, ToRepeatedKeys, [](YAMLMapping&) {});
+void RestoreRepeatedKeys(YAMLMapping& root, const TaskRunner& run) {
+    ReplaceTransitions(root, run, ToRepeatedKeys, [](YAMLMapping&) {});
 }
 
 } // namespace ovrin_yaml

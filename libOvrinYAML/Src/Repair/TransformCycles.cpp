@@ -41,19 +41,25 @@ public:
         const auto isRemoved = [&](std::string_view parent) {
             return removed.MayContain(parent) && roots.IsRemoved(YAMLScalar::Lookup(parent));
         };
-        const auto isOfInterest = [&](const YAMLMapping& object) {
+        const auto mayHaveOne = [&](const YAMLMapping& object) {
             const std::uint8_t traits = object.TraitsAsRead();
             if (traits & kLacksFather) return (traits & kLacksInstance) != 0;
             return anyRemoved && traits & kIsTransform && MayRefer(object, *YAMLScalar::mFather, isRemoved);
         };
-        ForEachObject(roots.merged, isOfInterest, [&](const YAMLScalar* id, const YAMLNode* object) {
-            const TransformFields transform = GetTransform(object);
-            if (!transform.fields) return;
-            const YAMLScalar* parent = ParentOf(id, *transform.fields);
-            if (!transform.fields->HasKey(YAMLScalar::mFather) || !roots.IsRemoved(parent)) return;
-            SetReference(roots.merged, id, transform.classKey, YAMLScalar::mFather, YAMLScalar::zero);
+        const auto removedParent = [&](const YAMLScalar* id, const YAMLNode* object) -> const YAMLScalar* {
+            const YAMLMapping* fields = GetTransform(object).fields;
+            if (!fields) return nullptr;
+            const YAMLScalar* parent = ParentOf(id, *fields);
+            return fields->HasKey(YAMLScalar::mFather) && roots.IsRemoved(parent) ? parent : nullptr;
+        };
+        const auto visit = [&](const YAMLScalar* id, const YAMLNode* object) {
+            const YAMLScalar* parent = removedParent(id, object);
+            if (!parent) return;
+            SetReference(roots.merged, id, GetTransform(object).classKey, YAMLScalar::mFather,
+                         YAMLScalar::zero);
             m_RemovedParents.emplace(id, parent);
-        });
+        };
+        ForEachObject(roots.merged, roots.run, mayHaveOne, removedParent, visit);
     }
 
     /// Null if the Transform or its parent isn't known.

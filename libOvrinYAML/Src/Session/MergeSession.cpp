@@ -32,16 +32,17 @@ template <class Step> void WithStage(Stage stage, const Step& step) {
     }
 }
 
-void PreProcessFile(const std::string& name, OvrinObjects& objects) {
+void PreProcessFile(const std::string& name, OvrinObjects& objects, const TaskRunner& run) {
     try {
-        PreProcess(objects.GetMapping());
+        PreProcess(objects.GetMapping(), run);
     } catch (const YAMLError& error) {
         throw MergeError(Stage::Prepare, name, error, "Cannot merge file '" + name + "': " + error.what());
     }
 }
 
-void MoveCollidingIDs(const YAMLMapping& base, const YAMLMapping& left, YAMLMapping& right) {
-    RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right);
+void MoveCollidingIDs(const YAMLMapping& base, const YAMLMapping& left, YAMLMapping& right,
+                      const TaskRunner& run) {
+    RemapCollidingAddFileIDs(CreateConflictingFileIDsRemapper(base, left, right), base, left, right, run);
 }
 
 const YAMLMappingDiff* DiffFiles(const MergeRules& rules, const OvrinObjects& base,
@@ -82,15 +83,17 @@ void MergeSession::Read(const std::vector<InputFile>& files, StageWatcher* watch
     }
     // The check of component dependencies looks into every object.
     if (m_Types.IsLoaded()) options.recognise = false;
+    m_AreSmall = IsLittleWork(readings, m_Threads);
     ReadInputs(readings, m_Threads, watcher, options);
 }
 
 void MergeSession::Prepare() {
     OvrinObjects* const objects[] = {&m_Base, &m_Left, &m_Right};
-    for (std::size_t i = 0; i < m_Names.size(); ++i) PreProcessFile(m_Names[i], *objects[i]);
+    for (std::size_t i = 0; i < m_Names.size(); ++i) PreProcessFile(m_Names[i], *objects[i], m_Run);
     if (!HasRight()) return;
-    WithStage(Stage::Prepare,
-              [&] { MoveCollidingIDs(m_Base.GetMapping(), m_Left.GetMapping(), m_Right.GetMapping()); });
+    WithStage(Stage::Prepare, [&] {
+        MoveCollidingIDs(m_Base.GetMapping(), m_Left.GetMapping(), m_Right.GetMapping(), m_Run);
+    });
 }
 
 void MergeSession::Diff(StageWatcher* watcher) {
@@ -105,8 +108,9 @@ void MergeSession::Diff(StageWatcher* watcher) {
 }
 
 void MergeSession::DiffOnThreads(StageWatcher* watcher) {
+    // The size of a pipe isn't known.
     constexpr std::size_t kFewObjects = 1000;
-    const bool isLittle = m_Threads == Threads::WhereWorthwhile && m_Base.GetMapping().Size() < kFewObjects;
+    const bool isLittle = m_AreSmall && m_Base.GetMapping().Size() < kFewObjects;
     Thread left([this] { m_LeftDiff = DiffFiles(m_Rules, m_Base, m_Left); }, isLittle);
     Thread right([this] { m_RightDiff = DiffFiles(m_Rules, m_Base, m_Right); }, isLittle);
     {
@@ -133,13 +137,13 @@ void MergeSession::Apply(Base base) {
     assert(m_Result != &m_Base && "the base is used up");
     if (base == Base::Kept) m_Copy.reset(m_Base.Clone());
     m_Result = base == Base::Kept ? m_Copy.get() : &m_Base;
-    WithStage(Stage::Apply, [&] { m_MergedDiff->Apply(m_Result->GetMapping()); });
+    WithStage(Stage::Apply, [&] { m_MergedDiff->Apply(m_Result->GetMapping(), m_Run); });
 }
 
 void MergeSession::Repair() {
     WithStage(Stage::Repair, [&] {
         m_HasBrokenDependencies = PostProcess(m_Result->GetMapping(), m_Left.GetMapping(),
-                                              m_Right.GetMapping(), m_Types, *m_Resolver);
+                                              m_Right.GetMapping(), m_Types, *m_Resolver, m_Run);
     });
 }
 
@@ -151,9 +155,10 @@ std::unique_ptr<OvrinObjects> MergeSession::Premerge(MergeResolve resolve) {
     RecordingConflictResolver resolver(m_Rules, resolve);
     const YAMLMappingDiff* merged = nullptr;
     WithStage(Stage::Merge, [&] { merged = MergeDiffs(*m_LeftDiff, *m_RightDiff, resolver); });
-    WithStage(Stage::Apply, [&] { merged->Apply(root); });
-    WithStage(Stage::Repair,
-              [&] { PostProcessMergeOnly(root, m_Left.GetMapping(), m_Right.GetMapping(), resolver); });
+    WithStage(Stage::Apply, [&] { merged->Apply(root, m_Run); });
+    WithStage(Stage::Repair, [&] {
+        PostProcessMergeOnly(root, m_Left.GetMapping(), m_Right.GetMapping(), resolver, m_Run);
+    });
     return result;
 }
 

@@ -5,6 +5,7 @@
 #include "Repair/YAMLTypeInfo.h"
 #include "Session/MergeError.h"
 #include "Session/ReadInputs.h"
+#include "Session/Tasks.h"
 #include "Values/OvrinObjects.h"
 
 #include <array>
@@ -53,7 +54,8 @@ public:
         UsedUp ///< the result is built in it: nothing can be merged afterwards
     };
 
-    explicit MergeSession(Threads threads = Threads::WhereWorthwhile) : m_Threads(threads) {}
+    explicit MergeSession(Threads threads = Threads::WhereWorthwhile)
+        : m_Threads(threads), m_Run(RunnerFor(threads)) {}
     MergeSession(const MergeSession&) = delete;
     MergeSession& operator=(const MergeSession&) = delete;
 
@@ -109,9 +111,11 @@ private:
     void DiffOnThreads(StageWatcher* watcher);
 
     const Threads m_Threads;
+    const TaskRunner m_Run;
     MergeRules m_Rules;
     YAMLTypeInfoManager m_Types;
     std::vector<std::string> m_Names; // of base, left and right
+    bool m_AreSmall = false;          // as far as is known: threads may cost more than they bring
     OvrinObjects m_Base, m_Left, m_Right;
     const YAMLMappingDiff* m_LeftDiff = nullptr;
     const YAMLMappingDiff* m_RightDiff = nullptr;

@@ -98,15 +98,6 @@ private:
     bool m_IsTaken = false;
 };
 
-/// Below this size of all files together, threads cost more than they bring.
-constexpr std::size_t kLittleWork = std::size_t{1} << 20;
-
-bool IsLittleWork(const std::deque<FileInWork>& files) {
-    std::size_t bytes = 0;
-    for (const FileInWork& work : files) bytes += work.input.size;
-    return bytes < kLittleWork;
-}
-
 void RunAll(const std::vector<std::function<void()>>& tasks, bool isLittle) {
     RunTasks(
         tasks.size(), [&](std::size_t i) { tasks[i](); }, isLittle);
@@ -182,6 +173,13 @@ ReaderOptions DefaultReaderOptions() {
     return options;
 }
 
+bool IsLittleWork(const std::vector<FileReading>& readings, Threads threads) {
+    constexpr std::size_t kLittle = std::size_t{1} << 20;
+    std::size_t bytes = 0;
+    for (const FileReading& reading : readings) bytes += reading.input->size;
+    return threads != Threads::Everywhere && bytes < kLittle;
+}
+
 void ReadInputs(const std::vector<FileReading>& readings, Threads threads, StageWatcher* watcher,
                 ReaderOptions options) {
     std::deque<FileInWork> files;
@@ -189,7 +187,7 @@ void ReadInputs(const std::vector<FileReading>& readings, Threads threads, Stage
     if (threads == Threads::None)
         ReadInOrder(files, readings, watcher);
     else
-        ReadOnThreads(files, threads == Threads::WhereWorthwhile && IsLittleWork(files), watcher);
+        ReadOnThreads(files, IsLittleWork(readings, threads), watcher);
 }
 
 } // namespace ovrin_yaml

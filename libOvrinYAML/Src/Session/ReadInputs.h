@@ -22,6 +22,10 @@ struct FileReading {
 /// (Repair/ObjectTraits.h).
 ReaderOptions DefaultReaderOptions();
 
+/// Whether all files together are, as far as their sizes are known, so small that threads cost more than they
+/// bring.
+bool IsLittleWork(const std::vector<FileReading>& readings, Threads threads);
+
 /// Reads files that are versions of one another, the first being the one that the others share objects with.
 /// With threads all are read at once, in a single step; then all have been tried before the first failure, in
 /// the order of `readings`, is thrown. Without threads the first failure ends it.

@@ -12,10 +12,17 @@ void KeyIndex::Reserve(std::size_t count) {
 }
 
 void KeyIndex::Set(const YAMLScalar* key, std::uint32_t position) {
-    if (2 * (m_Count + 1) > m_Slots.size()) Reserve(m_Count + 1);
-    Slot& slot = m_Slots[PlaceOf(key)];
+    Slot& slot = NeedSlot(key);
     if (!slot.key) ++m_Count;
     slot = {key, position};
+}
+
+bool KeyIndex::Insert(const YAMLScalar* key, std::uint32_t position) {
+    Slot& slot = NeedSlot(key);
+    if (slot.key) return false;
+    ++m_Count;
+    slot = {key, position};
+    return true;
 }
 
 std::uint32_t KeyIndex::Find(const YAMLScalar* key) const {
@@ -29,6 +36,11 @@ std::size_t KeyIndex::PlaceOf(const YAMLScalar* key) const {
     std::size_t place = FirstPlaceOf(key);
     while (m_Slots[place & mask].key && m_Slots[place & mask].key != key) ++place;
     return place & mask;
+}
+
+KeyIndex::Slot& KeyIndex::NeedSlot(const YAMLScalar* key) {
+    if (2 * (m_Count + 1) > m_Slots.size()) Reserve(m_Count + 1);
+    return m_Slots[PlaceOf(key)];
 }
 
 void KeyIndex::Rehash(std::size_t capacity) {

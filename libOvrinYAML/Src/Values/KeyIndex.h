@@ -24,6 +24,8 @@ public:
     void Reserve(std::size_t count);
     /// Sets the position of `key`, in place of an earlier one.
     void Set(const YAMLScalar* key, std::uint32_t position);
+    /// Sets the position of `key` unless it has one. Returns whether it had none.
+    bool Insert(const YAMLScalar* key, std::uint32_t position);
     /// The position last set for `key`, or kMissing.
     std::uint32_t Find(const YAMLScalar* key) const;
     /// Starts to load where `key` would be found first.
@@ -44,6 +46,8 @@ private:
         return (reinterpret_cast<std::uintptr_t>(key) >> 3) * 0x9e3779b97f4a7c15u >> 20;
     }
     std::size_t PlaceOf(const YAMLScalar* key) const;
+    /// The slot of `key`, which is empty if the key has no position.
+    Slot& NeedSlot(const YAMLScalar* key);
     void Rehash(std::size_t capacity);
 
     using SlotVector = std::vector<Slot, HugePageAllocator<Slot>>;

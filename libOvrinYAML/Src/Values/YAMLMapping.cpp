@@ -47,8 +47,8 @@ void YAMLMapping::TakeTree(YAMLMapping& tree) {
     __atomic_store_n(&m_State, std::uint8_t{kShared}, __ATOMIC_RELEASE);
 }
 
-void YAMLMapping::RequireNormalState() const {
-    if (HasDuplicates()) throw YAMLError("Cannot perform this operation on a YAML file with duplicate keys");
+void YAMLMapping::FailForDuplicates() {
+    throw YAMLError("Cannot perform this operation on a YAML file with duplicate keys");
 }
 
 void YAMLMapping::MoveTo(std::size_t room) {
@@ -217,17 +217,6 @@ YAMLNode* YAMLMapping::GetForChange(const YAMLScalar* key) {
 std::size_t YAMLMapping::Size() const {
     RequireNormalState();
     return m_Size - RemovedCount();
-}
-
-YAMLMapping::Iterator YAMLMapping::begin() const {
-    RequireNormalState();
-    return {RawEntries(), 0};
-}
-
-YAMLMapping::Iterator YAMLMapping::end() const {
-    RequireNormalState();
-    const Pairs pairs = RawEntries();
-    return {pairs, pairs.size()};
 }
 
 YAMLMapping::Iterator YAMLMapping::FindKey(const YAMLScalar* key) const {

@@ -165,7 +165,10 @@ public:
         return m_HasDuplicates;
     }
     /// Throws the duplicate-keys YAMLError in the duplicate state.
-    void RequireNormalState() const;
+    void RequireNormalState() const {
+        if (HasDuplicates()) [[unlikely]]
+            FailForDuplicates();
+    }
     /// All pairs, in either state. In the normal state some may have been removed (their key is null).
     Pairs RawEntries() const {
         YAMLNode* const* values = const_cast<YAMLMapping*>(this)->Values();
@@ -198,8 +201,14 @@ public:
         if (const KeyIndex* index = Index()) index->Prefetch(key);
     }
     std::size_t Size() const;
-    Iterator begin() const;
-    Iterator end() const;
+    Iterator begin() const {
+        RequireNormalState();
+        return {RawEntries(), 0};
+    }
+    Iterator end() const {
+        RequireNormalState();
+        return {RawEntries(), m_Size};
+    }
     /// The position of `key` in RawEntries, or KeyIndex::kMissing. Not in the duplicate state.
     std::uint32_t Find(const YAMLScalar* key) const;
     /// The pair of `key`, or end().
@@ -253,6 +262,7 @@ private:
 
     /// What is there for threads that see the tree as built.
     std::uint8_t State() const { return __atomic_load_n(&m_State, __ATOMIC_ACQUIRE); }
+    [[noreturn]] static void FailForDuplicates();
     void BuildTree() const;
     void TakeTree(YAMLMapping& tree);
 
