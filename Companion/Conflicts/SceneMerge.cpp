@@ -109,7 +109,7 @@ ConflictKind KindOf(const MergeSession::Record& record) {
 
 /// Those of `decisions`, which are those of the table, that match no record.
 std::vector<Decision> FindUnmatched(std::span<const Decision> decisions, const ResolveTable& table,
-                                    const std::vector<MergeSession::Record>& records) {
+                                    std::span<const MergeSession::Record> records) {
     if (decisions.empty()) return {};
     std::vector<bool> isFound(decisions.size());
     for (const MergeSession::Record& record : records)

@@ -47,7 +47,7 @@ struct RankedRecord {
 /// Ranks are compared, for which std::sort takes the same decisions as for the paths of records, so that
 /// those of one path, which it may bring into any order, come out in the same one. Where no path comes twice
 /// among the pending records, their order is settled without the others.
-std::vector<RankedRecord> RecordsByPath(const std::vector<Record>& records, bool all) {
+std::vector<RankedRecord> RecordsByPath(std::span<const Record> records, bool all) {
     std::vector<RankedRecord> sorted;
     PathRanks paths;
     for (const Record& record : records)
@@ -162,7 +162,7 @@ void OutputConflictRecords(std::ostream& out, const RecordingConflictResolver& r
     output.Finish();
 }
 
-std::vector<const Record*> PendingByPath(const std::vector<Record>& records) {
+std::vector<const Record*> PendingByPath(std::span<const Record> records) {
     std::vector<const Record*> pending;
     for (const auto& [rank, record] : RecordsByPath(records, false))
         if (record->resolve == ResolveConflict) pending.push_back(record);

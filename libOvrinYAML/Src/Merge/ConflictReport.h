@@ -3,6 +3,7 @@
 #include "Merge/RecordingConflictResolver.h"
 
 #include <iosfwd>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -32,7 +33,7 @@ void OutputConflictRecords(std::ostream& out, const RecordingConflictResolver& r
 
 /// The pending conflicts among the records, in the order of the report.
 std::vector<const RecordingConflictResolver::Record*>
-PendingByPath(const std::vector<RecordingConflictResolver::Record>& records);
+PendingByPath(std::span<const RecordingConflictResolver::Record> records);
 
 /// Reads decisions. Only the lines of the section "Conflict handling:" count, up to "Non-conflicts:".
 /// Throws std::runtime_error for a line that it can't make out.

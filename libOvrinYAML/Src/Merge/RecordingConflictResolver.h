@@ -3,8 +3,10 @@
 #include "Diff/DifferenceCheck.h"
 #include "Merge/ResolveTable.h"
 #include "Merge/YAMLConflict.h"
+#include "Values/Arena.h"
 
 #include <optional>
+#include <span>
 #include <unordered_map>
 #include <vector>
 
@@ -33,7 +35,7 @@ public:
     void SetResolveMethodForPaths(const std::vector<RecordResolve>& resolves) { m_Resolves.Set(resolves); }
     const std::vector<RecordResolve>& Resolves() const { return m_Resolves.All(); }
     /// In the order of the decisions; that of a merged container stands behind those of what it holds.
-    const std::vector<Record>& Records() const { return m_Records; }
+    std::span<const Record> Records() const { return m_Records; }
     bool HasPendingConflicts() const;
 
     const Operation* OnValueAdded(const AddOperation* operation, ConflictType type) override;
@@ -85,7 +87,7 @@ private:
     const Operation* MergeAddedMappings(const AddOperation* left, const AddOperation* right);
     const Operation* MergeAddedSequences(const AddOperation* left, const AddOperation* right);
 
-    std::vector<Record> m_Records;
+    std::vector<Record, HugePageAllocator<Record>> m_Records;
     std::unordered_map<const YAMLScalar*, std::size_t> m_ObjectRecords; // of the first m_IndexedRecords ones
     std::size_t m_IndexedRecords = 0;
     ResolveTable m_Resolves;

@@ -3,8 +3,8 @@
 #include "Reading/DocumentCut.h"
 #include "Reading/DocumentTreeMaker.h"
 #include "Reading/LibraryReader.h"
+#include "Reading/OwnText.h"
 #include "Reading/ReaderPool.h"
-#include "Values/Arena.h"
 #include "Values/ScalarTable.h"
 #include "Values/YAMLScalar.h"
 #include "Writing/WrittenForm.h"
@@ -69,7 +69,7 @@ void ObjectFile::TakeText(std::string text) {
     m_Header = FileHeaderOf(*m_Text);
 }
 
-bool ObjectFile::TakeAlong(ByteSource source, ObjectFile& base) {
+bool ObjectFile::TakeAlong(ByteSource source, std::size_t size, ObjectFile& base) {
     if (!MayShareWith(base)) return false;
     TextWindow window(std::move(source));
     // One that begins with the header of another object file has the signature.
@@ -78,7 +78,7 @@ bool ObjectFile::TakeAlong(ByteSource source, ObjectFile& base) {
                               window.Rest().substr(base.m_Header.size()).starts_with(kDocumentStart);
     if (!hasItsHeader) return false;
     BecomeTakerOf(base);
-    CutAlong(base, window);
+    CutAlong(base, window, size);
     return true;
 }
 
@@ -88,7 +88,7 @@ void ObjectFile::Cut(ObjectFile* base) {
     if (base && MayShareWith(*base) && m_Header == base->m_Header) {
         const auto text = m_Text;
         TextWindow window(*text);
-        CutAlong(*base, window);
+        CutAlong(*base, window, text->size());
     } else {
         CutAlone();
         if (m_Options.recognise) m_Maker = std::make_shared<DocumentTreeMaker>(m_Text);
@@ -108,9 +108,7 @@ bool ObjectFile::MayShareWith(const ObjectFile& base) const {
 
 void ObjectFile::CutAlone() {
     constexpr std::size_t kBytesPerDocument = 400;
-    const std::size_t guess = m_Starts.empty() ? m_Text->size() / kBytesPerDocument : m_Starts.size() + 1;
-    m_Documents.reserve(guess);
-    AdviseHugePages(m_Documents.data(), guess * sizeof(Document));
+    m_Documents.reserve(m_Starts.empty() ? m_Text->size() / kBytesPerDocument : m_Starts.size() + 1);
     const char* begin = m_Text->data() + m_Header.size();
     const auto addUpTo = [&](const char* end) {
         m_Documents.push_back({begin, static_cast<std::size_t>(end - begin)});
@@ -142,10 +140,10 @@ bool ObjectFile::StandsAt(const Document& document, TextWindow& window) {
 
 /// Most documents follow each other as they do in the base, so the base's next one is tried before any
 /// search. What doesn't stand there is kept.
-void ObjectFile::CutAlong(ObjectFile& base, TextWindow& window) {
+void ObjectFile::CutAlong(ObjectFile& base, TextWindow& window, std::size_t size) {
     m_Base = &base;
-    const std::vector<Document>& known = base.m_Documents;
-    std::string own;
+    const DocumentList& known = base.m_Documents;
+    OwnText own(size);
     m_Length = base.m_Header.size();
     std::size_t length = 0;
     std::size_t expected = 0;
@@ -163,10 +161,10 @@ void ObjectFile::CutAlong(ObjectFile& base, TextWindow& window) {
         } else {
             AddToRun(m_Documents.size(), false);
             m_Documents.push_back({nullptr, length});
-            own += document;
+            own.Append(document, m_Length);
         }
     }
-    KeepOwn(std::move(own));
+    KeepOwn(own.Take());
 }
 
 /// Takes the texts of the documents that no other file lends, one behind the other.
@@ -222,7 +220,7 @@ std::size_t ObjectFile::FindInBase(std::string_view fileID, std::size_t expected
     constexpr std::size_t kNear = 16;
     constexpr std::size_t kManyUnfound = 256;
     if (m_UnfoundCount == kManyUnfound) return m_Base->IndexOf(fileID);
-    const std::vector<Document>& known = m_Base->m_Documents;
+    const DocumentList& known = m_Base->m_Documents;
     const std::size_t end = std::min(expected + kNear, known.size());
     for (std::size_t i = expected; i < end; ++i)
         if (UsualIDOf(known[i]) == fileID) return i;

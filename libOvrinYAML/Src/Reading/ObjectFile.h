@@ -5,6 +5,7 @@
 #include "Reading/PartReading.h"
 #include "Reading/ReaderOptions.h"
 #include "Reading/TextWindow.h"
+#include "Values/Arena.h"
 #include "Values/OvrinObjects.h"
 
 #include <cstddef>
@@ -55,9 +56,10 @@ public:
     void TakeCut(CutText text);
     /// The same for a text that needs no signature.
     void TakeText(std::string text);
-    /// Takes a file and cuts it along `base`, as below, without ever having it all in memory. False, with
-    /// nothing done, for a file that hasn't the base's header or isn't to share anything.
-    bool TakeAlong(ByteSource source, ObjectFile& base);
+    /// Takes a file, of `size` bytes as far as is known, and cuts it along `base`, as below, without ever
+    /// having it all in memory. False, with nothing done, for a file that hasn't the base's header or isn't
+    /// to share anything.
+    bool TakeAlong(ByteSource source, std::size_t size, ObjectFile& base);
     /// Cuts the text, along `base` if it is not null; that must be cut already and stay where it is. Objects
     /// that are wanted before they are read are marked as shared while they are at hand.
     void Cut(ObjectFile* base);
@@ -77,6 +79,7 @@ private:
         bool isLendable = false; // the object may be copied before a change, so another file may take it
         bool isAsWritten = false;
     };
+    using DocumentList = std::vector<Document, HugePageAllocator<Document>>;
     /// Documents that stand one behind the other, in this file and in m_Documents, its own or the base's.
     struct Run {
         std::size_t first, count;
@@ -97,7 +100,7 @@ private:
     std::size_t FindLender(std::string_view document, std::size_t& expected);
     std::size_t FindInBase(std::string_view fileID, std::size_t expected);
     std::size_t IndexOf(std::string_view fileID) const;
-    void CutAlong(ObjectFile& base, TextWindow& window);
+    void CutAlong(ObjectFile& base, TextWindow& window, std::size_t size);
     void AddToRun(std::size_t document, bool isLent);
     void KeepOwn(std::string own);
     void NeedWholeText();
@@ -126,7 +129,7 @@ private:
     std::shared_ptr<TreeMaker> m_Maker; // of the objects that are only recognised
     std::string_view m_Header;
     std::vector<std::size_t> m_Starts; // of documents in the text, but for the first, where they are known
-    std::vector<Document> m_Documents; // its own
+    DocumentList m_Documents;          // its own
     std::vector<Run> m_Runs;           // empty: libyaml reads all of the text
     std::size_t m_UnfoundCount = 0;    // documents taken for new without a search in all of the base
     std::vector<Piece> m_Pieces;

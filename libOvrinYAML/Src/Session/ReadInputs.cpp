@@ -69,7 +69,7 @@ struct FileInWork {
     /// Afterwards, and when the first file is cut.
     void CutAlong(ObjectFile& first) {
         Try([&] {
-            if (input.open && file.TakeAlong(input.open(), first)) return;
+            if (input.open && file.TakeAlong(input.open(), input.size, first)) return;
             if (input.open) file.Take(input.take());
             file.Cut(&first);
         });
