@@ -99,6 +99,17 @@ void AppendObject(const YAMLScalar& rootKey, const YAMLMapping& object, std::str
 
 namespace {
 
+/// Puts an object, if the entry holds one, to what takes bytes that stay (Put) and text that is appended
+/// (Own).
+template <class Target> void PutObject(const YAMLMapping::Entry& entry, Target& target) {
+    if (!entry.key) return;
+    const YAMLMapping& object = ToMapping(entry.value);
+    if (!object.Source().empty())
+        target.Put(object.Source());
+    else
+        AppendObject(*entry.key, object, target.Own());
+}
+
 /// Whether it is worth the while to write objects on several threads.
 bool AreManyChanged(const YAMLMapping::Pairs& entries) {
     constexpr std::size_t kMany = 1000;
@@ -113,18 +124,13 @@ struct Group {
     std::string text;
     std::exception_ptr failure; // at the object behind the text
 
+    std::string& Own() { return text; }
+    void Put(std::string_view bytes) { text += bytes; }
     void Write(const YAMLMapping::Pairs& entries, std::size_t first, std::size_t end) {
         text.clear();
         failure = nullptr;
         try {
-            for (std::size_t i = first; i < end; ++i) {
-                if (!entries[i].key) continue;
-                const YAMLMapping& object = ToMapping(entries[i].value);
-                if (!object.Source().empty())
-                    text += object.Source();
-                else
-                    AppendObject(*entries[i].key, object, text);
-            }
+            for (std::size_t i = first; i < end; ++i) PutObject(entries[i], *this);
         } catch (...) {
             failure = std::current_exception();
         }
@@ -161,18 +167,10 @@ void Output(const OvrinObjects& objects, std::ostream& stream, const TaskRunner&
     const YAMLMapping::Pairs entries = objects.GetMapping().RawEntries();
     Pieces pieces(stream);
     pieces.Own().append(kFileHeaderStart).append(kTagAuthority).append(kFileHeaderEnd);
-    if (run && AreManyChanged(entries)) {
+    if (run && AreManyChanged(entries))
         PutInGroups(entries, pieces, run);
-    } else {
-        for (const YAMLMapping::Entry entry : entries) {
-            if (!entry.key) continue;
-            const YAMLMapping& object = ToMapping(entry.value);
-            if (!object.Source().empty())
-                pieces.Put(object.Source());
-            else
-                AppendObject(*entry.key, object, pieces.Own());
-        }
-    }
+    else
+        for (const YAMLMapping::Entry entry : entries) PutObject(entry, pieces);
     pieces.Flush();
     stream.flush();
 }
