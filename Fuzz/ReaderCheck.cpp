@@ -118,8 +118,8 @@ std::string CheckTraits(const YAMLMapping& root) {
     for (const YAMLMapping::Entry entry : root.RawEntries()) {
         const YAMLMapping& object = *AsMapping(entry.value);
         const std::string id(entry.key->Value());
-        if (object.TraitsAsRead() && object.TraitsAsRead() != PlainTraits(object))
-            return "traits of " + id + ": " + std::to_string(object.TraitsAsRead());
+        if (object.Traits() && object.Traits() != PlainTraits(object))
+            return "traits of " + id + ": " + std::to_string(object.Traits());
     }
     return "";
 }

@@ -78,7 +78,7 @@ TEST(Generated, MostDocumentsAreReadFastAndManyAreWrittenForm) {
         const std::string file = FileOfInput(RandomDocuments(seed).Body());
         if (ErrorOf([&] { ParseYAMLFile(file, objects, {.inspect = InspectObject}); }) != "none") continue;
         const YAMLMapping& object = *AsMapping(objects.GetMapping().First());
-        fast += object.TraitsAsRead() != 0;
+        fast += object.Traits() != 0;
         written += !object.Source().empty();
     }
     EXPECT_GT(fast, kDocuments / 10 / 2);

@@ -46,8 +46,14 @@ void AddOperation::Apply(YAMLSequence& sequence, int index) const {
 }
 
 void ChangeMappingOperation::Apply(YAMLMapping& mapping, const YAMLScalar* key) const {
+    Change(mapping, key);
+}
+
+YAMLMapping& ChangeMappingOperation::Change(YAMLMapping& mapping, const YAMLScalar* key) const {
     mapping.GetRef(key);
-    m_Diff->Apply(ToMapping(mapping.GetForChange(key)));
+    YAMLMapping& value = ToMapping(mapping.GetForChange(key));
+    m_Diff->Apply(value);
+    return value;
 }
 
 void ChangeMappingOperation::Apply(YAMLSequence& sequence, int index) const {

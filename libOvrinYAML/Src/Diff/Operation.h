@@ -93,6 +93,8 @@ public:
 
     void Apply(YAMLMapping& mapping, const YAMLScalar* key) const override;
     void Apply(YAMLSequence& sequence, int index) const override;
+    /// As Apply. Returns the value, changed.
+    YAMLMapping& Change(YAMLMapping& mapping, const YAMLScalar* key) const;
 };
 
 /// A sequence changes inside: first its elements are brought into their new places by the remapper, then the

@@ -14,13 +14,15 @@ namespace {
 /// at once.
 class ChangesInside {
 public:
-    ChangesInside(const YAMLMappingDiff::EntryList& entries, YAMLMapping& target, const TaskRunner& run)
-        : m_States(entries.size(), State::Open), m_Failures(entries.size() / kGroupSize + 1) {
+    ChangesInside(const YAMLMappingDiff::EntryList& entries, YAMLMapping& target, const TaskRunner& run,
+                  ObjectInspector inspect)
+        : m_Inspect(inspect), m_States(entries.size(), State::Open),
+          m_Failures(entries.size() / kGroupSize + 1) {
         RunInGroups(run, entries.size(), kGroupSize, [&](std::size_t first, std::size_t end) {
             for (std::size_t i = first; i < end; ++i) {
                 if (i + kAhead < end) Prefetch(entries[i + kAhead], target);
-                if (entries[i].operation->GetKind() != Operation::Kind::ChangeMapping) continue;
-                if (!Try(entries[i], i, target)) return;
+                const auto* change = As<ChangeMappingOperation>(entries[i].operation);
+                if (change && !Try(*change, entries[i].key, i, target)) return;
             }
         });
     }
@@ -40,9 +42,10 @@ private:
         target.PrefetchKey(entry.key);
     }
 
-    bool Try(const YAMLMappingDiff::Entry& entry, std::size_t i, YAMLMapping& target) {
+    bool Try(const ChangeMappingOperation& change, const YAMLScalar* key, std::size_t i,
+             YAMLMapping& target) {
         try {
-            entry.operation->Apply(target, entry.key);
+            Inspect(change.Change(target, key));
             m_States[i] = State::Done;
         } catch (...) {
             m_Failures[i / kGroupSize] = std::current_exception();
@@ -51,6 +54,16 @@ private:
         return m_States[i] == State::Done;
     }
 
+    /// An object that repeats a key is left to who comes across it in its turn.
+    void Inspect(YAMLMapping& object) const {
+        if (!m_Inspect) return;
+        try {
+            object.SetTraitsOfChanged(m_Inspect(object));
+        } catch (const YAMLError&) {
+        }
+    }
+
+    const ObjectInspector m_Inspect;
     std::vector<State> m_States;                // by entry
     std::vector<std::exception_ptr> m_Failures; // by group, each of which ends with its first
 };
@@ -107,26 +120,27 @@ bool YAMLMappingDiff::LeavesKeys() const {
            std::all_of(m_Entries.begin(), m_Entries.end(), changesInPlace);
 }
 
-void YAMLMappingDiff::ApplyEntries(YAMLMapping& target, const TaskRunner& run) const {
+void YAMLMappingDiff::ApplyEntries(YAMLMapping& target, const TaskRunner& run,
+                                   ObjectInspector inspect) const {
     if (!run) {
         for (const Entry& entry : m_Entries) entry.operation->Apply(target, entry.key);
         return;
     }
-    const ChangesInside inside(m_Entries, target, run);
+    const ChangesInside inside(m_Entries, target, run, inspect);
     for (std::size_t i = 0; i < m_Entries.size(); ++i)
         if (!inside.IsDone(i)) m_Entries[i].operation->Apply(target, m_Entries[i].key);
 }
 
-void YAMLMappingDiff::Apply(YAMLMapping& target, const TaskRunner& run) const {
+void YAMLMappingDiff::Apply(YAMLMapping& target, const TaskRunner& run, ObjectInspector inspect) const {
     if (LeavesKeys()) {
         target.RequireNormalState();
-        ApplyEntries(target, run);
+        ApplyEntries(target, run, inspect);
         return;
     }
     std::vector<const YAMLScalar*> before;
     before.reserve(target.Size());
     for (const auto& entry : target) before.push_back(entry.key);
-    ApplyEntries(target, run);
+    ApplyEntries(target, run, inspect);
     if (m_KeyOrder) ApplyKeyOrder(m_KeyOrder, before, target);
 }
 

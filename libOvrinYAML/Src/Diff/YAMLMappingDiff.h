@@ -3,6 +3,7 @@
 #include "Diff/Operation.h"
 #include "Values/Arena.h"
 #include "Values/KeyIndex.h"
+#include "Values/ObjectTrait.h"
 #include "Values/TaskRunner.h"
 
 #include <memory>
@@ -46,9 +47,12 @@ public:
     /// changed and removed keys in base order, then the new ones in destination order.
     const EntryList& Entries() const { return m_Entries; }
 
-    /// Changes `target`, which must equal the base of the diff; what changes inside its values alone by
-    /// `run`, where there is one. Throws YAMLError where it doesn't fit; `target` is then left halfway.
-    void Apply(YAMLMapping& target, const TaskRunner& run = {}) const;
+    /// Changes `target`, which must equal the base of the diff. Throws YAMLError where it doesn't fit;
+    /// `target` is then left halfway.
+    void Apply(YAMLMapping& target) const { Apply(target, {}, nullptr); }
+    /// The same for a root: objects are changed inside by `run`, and `inspect` finds their traits anew while
+    /// they are at hand, where there are these.
+    void Apply(YAMLMapping& target, const TaskRunner& run, ObjectInspector inspect) const;
     /// Whether applying it neither adds nor removes a key, nor moves one.
     bool LeavesKeys() const;
 
@@ -59,7 +63,7 @@ public:
     void ResetForAlloc() {}
 
 private:
-    void ApplyEntries(YAMLMapping& target, const TaskRunner& run) const;
+    void ApplyEntries(YAMLMapping& target, const TaskRunner& run, ObjectInspector inspect) const;
 
     EntryList m_Entries;
     std::unique_ptr<KeyIndex>

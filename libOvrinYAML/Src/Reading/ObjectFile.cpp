@@ -298,7 +298,7 @@ bool ObjectFile::Recognise(DocumentReaders& readers, Document& document) const {
     const auto [object, isAsWritten] = readers.Recognisers().Read(text, kFileHeaderLines);
     if (!object || !isAsWritten || object->Traits() & m_Options.unshared) return false;
     document.object = YAMLMapping::CreateUnbuilt(text, *m_Maker);
-    document.object->SetTraitsAsRead(object->Traits());
+    document.object->SetTraits(object->Traits());
     document.isLendable = true;
     return true;
 }
@@ -335,8 +335,8 @@ void ObjectFile::InternIDs(std::span<Document> documents) {
 void ObjectFile::Complete(Document& document) const {
     YAMLMapping& object = *document.object;
     document.fileID = AsScalar(object.Get(YAMLScalar::fileIDPlaceHolderName));
-    if (m_Options.inspect) object.SetTraitsAsRead(m_Options.inspect(object));
-    document.isLendable = !(object.TraitsAsRead() & m_Options.unshared);
+    if (m_Options.inspect) object.SetTraits(m_Options.inspect(object));
+    document.isLendable = !(object.Traits() & m_Options.unshared);
     if (document.isLendable && document.wantedBy) object.MarkAsShared();
     if (!m_Base && document.isAsWritten) object.SetSource({document.begin, document.length});
 }

@@ -30,9 +30,9 @@ struct RepairRoots {
     void RemoveObjects(const std::vector<const YAMLScalar*>& ids);
 };
 
-/// Calls visit(id, value) in file order for the objects of a root that are of interest. Of an object that has
-/// traits (YAMLMapping::TraitsAsRead), byTraits(const YAMLMapping&) tells whether it is, of any other
-/// byTree(id, value).
+/// Calls visit(id, value) in file order for the objects of a root that are of interest: byTree(id, value)
+/// tells, but an object that has traits (YAMLMapping::Traits) may be told to be of none by
+/// byTraits(const YAMLMapping&) first, and one that is unbuilt is asked no more than that.
 ///
 /// All are asked for ahead of the first visit, many at once where there is a `run`. One whose question throws
 /// a YAMLError is visited, so that the first failure in file order is the one that is thrown; a YAMLError of
@@ -46,8 +46,8 @@ void ForEachObject(const YAMLMapping& root, const TaskRunner& run, const ByTrait
     const auto entries = root.RawEntries();
     const auto isOfInterest = [&](const YAMLMapping::Entry& entry) {
         const YAMLMapping* object = AsMapping(entry.value);
-        return object && object->TraitsAsRead() ? byTraits(*object)
-                                                : static_cast<bool>(byTree(entry.key, entry.value));
+        if (object && object->Traits() && !byTraits(*object)) return false;
+        return (object && !object->IsBuilt()) || byTree(entry.key, entry.value);
     };
     std::vector<std::uint8_t> isWanted(entries.size());
     RunInGroups(run, entries.size(), kGroupSize, [&](std::size_t first, std::size_t end) {

@@ -14,8 +14,7 @@ namespace {
 /// The objects that may have a prefab link to the file id that isMeant(std::string_view) tells of.
 template <class IsMeant> auto MayHaveLinkTo(const IsMeant& isMeant) {
     return [isMeant](const YAMLMapping& object) {
-        return object.TraitsAsRead() & kHasPrefabLink &&
-               MayRefer(object, *YAMLScalar::mPrefabInternal, isMeant);
+        return object.Traits() & kHasPrefabLink && MayRefer(object, *YAMLScalar::mPrefabInternal, isMeant);
     };
 }
 

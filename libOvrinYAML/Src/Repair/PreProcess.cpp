@@ -19,7 +19,7 @@ void ReplaceTransitions(YAMLMapping& root, const TaskRunner& run, const Replace&
     const YAMLScalar* const machine = YAMLScalar::Lookup("AnimatorStateMachine");
     const YAMLScalar* const key = YAMLScalar::Lookup("m_StateMachineTransitions");
     const auto hadTransitions = [](const YAMLMapping& object) {
-        return (object.TraitsAsRead() & kHasTransitions) != 0;
+        return (object.Traits() & kHasTransitions) != 0;
     };
     const auto find = [](const YAMLScalar*, const YAMLNode* value) {
         const YAMLMapping* object = AsMapping(value);

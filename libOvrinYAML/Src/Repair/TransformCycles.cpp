@@ -42,7 +42,7 @@ public:
             return removed.MayContain(parent) && roots.IsRemoved(YAMLScalar::Lookup(parent));
         };
         const auto mayHaveOne = [&](const YAMLMapping& object) {
-            const std::uint8_t traits = object.TraitsAsRead();
+            const std::uint8_t traits = object.Traits();
             if (traits & kLacksFather) return (traits & kLacksInstance) != 0;
             return anyRemoved && traits & kIsTransform && MayRefer(object, *YAMLScalar::mFather, isRemoved);
         };

@@ -4,6 +4,7 @@
 #include "Merge/ConflictReport.h"
 #include "Merge/DiffMerge.h"
 #include "Repair/FileIDCollisions.h"
+#include "Repair/ObjectTraits.h"
 #include "Repair/PostProcess.h"
 #include "Repair/PreProcess.h"
 #include "Session/StageWatcher.h"
@@ -137,7 +138,7 @@ void MergeSession::Apply(Base base) {
     assert(m_Result != &m_Base && "the base is used up");
     if (base == Base::Kept) m_Copy.reset(m_Base.Clone());
     m_Result = base == Base::Kept ? m_Copy.get() : &m_Base;
-    WithStage(Stage::Apply, [&] { m_MergedDiff->Apply(m_Result->GetMapping(), m_Run); });
+    WithStage(Stage::Apply, [&] { m_MergedDiff->Apply(m_Result->GetMapping(), m_Run, InspectObject); });
 }
 
 void MergeSession::Repair() {
@@ -155,7 +156,7 @@ std::unique_ptr<OvrinObjects> MergeSession::Premerge(MergeResolve resolve) {
     RecordingConflictResolver resolver(m_Rules, resolve);
     const YAMLMappingDiff* merged = nullptr;
     WithStage(Stage::Merge, [&] { merged = MergeDiffs(*m_LeftDiff, *m_RightDiff, resolver); });
-    WithStage(Stage::Apply, [&] { merged->Apply(root, m_Run); });
+    WithStage(Stage::Apply, [&] { merged->Apply(root, m_Run, InspectObject); });
     WithStage(Stage::Repair, [&] {
         PostProcessMergeOnly(root, m_Left.GetMapping(), m_Right.GetMapping(), resolver, m_Run);
     });

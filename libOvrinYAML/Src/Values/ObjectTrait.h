@@ -4,8 +4,11 @@
 
 namespace ovrin_yaml {
 
-/// What the repair stages want to know of an object before they look into it. Found once, when the object is
-/// read, so that they can pass over those that nobody changed and that are of no interest.
+class YAMLMapping;
+
+/// What the repair stages want to know of an object before they look into it. Found when the object is read,
+/// and again when it was changed, while it is at hand, so that they can pass over those that are of no
+/// interest.
 enum ObjectTrait : std::uint8_t {
     kTraitsKnown = 1,
     kHasTransitions = 2, ///< a state machine with transitions
@@ -14,5 +17,8 @@ enum ObjectTrait : std::uint8_t {
     kLacksFather = 16,   ///< these have no m_Father
     kLacksInstance = 32, ///< nor a link to the prefab instance that would know it
 };
+
+/// Finds the traits of an object that repeats no key. Called from any thread.
+using ObjectInspector = std::uint8_t (*)(const YAMLMapping& object);
 
 } // namespace ovrin_yaml

@@ -120,7 +120,11 @@ void YAMLMapping::BuildIndex() {
     KeyIndex*& index = NeedExtra().index;
     if (!index) index = new KeyIndex;
     index->Reserve(Room());
-    for (std::uint32_t i = 0; i < m_Size; ++i) index->Set(m_Keys[i], i);
+    constexpr std::uint32_t kAhead = 8;
+    for (std::uint32_t i = 0; i < m_Size; ++i) {
+        if (i + kAhead < m_Size) index->Prefetch(m_Keys[i + kAhead]);
+        index->Set(m_Keys[i], i);
+    }
 }
 
 void YAMLMapping::DropIndex() {

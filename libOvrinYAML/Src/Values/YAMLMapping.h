@@ -146,10 +146,14 @@ public:
     std::string_view Source() const { return m_Extra ? m_Extra->source : std::string_view(); }
     void SetSource(std::string_view source) { NeedExtra().source = source; }
 
-    /// What an inspector found in this object when it was read (ReaderOptions::inspect); 0: nobody looked, or
-    /// the object was changed since.
-    std::uint8_t TraitsAsRead() const { return m_Traits; }
-    void SetTraitsAsRead(std::uint8_t traits) { m_Traits = traits; }
+    /// What an inspector found in this object when it was read (ReaderOptions::inspect), or when the changes
+    /// of a merge had been applied; 0: nobody looked, or the object was changed since.
+    std::uint8_t Traits() const { return m_Traits; }
+    void SetTraits(std::uint8_t traits) { m_Traits = traits; }
+    void SetTraitsOfChanged(std::uint8_t traits) {
+        m_Traits = traits;
+        m_State |= kChanged;
+    }
 
     /// Whether several trees hold this mapping, an object: it is never freed, and copied before it is
     /// changed.
@@ -158,7 +162,9 @@ public:
 
     /// Whether the object is known to be as it was when its hashes were built. What changes one first gets it
     /// from GetForChange, which ends this state.
-    bool IsKnownUnchanged() const { return IsShared() || m_Traits || !Source().empty(); }
+    bool IsKnownUnchanged() const {
+        return IsShared() || (m_Traits && !(State() & kChanged)) || !Source().empty();
+    }
 
     bool HasDuplicates() const {
         NeedTree();
@@ -258,7 +264,7 @@ private:
     };
     friend class TreeCheck;
 
-    enum State : std::uint8_t { kShared = 1, kUnbuilt = 2 };
+    enum State : std::uint8_t { kShared = 1, kUnbuilt = 2, kChanged = 4 };
 
     /// What is there for threads that see the tree as built.
     std::uint8_t State() const { return __atomic_load_n(&m_State, __ATOMIC_ACQUIRE); }

@@ -8,6 +8,7 @@
 #include <array>
 #include <exception>
 #include <ostream>
+#include <utility>
 #include <vector>
 
 namespace ovrin_yaml {
@@ -110,13 +111,16 @@ template <class Target> void PutObject(const YAMLMapping::Entry& entry, Target& 
         AppendObject(*entry.key, object, target.Own());
 }
 
-/// Whether it is worth the while to write objects on several threads.
+/// Whether it is worth the while to write objects on several threads, as far as some of them tell.
 bool AreManyChanged(const YAMLMapping::Pairs& entries) {
     constexpr std::size_t kMany = 1000;
-    std::size_t count = 0;
-    for (const YAMLMapping::Entry entry : entries)
-        if (const YAMLMapping* object = AsMapping(entry.value); object && object->Source().empty()) ++count;
-    return count >= kMany && count >= entries.size() / 8;
+    const std::size_t step = entries.size() / kMany;
+    if (step == 0) return false;
+    std::size_t seen = 0, changed = 0;
+    for (std::size_t i = 0; i < entries.size(); i += step, ++seen)
+        if (const YAMLMapping* object = AsMapping(entries[i].value); object && object->Source().empty())
+            ++changed;
+    return changed >= seen / 8;
 }
 
 /// A few of many objects that are written one behind the other.
@@ -127,8 +131,6 @@ struct Group {
     std::string& Own() { return text; }
     void Put(std::string_view bytes) { text += bytes; }
     void Write(const YAMLMapping::Pairs& entries, std::size_t first, std::size_t end) {
-        text.clear();
-        failure = nullptr;
         try {
             for (std::size_t i = first; i < end; ++i) PutObject(entries[i], *this);
         } catch (...) {
@@ -137,23 +139,36 @@ struct Group {
     }
 };
 
+using Groups = std::array<Group, 32>;
+
+/// Leaves the groups empty. Throws the first failure.
+void PutGroups(Groups& groups, Pieces& pieces) {
+    for (const Group& group : groups) {
+        if (group.failure) std::rethrow_exception(group.failure);
+        pieces.Put(group.text);
+    }
+    pieces.Flush();
+    for (Group& group : groups) group.text.clear();
+}
+
 /// Writes groups of objects at the same time: so many that the threads have enough to do, and so few that
-/// little waits in memory. The first failure in the order of the objects is the one that is thrown.
+/// little waits in memory. What one round has written is put out beside the next. The first failure in the
+/// order of the objects is the one that is thrown.
 void PutInGroups(const YAMLMapping::Pairs& entries, Pieces& pieces, const TaskRunner& run) {
     constexpr std::size_t kGroupSize = 256;
-    std::array<Group, 32> groups;
-    for (std::size_t first = 0; first < entries.size(); first += groups.size() * kGroupSize) {
+    std::array<Groups, 2> rounds;
+    Groups *groups = &rounds[0], *before = &rounds[1];
+    for (std::size_t first = 0; first < entries.size(); first += groups->size() * kGroupSize) {
         const std::size_t left = entries.size() - first;
-        const std::size_t count = std::min(groups.size(), (left + kGroupSize - 1) / kGroupSize);
-        run(count, [&](std::size_t i) {
-            const std::size_t begin = first + i * kGroupSize;
-            groups[i].Write(entries, begin, std::min(begin + kGroupSize, entries.size()));
+        const std::size_t count = std::min(groups->size(), (left + kGroupSize - 1) / kGroupSize);
+        run(count + 1, [&](std::size_t i) {
+            if (i == 0) return PutGroups(*before, pieces);
+            const std::size_t begin = first + (i - 1) * kGroupSize;
+            (*groups)[i - 1].Write(entries, begin, std::min(begin + kGroupSize, entries.size()));
         });
-        for (std::size_t i = 0; i < count; ++i) {
-            if (groups[i].failure) std::rethrow_exception(groups[i].failure);
-            pieces.Own() += groups[i].text;
-        }
+        std::swap(groups, before);
     }
+    PutGroups(*before, pieces);
 }
 
 } // namespace
