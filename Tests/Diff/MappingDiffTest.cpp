@@ -1,5 +1,9 @@
 #include "Support/Diffs.h"
 
+#include "Session/Tasks.h"
+
+#include <map>
+
 namespace {
 
 using namespace diffs;
@@ -49,6 +53,61 @@ TEST_F(MappingDiff, WithoutAKeyOrderNewKeysComeLast) {
     diff.Add(YAMLScalar::Lookup("z"), YAMLAlloc<AddOperation>::create(Node("1"), true));
     diff.Add(YAMLScalar::Lookup("b"), YAMLAlloc<AddOperation>::create(Node("2"), true));
     EXPECT_EQ(Applied("c: 0", &diff), "{c: 0, z: 1, b: 2}");
+}
+
+/// A root of many objects, but for what is special.
+std::string ManyObjects(const std::string& value, const std::map<int, std::string>& special = {}) {
+    std::string text;
+    for (int i = 0; i < 5000; ++i) {
+        const auto found = special.find(i);
+        const std::string object = found == special.end() ? "{b: {x: " + value + "}}" : found->second;
+        if (!object.empty()) text += "k" + std::to_string(i) + ": " + object + "\n";
+    }
+    return text;
+}
+
+struct AppliedRoot {
+    std::string failure, text;
+    std::size_t traits = 0; // objects that were looked at
+};
+
+AppliedRoot ApplyToRoot(const std::string& target, const YAMLMappingDiff* diff, const TaskRunner& run) {
+    YAMLMapping* root = Doc(target);
+    AppliedRoot applied;
+    const auto inspect = [](const YAMLMapping& object) {
+        return static_cast<std::uint8_t>(object.HasKey(YAMLScalar::Lookup("b")));
+    };
+    std::string other;
+    applied.failure =
+        ErrorOf([&] { other = ErrorOf<std::bad_cast>([&] { diff->Apply(*root, run, inspect); }); });
+    if (applied.failure == "none") applied.failure = other;
+    applied.text = Show(root);
+    for (const auto& [key, value] : *root)
+        if (const YAMLMapping* object = AsMapping(value)) applied.traits += object->Traits();
+    return applied;
+}
+
+TEST_F(MappingDiff, ObjectsAreChangedAtOnceAsOneAfterTheOther) {
+    const YAMLMappingDiff* changes = DiffOf(ManyObjects("1"), ManyObjects("2", {{7, ""}, {2500, "{b: 5}"}}));
+    const TaskRunner atOnce = RunnerFor(Threads::Everywhere);
+    const AppliedRoot applied = ApplyToRoot(ManyObjects("1"), changes, atOnce);
+    EXPECT_EQ(applied.failure, "none");
+    EXPECT_TRUE(applied.text == Applied(ManyObjects("1"), changes));
+    EXPECT_EQ(applied.traits, 4999u);
+}
+
+TEST_F(MappingDiff, OfObjectsThatAreChangedAtOnceTheFirstThatFailsIsTold) {
+    const YAMLMappingDiff* changes = DiffOf(ManyObjects("1"), ManyObjects("2"));
+    const std::pair<const char*, const char*> failures[] = {{"", "Cannot get unknown key from yaml mapping"},
+                                                            {"text", "std::bad_cast"}};
+    for (const int place : {1, 255, 256, 3000, 4998}) {
+        for (const auto& [object, failure] : failures) {
+            const std::string other = *object ? "" : "text";
+            const std::string target = ManyObjects("1", {{place, object}, {place + 1, other}});
+            EXPECT_EQ(ApplyToRoot(target, changes, {}).failure, failure) << place;
+            EXPECT_EQ(ApplyToRoot(target, changes, RunnerFor(Threads::Everywhere)).failure, failure) << place;
+        }
+    }
 }
 
 TEST_F(MappingDiff, ATargetThatDoesNotFitFails) {

@@ -1,5 +1,6 @@
 #include "Repair/PostProcess.h"
 
+#include "Session/Tasks.h"
 #include "Support/ObjectText.h"
 
 #include <gtest/gtest.h>
@@ -9,12 +10,13 @@ using namespace object_text;
 namespace {
 
 /// The merged file behind the repair, or what failed.
-std::string Repaired(const std::string& merged, const std::string& left = "", const std::string& right = "") {
+std::string Repaired(const std::string& merged, const std::string& left = "", const std::string& right = "",
+                     const TaskRunner& run = {}) {
     Scene m(merged), l(left), r(right);
     const std::string failure = ErrorOf([&] {
         const MergeRules rules;
         RecordingConflictResolver resolver(rules, ResolveBase);
-        PostProcessMergeOnly(m.Root(), l.Root(), r.Root(), resolver);
+        PostProcessMergeOnly(m.Root(), l.Root(), r.Root(), resolver, run);
     });
     return failure == "none" ? m.Text() : failure;
 }
@@ -75,6 +77,42 @@ TEST(PostProcess, SidesStayAsTheyAre) {
     EXPECT_EQ(left.Text(), side + kPrefab);
     EXPECT_EQ(right.Text(), side);
     EXPECT_EQ(merged.Text(), "1107 &3 AnimatorStateMachine: {m_StateMachineTransitions: {}}\n");
+}
+
+/// So many objects that they are looked at on several threads, with each of `lines` among them.
+std::string AmongMany(const std::vector<std::string>& lines) {
+    constexpr std::size_t kCount = 36'000;
+    std::string text;
+    for (std::size_t i = 0; i < kCount; ++i) {
+        if (i % (kCount / lines.size()) == 11) text += lines[i / (kCount / lines.size())];
+        text += "4 &" + std::to_string(100'000 + i) + " Transform: {m_Father: {fileID: 0}}\n";
+    }
+    return text;
+}
+
+TEST(PostProcess, ManyObjectsAreRepairedAsFewAre) {
+    const auto transform = [](const char* start, const std::string& fields) {
+        return std::string(start) + " Transform: {" + fields + "}\n";
+    };
+    const std::string father = "m_Father: {fileID: 9}", link = "m_PrefabInternal: {fileID: 9}";
+    const std::string merged = AmongMany(
+        {transform("4 &7", father), Linked("9", "2"), transform("4 &3 stripped", link + ", " + father),
+         "114 &4 C: {l: [{m: {" + link + "}}]}\n", kGameObject, transform("4 &5", father),
+         "1107 &6 AnimatorStateMachine: {m_StateMachineTransitions: [{a: 1}, {a: 2}]}\n"});
+    EXPECT_TRUE(Repaired(merged, kPrefab, "", RunnerFor(Threads::Everywhere)) == Repaired(merged, kPrefab));
+    EXPECT_FALSE(Repaired(merged, kPrefab) == merged);
+}
+
+TEST(PostProcess, OfManyObjectsTheFirstThatFailsIsTold) {
+    const std::string repeated = "114 &1 C: {l: [{m: {k: 1, k: 2}}]}\n";
+    const std::string stripped = "4 &2 stripped Transform: {}\n";
+    const std::vector<std::string> orders[] = {{stripped, repeated}, {repeated, stripped}};
+    for (const auto& lines : orders) {
+        const std::string merged = AmongMany(lines);
+        const std::string failure = Repaired(merged);
+        EXPECT_LT(failure.size(), 100u) << "it fails";
+        EXPECT_EQ(Repaired(merged, "", "", RunnerFor(Threads::Everywhere)), failure);
+    }
 }
 
 } // namespace

@@ -17,12 +17,12 @@ constexpr std::size_t kWindowSize = std::size_t{1} << 20;
 
 TextWindow::TextWindow(ByteSource source) : m_Source(std::move(source)), m_Bytes(kWindowSize, '\0') {}
 
-/// Moves what is left to the front and fills the room behind it, which is made for twice `wanted` bytes in
-/// all: whoever asks for as many at each of many small steps shall not have them moved at each.
+/// Moves what is left to the front and fills the room behind it, at least half of `wanted` bytes: whoever asks
+/// for as many at each of many small steps shall not have them moved at each.
 void TextWindow::ReadMore(std::size_t wanted) {
     const std::size_t left = m_Rest.size();
     std::copy_n(m_Rest.data(), left, m_Bytes.data());
-    if (wanted > m_Bytes.size() / 2) m_Bytes.resize(2 * wanted);
+    if (m_Bytes.size() < left + wanted / 2 || m_Bytes.size() < wanted) m_Bytes.resize(wanted + wanted / 2);
     char* const bytes = m_Bytes.data() + left;
     std::size_t count = m_Source(bytes, m_Bytes.size() - left);
     const void* const nul = std::memchr(bytes, '\0', count);
