@@ -143,4 +143,26 @@ TEST_F(DestinationDrafts, AreMadeForBigResultsAndPlainFilesAlone) {
     ExpectDelivered();
 }
 
+/// The disk may not have room for both.
+TEST_F(DestinationDrafts, MakeRoomForWhatIsWrittenInTheirStead) {
+    const auto changes = {
+        +[](const fs::path& file) { fs::create_hard_link(file, file.parent_path() / "name"); },
+        +[](const fs::path& file) { fs::remove(file); },
+    };
+    for (const auto change : changes) {
+        DestinationDraft draft(Path("to/file"), 1);
+        WriteInSteps(draft);
+        ASSERT_TRUE(draft.Complete(OpenFile(Path("result").c_str(), O_RDONLY)));
+        change(Path("to/file"));
+        const auto write = [&](OutputStream& stream) {
+            EXPECT_FALSE(draft.GiveUp());
+            stream << "new";
+        };
+        EXPECT_EQ(::Deliver(Path("to/file"), {3, write, Durability::Synced, &draft}), 0);
+        EXPECT_EQ(folder.Read("to/file"), "new");
+        fs::remove_all(folder.Path() / "to");
+        StartAgain();
+    }
+}
+
 } // namespace
