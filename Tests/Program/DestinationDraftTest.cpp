@@ -37,6 +37,9 @@ struct DestinationDrafts : testing::Test {
     std::size_t CountFiles() const {
         return static_cast<std::size_t>(std::distance(fs::directory_iterator(folder.Path() / "to"), {}));
     }
+    static std::size_t CountDescriptors() {
+        return static_cast<std::size_t>(std::distance(fs::directory_iterator("/proc/self/fd"), {}));
+    }
     void ExpectDelivered(const std::string& dest = "to/file") const {
         EXPECT_TRUE(folder.Read(dest) == folder.Read("result"));
         EXPECT_EQ(CountFiles(), 1u);
@@ -163,6 +166,20 @@ TEST_F(DestinationDrafts, MakeRoomForWhatIsWrittenInTheirStead) {
         fs::remove_all(folder.Path() / "to");
         StartAgain();
     }
+}
+
+/// The process may have none to spare for the delivery.
+TEST_F(DestinationDrafts, KeepNoDescriptorOfTheResult) {
+    const std::size_t before = CountDescriptors();
+    DestinationDraft draft(Path("to/file"), 1);
+    WriteInSteps(draft);
+    EXPECT_EQ(CountDescriptors(), before + 2);
+    EXPECT_TRUE(draft.Complete(OpenFile(Path("result").c_str(), O_RDONLY)));
+    EXPECT_EQ(CountDescriptors(), before + 1);
+    EXPECT_TRUE(draft.GiveUp());
+    DestinationDraft inVain("/proc/self/comm", 1); // where no files can be made
+    Follow(inVain);
+    EXPECT_EQ(CountDescriptors(), before);
 }
 
 } // namespace
