@@ -1,7 +1,9 @@
 #include "DestinationDraft.h"
 
+#include "CommandSettings.h"
 #include "Destination.h"
 #include "FileUtils.h"
+#include "MergePipeline.h"
 
 #include "Support/Program.h"
 
@@ -166,6 +168,30 @@ TEST_F(DestinationDrafts, MakeRoomForWhatIsWrittenInTheirStead) {
         fs::remove_all(folder.Path() / "to");
         StartAgain();
     }
+}
+
+TEST_F(DestinationDrafts, DontFollowAResultThatComesBeforePremergedFiles) {
+    for (const char* side : {"base", "left", "right"})
+        folder.Write(side, "%YAML 1.1\n%TAG !o! tag:ovrin.dev,2011:\n--- !o!1 &1\nGameObject:\n  m_Name: " +
+                               std::string(side) + '\n');
+    folder.Write("rules", "");
+    MergeConfig config;
+    config.baseFile = Path("base");
+    config.leftFile = Path("left");
+    config.rightFile = Path("right");
+    config.destFile = Path("to/file");
+    config.conflictFile = Path("report");
+    config.rulesFile = Path("rules");
+    config.fallbackSpecFile = "none";
+    const auto hasDraft = [&] {
+        DestinationDraft draft(config.destFile, 1);
+        EXPECT_EQ(HandleMergeCommand(config, Path("result"), &draft), ExitStatus::Conflicts);
+        return draft.GiveUp();
+    };
+    EXPECT_TRUE(hasDraft());
+    config.premergeBaseDest = Path("premerged base");
+    config.premergeRightDest = Path("premerged right");
+    EXPECT_FALSE(hasDraft());
 }
 
 /// The process may have none to spare for the delivery.
