@@ -39,10 +39,16 @@ int Make(NewFile& file, const Descriptor* old, const Content& content) {
     return error ? error : file.Fill(content.write, content.durability);
 }
 
+/// What is written anew may need the room on the disk that the draft takes.
+void GiveUpDraft(const Content& content) {
+    if (content.draft) content.draft->GiveUp();
+}
+
 /// Puts a whole new file at `place`. `old` is what stands there, null for nothing. The file has no name in
 /// the folder while it is being written, if that can be had.
 int PutNewFile(const std::string& place, const Descriptor* old, const Content& content) {
     if (old && content.draft && content.draft->TakePlace(place, *old, content.durability)) return 0;
+    GiveUpDraft(content);
     const mode_t mode = old ? 0600 : 0666;
     if (NewFile file(place); file.OpenUnnamed(mode) == 0) {
         if (const int error = Make(file, old, content)) return error;
@@ -98,6 +104,7 @@ void PutBack(const Descriptor& file, const std::string& bytes) {
 /// Writes through a second descriptor, whose end tells what closing tells while there is still one to put the
 /// old bytes back.
 int Overwrite(const Descriptor& file, const std::string& path, const Content& content) {
+    GiveUpDraft(content);
     std::string old;
     errno = 0;
     if (ReadWholeFile(path, old) != ReadResult::Complete) return errno ? errno : EIO;

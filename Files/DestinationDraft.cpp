@@ -21,6 +21,7 @@ void DestinationDraft::Follow(const std::string& source, std::uint64_t length) n
         } catch (...) {
             // Neither memory nor a thread for what isn't needed.
         }
+        if (!m_File) m_Source.Close();
     }
     if (!m_File) return;
     {
@@ -69,7 +70,8 @@ std::uint64_t DestinationDraft::WaitBehind(std::uint64_t position) {
     return m_Length > position ? m_Length - position : 0;
 }
 
-/// Has the thread copy what there is up to `length` bytes, and waits for it.
+/// Has the thread copy what there is up to `length` bytes, and waits for it. The process may have no
+/// descriptors to spare for what comes then.
 void DestinationDraft::End(std::uint64_t length) {
     {
         const std::lock_guard lock(m_Lock);
@@ -78,6 +80,7 @@ void DestinationDraft::End(std::uint64_t length) {
     }
     m_Changed.notify_one();
     m_Thread.join();
+    m_Source.Close();
 }
 
 bool DestinationDraft::GiveUp() {

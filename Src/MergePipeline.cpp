@@ -128,12 +128,12 @@ ExitStatus HandleMergeCommand(const MergeConfig& config, const std::string& outp
     if (const int error = OutputConflicts(root, config, session.Resolver())) return FailToWrite({}, error);
     const bool hasConflicts = session.Resolver().HasPendingConflicts();
     const bool isForTool = hasConflicts && config.fallbackSpecFile != kNoSpecFile;
-    if (const int error =
-            OutputResult(root, config, outputPath, session.Result(), isForTool ? nullptr : draft))
+    const bool isPremerged = hasConflicts && UseOfBase(config) == MergeSession::Base::Kept;
+    // Premerged files come before the delivery, and may need the room on the disk.
+    DestinationDraft* const follower = isForTool || isPremerged ? nullptr : draft;
+    if (const int error = OutputResult(root, config, outputPath, session.Result(), follower))
         return FailToWrite(outputPath, error);
     if (!hasConflicts) return ExitStatus::Done;
-    if (UseOfBase(config) == MergeSession::Base::Kept &&
-        PremergeForTool(root, config, session) != ExitStatus::Done)
-        return ExitStatus::Failed;
+    if (isPremerged && PremergeForTool(root, config, session) != ExitStatus::Done) return ExitStatus::Failed;
     return session.HasBrokenDependencies() ? ExitStatus::BrokenDependencies : ExitStatus::Conflicts;
 }

@@ -1,7 +1,9 @@
 #include "DestinationDraft.h"
 
+#include "CommandSettings.h"
 #include "Destination.h"
 #include "FileUtils.h"
+#include "MergePipeline.h"
 
 #include "Support/Program.h"
 
@@ -36,6 +38,9 @@ struct DestinationDrafts : testing::Test {
     }
     std::size_t CountFiles() const {
         return static_cast<std::size_t>(std::distance(fs::directory_iterator(folder.Path() / "to"), {}));
+    }
+    static std::size_t CountDescriptors() {
+        return static_cast<std::size_t>(std::distance(fs::directory_iterator("/proc/self/fd"), {}));
     }
     void ExpectDelivered(const std::string& dest = "to/file") const {
         EXPECT_TRUE(folder.Read(dest) == folder.Read("result"));
@@ -141,6 +146,66 @@ TEST_F(DestinationDrafts, AreMadeForBigResultsAndPlainFilesAlone) {
     EXPECT_FALSE(small.GiveUp());
     EXPECT_EQ(Deliver(small), 0);
     ExpectDelivered();
+}
+
+/// The disk may not have room for both.
+TEST_F(DestinationDrafts, MakeRoomForWhatIsWrittenInTheirStead) {
+    const auto changes = {
+        +[](const fs::path& file) { fs::create_hard_link(file, file.parent_path() / "name"); },
+        +[](const fs::path& file) { fs::remove(file); },
+    };
+    for (const auto change : changes) {
+        DestinationDraft draft(Path("to/file"), 1);
+        WriteInSteps(draft);
+        ASSERT_TRUE(draft.Complete(OpenFile(Path("result").c_str(), O_RDONLY)));
+        change(Path("to/file"));
+        const auto write = [&](OutputStream& stream) {
+            EXPECT_FALSE(draft.GiveUp());
+            stream << "new";
+        };
+        EXPECT_EQ(::Deliver(Path("to/file"), {3, write, Durability::Synced, &draft}), 0);
+        EXPECT_EQ(folder.Read("to/file"), "new");
+        fs::remove_all(folder.Path() / "to");
+        StartAgain();
+    }
+}
+
+TEST_F(DestinationDrafts, DontFollowAResultThatComesBeforePremergedFiles) {
+    for (const char* side : {"base", "left", "right"})
+        folder.Write(side, "%YAML 1.1\n%TAG !o! tag:ovrin.dev,2011:\n--- !o!1 &1\nGameObject:\n  m_Name: " +
+                               std::string(side) + '\n');
+    folder.Write("rules", "");
+    MergeConfig config;
+    config.baseFile = Path("base");
+    config.leftFile = Path("left");
+    config.rightFile = Path("right");
+    config.destFile = Path("to/file");
+    config.conflictFile = Path("report");
+    config.rulesFile = Path("rules");
+    config.fallbackSpecFile = "none";
+    const auto hasDraft = [&] {
+        DestinationDraft draft(config.destFile, 1);
+        EXPECT_EQ(HandleMergeCommand(config, Path("result"), &draft), ExitStatus::Conflicts);
+        return draft.GiveUp();
+    };
+    EXPECT_TRUE(hasDraft());
+    config.premergeBaseDest = Path("premerged base");
+    config.premergeRightDest = Path("premerged right");
+    EXPECT_FALSE(hasDraft());
+}
+
+/// The process may have none to spare for the delivery.
+TEST_F(DestinationDrafts, KeepNoDescriptorOfTheResult) {
+    const std::size_t before = CountDescriptors();
+    DestinationDraft draft(Path("to/file"), 1);
+    WriteInSteps(draft);
+    EXPECT_EQ(CountDescriptors(), before + 2);
+    EXPECT_TRUE(draft.Complete(OpenFile(Path("result").c_str(), O_RDONLY)));
+    EXPECT_EQ(CountDescriptors(), before + 1);
+    EXPECT_TRUE(draft.GiveUp());
+    DestinationDraft inVain("/proc/self/comm", 1); // where no files can be made
+    Follow(inVain);
+    EXPECT_EQ(CountDescriptors(), before);
 }
 
 } // namespace
