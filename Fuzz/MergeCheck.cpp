@@ -43,7 +43,9 @@ std::string CheckMerge(const MergeTexts& texts) {
         return RunMerge({files, options, threads, sessions});
     };
     const auto runUnbuilt = [&](Threads threads, Sessions sessions) {
-        return RunMerge({inSteps, DefaultReaderOptions(), threads, sessions, {}, false});
+        ReaderOptions options = DefaultReaderOptions();
+        options.window = 200; // less than many a document
+        return RunMerge({inSteps, options, threads, sessions, {}, false});
     };
     const MergeOutcome expected = run(false, false, Threads::None, Sessions::OneEach);
     const MergeOutcome unshared = run(true, false, Threads::None, Sessions::One);

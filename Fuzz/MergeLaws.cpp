@@ -11,8 +11,10 @@
 #include "Repair/PreProcess.h"
 #include "Values/Hash.h"
 
-#include <map>
+#include <algorithm>
 #include <memory>
+#include <string>
+#include <vector>
 
 using namespace ovrin_yaml;
 
@@ -26,26 +28,56 @@ bool IsHeaderEntry(const YAMLScalar* key) {
            key == YAMLScalar::strippedPrefabPlaceHolderName;
 }
 
-enum class KeyOrder { Counts, CountsNot };
+/// The pairs that count, without those that were removed.
+std::vector<YAMLMapping::Entry> PairsOf(const YAMLMapping& mapping) {
+    std::vector<YAMLMapping::Entry> pairs;
+    for (const YAMLMapping::Entry entry : mapping.RawEntries())
+        if (entry.key && !IsHeaderEntry(entry.key)) pairs.push_back(entry);
+    return pairs;
+}
 
 /// The hash of all that stands in a node now.
-std::uint32_t ContentHash(const YAMLNode& node, KeyOrder order = KeyOrder::Counts) {
+std::uint32_t ContentHash(const YAMLNode& node) {
     std::uint32_t hash = 0;
     std::uint32_t index = 0;
     if (const YAMLMapping* mapping = AsMapping(&node)) {
-        for (const auto& [key, value] : mapping->RawEntries()) {
-            if (!key || IsHeaderEntry(key)) continue;
-            const std::uint32_t content = ContentHash(*value, order);
-            hash = order == KeyOrder::Counts ? FoldPair(hash, key->m_Hash, content, index++)
-                                             : hash + FoldPair(0, key->m_Hash, content, 0);
-        }
+        for (const auto& [key, value] : PairsOf(*mapping))
+            hash = FoldPair(hash, key->m_Hash, ContentHash(*value), index++);
     } else if (const YAMLSequence* sequence = AsSequence(&node)) {
-        for (const YAMLNode* item : sequence->m_Items)
-            hash = FoldItem(hash, ContentHash(*item, order), index++);
+        for (const YAMLNode* item : sequence->m_Items) hash = FoldItem(hash, ContentHash(*item), index++);
     } else {
         hash = node.m_Hash;
     }
     return hash;
+}
+
+enum class KeyOrder { Counts, CountsNot };
+
+bool IsSame(const YAMLNode& one, const YAMLNode& other, KeyOrder order);
+
+bool HasSamePairs(const YAMLMapping& one, const YAMLMapping& other) {
+    if (one.HasDuplicates() || other.HasDuplicates()) return false;
+    const std::vector<YAMLMapping::Entry> pairs = PairsOf(one);
+    return pairs.size() == PairsOf(other).size() &&
+           std::ranges::all_of(pairs, [&](const YAMLMapping::Entry& pair) {
+               const YAMLNode* value = other.Get(pair.key);
+               return value && IsSame(*pair.value, *value, KeyOrder::CountsNot);
+           });
+}
+
+/// Whether two nodes have the same content, or one that differs in nothing but the order of keys. Each level
+/// is asked for its hash: two mappings may have another one for their order, and have values that differ and
+/// have one.
+bool IsSame(const YAMLNode& one, const YAMLNode& other, KeyOrder order) {
+    if (ContentHash(one) == ContentHash(other)) return true;
+    if (order == KeyOrder::Counts) return false;
+    const YAMLMapping *mapping = AsMapping(&one), *otherMapping = AsMapping(&other);
+    if (mapping && otherMapping) return HasSamePairs(*mapping, *otherMapping);
+    const YAMLSequence *list = AsSequence(&one), *otherList = AsSequence(&other);
+    const auto isSame = [](const YAMLNode* item, const YAMLNode* otherItem) {
+        return IsSame(*item, *otherItem, KeyOrder::CountsNot);
+    };
+    return list && otherList && std::ranges::equal(list->m_Items, otherList->m_Items, isSame);
 }
 
 /// Whether somewhere in two mappings stand two that differ in nothing but the order of their keys, which is
@@ -104,25 +136,6 @@ std::unique_ptr<OvrinObjects> Read(const std::string& file) {
         return nullptr;
     }
     return objects;
-}
-
-/// An object by the two hashes that tell whether it is the same.
-struct Content {
-    explicit Content(const YAMLNode& object)
-        : hash(ContentHash(object)), unordered(ContentHash(object, KeyOrder::CountsNot)) {}
-
-    bool IsSame(const Content& other, KeyOrder order) const {
-        return hash == other.hash || (order == KeyOrder::CountsNot && unordered == other.unordered);
-    }
-
-    std::uint32_t hash, unordered;
-};
-using Contents = std::map<std::string, Content>;
-
-Contents ContentsOf(const YAMLMapping& root) {
-    Contents contents;
-    for (const auto& [id, object] : root) contents.emplace(id->Value(), Content(*object));
-    return contents;
 }
 
 bool Moves(const Operation* operation);
@@ -185,11 +198,13 @@ private:
         const YAMLMapping& changed = m_Changed->GetMapping();
         const KeyOrder order =
             OnlyKeysMove(base.GetMapping(), changed) ? KeyOrder::CountsNot : KeyOrder::Counts;
-        const Contents expected = ContentsOf(changed), actual = ContentsOf(merged->GetMapping());
-        if (actual.size() != expected.size()) return which + " has other objects";
-        for (const auto& [id, content] : expected)
-            if (!actual.contains(id) || !actual.at(id).IsSame(content, order))
-                return which + " has another object " + id;
+        const YAMLMapping& result = merged->GetMapping();
+        if (result.Size() != changed.Size()) return which + " has other objects";
+        for (const auto& [id, object] : changed) {
+            const YAMLNode* actual = result.Get(id);
+            if (!actual || !IsSame(*actual, *object, order))
+                return which + " has another object " + std::string(id->Value());
+        }
         return "";
     }
 

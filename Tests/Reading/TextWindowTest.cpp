@@ -18,6 +18,8 @@ ByteSource InSteps(const std::string& text, std::size_t step) {
     };
 }
 
+constexpr std::size_t kUsualSize = std::size_t{1} << 20;
+
 /// The documents that a window finds, with "|" in front of each.
 std::string Documents(TextWindow window) {
     std::string found;
@@ -28,10 +30,11 @@ std::string Documents(TextWindow window) {
 
 TEST(TextWindow, DocumentsAreTheSameHoweverTheBytesCome) {
     const std::string first = "--- !o!1 &1\na: b!\n- !o!1\n", last = "--- !o!1 &2\nc", all = first + last;
-    for (const std::size_t step : {1, 2, 7, 100})
-        EXPECT_EQ(Documents(TextWindow(InSteps(all, step))), "|" + first + "|" + last);
+    for (const std::size_t size : {std::size_t{1}, std::size_t{20}, kUsualSize})
+        for (const std::size_t step : {1, 2, 7, 100})
+            EXPECT_EQ(Documents(TextWindow(InSteps(all, step), size)), "|" + first + "|" + last);
     EXPECT_EQ(Documents(TextWindow(std::string_view(all))), "|" + first + "|" + last);
-    EXPECT_EQ(Documents(TextWindow(InSteps("", 1))), "");
+    EXPECT_EQ(Documents(TextWindow(InSteps("", 1), kUsualSize)), "");
 }
 
 TEST(TextWindow, DocumentsMayBeLongerThanAnyRoomForThem) {
@@ -40,8 +43,8 @@ TEST(TextWindow, DocumentsMayBeLongerThanAnyRoomForThem) {
         all += "|--- !o!1 &1\n" + std::string(length, 'x') + "\n";
     std::string text = all;
     std::erase(text, '|');
-    EXPECT_TRUE(Documents(TextWindow(InSteps(text, text.size()))) == all);
-    EXPECT_TRUE(Documents(TextWindow(InSteps(text, 999))) == all);
+    EXPECT_TRUE(Documents(TextWindow(InSteps(text, text.size()), kUsualSize)) == all);
+    EXPECT_TRUE(Documents(TextWindow(InSteps(text, 999), kUsualSize)) == all);
 }
 
 /// Whoever looks far ahead at each step makes the window move its bytes only now and then.
@@ -49,10 +52,12 @@ TEST(TextWindow, SmallStepsWithALongViewReadSeldom) {
     constexpr std::size_t kView = 2000000, kStep = 1000;
     const std::string text(5 * kView, 'x');
     std::size_t reads = 0;
-    TextWindow window([&, source = InSteps(text, text.size())](char* bytes, std::size_t size) mutable {
+    const ByteSource counted = [&, source = InSteps(text, text.size())](char* bytes,
+                                                                        std::size_t size) mutable {
         ++reads;
         return source(bytes, size);
-    });
+    };
+    TextWindow window(counted, kUsualSize);
     while (window.Reaches(kView)) window.Skip(kStep);
     EXPECT_LT(reads, 10u);
 }
@@ -60,7 +65,7 @@ TEST(TextWindow, SmallStepsWithALongViewReadSeldom) {
 TEST(TextWindow, TextEndsAtTheFirstNul) {
     using namespace std::string_literals;
     for (const std::size_t step : {1, 3, 100}) {
-        TextWindow window(InSteps("ab\0cd"s, step));
+        TextWindow window(InSteps("ab\0cd"s, step), kUsualSize);
         EXPECT_TRUE(window.Reaches(2));
         EXPECT_FALSE(window.Reaches(3));
         EXPECT_EQ(window.Rest(), "ab");

@@ -71,7 +71,7 @@ void ObjectFile::TakeText(std::string text) {
 
 bool ObjectFile::TakeAlong(ByteSource source, std::size_t size, ObjectFile& base) {
     if (!MayShareWith(base)) return false;
-    TextWindow window(std::move(source));
+    TextWindow window(std::move(source), m_Options.window);
     // One that begins with the header of another object file has the signature.
     const bool hasItsHeader = window.Reaches(base.m_Header.size() + kDocumentStart.size()) &&
                               window.Rest().starts_with(base.m_Header) &&

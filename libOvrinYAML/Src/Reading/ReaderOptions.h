@@ -2,6 +2,7 @@
 
 #include "Values/ObjectTrait.h"
 
+#include <cstddef>
 #include <cstdint>
 
 namespace ovrin_yaml {
@@ -18,6 +19,9 @@ struct ReaderOptions {
     /// Build no tree of an object that all files have in the same words before somebody asks for it. Its
     /// traits are those of ObjectTrait.
     bool recognise = false;
+    /// Bytes of a file that is read along the base which are in memory at once, where its documents allow.
+    /// Big enough to make calls cheap, small enough to stay in the cache.
+    std::size_t window = std::size_t{1} << 20;
 };
 
 } // namespace ovrin_yaml

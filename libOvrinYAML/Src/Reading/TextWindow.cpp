@@ -8,14 +8,8 @@
 
 namespace ovrin_yaml {
 
-namespace {
-
-/// Big enough to make calls cheap, small enough to stay in the cache.
-constexpr std::size_t kWindowSize = std::size_t{1} << 20;
-
-} // namespace
-
-TextWindow::TextWindow(ByteSource source) : m_Source(std::move(source)), m_Bytes(kWindowSize, '\0') {}
+TextWindow::TextWindow(ByteSource source, std::size_t size)
+    : m_Source(std::move(source)), m_Bytes(size, '\0') {}
 
 /// Moves what is left to the front and fills the room behind it, at least half of `wanted` bytes: whoever asks
 /// for as many at each of many small steps shall not have them moved at each.

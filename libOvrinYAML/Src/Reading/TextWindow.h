@@ -13,7 +13,8 @@ using ByteSource = std::function<std::size_t(char* bytes, std::size_t size)>;
 /// A text that is read from front to back, and of which only a part is in memory. It ends at the first NUL.
 class TextWindow {
 public:
-    explicit TextWindow(ByteSource source);
+    /// `size` bytes are in memory at first, more where documents are longer.
+    TextWindow(ByteSource source, std::size_t size);
     /// Of a text that is in memory, which must stay.
     explicit TextWindow(std::string_view text) : m_Rest(text), m_HasEnded(true) {}
 
