@@ -16,7 +16,7 @@ std::string Repaired(const std::string& merged, const std::string& left = "", co
     const std::string failure = ErrorOf([&] {
         const MergeRules rules;
         RecordingConflictResolver resolver(rules, ResolveBase);
-        PostProcessMergeOnly(m.Root(), l.Root(), r.Root(), resolver, run);
+        PostProcessMergeOnly({m.Root(), l.Root(), r.Root(), run}, resolver);
     });
     return failure == "none" ? m.Text() : failure;
 }
@@ -73,7 +73,7 @@ TEST(PostProcess, SidesStayAsTheyAre) {
     Scene merged(side), left(side + kPrefab), right(side);
     const MergeRules rules;
     RecordingConflictResolver resolver(rules, ResolveBase);
-    EXPECT_FALSE(PostProcess(merged.Root(), left.Root(), right.Root(), {}, resolver));
+    EXPECT_FALSE(PostProcess({merged.Root(), left.Root(), right.Root()}, {}, resolver));
     EXPECT_EQ(left.Text(), side + kPrefab);
     EXPECT_EQ(right.Text(), side);
     EXPECT_EQ(merged.Text(), "1107 &3 AnimatorStateMachine: {m_StateMachineTransitions: {}}\n");

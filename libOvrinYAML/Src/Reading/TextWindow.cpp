@@ -11,8 +11,8 @@ namespace ovrin_yaml {
 TextWindow::TextWindow(ByteSource source, std::size_t size)
     : m_Source(std::move(source)), m_Bytes(size, '\0') {}
 
-/// Moves what is left to the front and fills the room behind it, at least half of `wanted` bytes: whoever asks
-/// for as many at each of many small steps shall not have them moved at each.
+/// Moves what is left to the front and fills the room behind it, at least half of `wanted` bytes: whoever
+/// asks for as many at each of many small steps shall not have them moved at each.
 void TextWindow::ReadMore(std::size_t wanted) {
     const std::size_t left = m_Rest.size();
     std::copy_n(m_Rest.data(), left, m_Bytes.data());

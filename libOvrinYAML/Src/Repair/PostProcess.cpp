@@ -1,7 +1,6 @@
 #include "Repair/PostProcess.h"
 
 #include "Repair/ComponentDependencies.h"
-#include "Repair/ObjectAccess.h"
 #include "Repair/ObjectTraits.h"
 #include "Repair/PreProcess.h"
 #include "Repair/TransformCycles.h"
@@ -78,23 +77,23 @@ void RepairDanglingLinks(RepairRoots& roots) {
     roots.RemoveObjects(placeHolders);
 }
 
-} // namespace
-
-void PostProcessMergeOnly(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
-                          ConflictResolver& resolver, const TaskRunner& run) {
-    RepairRoots roots(merged, left, right, run);
+void RepairGraph(RepairRoots& roots, ConflictResolver& resolver) {
     RepairPrefabLinks(roots);
     CheckTransformHierarchy(roots, resolver);
     RepairDanglingLinks(roots);
-    RestoreRepeatedKeys(merged, run);
+    RestoreRepeatedKeys(roots.merged, roots.run);
 }
 
-bool PostProcess(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
-                 const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver,
-                 const TaskRunner& run) {
-    PostProcessMergeOnly(merged, left, right, resolver, run);
+} // namespace
+
+void PostProcessMergeOnly(RepairRoots roots, ConflictResolver& resolver) {
+    RepairGraph(roots, resolver);
+}
+
+bool PostProcess(RepairRoots roots, const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver) {
+    RepairGraph(roots, resolver);
     const std::vector<ComponentDependencyConflict> conflicts =
-        FindComponentDependencyConflicts(merged, left, right, types);
+        FindComponentDependencyConflicts(roots.merged, roots.left, roots.right, types);
     for (const ComponentDependencyConflict& conflict : conflicts)
         resolver.OnComponentDependencyConflict(conflict);
     return !conflicts.empty();

@@ -1,8 +1,8 @@
 #pragma once
 
 #include "Merge/RecordingConflictResolver.h"
+#include "Repair/ObjectAccess.h"
 #include "Repair/YAMLTypeInfo.h"
-#include "Values/TaskRunner.h"
 
 namespace ovrin_yaml {
 
@@ -13,15 +13,11 @@ namespace ovrin_yaml {
 ///  2. parents, and the search for cycles (TransformCycles.h);
 ///  3. dangling prefab links of any object become 0, and a stripped Transform that has one is removed;
 ///  4. the transitions of state machines get their stored form back (PreProcess.h).
-/// Objects that need nothing are told by `run`, many at once, where there is one.
 /// Throws what these throw, and the duplicate-keys YAMLError for a repeated key anywhere in the merged file.
-void PostProcessMergeOnly(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
-                          ConflictResolver& resolver, const TaskRunner& run = {});
+void PostProcessMergeOnly(RepairRoots roots, ConflictResolver& resolver);
 
 /// The same, and then the check of component dependencies (ComponentDependencies.h) by `types`. Returns
 /// whether that found broken ones, each of which is a conflict.
-bool PostProcess(YAMLMapping& merged, const YAMLMapping& left, const YAMLMapping& right,
-                 const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver,
-                 const TaskRunner& run = {});
+bool PostProcess(RepairRoots roots, const YAMLTypeInfoManager& types, RecordingConflictResolver& resolver);
 
 } // namespace ovrin_yaml

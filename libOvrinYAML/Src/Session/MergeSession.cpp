@@ -141,11 +141,13 @@ void MergeSession::Apply(Base base) {
     WithStage(Stage::Apply, [&] { m_MergedDiff->Apply(m_Result->GetMapping(), m_Run, InspectObject); });
 }
 
+RepairRoots MergeSession::RootsOf(OvrinObjects& merged) const {
+    return {merged.GetMapping(), m_Left.GetMapping(), m_Right.GetMapping(), m_Run};
+}
+
 void MergeSession::Repair() {
-    WithStage(Stage::Repair, [&] {
-        m_HasBrokenDependencies = PostProcess(m_Result->GetMapping(), m_Left.GetMapping(),
-                                              m_Right.GetMapping(), m_Types, *m_Resolver, m_Run);
-    });
+    WithStage(Stage::Repair,
+              [&] { m_HasBrokenDependencies = PostProcess(RootsOf(*m_Result), m_Types, *m_Resolver); });
 }
 
 std::unique_ptr<OvrinObjects> MergeSession::Premerge(MergeResolve resolve) {
@@ -157,9 +159,7 @@ std::unique_ptr<OvrinObjects> MergeSession::Premerge(MergeResolve resolve) {
     const YAMLMappingDiff* merged = nullptr;
     WithStage(Stage::Merge, [&] { merged = MergeDiffs(*m_LeftDiff, *m_RightDiff, resolver); });
     WithStage(Stage::Apply, [&] { merged->Apply(root, m_Run, InspectObject); });
-    WithStage(Stage::Repair, [&] {
-        PostProcessMergeOnly(root, m_Left.GetMapping(), m_Right.GetMapping(), resolver, m_Run);
-    });
+    WithStage(Stage::Repair, [&] { PostProcessMergeOnly(RootsOf(*result), resolver); });
     return result;
 }
 

@@ -2,6 +2,7 @@
 
 #include "Diff/MergeRules.h"
 #include "Merge/RecordingConflictResolver.h"
+#include "Repair/ObjectAccess.h"
 #include "Repair/YAMLTypeInfo.h"
 #include "Session/MergeError.h"
 #include "Session/ReadInputs.h"
@@ -109,6 +110,7 @@ public:
 private:
     bool HasRight() const { return m_Names.size() > 2; }
     void DiffOnThreads(StageWatcher* watcher);
+    RepairRoots RootsOf(OvrinObjects& merged) const;
 
     const Threads m_Threads;
     const TaskRunner m_Run;
