@@ -36,7 +36,9 @@ void* AllocateZeroed(std::size_t bytes) {
 
 void* AllocateOnHugePages(std::size_t bytes) {
     if (bytes < kHugePage) return ThrowIfNull(std::malloc(bytes));
-    void* memory = ThrowIfNull(std::aligned_alloc(kHugePage, bytes));
+    // Unlike std::aligned_alloc it takes any size.
+    void* memory = nullptr;
+    if (posix_memalign(&memory, kHugePage, bytes) != 0) throw std::bad_alloc();
     AdviseHugePages(memory, bytes);
     return memory;
 }
