@@ -1,5 +1,6 @@
 #include "MergeRun.h"
 
+#include "TraitsCheck.h"
 #include "TreeComparison.h"
 
 #include "Diff/CheckDiff.h"
@@ -34,7 +35,8 @@ private:
 };
 
 void Check(const char* when, const OvrinObjects& objects, TreeStage stage) {
-    const std::string fault = CheckTree(objects.GetMapping(), stage);
+    std::string fault = CheckTree(objects.GetMapping(), stage);
+    if (fault.empty()) fault = CheckTraits(objects.GetMapping());
     if (!fault.empty()) throw BrokenTree(std::string(when) + ": " + fault);
 }
 
