@@ -7,7 +7,8 @@
 
 namespace ovrin_yaml {
 
-/// The traits (ObjectTrait) of an object, which must not repeat a key anywhere.
+/// The traits (ObjectTrait) of an object. Throws the duplicate-keys YAMLError for a repeated key, unless it
+/// found a prefab link before.
 std::uint8_t InspectObject(const YAMLMapping& object);
 
 /// Whether a mapping that stands under `key` is a prefab link with a target, even if that is empty.

@@ -18,7 +18,8 @@ enum ObjectTrait : std::uint8_t {
     kLacksInstance = 32, ///< nor a link to the prefab instance that would know it
 };
 
-/// Finds the traits of an object that repeats no key. Called from any thread.
+/// Finds the traits of an object. Throws the duplicate-keys YAMLError where it comes across a repeated key.
+/// Called from any thread.
 using ObjectInspector = std::uint8_t (*)(const YAMLMapping& object);
 
 } // namespace ovrin_yaml
